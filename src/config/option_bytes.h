@@ -1,0 +1,44 @@
+// The nine option bytes in which a unit takes, and gives back, the configuration of one port:
+//
+//   flags | actual low, high | virtual low, high | stop left, right | default | neutral
+//
+// Each pulse width is one byte, its tenth. The flag byte:
+//
+//   bit 0-1  output kind + 1
+//   bit 2    something happens on lost communication ...
+//   bit 4      ... move to neutral
+//   bit 5      ... move to default                        (neither: hold)
+//   bit 3    the servo moves at power-up ...
+//   bit 6      ... to neutral
+//   bit 7      ... to default
+#pragma once
+
+#include <array>
+#include <cstdint>
+#include <string>
+#include <variant>
+
+#include "config/channel_config.h"
+
+namespace tendril {
+
+inline constexpr std::size_t kOptionByteCount = 9;
+using OptionBytes = std::array<std::uint8_t, kOptionByteCount>;
+
+inline constexpr std::uint8_t kFlagLostComm = 0x04;
+inline constexpr std::uint8_t kFlagPowerUp = 0x08;
+inline constexpr std::uint8_t kFlagLostCommNeutral = 0x10;
+inline constexpr std::uint8_t kFlagLostCommDefault = 0x20;
+inline constexpr std::uint8_t kFlagPowerUpNeutral = 0x40;
+inline constexpr std::uint8_t kFlagPowerUpDefault = 0x80;
+
+// Why a record cannot be sent, in the words that the person is shown.
+struct InvalidRecord {
+  std::string text;
+};
+
+// Checks `record` field by field and packs it. The first field that is out of its range ends it. How the
+// fields lie to each other is not checked here: that is the editor's business.
+std::variant<OptionBytes, InvalidRecord> EncodeOptions(const ChannelConfig& record);
+
+}  // namespace tendril

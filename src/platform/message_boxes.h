@@ -1,0 +1,31 @@
+// MessageBoxes: how the program speaks up.
+#pragma once
+
+#include <string>
+
+namespace tendril {
+
+enum class BoxIcon { kNone, kExclamation, kCritical };
+
+// One message. Texts are plain UTF-8 with CR LF between lines.
+struct BoxMessage {
+  std::string text;
+  std::string title;
+  BoxIcon icon = BoxIcon::kNone;
+
+  friend bool operator==(const BoxMessage&, const BoxMessage&) = default;
+};
+
+// Shows modal boxes, one at a time as they come. Both calls run the event loop until the person answers: have
+// everything settled before you call. When the program is being closed they return at once.
+class MessageBoxes {
+ public:
+  virtual ~MessageBoxes() = default;
+
+  // A box with an OK button.
+  virtual void Show(const BoxMessage& message) = 0;
+  // A box with Yes and No; true for Yes. Closing it by any other way is a No.
+  virtual bool AskYesNo(const BoxMessage& message) = 0;
+};
+
+}  // namespace tendril

@@ -1,0 +1,75 @@
+// RuntimeError: the one kind of failure that the program raises on purpose.
+#pragma once
+
+#include <cstdint>
+#include <exception>
+#include <string>
+#include <string_view>
+
+namespace tendril {
+
+// Error numbers that the program raises or tells apart. The serial ones follow the published list of the
+// platform's serial control, so that a support person can look them up.
+inline constexpr std::int32_t kErrOverflow = 6;
+inline constexpr std::int32_t kErrOutOfRange = 9;  // an index outside its table
+inline constexpr std::int32_t kErrDivisionByZero = 11;
+inline constexpr std::int32_t kErrInternal = 37;
+inline constexpr std::int32_t kErrNotAllowed = 70;
+inline constexpr std::int32_t kErrPathAccess = 75;
+inline constexpr std::int32_t kErrInvalidPropertyValue = 380;
+inline constexpr std::int32_t kErrUnsupported = 445;       // the object does not support this action
+inline constexpr std::int32_t kErrInvalidPort = 8002;      // no such device
+inline constexpr std::int32_t kErrPortAlreadyOpen = 8005;  // in use, here or in another program
+inline constexpr std::int32_t kErrPortNotOpen = 8012;
+inline constexpr std::int32_t kErrSettingsRefused = 8015;
+inline constexpr std::int32_t kErrReadFault = 8020;
+
+// A failure with a number and a description, as the person sees it. An operation that passes one on adds a
+// line "Trace: ..." to the description, so that the description tells the way that the failure took.
+class RuntimeError : public std::exception {
+ public:
+  // `description` is UTF-8, its lines separated by CR LF. `source` names the part that raised it.
+  RuntimeError(std::int32_t number, std::string description, std::string source = {});
+
+  std::int32_t number() const { return number_; }
+  const std::string& description() const { return description_; }
+  const std::string& source() const { return source_; }
+  const std::string& help_file() const { return help_file_; }
+  std::int32_t help_context() const { return help_context_; }
+  // Where help on this failure is found; empty and 0 unless set.
+  void SetHelp(std::string file, std::int32_t context);
+
+  // Adds a line to the description (a CR LF, then `line`).
+  void AddLine(std::string_view line);
+
+  const char* what() const noexcept override { return description_.c_str(); }
+
+ private:
+  std::int32_t number_;
+  std::string description_;
+  std::string source_;
+  std::string help_file_;
+  std::int32_t help_context_ = 0;
+};
+
+// Describes the exception that is being handled: a RuntimeError's description, any other exception's what(),
+// or "Unknown error". Call it in a catch block only.
+std::string DescribeCurrentFault();
+
+// Runs `operation`; a failure in it goes on with the line `trace` added. What is no RuntimeError becomes one
+// (kErrInternal) on the way, so that no failure loses its trace.
+template <typename Operation>
+decltype(auto) Traced(std::string_view trace, Operation&& operation) {
+  try {
+    return operation();
+  } catch (RuntimeError& error) {
+    error.AddLine(trace);
+    throw;
+  } catch (const std::exception& error) {
+    RuntimeError traced(kErrInternal, error.what());
+    traced.AddLine(trace);
+    throw traced;
+  }
+}
+
+}  // namespace tendril
