@@ -1,0 +1,352 @@
+#include "simulator/servo_simulator.h"
+
+#include <QAccessible>
+#include <QAccessibleWidget>
+#include <QFontMetricsF>
+#include <QKeyEvent>
+#include <QPainter>
+#include <algorithm>
+#include <array>
+#include <cmath>
+#include <exception>
+
+namespace tendril {
+namespace {
+
+// The pulse widths that a unit can hold, microseconds.
+constexpr int kLeastPulse = 10;
+constexpr int kMostPulse = 2550;
+constexpr int kPulseStep = 10;
+
+constexpr int kMargin = 5;  // around the picture
+constexpr double kCornerRadius = 4;
+constexpr int kPressedShade = 112;  // percent, as QColor::darker takes it
+constexpr double kFocusRingWidth = 1.5;
+constexpr double kAngleTextScale = 0.75;  // of the control's font
+constexpr double kLeastTextScale = 0.8;   // text is not made smaller than this part of its full size
+constexpr double kLeastTextPixels = 7;
+constexpr double kPlateRadius = 2;
+constexpr double kPlateOutline = 1;
+
+QColor ToColour(DialColour colour) {
+  return QColor(static_cast<int>(colour & 0xFF), static_cast<int>(colour >> 8 & 0xFF),
+                static_cast<int>(colour >> 16 & 0xFF));
+}
+
+QPointF ToPoint(DialPoint point) { return {point.x, point.y}; }
+
+// Strokes the elements of a dial, its picture's top left corner at the painter's origin.
+class DialPainter {
+ public:
+  DialPainter(QPainter& painter, double picture_width, bool bold_caption)
+      : painter_(painter),
+        scale_(painter.deviceTransform().m11()),
+        picture_width_(picture_width),
+        bold_caption_(bold_caption),
+        font_(painter.font()) {}
+
+  void Stroke(const DialElement& element) {
+    switch (element.shape) {
+      case DialShape::kBox:
+        Box(element);
+        break;
+      case DialShape::kPie:
+        Pie(element);
+        break;
+      case DialShape::kLine:
+        Line(element);
+        break;
+      case DialShape::kLineOutline:
+        LineOutline(element);
+        break;
+      case DialShape::kText:
+        Text(element);
+        break;
+    }
+  }
+
+ private:
+  // The box grown on all sides by `growth`, in whole device pixels: an outline is equally wide on each side.
+  QRectF Grown(const DialElement& box, double growth) const {
+    const double grown = std::round(growth * scale_) / scale_;
+    return QRectF(ToPoint(box.from), ToPoint(box.to)).adjusted(-grown, -grown, grown, grown);
+  }
+
+  void Box(const DialElement& box) {
+    const double straddling = box.line_width / 2;
+    painter_.setRenderHint(QPainter::Antialiasing, false);  // upright edges are crisp without
+    painter_.fillRect(Grown(box, straddling + box.outline_width), ToColour(box.outline));
+    painter_.fillRect(Grown(box, -straddling), ToColour(box.fill));
+    painter_.setRenderHint(QPainter::Antialiasing);
+  }
+
+  void Pie(const DialElement& pie) {
+    constexpr double kSixteenths = 180 * 16 / kDialPi;  // QPainter's unit of angle
+    painter_.setPen(QPen(ToColour(pie.outline), pie.line_width, Qt::SolidLine, Qt::FlatCap, Qt::RoundJoin));
+    painter_.setBrush(ToColour(pie.fill));
+    painter_.drawPie(QRectF(pie.from.x - pie.radius, pie.from.y - pie.radius, 2 * pie.radius, 2 * pie.radius),
+                     static_cast<int>(std::lround(pie.start_angle * kSixteenths)),
+                     static_cast<int>(std::lround(pie.sweep_angle * kSixteenths)));
+  }
+
+  void Line(const DialElement& line) {
+    const Qt::PenCapStyle cap = line.part == DialPart::kArm ? Qt::RoundCap : Qt::FlatCap;
+    painter_.setPen(QPen(ToColour(line.fill), line.line_width, Qt::SolidLine, cap));
+    painter_.drawLine(ToPoint(line.from), ToPoint(line.to));
+  }
+
+  void LineOutline(const DialElement& line) {
+    const QLineF axis(ToPoint(line.from), ToPoint(line.to));
+    const QLineF normal = axis.normalVector().unitVector();
+    const QPointF offset = QPointF(normal.dx(), normal.dy()) * ((line.line_width + line.outline_width) / 2);
+    const std::array<QPointF, 4> contour = {axis.p1() + offset, axis.p2() + offset, axis.p2() - offset,
+                                            axis.p1() - offset};
+    painter_.setPen(QPen(ToColour(line.fill), line.outline_width, Qt::SolidLine, Qt::FlatCap, Qt::MiterJoin));
+    painter_.setBrush(Qt::NoBrush);
+    painter_.drawConvexPolygon(contour.data(), static_cast<int>(contour.size()));
+  }
+
+  // The text is as large as the control's font, or smaller to keep to its room; what would become too small
+  // to read spreads beyond it instead, up to the picture's width. The plate lets it be read wherever it
+  // spreads.
+  void Text(const DialElement& element) {
+    const bool caption = element.part == DialPart::kCaption;
+    const double full_pixels = QFontInfo(font_).pixelSize() * (caption ? 1 : kAngleTextScale);
+    const double least_pixels = std::max(full_pixels * kLeastTextScale, kLeastTextPixels);
+    const double padding = std::round(full_pixels / 6);
+    QString text = QString::fromStdString(element.text);
+    QFont font = font_;
+    font.setBold(caption && bold_caption_);
+    font.setPixelSize(std::max(1, static_cast<int>(full_pixels)));
+    double width = QFontMetricsF(font).horizontalAdvance(text);
+    if (const double room = element.room - 2 * padding; width > room) {
+      font.setPixelSize(static_cast<int>(std::max(least_pixels, full_pixels * room / width)));
+      text = QFontMetricsF(font).elidedText(text, Qt::ElideRight,
+                                            picture_width_ - 2 * (padding + kPlateOutline));
+      width = QFontMetricsF(font).horizontalAdvance(text);
+    }
+    const double plate_width = width + 2 * padding;
+    const QRectF plate(element.from.x - plate_width / 2, element.from.y, plate_width,
+                       QFontMetricsF(font).height());
+    const bool spreads = plate_width > element.room;
+    if (spreads || !caption) {
+      painter_.setPen(spreads ? QPen(ToColour(kBodyOutline), kPlateOutline) : QPen(Qt::NoPen));
+      painter_.setBrush(ToColour(element.fill));
+      painter_.drawRoundedRect(plate, kPlateRadius, kPlateRadius);
+    }
+    painter_.setFont(font);
+    painter_.setPen(Qt::black);
+    painter_.drawText(plate, Qt::AlignCenter | Qt::TextSingleLine, text);
+  }
+
+  QPainter& painter_;
+  const double scale_;  // device pixels in a unit
+  const double picture_width_;
+  const bool bold_caption_;
+  const QFont font_;
+};
+
+// A drawn servo as assistive technology sees it: a button with a name and the arm's pulse width as its value.
+class ServoAccessible : public QAccessibleWidget, public QAccessibleValueInterface {
+ public:
+  explicit ServoAccessible(ServoSimulator* servo)
+      : QAccessibleWidget(servo, QAccessible::Button), servo_(*servo) {}
+
+  static QAccessibleInterface* Create(const QString&, QObject* object) {
+    auto* servo = qobject_cast<ServoSimulator*>(object);
+    return servo != nullptr ? new ServoAccessible(servo) : nullptr;
+  }
+
+  void* interface_cast(QAccessible::InterfaceType type) override {
+    if (type == QAccessible::ValueInterface) return static_cast<QAccessibleValueInterface*>(this);
+    return QAccessibleWidget::interface_cast(type);
+  }
+
+  QString text(QAccessible::Text kind) const override {
+    if (kind == QAccessible::Value) return QStringLiteral("%1 µs").arg(servo_.dial().arm_pulse());
+    if (kind == QAccessible::Name && servo_.accessibleName().isEmpty()) {
+      QString name = QString::fromStdString(servo_.dial().caption());
+      const QLatin1String abbreviation("CHAN ");
+      if (name.startsWith(abbreviation)) name.replace(0, abbreviation.size(), QLatin1String("Channel "));
+      return name;
+    }
+    return QAccessibleWidget::text(kind);
+  }
+
+  QAccessible::State state() const override {
+    QAccessible::State state = QAccessibleWidget::state();
+    state.selectable = true;
+    state.selected = servo_.dial().selected();
+    state.pressed = servo_.isDown();
+    return state;
+  }
+
+  QStringList actionNames() const override { return {pressAction(), setFocusAction()}; }
+
+  void doAction(const QString& action) override {
+    if (action == pressAction()) {
+      servo_.click();
+    } else {
+      QAccessibleWidget::doAction(action);
+    }
+  }
+
+  QVariant currentValue() const override { return static_cast<qlonglong>(servo_.dial().arm_pulse()); }
+  void setCurrentValue(const QVariant&) override {}  // the arm only shows; it is moved by the container
+  QVariant minimumValue() const override { return kLeastPulse; }
+  QVariant maximumValue() const override { return kMostPulse; }
+  QVariant minimumStepSize() const override { return kPulseStep; }
+
+ private:
+  ServoSimulator& servo_;
+};
+
+}  // namespace
+
+ServoSimulator::ServoSimulator(QWidget* parent)
+    : QAbstractButton(parent), announced_pulse_(dial_.arm_pulse()) {
+  [[maybe_unused]] static const bool installed =
+      (QAccessible::installFactory(&ServoAccessible::Create), true);
+  setFocusPolicy(Qt::StrongFocus);
+  setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Expanding);
+  connect(this, &QAbstractButton::clicked, this, &ServoSimulator::Clicked);
+}
+
+void ServoSimulator::SetMovingArm(std::int32_t degrees) {
+  dial_.SetMovingArm(degrees);
+  AnnounceArm();
+}
+
+void ServoSimulator::SetDisplayServoText(bool display) {
+  dial_.SetDisplayServoText(display);
+  DrawServo();
+  Q_EMIT DisplayServoTextChanged();
+}
+
+void ServoSimulator::SetMovingArmPosition(std::int32_t degrees) {
+  SetMovingArm(degrees);
+  DrawServo();
+}
+
+void ServoSimulator::SetMovingArmPositionUS(std::int32_t microseconds) {
+  dial_.SetMovingArmPositionUS(microseconds);
+  AnnounceArm();
+  DrawServo();
+}
+
+void ServoSimulator::SetNeutralPosition(std::int32_t degrees) {
+  dial_.SetNeutralPosition(degrees);
+  DrawServo();
+}
+
+void ServoSimulator::SetDefaultPosition(std::int32_t degrees) {
+  dial_.SetDefaultPosition(degrees);
+  DrawServo();
+}
+
+void ServoSimulator::SetNeutralPositionUS(std::int32_t microseconds) {
+  dial_.SetNeutralPositionUS(microseconds);
+  DrawServo();
+}
+
+void ServoSimulator::SetDefaultPositionUS(std::int32_t microseconds) {
+  dial_.SetDefaultPositionUS(microseconds);
+  DrawServo();
+}
+
+void ServoSimulator::DisplaySize(std::int32_t size) {
+  dial_.DisplaySize(size);
+  updateGeometry();
+  DrawServo();
+}
+
+void ServoSimulator::DisplayCaption(const QString& text) {
+  dial_.DisplayCaption(text.toStdString());
+  QAccessibleEvent event(this, QAccessible::NameChanged);
+  QAccessible::updateAccessibility(&event);
+  DrawServo();
+}
+
+void ServoSimulator::SelectServo(bool selected) {
+  if (selected == dial_.selected()) return;
+  dial_.SelectServo(selected);
+  QAccessible::State changed;
+  changed.selected = true;
+  QAccessibleStateChangeEvent event(this, changed);
+  QAccessible::updateAccessibility(&event);
+  update();
+}
+
+void ServoSimulator::AnnounceArm() {
+  if (dial_.arm_pulse() == announced_pulse_) return;
+  announced_pulse_ = dial_.arm_pulse();
+  QAccessibleValueChangeEvent event(this, static_cast<qlonglong>(announced_pulse_));
+  QAccessible::updateAccessibility(&event);
+}
+
+QSize ServoSimulator::sizeHint() const {
+  if (dial_.sizes() == kSmallSizes) return {110, 110};
+  if (dial_.sizes() == kMediumSizes) return {180, 180};
+  return {320, 320};
+}
+
+QSize ServoSimulator::minimumSizeHint() const {
+  if (dial_.sizes() == kSmallSizes) return {72, 72};
+  if (dial_.sizes() == kMediumSizes) return {120, 120};
+  return {200, 200};
+}
+
+void ServoSimulator::paintEvent(QPaintEvent*) {
+  QPainter painter(this);
+  PaintBackground(painter);
+  painter.translate(kMargin, kMargin);
+  const QSize picture = size() - QSize(2 * kMargin, 2 * kMargin);
+  DialPainter dial_painter(painter, picture.width(), dial_.selected() || dial_.sizes().marker > 0);
+  for (const DialElement& element : dial_.Draw(picture.width(), picture.height())) {
+    try {
+      dial_painter.Stroke(element);
+    } catch (const std::exception&) {
+      // An element that cannot be drawn is missing from the picture; the next one is drawn all the same.
+    }
+  }
+}
+
+void ServoSimulator::PaintBackground(QPainter& painter) const {
+  const QColor face = palette().color(QPalette::Button);
+  const QColor button = isDown() ? face.darker(kPressedShade) : face;
+  const QRectF whole = rect();
+  painter.setPen(Qt::NoPen);
+  painter.fillRect(whole, button);
+  painter.setRenderHint(QPainter::Antialiasing);
+  if (dial_.selected()) {
+    painter.setBrush(ToColour(kSelectedBackground));
+    painter.drawRoundedRect(whole, kCornerRadius, kCornerRadius);
+    painter.fillRect(whole.adjusted(kMargin, kMargin, -kMargin, -kMargin), button);
+  }
+  if (hasFocus()) {
+    const double middle = kMargin / 2.0;
+    painter.setPen(
+        QPen(dial_.selected() ? QColor(Qt::white) : palette().color(QPalette::WindowText), kFocusRingWidth));
+    painter.setBrush(Qt::NoBrush);
+    painter.drawRoundedRect(whole.adjusted(middle, middle, -middle, -middle), kCornerRadius, kCornerRadius);
+  }
+}
+
+void ServoSimulator::resizeEvent(QResizeEvent* event) {
+  QAbstractButton::resizeEvent(event);
+  dial_.ResetAfterResize();
+  DrawServo();
+  Q_EMIT Resized();
+  AnnounceArm();  // only now: an arm that the receiver put back has not moved
+}
+
+void ServoSimulator::keyPressEvent(QKeyEvent* event) {
+  const bool enter = event->key() == Qt::Key_Return || event->key() == Qt::Key_Enter;
+  if (enter && !event->isAutoRepeat()) {
+    click();
+  } else {
+    QAbstractButton::keyPressEvent(event);
+  }
+}
+
+}  // namespace tendril

@@ -1,0 +1,91 @@
+// ServoSimulator: a drawn servo that can be clicked.
+#pragma once
+
+#include <QAbstractButton>
+#include <QString>
+#include <cstdint>
+
+#include "simulator/servo_dial.h"
+
+class QPainter;
+
+namespace tendril {
+
+// Shows one servo channel as a picture. It knows nothing of a configuration: all that it shows comes in by
+// the operations below, in degrees (0 straight up, positive to the right) or in microseconds (longer turns
+// left). Operations that convert raise RuntimeError(kErrOverflow) where 32-bit arithmetic overflows.
+//
+// The whole control is a button: a click with the mouse, the space bar or Enter raises Clicked. The picture
+// lies 5 units inside the control; around it the background tells whether the channel is selected.
+//
+// To assistive technology it is a button with a value: named by accessibleName() or else by its caption
+// ("CHAN 3" is spoken "Channel 3"), its value the arm's pulse width ("1500 µs").
+class ServoSimulator : public QAbstractButton {
+  Q_OBJECT
+
+ public:
+  explicit ServoSimulator(QWidget* parent = nullptr);
+
+  // Set an arc without drawing it. The ...US forms take the lower pulse width first.
+  void SetRange(std::int32_t first, std::int32_t second) { dial_.SetRange(first, second); }
+  void SetRangeUS(std::int32_t first, std::int32_t second) { dial_.SetRangeUS(first, second); }
+  void SetLimit(std::int32_t first, std::int32_t second) { dial_.SetLimit(first, second); }
+  void SetLimitUS(std::int32_t first, std::int32_t second) { dial_.SetLimitUS(first, second); }
+  void SetStops(std::int32_t first, std::int32_t second) { dial_.SetStops(first, second); }
+  void SetStopsUS(std::int32_t first, std::int32_t second) { dial_.SetStopsUS(first, second); }
+  // Sets the arm without drawing it.
+  void SetMovingArm(std::int32_t degrees);
+
+  // Has the picture painted anew; several calls before the next paint cost one.
+  void DrawServo() { update(); }
+
+  // Whether the angles are printed on the picture, in place of the caption.
+  bool DisplayServoText() const { return dial_.DisplayServoText(); }
+  void SetDisplayServoText(bool display);
+
+  // Set the arm or a marker, and draw. A marker that was set once stays shown.
+  void SetMovingArmPosition(std::int32_t degrees);
+  void SetMovingArmPositionUS(std::int32_t microseconds);
+  void SetNeutralPosition(std::int32_t degrees);
+  void SetDefaultPosition(std::int32_t degrees);
+  // Shows where 1500 lay under the neutral pulse so far; `microseconds` is the neutral pulse from then on.
+  void SetNeutralPositionUS(std::int32_t microseconds);
+  void SetDefaultPositionUS(std::int32_t microseconds);
+
+  // Takes a row of drawing sizes, and with it the size that the control asks for: 1 small, 2 medium, any
+  // other value normal.
+  void DisplaySize(std::int32_t size);
+  // Sets the text on the servo's body.
+  void DisplayCaption(const QString& text);
+  // Marks the control as the chosen one, or takes the mark away.
+  void SelectServo(bool selected);
+
+  // What the control shows.
+  const ServoDial& dial() const { return dial_; }
+
+  QSize sizeHint() const override;
+  QSize minimumSizeHint() const override;
+
+ Q_SIGNALS:
+  // The user chose this servo.
+  void Clicked();
+  // The control was resized: range and limit are back at their first values and the arm at 0 degrees. What
+  // the receiver sets now is painted at once; the first values never reach the screen.
+  void Resized();
+  // DisplayServoText was written.
+  void DisplayServoTextChanged();
+
+ protected:
+  void paintEvent(QPaintEvent* event) override;
+  void resizeEvent(QResizeEvent* event) override;
+  void keyPressEvent(QKeyEvent* event) override;
+
+ private:
+  void AnnounceArm();
+  void PaintBackground(QPainter& painter) const;
+
+  ServoDial dial_;
+  std::int64_t announced_pulse_;  // the arm's pulse width that assistive technology knows of
+};
+
+}  // namespace tendril
