@@ -1,0 +1,380 @@
+#include "bench/virtual_serial_device.h"
+
+#include <algorithm>
+#include <charconv>
+#include <limits>
+#include <optional>
+#include <stdexcept>
+#include <string_view>
+
+#include "platform/runtime_error.h"
+
+namespace tendril {
+namespace {
+
+RuntimeError Fault(std::int32_t number, std::string description) {
+  return RuntimeError(number, std::move(description), "Serial port");
+}
+
+// The only settings that the virtual ports do: a speed, no parity, eight data bits, one stop bit.
+std::uint32_t ParseBaud(const std::string& settings) {
+  const std::string_view text = settings;
+  const std::string_view speed = text.substr(0, text.find(','));
+  if (speed.empty()) {
+    throw Fault(kErrInvalidPropertyValue, "The port settings \"" + settings + "\" lack a speed.");
+  }
+  std::uint32_t baud = 0;
+  const auto [end, error] = std::from_chars(speed.data(), speed.data() + speed.size(), baud);
+  if (error != std::errc() || end != speed.data() + speed.size() || baud == 0 ||
+      text.substr(speed.size()) != ",N,8,1") {
+    throw Fault(kErrSettingsRefused, "The serial port does not do \"" + settings + "\".");
+  }
+  return baud;
+}
+
+}  // namespace
+
+// Calls back once after a time. It does so even when an earlier call has not returned, because a message box
+// runs the event loop in it: a timer would not tick then, so another one is taken.
+class VirtualPorts::Alarm {
+ public:
+  Alarm(TimerFactory& timers, std::function<void()> on_alarm)
+      : timers_(timers), on_alarm_(std::move(on_alarm)) {}
+
+  void Set(std::int32_t ms) {
+    Clear();
+    const auto free =
+        std::find_if(slots_.begin(), slots_.end(), [](const auto& slot) { return !slot->ticking; });
+    armed_ = free != slots_.end() ? free->get() : &AddSlot();
+    armed_->timer->SetInterval(ms);
+    armed_->timer->SetEnabled(true);
+  }
+
+  void Clear() {
+    if (armed_ != nullptr) armed_->timer->SetEnabled(false);
+    armed_ = nullptr;
+  }
+
+ private:
+  struct Slot {
+    std::unique_ptr<Timer> timer;
+    bool ticking = false;
+  };
+  struct Ticking {
+    explicit Ticking(Slot& ticking_slot) : slot(ticking_slot) { slot.ticking = true; }
+    ~Ticking() { slot.ticking = false; }
+    Slot& slot;
+  };
+
+  Slot& AddSlot() {
+    Slot& slot = *slots_.emplace_back(std::make_unique<Slot>());
+    slot.timer = timers_.CreateTimer([this, &slot] {
+      const Ticking ticking(slot);
+      Clear();
+      on_alarm_();
+    });
+    return slot;
+  }
+
+  TimerFactory& timers_;
+  std::function<void()> on_alarm_;
+  std::vector<std::unique_ptr<Slot>> slots_;
+  Slot* armed_ = nullptr;
+};
+
+struct VirtualPorts::Port {
+  explicit Port(const VirtualLineOptions& options) : line(options) {}
+
+  VirtualLine line;
+  std::vector<std::unique_ptr<LineUnit>> units;
+  bool plugged_in = true;
+  bool held_by_another = false;
+  bool allowed = true;
+  Device* opener = nullptr;
+};
+
+class VirtualPorts::Device final : public SerialDevice {
+ public:
+  explicit Device(VirtualPorts& ports) : ports_(ports) { ports_.devices_.push_back(this); }
+  ~Device() override {
+    Close();
+    std::erase(ports_.devices_, this);
+  }
+
+  void SetEventHandler(std::function<void(SerialEvent)> handler) override { handler_ = std::move(handler); }
+  bool Exists(std::int32_t number) const override;
+
+  void SetSettings(const std::string& settings) override;
+  void SetPortNumber(std::int32_t number) override;
+  void SetLineOptions(const LineOptions& options) override;
+  void Open() override;
+  void Close() noexcept override;
+  bool IsOpen() const override { return port_ != nullptr || lost_; }
+
+  void SetReceiveThreshold(std::int32_t bytes) override;
+  void SetTransmitThreshold(std::int32_t bytes) override;
+  void SetRts(bool asserted) override;
+  void Write(std::span<const std::uint8_t> bytes) override;
+  Bytes ReadAll() override;
+  void ClearInput() override;
+  std::size_t PendingOutput() const override;
+
+  // The adapter was pulled out. Until the owner is told, the device counts as open: writing goes nowhere, and
+  // what had arrived can be read.
+  void Lose();
+  bool HasEvent() const { return DataIsDue() || overflowed_ || lost_; }
+  // Tells the owner of one event. The owner may do anything in it, also destroy this device.
+  void DeliverEvent();
+
+ private:
+  // The line of the open port; null when the adapter was pulled out.
+  VirtualLine* OpenLine() const;
+  bool DataIsDue() const {
+    return untold_ && options_.receive_threshold > 0 &&
+           input_.size() >= static_cast<std::size_t>(options_.receive_threshold);
+  }
+  void AskAgainAboutInput();
+  void Arrive(std::uint8_t byte);
+  void ForgetInput();
+  void LetGoOfLine();
+
+  VirtualPorts& ports_;
+  std::function<void(SerialEvent)> handler_;
+  std::int32_t number_ = 1;
+  std::uint32_t baud_ = 9600;
+  LineOptions options_;
+  Port* port_ = nullptr;     // while open and plugged in
+  Bytes input_;              // at most options_.input_buffer_size
+  bool untold_ = false;      // kDataReceived is due as soon as enough bytes wait
+  bool overflowed_ = false;  // kReceiveOverflow is due
+  bool lost_ = false;        // kDeviceLost is due; port_ is null then
+};
+
+bool VirtualPorts::Device::Exists(std::int32_t number) const {
+  const auto port = ports_.ports_.find(number);
+  return port != ports_.ports_.end() && port->second->plugged_in;
+}
+
+void VirtualPorts::Device::SetSettings(const std::string& settings) {
+  baud_ = ParseBaud(settings);
+  if (port_ != nullptr) port_->line.SetProgramBaud(baud_, ports_.NowUs());
+}
+
+void VirtualPorts::Device::SetPortNumber(std::int32_t number) {
+  if (number < 1) throw Fault(kErrInvalidPropertyValue, "A port number must be 1 or more.");
+  number_ = number;
+}
+
+void VirtualPorts::Device::SetLineOptions(const LineOptions& options) {
+  if (options.handshaking || !options.binary_input || options.discard_nul ||
+      options.transmit_threshold != 0 || options.input_buffer_size < 1 || options.receive_threshold < 0) {
+    throw Fault(kErrSettingsRefused, "The serial port does not do these line options.");
+  }
+  options_ = options;
+  AskAgainAboutInput();
+}
+
+void VirtualPorts::Device::Open() {
+  const std::string name = "Comm " + std::to_string(number_);
+  if (IsOpen()) throw Fault(kErrPortAlreadyOpen, name + " is open already.");
+  if (!Exists(number_)) {
+    throw Fault(kErrInvalidPort, name + " does not exist. Is its adapter plugged in?");
+  }
+  Port& port = ports_.At(number_);
+  if (!port.allowed) {
+    throw Fault(kErrNotAllowed,
+                "You are not allowed to use " + name +
+                    ". Its device belongs to the group \"dialout\": ask for your user to be added "
+                    "to that group, then log in again.");
+  }
+  if (port.held_by_another || port.opener != nullptr) {
+    throw Fault(kErrPortAlreadyOpen, name + " is in use by another program.");
+  }
+  port_ = &port;
+  port.opener = this;
+  port.line.SetProgramBaud(baud_, ports_.NowUs());
+  port.line.SetProgramHandler([this](std::uint8_t byte, std::uint64_t /*at_us*/) { Arrive(byte); });
+}
+
+void VirtualPorts::Device::Close() noexcept {
+  LetGoOfLine();
+  lost_ = false;
+  ForgetInput();
+  ports_.Schedule();
+}
+
+void VirtualPorts::Device::LetGoOfLine() {
+  if (port_ == nullptr) return;
+  const std::uint64_t now_us = ports_.NowUs();
+  port_->line.DropPendingFromProgram(now_us);
+  port_->line.SetDriver(false, now_us);
+  port_->line.SetProgramHandler({});
+  port_->opener = nullptr;
+  port_ = nullptr;
+}
+
+void VirtualPorts::Device::Lose() {
+  LetGoOfLine();
+  lost_ = true;
+  ports_.Schedule();
+}
+
+VirtualLine* VirtualPorts::Device::OpenLine() const {
+  if (!IsOpen()) throw Fault(kErrPortNotOpen, "Comm " + std::to_string(number_) + " is not open.");
+  return port_ != nullptr ? &port_->line : nullptr;
+}
+
+void VirtualPorts::Device::SetReceiveThreshold(std::int32_t bytes) {
+  if (bytes < 0) throw Fault(kErrInvalidPropertyValue, "A receive threshold must be 0 or more.");
+  options_.receive_threshold = bytes;
+  AskAgainAboutInput();
+}
+
+void VirtualPorts::Device::SetTransmitThreshold(std::int32_t bytes) {
+  if (bytes != 0) throw Fault(kErrInvalidPropertyValue, "The serial port has no event on transmit.");
+}
+
+// What waits may be enough for the new threshold.
+void VirtualPorts::Device::AskAgainAboutInput() {
+  untold_ = !input_.empty();
+  if (port_ != nullptr) ports_.Schedule();
+}
+
+void VirtualPorts::Device::SetRts(bool asserted) {
+  if (VirtualLine* line = OpenLine()) line->SetDriver(asserted, ports_.NowUs());
+}
+
+void VirtualPorts::Device::Write(std::span<const std::uint8_t> bytes) {
+  if (VirtualLine* line = OpenLine()) line->ProgramWrites(bytes, ports_.NowUs());
+  ports_.Schedule();
+}
+
+Bytes VirtualPorts::Device::ReadAll() {
+  if (VirtualLine* line = OpenLine()) line->AdvanceTo(ports_.NowUs());
+  untold_ = false;
+  return std::exchange(input_, {});
+}
+
+void VirtualPorts::Device::ClearInput() {
+  if (VirtualLine* line = OpenLine()) line->AdvanceTo(ports_.NowUs());
+  ForgetInput();
+}
+
+std::size_t VirtualPorts::Device::PendingOutput() const {
+  VirtualLine* line = OpenLine();
+  return line != nullptr ? line->PendingFromProgram(ports_.NowUs()) : 0;
+}
+
+void VirtualPorts::Device::Arrive(std::uint8_t byte) {
+  if (input_.size() >= static_cast<std::size_t>(options_.input_buffer_size)) {
+    overflowed_ = true;
+    return;
+  }
+  input_.push_back(byte);
+  untold_ = true;
+}
+
+void VirtualPorts::Device::ForgetInput() {
+  input_.clear();
+  untold_ = false;
+  overflowed_ = false;
+}
+
+void VirtualPorts::Device::DeliverEvent() {
+  SerialEvent event = SerialEvent::kDeviceLost;
+  if (DataIsDue()) {
+    untold_ = false;
+    event = SerialEvent::kDataReceived;
+  } else if (std::exchange(overflowed_, false)) {
+    event = SerialEvent::kReceiveOverflow;
+  } else {
+    Close();
+  }
+  const std::function<void(SerialEvent)> handler = handler_;
+  if (handler) handler(event);
+}
+
+VirtualPorts::VirtualPorts(Clock& clock, TimerFactory& timers)
+    : clock_(clock), last_ms_(clock.NowMs()), alarm_(std::make_unique<Alarm>(timers, [this] { Pump(); })) {}
+
+VirtualPorts::~VirtualPorts() = default;
+
+VirtualLine& VirtualPorts::AddPort(std::int32_t number, const VirtualLineOptions& options) {
+  if (number < 1 || ports_.contains(number)) {
+    throw std::invalid_argument("a port number is 1 or more and stands for one port");
+  }
+  return ports_.emplace(number, std::make_unique<Port>(options)).first->second->line;
+}
+
+VirtualPorts::Port& VirtualPorts::At(std::int32_t number) { return *ports_.at(number); }
+
+VirtualLine& VirtualPorts::Line(std::int32_t number) { return At(number).line; }
+
+void VirtualPorts::Attach(std::int32_t number, std::unique_ptr<LineUnit> unit) {
+  Port& port = At(number);
+  port.line.AdvanceTo(NowUs());
+  port.line.Attach(*unit);
+  port.units.push_back(std::move(unit));
+}
+
+void VirtualPorts::Detach(std::int32_t number, LineUnit& unit) {
+  Port& port = At(number);
+  port.line.AdvanceTo(NowUs());
+  port.line.Detach(unit);
+  std::erase_if(port.units, [&](const auto& attached) { return attached.get() == &unit; });
+}
+
+void VirtualPorts::SetHeldByAnother(std::int32_t number, bool held) { At(number).held_by_another = held; }
+
+void VirtualPorts::SetAllowed(std::int32_t number, bool allowed) { At(number).allowed = allowed; }
+
+void VirtualPorts::Unplug(std::int32_t number) {
+  Port& port = At(number);
+  port.plugged_in = false;
+  if (port.opener != nullptr) port.opener->Lose();
+}
+
+void VirtualPorts::Replug(std::int32_t number) { At(number).plugged_in = true; }
+
+std::unique_ptr<SerialDevice> VirtualPorts::CreateDevice() { return std::make_unique<Device>(*this); }
+
+std::uint64_t VirtualPorts::NowUs() {
+  const std::uint32_t now_ms = clock_.NowMs();
+  elapsed_ms_ += now_ms - last_ms_;  // unsigned: right across the wrap
+  last_ms_ = now_ms;
+  return elapsed_ms_ * 1000;
+}
+
+void VirtualPorts::Pump() {
+  const std::uint64_t now_us = NowUs();
+  for (const auto& [number, port] : ports_) port->line.AdvanceTo(now_us);
+  while (true) {
+    // The next event is set up before the owner is called: a message box may keep it for long.
+    Schedule();
+    const auto device =
+        std::find_if(devices_.begin(), devices_.end(), [](const Device* each) { return each->HasEvent(); });
+    if (device == devices_.end()) return;
+    (*device)->DeliverEvent();
+  }
+}
+
+void VirtualPorts::Schedule() {
+  const bool event_waits =
+      std::any_of(devices_.begin(), devices_.end(), [](const Device* device) { return device->HasEvent(); });
+  std::optional<std::uint64_t> next_us;
+  for (const auto& [number, port] : ports_) {
+    const auto at_us = port->line.NextEventUs();
+    if (at_us && (!next_us || *at_us < *next_us)) next_us = at_us;
+  }
+  if (!event_waits && !next_us) {
+    alarm_->Clear();
+    return;
+  }
+  const std::uint64_t now_us = NowUs();
+  std::uint64_t wait_ms = 1;  // the least that a timer can wait
+  if (!event_waits && *next_us > now_us) wait_ms = (*next_us - now_us + 999) / 1000;
+  alarm_->Set(
+      static_cast<std::int32_t>(std::min<std::uint64_t>(wait_ms, std::numeric_limits<std::int32_t>::max())));
+}
+
+}  // namespace tendril
