@@ -1,0 +1,35 @@
+// PortSelection: the comm ports that can be chosen, and the opening of the chosen one.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <string>
+#include <vector>
+
+#include "platform/message_boxes.h"
+#include "serial/hw_serial.h"
+
+namespace tendril {
+
+// Title of boxes that have none of their own.
+inline constexpr char kDefaultBoxTitle[] = "Tendril Configuration";
+
+class PortSelection {
+ public:
+  PortSelection(HwSerial& link, MessageBoxes& boxes);
+
+  // Looks for ports 1 to 25 and returns the lines of the list: "Select", then "Comm n" for each that exists.
+  std::vector<std::string> ListCommPorts();
+
+  // Opens the port of line `entry` at once. Line 0, "Select", leaves the port as it is. Shows a failure.
+  void Choose(std::size_t entry);
+
+ private:
+  void ReportPortOpenError(std::int32_t number, const std::string& description);
+
+  HwSerial& link_;
+  MessageBoxes& boxes_;
+  std::vector<std::int16_t> port_table_;  // the port number of each line; 0 for "Select"
+};
+
+}  // namespace tendril

@@ -1,0 +1,17 @@
+// UnitTarget: whom the person has chosen to talk to.
+#pragma once
+
+#include <cstdint>
+
+namespace tendril {
+
+class UnitTarget {
+ public:
+  virtual ~UnitTarget() = default;
+  // Whether a comm port is chosen.
+  virtual bool PortChosen() const = 0;
+  // The unit ID that is chosen now, 0 to 255.
+  virtual std::uint8_t UnitId() const = 0;
+};
+
+}  // namespace tendril

@@ -1,0 +1,378 @@
+#include "unitops/send_operation.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "bench/faulty_units.h"
+#include "serial/hw_serial.h"
+#include "support/recorded_progress.h"
+#include "support/simulated_world.h"
+#include "unitops/unit_commands.h"
+
+namespace tendril::test {
+namespace {
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+using testing::StartsWith;
+
+const BoxMessage kNoResponse{"Unit did not respond to the Option Settings, Retry Command", "No Repsonse",
+                             BoxIcon::kCritical};
+
+struct ChosenTarget final : public UnitTarget {
+  bool PortChosen() const override { return port_chosen; }
+  std::uint8_t UnitId() const override { return unit; }
+  bool port_chosen = true;
+  std::uint8_t unit = 0x01;
+};
+
+class Send : public testing::Test {
+ protected:
+  Send() {
+    link_.SetCommPort(1);
+    link_.SetBaudRate(19200);
+    for (std::size_t slot = 0; slot < kPortCount; ++slot)
+      SetFromPreset(kPresets[kStartPreset], working_.At(slot));
+  }
+
+  // Lets the command run until it has ended. The longest takes three polls for each port, and the pauses.
+  void RunToTheEnd() {
+    ASSERT_TRUE(world_.time.AdvanceUntil([&] { return !commands_.Running().Active(); }, 8 * (3 * 400 + 300)));
+  }
+  void ExpectFailure(const BoxMessage& box) {
+    EXPECT_THAT(world_.boxes.Take(), ElementsAre(box));
+    EXPECT_EQ(progress_.text, "COMMAND FAILED!");
+    EXPECT_EQ(progress_.colour, ProgressColour::kRed);
+    EXPECT_FALSE(commands_.Running().Active());
+  }
+  void ExpectSuccess() {
+    EXPECT_THAT(world_.boxes.Take(), IsEmpty());
+    EXPECT_EQ(progress_.text, "SUCCESS: Send Complete!");
+    EXPECT_EQ(progress_.colour, ProgressColour::kGreen);
+  }
+
+  SimulatedWorld world_;
+  HwSerial link_{*world_.device, world_.time, world_.time, world_.log};
+  RecordedProgress progress_;
+  ChosenTarget target_;
+  ChannelTable working_;
+  UnitCommands commands_{link_, world_.time, world_.boxes, progress_, target_, working_};
+};
+
+// What the program puts on the line of Comm 1.
+Bytes Recorded(VirtualPorts& bench, const std::function<void()>& action) {
+  Bytes bytes;
+  bench.Line(1).SetTap([&](const LineByte& byte) {
+    if (byte.from == LineSide::kProgram) bytes.push_back(byte.value);
+  });
+  action();
+  bench.Line(1).SetTap(nullptr);
+  return bytes;
+}
+
+TEST_F(Send, EveryPort_GoesOutAsUnlockOptionsAndPoll) {
+  struct Case {
+    std::string what;
+    int unit;
+    bool echo;
+    Bytes widths;  // the eight width bytes of each port
+    std::vector<int> checksums;
+  };
+  // Every packet written out by hand. Checksums: 0xAA + 17 + port + 1 + widths + checksum = 0 modulo 256.
+  const std::vector<Case> cases{
+      {"medium range",
+       0x01,
+       true,
+       {60, 240, 100, 200, 100, 200, 150, 150},
+       {0x93, 0x92, 0x91, 0x90, 0x8F, 0x8E, 0x8D, 0x8C}},
+      {"narrow range",
+       0x7F,
+       true,
+       {80, 220, 125, 175, 125, 175, 150, 150},
+       {0x93, 0x92, 0x91, 0x90, 0x8F, 0x8E, 0x8D, 0x8C}},
+      {"wide range",
+       0x01,
+       true,
+       {50, 250, 70, 230, 70, 230, 150, 150},
+       {0x93, 0x92, 0x91, 0x90, 0x8F, 0x8E, 0x8D, 0x8C}},
+      {"the narrowest and the widest pulse",
+       0xFE,
+       false,
+       {1, 255, 1, 255, 1, 255, 1, 255},
+       {0x43, 0x42, 0x41, 0x40, 0x3F, 0x3E, 0x3D, 0x3C}},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.what);
+    SimulatedWorld world;
+    world.bench.AddPort(5, {.echo = c.echo});
+    auto& unit = world.bench.Attach<VirtualUnit>(5, static_cast<std::uint8_t>(c.unit));
+    HwSerial link(*world.device, world.time, world.time, world.log);
+    link.SetCommPort(5);
+    link.SetBaudRate(19200);
+    RecordedProgress progress;
+    ChosenTarget target;
+    target.unit = static_cast<std::uint8_t>(c.unit);
+    ChannelTable working;
+    for (std::size_t slot = 0; slot < kPortCount; ++slot) {
+      SetFromPreset(kPresets[0], working.At(slot));
+      const auto width = [&](std::size_t i) { return c.widths[i] * 10; };
+      working.At(slot).ActualRange = {width(0), width(1)};
+      working.At(slot).VirtualRange = {width(2), width(3)};
+      working.At(slot).VirtualStops = {width(4), width(5)};
+      working.At(slot).DefaultPosition = width(6);
+      working.At(slot).NeutralPosition = width(7);
+    }
+    UnitCommands commands(link, world.time, world.boxes, progress, target, working);
+
+    Bytes sent;
+    world.bench.Line(5).SetTap([&](const LineByte& byte) {
+      if (byte.from == LineSide::kProgram) sent.push_back(byte.value);
+    });
+    commands.Send();
+    ASSERT_TRUE(world.time.AdvanceUntil([&] { return !commands.Running().Active(); }, 10000));
+    EXPECT_EQ(progress.text, "SUCCESS: Send Complete!");
+
+    Bytes expected;
+    const auto id = static_cast<std::uint8_t>(c.unit);
+    for (std::uint8_t port = 1; port <= 8; ++port) {
+      Bytes packets{0, id, 0x8A, 0x56, 0, 0, id, 0x0A, 17, port, 1};
+      packets.insert(packets.end(), c.widths.begin(), c.widths.end());
+      const Bytes rest{static_cast<std::uint8_t>(c.checksums[port - 1u]), 0, 0, id, 0x88, 0x30, 45, 0, 0, 0};
+      packets.insert(packets.end(), rest.begin(), rest.end());
+      expected.insert(expected.end(), packets.begin(), packets.end());
+      EXPECT_EQ(unit.PortOptions(port)[1], c.widths[0]);
+    }
+    EXPECT_EQ(sent, expected);
+    EXPECT_EQ(unit.accepted_commands(), 8u);
+    EXPECT_EQ(world.bench.Line(5).counters().program_talked_into_reply, 0u);
+  }
+}
+
+TEST_F(Send, Ports_FollowEachOther300msAfterTheAcknowledgement) {
+  auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
+  commands_.Send();
+  EXPECT_EQ(commands_.Running().What(), "Sending the configuration to unit 01");
+  ASSERT_TRUE(
+      world_.time.AdvanceUntil([&] { return unit.polls_heard() == 1 && !link_.PollOutstanding(); }, 200));
+  // Nothing until the pause is over.
+  EXPECT_THAT(Recorded(world_.bench, [&] { world_.time.Advance(299); }), ElementsAre(0, 0));
+  EXPECT_THAT(Recorded(world_.bench, [&] { world_.time.Advance(20); }).size(), testing::Gt(10u));
+  RunToTheEnd();
+  ExpectSuccess();
+  EXPECT_TRUE(progress_.shown);
+  world_.time.Advance(3000);
+  EXPECT_FALSE(progress_.shown);
+  EXPECT_EQ(world_.time.RunningTimers(), 0);
+}
+
+TEST_F(Send, BadlyBehavedUnits_EndWithTheStatedOutcome) {
+  struct Case {
+    std::string unit;
+    std::size_t polls;  // that reach the unit
+    bool success;
+  };
+  for (const Case& c : std::vector<Case>{{"mute", 3, false},
+                                         {"wrong-answer", 1, false},
+                                         {"locked", 1, false},
+                                         {"rambling", 8, true},
+                                         {"slow", 8, true},
+                                         {"wrong-address", 3, false},
+                                         {"unfinished", 3, false}}) {
+    SCOPED_TRACE(c.unit);
+    const FaultKind* kind = FindFaultKind(c.unit);
+    ASSERT_NE(kind, nullptr);
+    auto made = kind->make(0x05);
+    VirtualUnit& unit = *made;
+    world_.bench.Attach(1, std::move(made));
+    target_.unit = 0x05;
+    commands_.Send();
+    RunToTheEnd();
+    EXPECT_EQ(unit.polls_heard(), c.polls);
+    if (c.success) {
+      ExpectSuccess();
+    } else {
+      ExpectFailure(kNoResponse);
+    }
+    world_.bench.Detach(1, unit);
+
+    // The program is usable afterwards.
+    auto& good = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x05});
+    commands_.Send();
+    RunToTheEnd();
+    ExpectSuccess();
+    world_.bench.Detach(1, good);
+  }
+}
+
+TEST_F(Send, Flood_EndsByTimeOutWithBoundedMemoryAndTheLinkRecovers) {
+  auto& flooding = world_.bench.Attach<FloodingUnit>(1, std::uint8_t{0x01});
+  commands_.Send();
+  RunToTheEnd();
+  ExpectFailure(kNoResponse);
+  world_.bench.Detach(1, flooding);
+  world_.time.Advance(5000);
+  world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
+  commands_.Send();
+  RunToTheEnd();
+  ExpectSuccess();
+}
+
+TEST_F(Send, LostPolls_AreRepeatedTwiceForEachPort) {
+  auto& unit = world_.bench.Attach<DeafUnit>(1, std::uint8_t{0x01}, std::size_t{2});
+  commands_.Send();
+  RunToTheEnd();
+  ExpectSuccess();
+  EXPECT_EQ(unit.accepted_commands(), 8u);
+}
+
+TEST_F(Send, NobodyThere_FailsAfterThreePollsAndOnePort) {
+  const Bytes sent = Recorded(world_.bench, [&] {
+    commands_.Send();
+    RunToTheEnd();
+  });
+  ExpectFailure(kNoResponse);
+  const Bytes poll{0, 1, 0x88, 0x30, 45, 0};
+  int polls = 0;
+  for (auto at = sent.begin(); (at = std::search(at, sent.end(), poll.begin(), poll.end())) != sent.end();
+       ++at)
+    ++polls;
+  EXPECT_EQ(polls, 3);
+}
+
+TEST_F(Send, UnitFEOnAnEchoingLine_TakesItsOwnEchoForAWrongReply) {
+  world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0xFE});
+  target_.unit = 0xFE;
+  commands_.Send();
+  RunToTheEnd();
+  ExpectFailure(kNoResponse);
+}
+
+TEST_F(Send, AllUnits_GarbleEachOthersReplies) {
+  world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
+  world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x02});
+  target_.unit = 0xFF;
+  commands_.Send();
+  RunToTheEnd();
+  ExpectFailure(kNoResponse);
+  EXPECT_GT(world_.bench.Line(1).counters().garbled_bytes, 0u);
+}
+
+TEST_F(Send, Refusals_AreToldAndStartNothing) {
+  target_.port_chosen = false;
+  commands_.Send();
+  EXPECT_THAT(world_.boxes.Take(),
+              ElementsAre(BoxMessage{"No comm port selected!!!\r\n\r\nYou must select a comm port first.",
+                                     "No Port Selected", BoxIcon::kExclamation}));
+  target_.port_chosen = true;
+  target_.unit = 0x00;
+  commands_.Send();
+  EXPECT_THAT(world_.boxes.Take(), ElementsAre(BoxMessage{"Error sending configuration, Please retry",
+                                                          "Send Error", BoxIcon::kCritical}));
+  EXPECT_FALSE(commands_.Running().Active());
+  EXPECT_FALSE(progress_.shown);
+}
+
+TEST_F(Send, InvalidRecord_StopsBeforeItsPort) {
+  auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
+  for (std::size_t slot = 0; slot < kPortCount; ++slot) working_.At(slot).DefaultPosition = 1200;
+  working_.At(4).ActualRange[0] = 9;
+  bool running_during_the_box = true;
+  world_.boxes.while_open = [&] { running_during_the_box = commands_.Running().Active(); };
+  commands_.Send();
+  RunToTheEnd();
+  EXPECT_THAT(world_.boxes.Take(), ElementsAre(BoxMessage{"Internal Error - Invalid ActualRange(0)=9",
+                                                          "Internal Error", BoxIcon::kNone}));
+  EXPECT_FALSE(running_during_the_box);
+  EXPECT_EQ(unit.accepted_commands(), 4u);
+  EXPECT_EQ(unit.PortOptions(4)[7], 120);
+  EXPECT_EQ(unit.PortOptions(5)[7], 150);
+  // The display is not ended; the next command takes it over.
+  world_.time.Advance(10000);
+  EXPECT_TRUE(progress_.shown);
+  EXPECT_EQ(progress_.text, "");
+  working_.At(4).ActualRange[0] = 10;
+  commands_.Send();
+  RunToTheEnd();
+  ExpectSuccess();
+
+  working_.At(0).PortType = 7;  // the first port: nothing starts at all
+  commands_.Send();
+  EXPECT_THAT(world_.boxes.Take(), ElementsAre(BoxMessage{"Internal Error - Invalid PortType=7",
+                                                          "Internal Error", BoxIcon::kNone}));
+  EXPECT_FALSE(commands_.Running().Active());
+}
+
+TEST_F(Send, UnpluggedWhilePolling_IsASerialEventErrorOfTheRepeat) {
+  world_.bench.Attach<MuteUnit>(1, std::uint8_t{0x01});
+  commands_.Send();
+  world_.time.Advance(60);
+  ASSERT_TRUE(link_.PollOutstanding());
+  world_.bench.Unplug(1);
+  RunToTheEnd();
+  ASSERT_EQ(world_.boxes.shown.size(), 1u);
+  EXPECT_THAT(world_.boxes.shown[0].text,
+              StartsWith("Serial Event Error (Poll Type 48)\r\n\r\nOpen of serial port 1 has failed\r\n"));
+  EXPECT_EQ(world_.boxes.shown[0].title, "Serial Event Error");
+  EXPECT_EQ(progress_.text, "COMMAND FAILED!");
+  EXPECT_FALSE(link_.PortOpen());
+}
+
+TEST_F(Send, UnpluggedBetweenTwoPorts_IsADownloadFailure) {
+  auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
+  commands_.Send();
+  ASSERT_TRUE(
+      world_.time.AdvanceUntil([&] { return unit.polls_heard() == 2 && !link_.PollOutstanding(); }, 1000));
+  world_.bench.Unplug(1);
+  RunToTheEnd();
+  ASSERT_EQ(world_.boxes.shown.size(), 1u);
+  EXPECT_THAT(world_.boxes.shown[0].text,
+              StartsWith("Download Failed\r\nOpen of serial port 1 has failed\r\n"));
+  EXPECT_EQ(world_.boxes.shown[0].title, "Comm Error!");
+  EXPECT_EQ(world_.boxes.shown[0].icon, BoxIcon::kCritical);
+  EXPECT_EQ(progress_.text, "COMMAND FAILED!");
+  world_.boxes.Take();
+
+  // Still gone: the start itself fails. Back again: it works, without choosing the port anew.
+  commands_.Send();
+  EXPECT_THAT(world_.boxes.shown.at(0).text, StartsWith("Download Failed\r\n"));
+  world_.boxes.Take();
+  world_.bench.Replug(1);
+  commands_.Send();
+  RunToTheEnd();
+  ExpectSuccess();
+}
+
+TEST_F(Send, BrokenCommandLog_FailsTheCommandInWords) {
+  world_.log.broken = true;
+  commands_.Send();
+  ASSERT_EQ(world_.boxes.shown.size(), 1u);
+  EXPECT_EQ(
+      world_.boxes.shown[0].text,
+      "Download Failed\r\nThe command log cannot be written\r\nTrace: SendCommand\r\nTrace: SendUnlockCmd\r\n"
+      "Trace: Fade");
+}
+
+TEST_F(Send, SecondStartWhileOneRuns_IsIgnored) {
+  auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
+  commands_.Send();
+  world_.time.Advance(700);
+  commands_.Send();
+  RunToTheEnd();
+  ExpectSuccess();
+  EXPECT_EQ(unit.accepted_commands(), 8u);
+}
+
+TEST_F(Send, StoppedByTheClosingWindow_SaysNothingMore) {
+  world_.bench.Attach<MuteUnit>(1, std::uint8_t{0x01});
+  commands_.Send();
+  world_.time.Advance(50);
+  commands_.Stop();
+  world_.time.Advance(60000);
+  EXPECT_THAT(world_.boxes.Take(), IsEmpty());
+}
+
+}  // namespace
+}  // namespace tendril::test
