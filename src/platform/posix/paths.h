@@ -1,0 +1,19 @@
+// Where the program keeps its files. Each system compiles its own implementation: posix/ or windows/.
+#pragma once
+
+#include <filesystem>
+
+namespace tendril {
+
+#ifndef _WIN32
+// `$XDG_CONFIG_HOME/kelvane`, by default `~/.config/kelvane`. Not created.
+std::filesystem::path ConfigFolder();
+
+// `$XDG_STATE_HOME/kelvane`, by default `~/.local/state/kelvane`. Not created.
+std::filesystem::path StateFolder();
+#endif
+
+// The text file that unit-wide commands are logged to. Neither it nor its folder is created.
+std::filesystem::path CommandLogPath();
+
+}  // namespace tendril

@@ -1,0 +1,81 @@
+#include "platform/posix/port_names.h"
+
+#include <algorithm>
+#include <array>
+#include <fstream>
+#include <string>
+#include <string_view>
+#include <system_error>
+#include <vector>
+
+#include "platform/posix/paths.h"
+
+namespace tendril {
+namespace {
+
+namespace fs = std::filesystem;
+
+// What the serial drivers of Linux report as a UART's type when they found none.
+constexpr int kNoUart = 0;
+
+#ifdef __APPLE__
+
+fs::path DeviceAt(std::int32_t number) {
+  std::vector<fs::path> devices;
+  std::error_code ignored;
+  for (const fs::directory_entry& entry : fs::directory_iterator("/dev", ignored)) {
+    if (entry.path().filename().string().starts_with("cu.")) devices.push_back(entry.path());
+  }
+  std::sort(devices.begin(), devices.end());
+  const auto index = static_cast<std::size_t>(number - 1);
+  return index < devices.size() ? devices[index] : fs::path();
+}
+
+#else
+
+// A run of port numbers that belong to one driver's devices, counted from 0.
+struct DriverRange {
+  std::int32_t first_number;
+  std::int32_t last_number;
+  std::string_view device_prefix;
+};
+
+constexpr std::array<DriverRange, 3> kDriverRanges = {{
+    {1, 4, "/dev/ttyS"},      // built in
+    {5, 14, "/dev/ttyUSB"},   // USB adapters with a chip of their own
+    {15, 24, "/dev/ttyACM"},  // USB adapters of the modem class
+}};
+
+fs::path DeviceAt(std::int32_t number) {
+  for (const DriverRange& range : kDriverRanges) {
+    if (number >= range.first_number && number <= range.last_number) {
+      return std::string(range.device_prefix) + std::to_string(number - range.first_number);
+    }
+  }
+  return {};
+}
+
+#endif
+
+}  // namespace
+
+fs::path DefaultSerialDevice(std::int32_t number) { return number >= 1 ? DeviceAt(number) : fs::path(); }
+
+bool DriverFoundHardware(const fs::path& device, const fs::path& tty_class) {
+  std::ifstream file(tty_class / device.filename() / "type");
+  int type = kNoUart;
+  return !(file >> type) || type != kNoUart;  // only UART drivers have a type to tell
+}
+
+std::optional<fs::path> FindSerialDevice(std::int32_t number) {
+  std::error_code error;
+  fs::path device = ConfigFolder() / "ports" / ("com" + std::to_string(number));
+  if (!fs::exists(fs::symlink_status(device, error))) device = DefaultSerialDevice(number);
+  if (device.empty()) return std::nullopt;
+
+  device = fs::canonical(device, error);
+  if (error || !fs::is_character_file(device, error) || !DriverFoundHardware(device)) return std::nullopt;
+  return device;
+}
+
+}  // namespace tendril

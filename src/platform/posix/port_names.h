@@ -1,0 +1,31 @@
+// Which device stands behind a comm port number. Each system compiles its own implementation: posix/ or
+// windows/.
+//
+//   Windows        COM<n>
+//   Linux, macOS   the link com<n> in the folder `ports` of the configuration folder, if there is one; else
+//     Linux        1-4 /dev/ttyS0-3, 5-14 /dev/ttyUSB0-9, 15-24 /dev/ttyACM0-9
+//     macOS        the /dev/cu.* devices in order of name
+#pragma once
+
+#include <cstdint>
+#include <filesystem>
+#include <optional>
+
+namespace tendril {
+
+// The device behind port `number` (1 = the first), links resolved; nothing when there is none. A link whose
+// device is gone is no port, and the device it stands in for is not tried instead. Never opens a device:
+// opening one would pull its control lines.
+std::optional<std::filesystem::path> FindSerialDevice(std::int32_t number);
+
+#ifndef _WIN32
+// The device that port `number` has without a link; empty when the number has none. It need not exist.
+std::filesystem::path DefaultSerialDevice(std::int32_t number);
+
+// False when the driver says that no hardware is behind its device: Linux keeps /dev/ttyS nodes for UARTs
+// that a machine could have. `tty_class` is the folder in which the drivers describe their devices.
+bool DriverFoundHardware(const std::filesystem::path& device,
+                         const std::filesystem::path& tty_class = "/sys/class/tty");
+#endif
+
+}  // namespace tendril

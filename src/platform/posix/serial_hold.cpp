@@ -1,0 +1,162 @@
+#include "platform/posix/serial_hold.h"
+
+#include <fcntl.h>
+#include <grp.h>
+#include <poll.h>
+#include <pwd.h>
+#include <sys/file.h>
+#include <sys/ioctl.h>
+#include <sys/stat.h>
+#include <termios.h>
+#include <unistd.h>
+#ifdef __linux__
+#include <linux/serial.h>
+#endif
+
+#include <algorithm>
+#include <cerrno>
+#include <string_view>
+#include <system_error>
+
+#include "platform/runtime_error.h"
+
+namespace tendril {
+namespace {
+
+namespace fs = std::filesystem;
+
+constexpr char kSource[] = "SerialHold";
+
+RuntimeError Busy(const fs::path& device) {
+  return {kErrPortAlreadyOpen, device.string() + " is in use by another program.", kSource};
+}
+
+RuntimeError NoSuchDevice(const fs::path& device) {
+  return {kErrInvalidPort, "There is no serial device at " + device.string() + ".", kSource};
+}
+
+DeviceAccess LookUpAccess(const fs::path& device) {
+  DeviceAccess access;
+  access.device = device.string();
+
+  struct stat about {};
+  ::stat(device.c_str(), &about);
+  constexpr mode_t kGroupReadWrite = S_IRGRP | S_IWGRP;
+  access.group_may_use = (about.st_mode & kGroupReadWrite) == kGroupReadWrite;
+  const passwd* user = ::getpwuid(::geteuid());
+  if (user != nullptr) access.user = user->pw_name;
+  const group* owner = ::getgrgid(about.st_gid);
+  access.group = owner != nullptr ? owner->gr_name : std::to_string(about.st_gid);
+  if (user != nullptr && owner != nullptr) {
+    for (char** member = owner->gr_mem; *member != nullptr; ++member) {
+      access.user_is_member = access.user_is_member || access.user == *member;
+    }
+  }
+  return access;
+}
+
+int OpenDevice(const fs::path& device) {
+  // Non-blocking: otherwise opening waits for a modem's carrier.
+  const int descriptor = ::open(device.c_str(), O_RDWR | O_NOCTTY | O_NONBLOCK | O_CLOEXEC);
+  if (descriptor >= 0) return descriptor;
+  switch (errno) {
+    case EACCES:
+    case EPERM:
+      throw RuntimeError(kErrNotAllowed, ExplainNotAllowed(LookUpAccess(device)), kSource);
+    case EBUSY:
+      throw Busy(device);
+    case ENOENT:
+    case ENOTDIR:
+    case ENODEV:
+    case ENXIO:
+    case EIO:  // the far end of a pseudo-terminal is gone
+      throw NoSuchDevice(device);
+    default:
+      throw RuntimeError(
+          kErrInvalidPort,
+          device.string() + " cannot be opened: " + std::generic_category().message(errno) + ".", kSource);
+  }
+}
+
+#ifdef TIOCGEXCL
+// Whether any descriptor but `own` is open on the device, as far as this user may see.
+bool OpenElsewhere(const fs::path& device, int own) {
+  std::error_code error;
+  const std::string self = std::to_string(::getpid());
+  for (const fs::directory_entry& process : fs::directory_iterator("/proc", error)) {
+    const std::string id = process.path().filename().string();
+    if (id.find_first_not_of("0123456789") != std::string::npos) continue;
+    for (fs::directory_iterator entry(process.path() / "fd", error), end; !error && entry != end;
+         entry.increment(error)) {
+      if (id == self && entry->path().filename() == std::to_string(own)) continue;
+      std::error_code closed_meanwhile;
+      if (fs::read_symlink(entry->path(), closed_meanwhile) == device) return true;
+    }
+  }
+  return false;
+}
+
+// Only the superuser gets this far on a device in exclusive mode. The mode of a pseudo-terminal outlives a
+// program that was killed, so it says "in use" only while somebody has the device open.
+bool HeldExclusively(const fs::path& device, int own) {
+  int exclusive = 0;
+  return ::ioctl(own, TIOCGEXCL, &exclusive) == 0 && exclusive != 0 && OpenElsewhere(device, own);
+}
+#else
+bool HeldExclusively(const fs::path& /*device*/, int /*own*/) { return false; }
+#endif
+
+}  // namespace
+
+SerialHold::SerialHold(const fs::path& device) : SerialHold(OpenDevice(device)) {
+  device_ = device;
+  if (::isatty(descriptor_) == 0) throw NoSuchDevice(device);
+  if (::flock(descriptor_, LOCK_EX | LOCK_NB) != 0 && errno == EWOULDBLOCK) throw Busy(device);
+  if (HeldExclusively(device, descriptor_)) throw Busy(device);
+}
+
+SerialHold::~SerialHold() { ::close(descriptor_); }
+
+bool SerialHold::DeviceGone() const {
+  pollfd state = {descriptor_, 0, 0};
+  return ::poll(&state, 1, 0) > 0 && (state.revents & (POLLHUP | POLLERR | POLLNVAL)) != 0;
+}
+
+std::size_t SerialHold::QueuedOutput() const {
+  int bytes = 0;
+  if (::ioctl(descriptor_, TIOCOUTQ, &bytes) != 0) return 0;
+  return static_cast<std::size_t>(std::max(bytes, 0));
+}
+
+void SerialHold::AskForLowLatency() const {
+#ifdef __linux__
+  serial_struct settings = {};
+  if (::ioctl(descriptor_, TIOCGSERIAL, &settings) != 0) return;
+  settings.flags |= ASYNC_LOW_LATENCY;
+  (void)::ioctl(descriptor_, TIOCSSERIAL, &settings);
+#endif
+}
+
+std::string ExplainNotAllowed(const DeviceAccess& access) {
+  std::string text = "You are not allowed to use " + access.device + ". ";
+  // The superuser's own group opens far more than a serial port: nobody is advised to join it.
+  const bool group_helps = access.group_may_use && access.group != "root" && access.group != "wheel";
+  if (!group_helps) {
+    return text + "It belongs to the group \"" + access.group +
+           "\", and joining that group is not the way: ask the person who looks after this computer for "
+           "access.";
+  }
+  text += "It belongs to the group \"" + access.group + "\"";
+  if (access.user_is_member) {
+    return text + ", which you have joined: log out and in again for that to take effect.";
+  }
+  const std::string user = access.user.empty() ? "YOUR-USER-NAME" : access.user;
+#ifdef __APPLE__
+  const std::string command = "sudo dseditgroup -o edit -a " + user + " -t user " + access.group;
+#else
+  const std::string command = "sudo usermod -aG " + access.group + " " + user;
+#endif
+  return text + ": run \"" + command + "\", then log out and in again.";
+}
+
+}  // namespace tendril

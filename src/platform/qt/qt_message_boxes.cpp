@@ -1,0 +1,84 @@
+#include "platform/qt/qt_message_boxes.h"
+
+#include <QApplication>
+#include <QEventLoop>
+#include <QString>
+
+namespace tendril {
+namespace {
+
+constexpr char kBoxName[] = "messageBox";
+
+// How a box's event loop ends when the box is gone; any other way, the program ends.
+constexpr int kSettled = 0x5E77;
+
+QMessageBox::Icon QtIcon(BoxIcon icon) {
+  switch (icon) {
+    case BoxIcon::kNone:
+      return QMessageBox::NoIcon;
+    case BoxIcon::kExclamation:
+      return QMessageBox::Warning;
+    case BoxIcon::kCritical:
+      return QMessageBox::Critical;
+  }
+  return QMessageBox::NoIcon;
+}
+
+}  // namespace
+
+QtMessageBoxes::QtMessageBoxes() {
+  QObject::connect(qApp, &QCoreApplication::aboutToQuit, &context_, [this] { closing_ = true; });
+}
+
+QtMessageBoxes::~QtMessageBoxes() { CloseAll(); }
+
+void QtMessageBoxes::CloseAll() {
+  closing_ = true;
+  const std::vector<QMessageBox*> open = open_;
+  for (QMessageBox* box : open) box->reject();
+}
+
+void QtMessageBoxes::Show(const BoxMessage& message) { Ask(message, QMessageBox::Ok); }
+
+bool QtMessageBoxes::AskYesNo(const BoxMessage& message) {
+  return Ask(message, QMessageBox::Yes | QMessageBox::No) == QMessageBox::Yes;
+}
+
+QMessageBox::StandardButton QtMessageBoxes::Ask(const BoxMessage& message,
+                                                QMessageBox::StandardButtons buttons) {
+  if (closing_) return QMessageBox::NoButton;
+
+  // On the heap, because the parent may take the box with it.
+  const QPointer<QMessageBox> box = new QMessageBox(parent_);
+  box->setObjectName(QLatin1String(kBoxName));
+  box->setTextFormat(Qt::PlainText);  // otherwise a text with a "<" in it could turn into rich text
+  box->setTextInteractionFlags(Qt::TextSelectableByMouse);
+  box->setText(QString::fromStdString(message.text).replace(QLatin1String("\r\n"), QLatin1String("\n")));
+  box->setWindowTitle(QString::fromStdString(message.title));
+  box->setIcon(QtIcon(message.icon));
+  box->setStandardButtons(buttons);
+
+  // The box's own exec() does not tell an answer from a quit, which closes the box like a person and then
+  // ends every event loop.
+  QEventLoop loop;
+  const auto settle = [&loop] { loop.exit(kSettled); };
+  QObject::connect(box, &QMessageBox::finished, &loop, settle);
+  QObject::connect(box, &QObject::destroyed, &loop, settle);
+
+  const QPointer<QObject> alive = &context_;
+  QMessageBox* const opened = box;
+  open_.push_back(opened);
+  box->setModal(true);
+  box->show();
+  const bool ended_from_outside = loop.exec() != kSettled;
+  if (alive) {
+    std::erase(open_, opened);
+    closing_ = closing_ || ended_from_outside;
+  }
+  if (!box) return QMessageBox::NoButton;
+  const QMessageBox::StandardButton answer = box->standardButton(box->clickedButton());
+  delete box;
+  return answer;
+}
+
+}  // namespace tendril

@@ -1,0 +1,165 @@
+#include "platform/qt/qt_tcp_socket.h"
+
+#include <QCoreApplication>
+#include <QHostAddress>
+#include <QNetworkProxy>
+#include <QTimer>
+#include <algorithm>
+#include <utility>
+
+namespace tendril {
+namespace {
+
+// Received bytes that wait in the program at most. When they are not taken, the peer is held back.
+constexpr qint64 kReadBufferBytes = 64 * 1024;
+
+// How long a closed connection may go on sending what it was given before.
+constexpr int kLingerMs = 5000;
+
+// The platform's published socket error numbers.
+constexpr std::int32_t kOperationFailed = 10000;
+constexpr std::int32_t kNetworkUnreachable = 10051;
+constexpr std::int32_t kConnectionReset = 10054;
+constexpr std::int32_t kTimedOut = 10060;
+constexpr std::int32_t kConnectionRefused = 10061;
+constexpr std::int32_t kHostNotFound = 11001;
+
+std::int32_t ErrorNumber(QAbstractSocket::SocketError error) {
+  if (error == QAbstractSocket::ConnectionRefusedError) return kConnectionRefused;
+  if (error == QAbstractSocket::RemoteHostClosedError) return kConnectionReset;
+  if (error == QAbstractSocket::HostNotFoundError) return kHostNotFound;
+  if (error == QAbstractSocket::SocketTimeoutError) return kTimedOut;
+  if (error == QAbstractSocket::NetworkError) return kNetworkUnreachable;
+  return kOperationFailed;
+}
+
+// A socket that connects to a closed port of its own machine may be given that very port as its own, and is
+// then connected to itself.
+bool IsConnectedToItself(const QTcpSocket& socket) {
+  return socket.localPort() == socket.peerPort() && socket.localAddress() == socket.peerAddress();
+}
+
+// Closes the connection. What was given to it before still goes out, after this call if need be. Until then
+// what the peer sends is read and dropped: a connection that ends with something unread is cut off, and with
+// it what the peer has yet to read. (Qt's own way of closing stops reading first.)
+void Retire(std::unique_ptr<QTcpSocket> socket) {
+  if (!socket || socket->state() != QAbstractSocket::ConnectedState) return;
+  socket->readAll();
+  if (socket->waitForReadyRead(0)) socket->readAll();
+  socket->flush();
+  if (socket->bytesToWrite() == 0 || socket->state() != QAbstractSocket::ConnectedState) return;
+
+  QTcpSocket* const lingering = socket.release();
+  lingering->setParent(QCoreApplication::instance());
+  QObject::connect(lingering, &QTcpSocket::readyRead, lingering, &QTcpSocket::readAll);
+  QObject::connect(lingering, &QTcpSocket::bytesWritten, lingering, [lingering] {
+    if (lingering->bytesToWrite() == 0) lingering->disconnectFromHost();
+  });
+  QObject::connect(lingering, &QTcpSocket::disconnected, lingering, &QObject::deleteLater);
+  QTimer::singleShot(kLingerMs, lingering, &QTcpSocket::abort);
+}
+
+}  // namespace
+
+QtTcpSocket::QtTcpSocket(FaultHandler on_fault) : on_fault_(std::move(on_fault)) {}
+
+QtTcpSocket::~QtTcpSocket() { Close(); }
+
+void QtTcpSocket::SetEvents(TcpEvents events) { events_ = std::move(events); }
+
+void QtTcpSocket::Connect(const std::string& host, std::uint16_t port) {
+  Close();
+  socket_ = std::make_unique<QTcpSocket>();
+  QTcpSocket* const socket = socket_.get();
+  socket->setProxy(QNetworkProxy::NoProxy);  // the connection never leaves for where a proxy would be
+  socket->setReadBufferSize(kReadBufferBytes);
+  QObject::connect(socket, &QTcpSocket::connected, &context_, [this] { OnConnected(); });
+  QObject::connect(socket, &QTcpSocket::readyRead, &context_, [this] {
+    data_noted_ = true;
+    PostDelivery();
+  });
+  // A refusal comes with an error and nothing else, a peer's close with an error while still connected and
+  // a `disconnected` afterwards: whichever is first ends the attempt.
+  QObject::connect(socket, &QTcpSocket::errorOccurred, &context_, [this, socket] {
+    NoteEnd({ErrorNumber(socket->error()), socket->errorString().toStdString()});
+  });
+  QObject::connect(socket, &QTcpSocket::disconnected, &context_, [this] {
+    NoteEnd({kConnectionReset, "The connection was closed"});
+  });
+
+  const QHostAddress address(QString::fromStdString(host));
+  if (address.isNull()) return NoteEnd({kHostNotFound, "\"" + host + "\" is no numeric address"});
+  const bool ipv6 = address.protocol() == QAbstractSocket::IPv6Protocol;
+  const QHostAddress any(ipv6 ? QHostAddress::AnyIPv6 : QHostAddress::AnyIPv4);
+  if (local_port_ != 0 && !socket->bind(any, local_port_)) {
+    return NoteEnd({ErrorNumber(socket->error()), socket->errorString().toStdString()});
+  }
+  socket->connectToHost(address, port);
+}
+
+void QtTcpSocket::Close() {
+  if (socket_) socket_->disconnect(&context_);
+  Retire(std::move(socket_));
+  connected_ = connected_noted_ = data_noted_ = false;
+  end_noted_.reset();
+}
+
+bool QtTcpSocket::IsConnected() const { return connected_; }
+
+void QtTcpSocket::Send(std::span<const std::uint8_t> bytes) {
+  if (!connected_ || socket_->state() != QAbstractSocket::ConnectedState) return;
+  socket_->write(reinterpret_cast<const char*>(bytes.data()), static_cast<qint64>(bytes.size()));
+  socket_->flush();
+}
+
+Bytes QtTcpSocket::Receive(std::size_t limit) {
+  if (!connected_) return {};
+  const auto most = static_cast<qint64>(std::min(limit, static_cast<std::size_t>(kReadBufferBytes)));
+  const QByteArray bytes = socket_->read(most);
+  return {bytes.begin(), bytes.end()};
+}
+
+std::uint16_t QtTcpSocket::LocalPort() const { return connected_ ? socket_->localPort() : local_port_; }
+
+void QtTcpSocket::OnConnected() {
+  if (IsConnectedToItself(*socket_)) {
+    NoteEnd({kConnectionRefused, "Connection refused"});
+    return socket_->abort();
+  }
+  connected_noted_ = true;
+  PostDelivery();
+}
+
+void QtTcpSocket::NoteEnd(End end) {
+  if (end_noted_) return;
+  end_noted_ = std::move(end);
+  PostDelivery();
+}
+
+void QtTcpSocket::PostDelivery() {
+  if (std::exchange(delivery_posted_, true)) return;
+  QMetaObject::invokeMethod(
+      &context_, [this] { DeliverNext(); }, Qt::QueuedConnection);
+}
+
+void QtTcpSocket::DeliverNext() {
+  delivery_posted_ = false;
+  std::function<void()> event;
+  if (std::exchange(connected_noted_, false)) {
+    connected_ = true;
+    event = events_.connected;
+  } else if (std::exchange(data_noted_, false)) {
+    event = events_.data_arrived;
+  } else if (end_noted_) {
+    event = [ended = events_.ended, end = *std::move(end_noted_)] {
+      if (ended) ended(end.number, end.description);
+    };
+    Close();
+  }
+  if (connected_noted_ || data_noted_ || end_noted_) PostDelivery();
+
+  // The event may close, reconnect or destroy this object: nothing of it is touched any more.
+  if (event) CallGuarded(FaultHandler(on_fault_), event);
+}
+
+}  // namespace tendril

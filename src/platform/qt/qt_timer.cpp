@@ -1,0 +1,77 @@
+#include "platform/qt/qt_timer.h"
+
+#include <QPointer>
+#include <QTimer>
+#include <utility>
+
+#include "platform/runtime_error.h"
+
+namespace tendril {
+namespace {
+
+class QtTimer final : public Timer {
+ public:
+  QtTimer(std::function<void()> on_tick, FaultHandler on_fault)
+      : tick_(std::make_shared<Tick>(Tick{std::move(on_tick), std::move(on_fault)})) {
+    timer_.setTimerType(Qt::PreciseTimer);  // the other types fire up to 5 % early
+    QObject::connect(&timer_, &QTimer::timeout, &timer_, [this] { OnTimeout(); });
+  }
+
+  void SetInterval(std::int32_t ms) override {
+    if (ms < 0) throw RuntimeError(kErrInvalidPropertyValue, "A timer's interval cannot be negative.");
+    interval_ms_ = ms;
+    BeginPeriod();
+  }
+  std::int32_t Interval() const override { return interval_ms_; }
+
+  void SetEnabled(bool enabled) override {
+    enabled_ = enabled;
+    BeginPeriod();
+  }
+  bool Enabled() const override { return enabled_; }
+
+ private:
+  // Outlives the timer when the tick itself leads to the timer's end.
+  struct Tick {
+    std::function<void()> on_tick;
+    FaultHandler on_fault;
+    bool running = false;
+  };
+
+  void BeginPeriod() {
+    if (enabled_ && interval_ms_ > 0) {
+      timer_.start(interval_ms_);
+    } else {
+      timer_.stop();
+    }
+  }
+
+  void OnTimeout() {
+    // Qt keeps a timer from ticking inside its own tick, but forgets it when the tick starts a new period.
+    if (tick_->running) return;
+
+    const std::shared_ptr<Tick> tick = tick_;
+    const QPointer<QTimer> alive = &timer_;
+    tick->running = true;
+    CallGuarded(
+        [&](const std::string& description) {
+          if (alive) SetEnabled(false);
+          TellFault(tick->on_fault, description);
+        },
+        tick->on_tick);
+    tick->running = false;
+  }
+
+  std::shared_ptr<Tick> tick_;
+  QTimer timer_;
+  std::int32_t interval_ms_ = 0;
+  bool enabled_ = false;
+};
+
+}  // namespace
+
+std::unique_ptr<Timer> QtTimerFactory::CreateTimer(std::function<void()> on_tick) {
+  return std::make_unique<QtTimer>(std::move(on_tick), on_fault_);
+}
+
+}  // namespace tendril

@@ -1,0 +1,25 @@
+// QtTimerFactory: timers that tick from Qt's event loop.
+#pragma once
+
+#include <functional>
+#include <memory>
+
+#include "platform/qt/fault_handler.h"
+#include "platform/timer.h"
+
+namespace tendril {
+
+// Its timers never tick early. A tick that fails switches its timer off, because it would most likely fail
+// again at once, before the person has read what is wrong; then it tells `on_fault`.
+class QtTimerFactory final : public TimerFactory {
+ public:
+  explicit QtTimerFactory(FaultHandler on_fault) : on_fault_(std::move(on_fault)) {}
+
+  // The timer may be destroyed even while its own tick runs the event loop.
+  std::unique_ptr<Timer> CreateTimer(std::function<void()> on_tick) override;
+
+ private:
+  FaultHandler on_fault_;
+};
+
+}  // namespace tendril

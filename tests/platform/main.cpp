@@ -1,0 +1,15 @@
+// Runs the adapters' tests under a real event loop, with a configuration folder of their own: no test ever
+// touches a device of the machine.
+#include <gmock/gmock.h>
+
+#include <QApplication>
+#include <QTemporaryDir>
+
+int main(int argc, char** argv) {
+  testing::InitGoogleMock(&argc, argv);
+  const QTemporaryDir folder;
+  qputenv("XDG_CONFIG_HOME", folder.path().toLocal8Bit());
+  if (!qEnvironmentVariableIsSet("QT_QPA_PLATFORM")) qputenv("QT_QPA_PLATFORM", "offscreen");
+  const QApplication app(argc, argv);
+  return RUN_ALL_TESTS();
+}

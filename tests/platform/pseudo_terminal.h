@@ -1,0 +1,78 @@
+// PseudoTerminal: a serial device made by the kernel, with the test at its far end.
+#pragma once
+
+#include <fcntl.h>
+#include <poll.h>
+#include <stdlib.h>
+#include <unistd.h>
+
+#include <filesystem>
+#include <stdexcept>
+#include <string>
+
+#include "platform/bytes.h"
+#include "platform/posix/paths.h"
+
+namespace tendril::test {
+
+// Makes `device` comm port `number`, whatever it was before.
+inline void LinkPort(int number, const std::filesystem::path& device) {
+  const std::filesystem::path folder = ConfigFolder() / "ports";
+  std::filesystem::create_directories(folder);
+  const std::filesystem::path link = folder / ("com" + std::to_string(number));
+  std::filesystem::remove(link);
+  std::filesystem::create_symlink(device, link);
+}
+
+class PseudoTerminal {
+ public:
+  PseudoTerminal() : far_end_(::posix_openpt(O_RDWR | O_NOCTTY | O_NONBLOCK)) {
+    if (far_end_ < 0 || ::grantpt(far_end_) != 0 || ::unlockpt(far_end_) != 0) {
+      throw std::runtime_error("no pseudo-terminal to be had");
+    }
+    path_ = ::ptsname(far_end_);
+    observer_ = OpenAsAnother();
+  }
+  ~PseudoTerminal() {
+    Unplug();
+    ::close(observer_);
+  }
+  PseudoTerminal(const PseudoTerminal&) = delete;
+  PseudoTerminal& operator=(const PseudoTerminal&) = delete;
+
+  const std::string& path() const { return path_; }
+  // Opens the device's own side once more, as another program could.
+  int OpenAsAnother() const { return ::open(path_.c_str(), O_RDWR | O_NOCTTY | O_NONBLOCK); }
+
+  void PlugInAs(int number) const { LinkPort(number, path_); }
+  // Takes the device away from whoever has it open.
+  void Unplug() {
+    if (far_end_ >= 0) ::close(far_end_);
+    far_end_ = -1;
+  }
+
+  // Sends to the device; how many of `bytes` it took.
+  std::size_t Send(const Bytes& bytes) const {
+    const ssize_t taken = ::write(far_end_, bytes.data(), bytes.size());
+    return taken > 0 ? static_cast<std::size_t>(taken) : 0;
+  }
+  // Sends to the open device and waits, without an event loop, until it is there to be read.
+  bool SendAndSettle(const Bytes& bytes) const {
+    pollfd readable = {observer_, POLLIN, 0};
+    return Send(bytes) == bytes.size() && ::poll(&readable, 1, 10'000) == 1;
+  }
+  // Takes what the device has sent by now.
+  Bytes Take() const {
+    Bytes bytes(65'536);
+    const ssize_t got = ::read(far_end_, bytes.data(), bytes.size());
+    bytes.resize(got > 0 ? static_cast<std::size_t>(got) : 0);
+    return bytes;
+  }
+
+ private:
+  int far_end_;
+  int observer_ = -1;  // on the device's own side; only watches
+  std::string path_;
+};
+
+}  // namespace tendril::test

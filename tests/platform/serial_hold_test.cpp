@@ -1,0 +1,73 @@
+#include "platform/posix/serial_hold.h"
+
+#include <gmock/gmock.h>
+#include <grp.h>
+#include <sys/ioctl.h>
+#include <sys/stat.h>
+#include <sys/wait.h>
+
+#include "platform/pseudo_terminal.h"
+#include "platform/runtime_error.h"
+
+namespace tendril::test {
+namespace {
+
+using testing::AllOf;
+using testing::HasSubstr;
+using testing::Not;
+
+// The number of the failure that a claim on `device` by an ordinary user ends in; 0 when it does not fail.
+int FailureOfOrdinaryUser(const std::string& device) {
+  const pid_t child = ::fork();
+  if (child == 0) {
+    constexpr uid_t kNobody = 65534;
+    if (::geteuid() == 0 &&
+        (::setgroups(0, nullptr) != 0 || ::setgid(kNobody) != 0 || ::setuid(kNobody) != 0)) {
+      ::_exit(255);
+    }
+    try {
+      const SerialHold hold(device);
+      ::_exit(0);
+    } catch (const RuntimeError& error) {
+      ::_exit(error.number() % 256);
+    }
+  }
+  int status = 0;
+  ::waitpid(child, &status, 0);
+  return WEXITSTATUS(status);
+}
+
+TEST(SerialHold, OrdinaryUserWithoutPermission_IsNotAllowedRatherThanBusy) {
+  const PseudoTerminal line;
+  const int other = line.OpenAsAnother();
+  ::ioctl(other, TIOCEXCL);
+  ::chmod(line.path().c_str(), 0);
+  EXPECT_EQ(FailureOfOrdinaryUser(line.path()), kErrNotAllowed);
+  ::chmod(line.path().c_str(), 0666);
+  EXPECT_EQ(FailureOfOrdinaryUser(line.path()), kErrPortAlreadyOpen % 256);
+  ::ioctl(other, TIOCNXCL);
+  EXPECT_EQ(FailureOfOrdinaryUser(line.path()), 0);
+  ::close(other);
+}
+
+TEST(SerialHold, NotAllowedText_SaysWhatHelpsAndNothingElse) {
+  const DeviceAccess stranger = {"/dev/ttyUSB0", "dialout", true, "anna", false};
+  EXPECT_THAT(ExplainNotAllowed(stranger), AllOf(HasSubstr("/dev/ttyUSB0"), HasSubstr("\"dialout\""),
+                                                 HasSubstr("dialout anna"), HasSubstr("log out")));
+
+  DeviceAccess joined = stranger;
+  joined.user_is_member = true;
+  EXPECT_THAT(ExplainNotAllowed(joined), AllOf(HasSubstr("log out and in again"), Not(HasSubstr("sudo"))));
+
+  DeviceAccess of_root = stranger;
+  of_root.group = "root";
+  DeviceAccess closed_to_group = stranger;
+  closed_to_group.group_may_use = false;
+  for (const DeviceAccess& access : {of_root, closed_to_group}) {
+    EXPECT_THAT(ExplainNotAllowed(access),
+                AllOf(HasSubstr("\"" + access.group + "\""), Not(HasSubstr("sudo"))));
+  }
+}
+
+}  // namespace
+}  // namespace tendril::test

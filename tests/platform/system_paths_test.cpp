@@ -1,0 +1,49 @@
+#include <gmock/gmock.h>
+
+#include <QTemporaryDir>
+#include <fstream>
+
+#include "platform/posix/paths.h"
+#include "platform/posix/port_names.h"
+
+namespace tendril::test {
+namespace {
+
+TEST(SystemPaths, CommandLog_FollowsTheEnvironmentAndIgnoresRelativeFolders) {
+  const QByteArray home_before = qgetenv("HOME");
+  qputenv("HOME", "/home/anna");
+  for (const char* no_folder : {"", "relative"}) {
+    qputenv("XDG_STATE_HOME", no_folder);
+    EXPECT_EQ(CommandLogPath(), "/home/anna/.local/state/kelvane/HUtest.txt") << no_folder;
+  }
+  qputenv("XDG_STATE_HOME", "/srv/x");
+  EXPECT_EQ(CommandLogPath(), "/srv/x/kelvane/HUtest.txt");
+  qunsetenv("XDG_STATE_HOME");
+  qputenv("HOME", home_before);
+}
+
+#ifdef __linux__
+TEST(PortNames, NumbersWithoutALink_StandForTheDriversDevices) {
+  for (const auto& [number, device] :
+       {std::pair(0, ""), std::pair(1, "/dev/ttyS0"), std::pair(4, "/dev/ttyS3"),
+        std::pair(5, "/dev/ttyUSB0"), std::pair(14, "/dev/ttyUSB9"), std::pair(15, "/dev/ttyACM0"),
+        std::pair(24, "/dev/ttyACM9"), std::pair(25, "")}) {
+    EXPECT_EQ(DefaultSerialDevice(number), device) << number;
+  }
+}
+
+TEST(PortNames, UartThatTheDriverDidNotFind_IsNoHardware) {
+  const QTemporaryDir folder;
+  const std::filesystem::path tty_class = folder.path().toStdString();
+  for (const auto& [device, type] : {std::pair("ttyS0", "4\n"), std::pair("ttyS1", "0\n")}) {
+    std::filesystem::create_directory(tty_class / device);
+    std::ofstream(tty_class / device / "type") << type;
+  }
+  EXPECT_TRUE(DriverFoundHardware("/dev/ttyS0", tty_class));
+  EXPECT_FALSE(DriverFoundHardware("/dev/ttyS1", tty_class));
+  EXPECT_TRUE(DriverFoundHardware("/dev/ttyUSB0", tty_class)) << "a driver that tells no type";
+}
+#endif
+
+}  // namespace
+}  // namespace tendril::test
