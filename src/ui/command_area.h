@@ -1,0 +1,44 @@
+// CommandArea: the unit commands, and the buttons that switch the view.
+#pragma once
+
+#include <QAbstractButton>
+#include <QString>
+#include <QWidget>
+#include <functional>
+#include <vector>
+
+#include "unitops/running_command.h"
+#include "unitops/unit_commands.h"
+
+namespace tendril {
+
+// The buttons that run unit commands, wherever they stand. Disabled while a command runs, with a tool tip
+// that says which.
+class CommandButtons {
+ public:
+  // Adds a button of `Command3`, and runs `action` when it is pressed.
+  void Add(QAbstractButton* button, const QString& tip, std::function<void()> action);
+  void ShowRunning(const RunningCommand& running);
+
+ private:
+  struct Entry {
+    QAbstractButton* button;
+    QString tip;
+  };
+  std::vector<Entry> entries_;
+};
+
+class CommandArea : public QWidget {
+ public:
+  // `commands` must outlive the area; its buttons are added to `buttons`.
+  CommandArea(UnitCommands& commands, CommandButtons& buttons, QWidget* parent = nullptr);
+
+  // Start-up: exporting and importing have no function.
+  void DisableExportAndImport();
+
+ private:
+  QAbstractButton* cmdWriteConfig_;
+  QAbstractButton* cmdReadConfig_;
+};
+
+}  // namespace tendril

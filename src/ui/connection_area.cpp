@@ -1,0 +1,95 @@
+#include "ui/connection_area.h"
+
+#include <QGroupBox>
+#include <QHBoxLayout>
+#include <QLabel>
+
+#include "ui/controls.h"
+
+namespace tendril {
+namespace {
+
+constexpr int kDigits = 16;
+constexpr std::array kUnitIdTips{
+    "First hexadecimal digit of the unit's ID, 0 to F. A unit fresh from the factory has FF.",
+    "Second hexadecimal digit of the unit's ID, 0 to F. A unit fresh from the factory has FF."};
+constexpr char kPortTip[] = "The serial port that the units are connected to. Choosing it opens it at once.";
+
+}  // namespace
+
+ConnectionArea::ConnectionArea(PortSelection& ports, QWidget* parent)
+    : QWidget(parent), ports_(ports), cmbNYX_(Named(new CalmComboBox, QStringLiteral("cmbNYX"))) {
+  auto* port_label = new QLabel(QStringLiteral("&Comm Port"));
+  port_label->setBuddy(cmbNYX_);
+  cmbNYX_->setSizeAdjustPolicy(QComboBox::AdjustToContents);
+  cmbNYX_->setMinimumContentsLength(6);
+  cmbNYX_->setSizePolicy(QSizePolicy::Fixed, QSizePolicy::Fixed);
+  cmbNYX_->setAccessibleName(QStringLiteral("Comm Port"));
+
+  auto* id_label = new QLabel(QStringLiteral("Select Unit &ID"));
+  auto* group = new QGroupBox(QStringLiteral("Connection"));
+  auto* row = new QHBoxLayout(group);
+  row->setContentsMargins(7, 4, 7, 6);
+  row->setSpacing(5);
+  row->addWidget(port_label);
+  row->addWidget(cmbNYX_);
+  row->addSpacing(6);
+  row->addWidget(id_label);
+  for (std::size_t digit = 0; digit < CmbUnitID_.size(); ++digit) {
+    auto* box = Named(new CalmComboBox, ArrayName(QStringLiteral("CmbUnitID"), static_cast<int>(digit)));
+    box->setMaxVisibleItems(kDigits);
+    box->setSizeAdjustPolicy(QComboBox::AdjustToMinimumContentsLengthWithIcon);
+    box->setMinimumContentsLength(1);
+    box->setIconSize({0, 0});  // there are no icons to keep room for
+    box->setSizePolicy(QSizePolicy::Fixed, QSizePolicy::Fixed);
+    box->setAccessibleName(digit == 0 ? QStringLiteral("Unit ID, first digit")
+                                      : QStringLiteral("Unit ID, second digit"));
+    row->addWidget(box);
+    CmbUnitID_[digit] = box;
+  }
+  id_label->setBuddy(CmbUnitID_[0]);
+
+  auto* layout = new QHBoxLayout(this);
+  layout->setContentsMargins(0, 0, 0, 0);
+  layout->addWidget(group);
+  ShowRunning({});
+
+  // "activated" is the person's own choice, of the same line again too; what the program selects is none.
+  QObject::connect(cmbNYX_, &QComboBox::activated, this,
+                   [this](int entry) { ports_.Choose(static_cast<std::size_t>(entry)); });
+}
+
+void ConnectionArea::FillUnitIds() {
+  for (QComboBox* box : CmbUnitID_) {
+    for (int digit = 0; digit < kDigits; ++digit) box->addItem(QString::number(digit, kDigits).toUpper());
+  }
+  CmbUnitID_[1]->setCurrentIndex(1);
+}
+
+void ConnectionArea::ListCommPorts() {
+  cmbNYX_->clear();
+  for (const std::string& line : ports_.ListCommPorts()) cmbNYX_->addItem(QString::fromStdString(line));
+  cmbNYX_->setCurrentIndex(0);
+}
+
+void ConnectionArea::ShowRunning(const RunningCommand& running) {
+  const QString what = QString::fromStdString(running.What());
+  const auto show = [&](QComboBox* box, const char* tip) {
+    if (running.Active()) {
+      Disable(box, what);
+    } else {
+      box->setEnabled(true);
+      Describe(box, QString::fromUtf8(tip));
+    }
+  };
+  show(cmbNYX_, kPortTip);
+  for (std::size_t digit = 0; digit < CmbUnitID_.size(); ++digit) show(CmbUnitID_[digit], kUnitIdTips[digit]);
+}
+
+bool ConnectionArea::PortChosen() const { return cmbNYX_->currentIndex() > 0; }
+
+std::uint8_t ConnectionArea::UnitId() const {
+  return static_cast<std::uint8_t>(CmbUnitID_[0]->currentIndex() * kDigits + CmbUnitID_[1]->currentIndex());
+}
+
+}  // namespace tendril

@@ -1,0 +1,36 @@
+// ConnectionArea: which comm port, and which unit.
+#pragma once
+
+#include <QComboBox>
+#include <QWidget>
+#include <array>
+#include <cstdint>
+
+#include "unitops/port_selection.h"
+#include "unitops/running_command.h"
+#include "unitops/unit_target.h"
+
+namespace tendril {
+
+class ConnectionArea : public QWidget, public UnitTarget {
+ public:
+  // `ports` must outlive the area.
+  explicit ConnectionArea(PortSelection& ports, QWidget* parent = nullptr);
+
+  // Start-up: the digits of the unit ID, unit 01 chosen.
+  void FillUnitIds();
+  // Fills the list of comm ports and selects "Select", which opens nothing.
+  void ListCommPorts();
+  // Lets port and unit be chosen only while no command runs.
+  void ShowRunning(const RunningCommand& running);
+
+  bool PortChosen() const override;
+  std::uint8_t UnitId() const override;
+
+ private:
+  PortSelection& ports_;
+  QComboBox* cmbNYX_;
+  std::array<QComboBox*, 2> CmbUnitID_{};  // the high digit, then the low one
+};
+
+}  // namespace tendril

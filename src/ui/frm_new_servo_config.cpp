@@ -1,0 +1,136 @@
+#include "ui/frm_new_servo_config.h"
+
+#include <QCloseEvent>
+#include <QHBoxLayout>
+#include <QScrollArea>
+#include <QTimer>
+#include <QVBoxLayout>
+#include <optional>
+
+namespace tendril {
+namespace {
+
+constexpr QSize kFirstSize(1280, 800);
+// Where the content does not fit, the window scrolls.
+constexpr QSize kSmallestWindow(480, 360);
+
+}  // namespace
+
+frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes,
+                                     const Version& version)
+    : link_(link),
+      ports_(link, boxes),
+      connection_(new ConnectionArea(ports_)),
+      progress_(new ProgressArea),
+      commands_(link, timers, boxes, *progress_, *connection_, working_),
+      command_area_(new CommandArea(commands_, command_buttons_)),
+      apply_boxes_(new ApplyBoxes),
+      channels_(new ChannelStrip(working_)),
+      editor_(new EditorArea),
+      live_test_(new LiveTestArea),
+      views_(new QStackedWidget),
+      shutdown_(
+          link, timers, [](std::int16_t) {}, [this] { close(); }) {
+  setObjectName(QStringLiteral("frmNewServoConfig"));
+  LayOut();
+  commands_.Running().SetObserver([this] { ShowRunning(); });
+  StartUp(version);
+}
+
+frmNewServoConfig::~frmNewServoConfig() { commands_.Running().SetObserver(nullptr); }
+
+void frmNewServoConfig::LayOut() {
+  auto* content = new QWidget;
+  auto* top = new QHBoxLayout;
+  top->addWidget(connection_);
+  top->addWidget(command_area_, 1);
+
+  auto* boxes_or_progress = new QStackedLayout;
+  progress_->SharePlace(*boxes_or_progress, apply_boxes_);
+
+  auto* simulator_view = new QWidget;
+  auto* simulator_column = new QVBoxLayout(simulator_view);
+  simulator_column->setContentsMargins(0, 0, 0, 0);
+  simulator_column->setSpacing(4);
+  simulator_column->addWidget(channels_, 1);
+  simulator_column->addWidget(editor_, 3);
+  simulator_column->addWidget(live_test_);
+  views_->addWidget(simulator_view);
+
+  auto* column = new QVBoxLayout(content);
+  column->setContentsMargins(8, 4, 8, 8);
+  column->setSpacing(4);
+  column->addLayout(top);
+  column->addLayout(boxes_or_progress);
+  column->addWidget(views_, 1);
+
+  auto* scroll = new QScrollArea(this);
+  scroll->setFrameShape(QFrame::NoFrame);
+  scroll->setWidgetResizable(true);
+  scroll->setFocusPolicy(Qt::NoFocus);
+  scroll->setWidget(content);
+  auto* whole = new QVBoxLayout(this);
+  whole->setContentsMargins(0, 0, 0, 0);
+  whole->addWidget(scroll);
+  setMinimumSize(kSmallestWindow);
+  resize(kFirstSize);
+}
+
+void frmNewServoConfig::StartUp(const Version& version) {
+  setWindowTitle(QStringLiteral("Kelvane Tendril Utility v%1.%2.%3")
+                     .arg(version.major_number)
+                     .arg(version.minor_number)
+                     .arg(version.revision));
+  command_area_->DisableExportAndImport();
+  arm_position_ = kCentrePulseWidth;
+  editor_->SetUpSimulator();
+  channels_->SetUpSimulators();
+  connection_->FillUnitIds();
+  editor_->SetUpSpinButtons();
+  progress_->ShowProgress(false);
+  editor_->ListPresets();
+  for (std::size_t slot = 0; slot < kPortCount; ++slot)
+    SetFromPreset(kPresets[kStartPreset], working_.At(slot));
+  connection_->ListCommPorts();
+  UpdateSimulators();
+}
+
+void frmNewServoConfig::UpdateSimulators() {
+  channels_->UpdateSimulators(arm_position_);
+  editor_->UpdateSimulator(arm_position_);
+}
+
+void frmNewServoConfig::ShowRunning() {
+  const RunningCommand& running = commands_.Running();
+  if (running.Active()) focus_before_command_ = focusWidget();
+  connection_->ShowRunning(running);
+  command_buttons_.ShowRunning(running);
+  progress_->ShowRunning(running);
+  // Disabling took the focus off the button that was pressed; whoever works by keyboard wants it back.
+  if (!running.Active() && focus_before_command_) focus_before_command_->setFocus();
+}
+
+// The summary has more controls than all the rest, and is not seen at first: the window does not wait for it.
+void frmNewServoConfig::showEvent(QShowEvent* event) {
+  QWidget::showEvent(event);
+  QTimer::singleShot(0, this, [this] { MakeSummary(); });
+}
+
+void frmNewServoConfig::MakeSummary() {
+  if (summary_ != nullptr) return;
+  summary_ = new SummaryArea;
+  summary_->SetRangeCaptions(QStringLiteral("1000--2000"));
+  views_->addWidget(summary_);
+}
+
+void frmNewServoConfig::closeEvent(QCloseEvent* event) {
+  commands_.Stop();
+  if (!shutdown_.MayClose()) {
+    event->ignore();
+    return;
+  }
+  link_.SetPortOpen(false);
+  event->accept();
+}
+
+}  // namespace tendril

@@ -1,0 +1,79 @@
+// frmNewServoConfig: the program's window.
+#pragma once
+
+#include <QPointer>
+#include <QStackedWidget>
+#include <QString>
+#include <QWidget>
+
+#include "config/channel_config.h"
+#include "platform/message_boxes.h"
+#include "platform/timer.h"
+#include "serial/hw_serial.h"
+#include "ui/apply_boxes.h"
+#include "ui/channel_strip.h"
+#include "ui/command_area.h"
+#include "ui/connection_area.h"
+#include "ui/editor_area.h"
+#include "ui/live_test_area.h"
+#include "ui/progress_area.h"
+#include "ui/summary_area.h"
+#include "unitops/port_selection.h"
+#include "unitops/shutdown.h"
+#include "unitops/unit_commands.h"
+
+namespace tendril {
+
+// The program's version, "major.minor.revision".
+struct Version {
+  int major_number;
+  int minor_number;
+  int revision;
+};
+
+// Lays out the areas, wires them to what the program does, and runs start-up and shutdown. Each area takes
+// care of itself.
+class frmNewServoConfig : public QWidget {
+ public:
+  // Everything handed in must outlive the window. `link` is not to be used by anyone else.
+  frmNewServoConfig(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes, const Version& version);
+  ~frmNewServoConfig() override;
+
+  // The records that are edited, sent and shown. After a change, call UpdateSimulators().
+  ChannelTable& WorkingConfiguration() { return working_; }
+  // Pushes the working configuration into the simulators.
+  void UpdateSimulators();
+
+ protected:
+  void showEvent(QShowEvent* event) override;
+  void closeEvent(QCloseEvent* event) override;
+
+ private:
+  void LayOut();
+  void StartUp(const Version& version);
+  void ShowRunning();
+  void MakeSummary();
+
+  HwSerial& link_;
+  ChannelTable working_;
+  Microseconds arm_position_ = kCentrePulseWidth;
+  PortSelection ports_;
+  CommandButtons command_buttons_;
+
+  // Owned by the window, as its child widgets.
+  ConnectionArea* connection_;
+  ProgressArea* progress_;
+  UnitCommands commands_;
+  CommandArea* command_area_;
+  ApplyBoxes* apply_boxes_;
+  ChannelStrip* channels_;
+  EditorArea* editor_;
+  LiveTestArea* live_test_;
+  QStackedWidget* views_;
+  SummaryArea* summary_ = nullptr;  // made once the window is on its way to the screen
+  QPointer<QWidget> focus_before_command_;
+
+  Shutdown shutdown_;
+};
+
+}  // namespace tendril

@@ -1,0 +1,29 @@
+#include "ui/simulator_feed.h"
+
+namespace tendril {
+namespace {
+
+void SetRanges(ServoSimulator& simulator, const ChannelConfig& record) {
+  simulator.SetRangeUS(record.ActualRange[0], record.ActualRange[1]);
+  simulator.SetLimitUS(record.VirtualRange[0], record.VirtualRange[1]);
+  simulator.SetStopsUS(record.VirtualStops[0], record.VirtualStops[1]);
+}
+
+}  // namespace
+
+void FeedSimulator(ServoSimulator& simulator, const ChannelConfig& record, std::int32_t size,
+                   Microseconds arm) {
+  SetRanges(simulator, record);
+  simulator.SetNeutralPositionUS(record.NeutralPosition);  // before the default, which is measured from it
+  simulator.SetDefaultPositionUS(record.DefaultPosition);
+  simulator.DisplaySize(size);
+  simulator.SetMovingArmPositionUS(arm);
+  simulator.DrawServo();
+}
+
+void RefeedResizedSimulator(ServoSimulator& simulator, const ChannelConfig& record, Microseconds arm) {
+  SetRanges(simulator, record);
+  simulator.SetMovingArmPositionUS(arm);
+}
+
+}  // namespace tendril
