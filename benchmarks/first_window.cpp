@@ -1,0 +1,24 @@
+// The program up to its first painted window, put together as its main function does.
+#include <QApplication>
+
+#include "app/qt_platform.h"
+#include "first_paint.h"
+#include "platform/posix/paths.h"
+#include "platform/qt/qt_serial_device.h"
+#include "serial/command_log.h"
+#include "serial/hw_serial.h"
+#include "ui/frm_new_servo_config.h"
+
+int main(int argc, char** argv) {
+  using namespace tendril;
+  QApplication application(argc, argv);
+  QtPlatform platform;
+  QtSerialDevice device(platform.on_fault);
+  FileCommandLog log(CommandLogPath());
+  HwSerial link(device, platform.timers, platform.clock, log);
+  frmNewServoConfig window(link, platform.timers, platform.boxes, {1, 0, 0});
+  platform.boxes.SetParent(&window);
+  const FirstPaint first_paint;
+  window.show();
+  return QApplication::exec();
+}

@@ -1,0 +1,48 @@
+# What the scripts have in common: what the project needs, and how it is built. Sourced, not run.
+set -euo pipefail
+cd "$(dirname "${BASH_SOURCE[0]}")/.."
+
+# What building, running and testing needs on Debian 12 and its relatives.
+build_packages=(g++ cmake ninja-build qt6-base-dev qt6-serialport-dev libgl-dev libgtest-dev libgmock-dev
+                fonts-dejavu-core)
+check_packages=(clang-format-14 clang-tidy-14)
+
+say() { printf '%s\n' "== $*" >&2; }
+
+# Installs those of the named packages that are missing. Asks for a password only then.
+require_packages() {
+  command -v dpkg-query >/dev/null || return 0  # another system: its packages are the user's own affair
+  local missing=() package
+  for package in "$@"; do
+    dpkg-query -W -f='${Status}' "$package" 2>/dev/null | grep -q 'ok installed' || missing+=("$package")
+  done
+  [ ${#missing[@]} -gt 0 ] || return 0
+  local as_root=()
+  if [ "$(id -u)" -ne 0 ]; then
+    command -v sudo >/dev/null || { say "Please install as root: ${missing[*]}"; exit 1; }
+    as_root=(sudo)
+    say "Installing packages; this may ask for your password: ${missing[*]}"
+  else
+    say "Installing packages: ${missing[*]}"
+  fi
+  "${as_root[@]}" apt-get update -qq
+  "${as_root[@]}" env DEBIAN_FRONTEND=noninteractive apt-get install -y -qq --no-install-recommends "${missing[@]}" \
+    >/dev/null
+}
+
+# build PRESET [TARGET ...]: configures when needed and brings the build up to date.
+build() {
+  local preset=$1
+  shift
+  require_packages "${build_packages[@]}"
+  if [ ! -f "build/$preset/build.ninja" ]; then
+    say "Configuring ($preset)"
+    cmake --preset "$preset" >/dev/null
+  fi
+  local targets=()
+  [ $# -eq 0 ] || targets=(--target "$@")
+  if ! cmake --build --preset "$preset" "${targets[@]}" -- -n | grep -q 'no work to do'; then
+    say "Building ($preset); the first time takes a few minutes"
+    cmake --build --preset "$preset" "${targets[@]}"
+  fi
+}

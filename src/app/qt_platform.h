@@ -1,0 +1,24 @@
+// QtPlatform: what the programs stand on, apart from the serial device.
+#pragma once
+
+#include <string>
+
+#include "platform/qt/fault_handler.h"
+#include "platform/qt/qt_clock.h"
+#include "platform/qt/qt_message_boxes.h"
+#include "platform/qt/qt_timer.h"
+#include "unitops/port_selection.h"
+
+namespace tendril {
+
+struct QtPlatform {
+  QtClock clock;
+  QtMessageBoxes boxes;
+  // A failure that no part of the program could handle is shown, and the program goes on.
+  FaultHandler on_fault = [this](const std::string& description) {
+    boxes.Show({description, kDefaultBoxTitle, BoxIcon::kCritical});
+  };
+  QtTimerFactory timers{on_fault};
+};
+
+}  // namespace tendril

@@ -1,0 +1,94 @@
+// tendril-demo: the utility's window on a virtual bench inside the process, for trying it without hardware.
+#include <QApplication>
+#include <QCommandLineParser>
+#include <QPalette>
+#include <QStyleFactory>
+#include <QTemporaryDir>
+#include <cstdint>
+#include <filesystem>
+#include <memory>
+
+#include "app/demo_show.h"
+#include "app/qt_platform.h"
+#include "app/version.h"
+#include "bench/virtual_serial_device.h"
+#include "bench/virtual_unit.h"
+#include "serial/command_log.h"
+#include "serial/hw_serial.h"
+#include "ui/frm_new_servo_config.h"
+
+namespace {
+
+using namespace tendril;
+
+// Pads enough for the program to release the line in time even when its window has just been painting.
+constexpr ReplyTiming kPatient{.turn_round_us = 2000, .pads = 45};
+
+// Comm 1: two working units. Comm 2: one fresh from the factory. Comm 3: in use. Comm 4: nobody answers.
+VirtualUnit& FillBench(VirtualPorts& bench) {
+  for (const int port : {1, 2, 3, 4}) bench.AddPort(port);
+  auto& first = bench.Attach<VirtualUnit>(1, std::uint8_t{0x01}, kPatient);
+  bench.Attach<VirtualUnit>(1, std::uint8_t{0x0A}, kPatient);
+  bench.Attach<VirtualUnit>(2, std::uint8_t{0xFF}, kPatient);
+  bench.SetHeldByAnother(3, true);
+  // Somebody has set it up before, otherwise than the window starts with.
+  for (int port = 1; port <= kUnitPorts; ++port) {
+    first.SetPortOptions(port, {1, 80, 220, 125, 175, 125, 175, 150, 150});
+  }
+  return first;
+}
+
+QPalette DarkPalette() {
+  const QColor text(0xE6, 0xE6, 0xE6);
+  QPalette dark(QColor(0x35, 0x37, 0x3A), QColor(0x2B, 0x2D, 0x30));
+  dark.setColor(QPalette::Base, QColor(0x1F, 0x21, 0x24));
+  dark.setColor(QPalette::AlternateBase, QColor(0x2B, 0x2D, 0x30));
+  for (const auto role :
+       {QPalette::WindowText, QPalette::Text, QPalette::ButtonText, QPalette::ToolTipText}) {
+    dark.setColor(role, text);
+    dark.setColor(QPalette::Disabled, role, QColor(0x8A, 0x8D, 0x91));
+  }
+  dark.setColor(QPalette::PlaceholderText, QColor(0xA0, 0xA4, 0xA8));
+  dark.setColor(QPalette::ToolTipBase, QColor(0x3C, 0x3F, 0x43));
+  dark.setColor(QPalette::Highlight, QColor(0x2A, 0x82, 0xDA));
+  dark.setColor(QPalette::HighlightedText, Qt::white);
+  return dark;
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  QApplication application(argc, argv);
+  QCommandLineParser parser;
+  parser.setApplicationDescription(QStringLiteral(
+      "The Tendril Configuration Utility on a virtual bench. Comm 1 has working units at 01 and 0A, Comm 2 "
+      "one fresh from the factory at FF, Comm 3 is in use, and on Comm 4 nobody answers."));
+  parser.addHelpOption();
+  const QCommandLineOption show(
+      QStringLiteral("without-display"),
+      QStringLiteral("Send a configuration to unit 01, print what crosses the line, save "
+                     "pictures of the window in <folder>, and end."),
+      QStringLiteral("folder"));
+  const QCommandLineOption dark(QStringLiteral("dark"), QStringLiteral("Light text on a dark ground."));
+  parser.addOptions({show, dark});
+  parser.process(application);
+  if (parser.isSet(dark)) {
+    QApplication::setStyle(QStyleFactory::create(QStringLiteral("Fusion")));
+    QApplication::setPalette(DarkPalette());
+  }
+
+  QTemporaryDir scratch;  // a demonstration leaves nothing behind
+  QtPlatform platform;
+  VirtualPorts bench(platform.clock, platform.timers);
+  VirtualUnit& unit = FillBench(bench);
+  const std::unique_ptr<SerialDevice> device = bench.CreateDevice();
+  FileCommandLog log(std::filesystem::path(scratch.filePath(QStringLiteral("HUtest.txt")).toStdString()));
+  HwSerial Serial1(*device, platform.timers, platform.clock, log);
+  PrintedBoxes printed_boxes;
+  MessageBoxes& boxes = parser.isSet(show) ? static_cast<MessageBoxes&>(printed_boxes) : platform.boxes;
+  frmNewServoConfig window(Serial1, platform.timers, boxes, kVersion);
+  platform.boxes.SetParent(&window);
+  window.show();
+  if (parser.isSet(show)) return ShowWithoutDisplay(window, bench.Line(1), unit, parser.value(show));
+  return QApplication::exec();
+}

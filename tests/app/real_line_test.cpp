@@ -1,0 +1,146 @@
+// The window with its real adapters, on a kernel terminal device, with the units in another process.
+#include <gtest/gtest.h>
+#include <sys/resource.h>
+
+#include <QAbstractButton>
+#include <QApplication>
+#include <QComboBox>
+#include <QLabel>
+#include <QMessageBox>
+#include <QTest>
+#include <QTimer>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "app/qt_platform.h"
+#include "platform/posix/paths.h"
+#include "platform/qt/qt_serial_device.h"
+#include "serial/command_log.h"
+#include "serial/hw_serial.h"
+#include "support/bench_process.h"
+#include "ui/frm_new_servo_config.h"
+
+namespace tendril::test {
+namespace {
+
+constexpr int kGenerousMs = 20000;
+
+class RealLine : public testing::Test {
+ protected:
+  // Makes the program, as its main function does. Call it when Comm 1 is there.
+  void StartProgram() {
+    device_ = std::make_unique<QtSerialDevice>(platform_.on_fault);
+    log_ = std::make_unique<FileCommandLog>(CommandLogPath());
+    link_ = std::make_unique<HwSerial>(*device_, platform_.timers, platform_.clock, *log_);
+    window_ =
+        std::make_unique<frmNewServoConfig>(*link_, platform_.timers, platform_.boxes, Version{1, 0, 0});
+    platform_.boxes.SetParent(window_.get());
+    window_->show();
+    // A person who reads each box and presses OK.
+    reader_.setInterval(20);
+    QObject::connect(&reader_, &QTimer::timeout, &reader_, [this] {
+      if (auto* box = qobject_cast<QMessageBox*>(QApplication::activeModalWidget())) {
+        read_.push_back(box->text().toStdString());
+        box->accept();
+      }
+    });
+    reader_.start();
+  }
+  void ChooseComm1() {
+    auto& ports = *window_->findChild<QComboBox*>(QStringLiteral("cmbNYX"));
+    ports.setCurrentIndex(0);
+    QTest::keyClick(&ports, Qt::Key_Down);
+    ASSERT_EQ(ports.currentText().toStdString(), "Comm 1");
+  }
+  void PressSend() {
+    outcome().clear();
+    QTest::mouseClick(&Button(), Qt::LeftButton);
+  }
+  std::string Outcome() {
+    return QTest::qWaitFor([this] { return !outcome().text().isEmpty() && Button().isEnabled(); },
+                           kGenerousMs)
+               ? outcome().text().toStdString()
+               : "none";
+  }
+  bool WaitForBox() {
+    return QTest::qWaitFor([this] { return !read_.empty() && QApplication::activeModalWidget() == nullptr; },
+                           kGenerousMs);
+  }
+  QAbstractButton& Button() { return *window_->findChild<QAbstractButton*>(QStringLiteral("Command3_0")); }
+  QLabel& outcome() { return *window_->findChild<QLabel*>(QStringLiteral("lblProgress")); }
+
+  BenchProcess bench_;
+  QtPlatform platform_;
+  std::unique_ptr<QtSerialDevice> device_;
+  std::unique_ptr<FileCommandLog> log_;
+  std::unique_ptr<HwSerial> link_;
+  std::unique_ptr<frmNewServoConfig> window_;
+  QTimer reader_;
+  std::vector<std::string> read_;
+};
+
+double CpuSeconds() {
+  rusage usage{};
+  getrusage(RUSAGE_SELF, &usage);
+  const auto seconds = [](const timeval& time) {
+    return static_cast<double>(time.tv_sec) + static_cast<double>(time.tv_usec) / 1e6;
+  };
+  return seconds(usage.ru_utime) + seconds(usage.ru_stime);
+}
+
+TEST_F(RealLine, Send_SucceedsWithAndWithoutEcho) {
+  for (const QStringList& options : {QStringList{}, QStringList{QStringLiteral("--no-echo")}}) {
+    bench_.Start(options);
+    if (!window_) StartProgram();
+    ChooseComm1();
+    PressSend();
+    EXPECT_EQ(Outcome(), "SUCCESS: Send Complete!") << options.join(QLatin1Char(' ')).toStdString();
+    EXPECT_TRUE(read_.empty());
+    bench_.Kill();
+    ASSERT_TRUE(QTest::qWaitFor([this] { return !link_->PortOpen(); }, kGenerousMs));
+  }
+  EXPECT_TRUE(std::filesystem::exists(CommandLogPath()));
+}
+
+TEST_F(RealLine, NoisyUnits_AreHeardThroughTheNoise) {
+  bench_.Start({QStringLiteral("--fault"), QStringLiteral("rambling")});
+  StartProgram();
+  ChooseComm1();
+  PressSend();
+  EXPECT_EQ(Outcome(), "SUCCESS: Send Complete!");
+}
+
+TEST_F(RealLine, UnpluggedInTheMiddle_IsToldOnceAndThePortWorksAfterReplugging) {
+  bench_.Start();
+  StartProgram();
+  ChooseComm1();
+  PressSend();
+  QTest::qWait(500);
+  bench_.Kill();
+  ASSERT_TRUE(WaitForBox());
+  EXPECT_EQ(outcome().text().toStdString(), "COMMAND FAILED!");
+  EXPECT_EQ(read_.size(), 1u);
+  EXPECT_NE(read_[0].find("Open of serial port 1 has failed"), std::string::npos) << read_[0];
+
+  bench_.Start();
+  ChooseComm1();
+  PressSend();
+  EXPECT_EQ(Outcome(), "SUCCESS: Send Complete!");
+}
+
+TEST_F(RealLine, UnpluggedWhileIdle_SaysNothingAndCostsNothing) {
+  bench_.Start();
+  StartProgram();
+  ChooseComm1();
+  bench_.Kill();
+  EXPECT_TRUE(QTest::qWaitFor([this] { return !link_->PortOpen(); }, kGenerousMs));
+  reader_.stop();
+  const double before = CpuSeconds();
+  QTest::qWait(1000);
+  EXPECT_LT(CpuSeconds() - before, 0.05);
+  EXPECT_TRUE(read_.empty());
+}
+
+}  // namespace
+}  // namespace tendril::test
