@@ -9,9 +9,7 @@ void CalmComboBox::wheelEvent(QWheelEvent* event) { event->ignore(); }
 
 QString ArrayName(const QString& array, int index) { return QStringLiteral("%1_%2").arg(array).arg(index); }
 
-void Describe(QWidget* widget, const QString& what_it_does) {
-  widget->setToolTip(what_it_does);
-}
+void Describe(QWidget* widget, const QString& what_it_does) { widget->setToolTip(what_it_does); }
 
 void Disable(QWidget* widget, const QString& why) {
   widget->setEnabled(false);
