@@ -18,6 +18,7 @@ int main(int argc, char** argv) {
   HwSerial link(device, platform.timers, platform.clock, log);
   frmNewServoConfig window(link, platform.timers, platform.boxes, {1, 0, 0});
   platform.boxes.SetParent(&window);
+  window.resize(1280, 800);  // on any screen
   const FirstPaint first_paint;
   window.show();
   return QApplication::exec();

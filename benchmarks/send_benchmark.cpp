@@ -11,6 +11,7 @@
 #include <array>
 #include <cstdio>
 #include <cstdlib>
+#include <exception>
 
 #include "app/qt_platform.h"
 #include "platform/posix/paths.h"
@@ -65,11 +66,7 @@ class CountingDevice final : public SerialDevice {
   SerialDevice& device_;
 };
 
-}  // namespace
-
-int main(int argc, char** argv) {
-  if (!qEnvironmentVariableIsSet("QT_QPA_PLATFORM")) qputenv("QT_QPA_PLATFORM", "offscreen");
-  QApplication application(argc, argv);
+int Measure() {
   test::BenchProcess bench;
   bench.Start();
 
@@ -115,4 +112,17 @@ int main(int argc, char** argv) {
   std::printf("send, median of %d: measured %.1f ms, floor %.1f ms, ratio %.4f (at most %.2f)\n", kRuns,
               median.measured_ms, median.floor_ms, median.Ratio(), kMaxRatio);
   return median.Ratio() <= kMaxRatio ? EXIT_SUCCESS : EXIT_FAILURE;
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  if (!qEnvironmentVariableIsSet("QT_QPA_PLATFORM")) qputenv("QT_QPA_PLATFORM", "offscreen");
+  QApplication application(argc, argv);
+  try {
+    return Measure();
+  } catch (const std::exception& fault) {
+    std::printf("%s\n", fault.what());
+    return EXIT_FAILURE;
+  }
 }

@@ -18,6 +18,7 @@ namespace tendril {
 namespace {
 
 constexpr int kLongestSendMs = 30000;
+constexpr QSize kPictureSize(1280, 800);
 
 void Print(const std::string& line) {
   std::puts(line.c_str());
@@ -86,6 +87,7 @@ bool PrintedBoxes::AskYesNo(const BoxMessage& message) {
 int ShowWithoutDisplay(frmNewServoConfig& window, VirtualLine& line, const VirtualUnit& unit,
                        const QString& folder) {
   const Actor actor(window, folder);
+  window.resize(kPictureSize);
   if (!QDir().mkpath(folder) || !actor.SavePicture("window-start.png")) return 1;
 
   LinePrinter printer(Print);

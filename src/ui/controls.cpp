@@ -31,7 +31,7 @@ QLabel* BoldLabel(const QString& text, QWidget* parent) {
 }
 
 bool IsDark(const QWidget& widget) {
-  const QPalette palette = widget.palette();
+  const QPalette& palette = widget.palette();
   return palette.color(QPalette::Window).lightness() < palette.color(QPalette::WindowText).lightness();
 }
 

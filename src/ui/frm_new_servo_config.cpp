@@ -2,6 +2,7 @@
 
 #include <QCloseEvent>
 #include <QHBoxLayout>
+#include <QScreen>
 #include <QScrollArea>
 #include <QTimer>
 #include <QVBoxLayout>
@@ -73,7 +74,8 @@ void frmNewServoConfig::LayOut() {
   whole->setContentsMargins(0, 0, 0, 0);
   whole->addWidget(scroll);
   setMinimumSize(kSmallestWindow);
-  resize(kFirstSize);
+  // A frame and a task bar want room too.
+  resize(kFirstSize.boundedTo(screen()->availableSize() - QSize(8, 40)));
 }
 
 void frmNewServoConfig::StartUp(const Version& version) {

@@ -11,7 +11,7 @@
 namespace tendril {
 namespace {
 
-constexpr int kBarHeight = 12;
+constexpr int kBarHeight = 10;
 
 QColor Shade(ProgressColour colour, bool dark) {
   switch (colour) {
@@ -28,7 +28,8 @@ QColor Shade(ProgressColour colour, bool dark) {
 }  // namespace
 
 ProgressArea::ProgressArea(QWidget* parent)
-    : QGroupBox(parent),
+    : QGroupBox(QStringLiteral("Progress"),
+                parent),  // until there is more to say; it keeps room for the title
       pctProgress_(Named(new QWidget(this), QStringLiteral("pctProgress"))),
       ShapeProgress_(Named(new QWidget(pctProgress_), QStringLiteral("ShapeProgress"))),
       lblProgress_(Named(new QLabel(this), QStringLiteral("lblProgress"))) {
@@ -46,8 +47,8 @@ ProgressArea::ProgressArea(QWidget* parent)
   lblProgress_->setFont(font);
 
   auto* layout = new QVBoxLayout(this);
-  layout->setContentsMargins(9, 2, 9, 6);
-  layout->setSpacing(3);
+  layout->setContentsMargins(9, 0, 9, 3);
+  layout->setSpacing(2);
   layout->addWidget(lblProgress_);
   layout->addWidget(pctProgress_);
   ApplyColour();

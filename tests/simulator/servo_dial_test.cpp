@@ -22,6 +22,7 @@ constexpr std::int32_t kHighest = std::numeric_limits<std::int32_t>::max();
 
 std::vector<DialPart> PartsOf(const std::vector<DialElement>& elements) {
   std::vector<DialPart> parts;
+  parts.reserve(elements.size());
   for (const DialElement& element : elements) parts.push_back(element.part);
   return parts;
 }

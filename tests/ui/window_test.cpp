@@ -23,7 +23,6 @@
 namespace tendril::test {
 namespace {
 
-using testing::ElementsAre;
 using testing::IsEmpty;
 
 class Window : public testing::Test {
@@ -124,9 +123,12 @@ TEST_F(Window, Send_ByMouse_EndsGreenAndTheUnitHoldsWhatWasSent) {
   ChooseByKeys("cmbNYX", 1);
   EXPECT_TRUE(link_.PortOpen());
   ChooseByKeys("CmbUnitID_1", 10);
+  const QPoint servo_before = Find("ServoSimulator2_0").mapTo(window_.get(), QPoint());
   Click("Command3_0");
+  QTest::qWait(0);
 
   EXPECT_TRUE(Find("frmProgress").isVisible());
+  EXPECT_EQ(Find("ServoSimulator2_0").mapTo(window_.get(), QPoint()), servo_before) << "the window jumps";
   EXPECT_FALSE(Find("fraApplyChans").isVisible());
   EXPECT_EQ(Find<QGroupBox>("frmProgress").title().toStdString(), "Sending the configuration to unit 0A");
   for (const char* busy : {"cmbNYX", "CmbUnitID_0", "CmbUnitID_1", "Command3_0"}) {

@@ -40,7 +40,8 @@ class Send : public testing::Test {
 
   // Lets the command run until it has ended. The longest takes three polls for each port, and the pauses.
   void RunToTheEnd() {
-    ASSERT_TRUE(world_.time.AdvanceUntil([&] { return !commands_.Running().Active(); }, 8 * (3 * 400 + 300)));
+    constexpr std::uint64_t kLongestMs = 12000;
+    ASSERT_TRUE(world_.time.AdvanceUntil([&] { return !commands_.Running().Active(); }, kLongestMs));
   }
   void ExpectFailure(const BoxMessage& box) {
     EXPECT_THAT(world_.boxes.Take(), ElementsAre(box));

@@ -11,7 +11,7 @@ namespace tendril {
 namespace {
 
 // Received bytes that wait in the program at most. When they are not taken, the peer is held back.
-constexpr qint64 kReadBufferBytes = 64 * 1024;
+constexpr qint64 kReadBufferBytes = qint64{64} * 1024;
 
 // How long a closed connection may go on sending what it was given before.
 constexpr int kLingerMs = 5000;
