@@ -88,6 +88,7 @@ int ShowWithoutDisplay(frmNewServoConfig& window, VirtualLine& line, const Virtu
                        const QString& folder) {
   const Actor actor(window, folder);
   window.resize(kPictureSize);
+  QApplication::processEvents();
   if (!QDir().mkpath(folder) || !actor.SavePicture("window-start.png")) return 1;
 
   LinePrinter printer(Print);

@@ -7,7 +7,6 @@
 #include "platform/qt/qt_clock.h"
 #include "platform/qt/qt_message_boxes.h"
 #include "platform/qt/qt_timer.h"
-#include "unitops/port_selection.h"
 
 namespace tendril {
 

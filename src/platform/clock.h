@@ -5,6 +5,7 @@
 
 namespace tendril {
 
+// The time, and how finely it is told.
 class Clock {
  public:
   virtual ~Clock() = default;

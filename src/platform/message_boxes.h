@@ -5,6 +5,10 @@
 
 namespace tendril {
 
+// Title of boxes that have none of their own.
+inline constexpr char kDefaultBoxTitle[] = "Tendril Configuration";
+
+// The picture beside the text.
 enum class BoxIcon { kNone, kExclamation, kCritical };
 
 // One message. Texts are plain UTF-8 with CR LF between lines.

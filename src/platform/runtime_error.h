@@ -65,8 +65,8 @@ decltype(auto) Traced(std::string_view trace, Operation&& operation) {
   } catch (RuntimeError& error) {
     error.AddLine(trace);
     throw;
-  } catch (const std::exception& error) {
-    RuntimeError traced(kErrInternal, error.what());
+  } catch (...) {
+    RuntimeError traced(kErrInternal, DescribeCurrentFault());
     traced.AddLine(trace);
     throw traced;
   }

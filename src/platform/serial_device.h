@@ -54,6 +54,8 @@ class SerialDevice {
   virtual void Open() = 0;
   // Never fails; does nothing on a closed port. What was queued to send or waits to be read is dropped.
   virtual void Close() noexcept = 0;
+  // Whether it is open. A device that was lost counts as open until kDeviceLost has been told; what is written
+  // until then goes nowhere, without a failure.
   virtual bool IsOpen() const = 0;
 
   // Bytes that must wait before kDataReceived comes; 1 tells of every byte, 0 of none.

@@ -17,10 +17,12 @@ class Timer {
   // Interval in milliseconds, at least 0. 0 never ticks. Setting it on an enabled timer starts the period
   // anew.
   virtual void SetInterval(std::int32_t ms) = 0;
+  // The interval that was set last.
   virtual std::int32_t Interval() const = 0;
 
   // Enabling starts a new period, also when the timer was enabled already.
   virtual void SetEnabled(bool enabled) = 0;
+  // Whether it is enabled, ticking or not.
   virtual bool Enabled() const = 0;
 };
 

@@ -6,6 +6,7 @@
 
 namespace tendril {
 
+// Where the serial link notes them.
 class CommandLog {
  public:
   virtual ~CommandLog() = default;

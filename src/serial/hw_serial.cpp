@@ -48,6 +48,7 @@ HwSerial::~HwSerial() {
 
 void HwSerial::SetCommPort(std::int16_t number) {
   Traced("Trace: Let CommPort", [&] {
+    (void)ComPortExists(number);  // asked at every choice; the answer that counts comes with the opening
     comm_port_ = number;
     if (port_open_) OpenPort();
   });
@@ -97,8 +98,8 @@ void HwSerial::OpenPort() {
     port_open_ = true;
   } catch (const RuntimeError& error) {
     fail(error.number(), error.description());
-  } catch (const std::exception& error) {
-    fail(kErrInternal, error.what());
+  } catch (...) {
+    fail(kErrInternal, DescribeCurrentFault());
   }
 }
 
@@ -106,6 +107,7 @@ void HwSerial::ClosePort() noexcept {
   device_.Close();
   port_open_ = false;
   held_back_.assign(1, 0);
+  if (poll_) poll_->line_closed = true;
 }
 
 void HwSerial::SetRTS(bool asserted) {

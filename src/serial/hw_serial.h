@@ -11,6 +11,7 @@
 #include <span>
 #include <string>
 #include <string_view>
+#include <utility>
 
 #include "platform/bytes.h"
 #include "platform/clock.h"
@@ -75,6 +76,7 @@ class HwSerial {
   void SetBaudRate(std::int32_t baud);
   // Whether a device stands behind port `number`. Does not open it.
   bool ComPortExists(std::int16_t number) const { return device_.Exists(number); }
+  // Whether the port is open.
   bool PortOpen() const { return port_open_; }
   // True opens the port with the current settings, and does nothing when it is open with them already or when
   // CommPort is 0. A failure keeps the number of what failed (kErrPortAlreadyOpen, kErrInvalidPort ...) and
@@ -89,9 +91,11 @@ class HwSerial {
 
   // --- Properties ---
 
+  // Whether heartbeats are sent.
   bool HeartBeat() const { return heartbeat_timer_->Enabled(); }
   // While on, and while the port is open, a heartbeat goes to all units every 500 ms.
   void SetHeartBeat(bool on) { heartbeat_timer_->SetEnabled(on); }
+  // Whether each transmission and each poll's reply gives a trace line.
   bool TraceOutput() const { return trace_output_; }
   void SetTraceOutput(bool on) { trace_output_ = on; }
   // Kept for the host; no effect here.
@@ -110,7 +114,7 @@ class HwSerial {
   std::uint8_t PollPad() const { return poll_pad_; }
   void SetPollPad(std::uint8_t pads);
   // Zero bytes between the echo and the reply of the last poll. A count above 200 reads as 0.
-  std::uint32_t LastPollPads();
+  std::uint32_t LastPollPads() const;
   // Granularity of the clock and period of the system's timer, in milliseconds, as found at the start.
   std::uint32_t TickGranularity() const { return tick_granularity_ms_; }
   std::uint32_t TimerPeriod() const { return timer_period_ms_; }
@@ -124,6 +128,7 @@ class HwSerial {
   // A `time` of 0 fails.
   void cmdFade(std::uint8_t unit, std::int16_t circuit, std::uint8_t time, std::uint8_t from,
                std::uint8_t to);
+  // Effects on one circuit.
   void cmdSetTwinkle(std::uint8_t unit, std::int16_t circuit);
   void cmdSetShimmer(std::uint8_t unit, std::int16_t circuit);
   // Not supported: raise kErrUnsupported.
@@ -148,6 +153,7 @@ class HwSerial {
   // sent.
   bool CommandBuffering() const { return command_buffering_; }
   void SetCommandBuffering(bool on) { command_buffering_ = on; }
+  // What is kept.
   const CommandBuffer& Buffer() const { return command_buffer_; }
   // Not supported: raises kErrUnsupported and leaves the buffer as it is.
   void FlushCB();
@@ -163,6 +169,7 @@ class HwSerial {
   // 202 and 203). False: nothing was sent, because the unit ID is 0 or an earlier poll is outstanding. Raises
   // kErrPortNotOpen when no port is chosen.
   bool cmdPollStation(std::uint8_t unit, std::uint8_t kind);
+  // Whether a poll waits for its reply or its time-out.
   bool PollOutstanding() const { return poll_.has_value(); }
 
   // Results of the polls of kind 202, by unit, and of kind 203.
@@ -175,6 +182,8 @@ class HwSerial {
     std::uint8_t kind;
     std::uint32_t start_ms;
     std::uint32_t time_out_ms;
+    // The port was closed since: whatever line is open now, this poll has no part in it.
+    bool line_closed = false;
   };
 
   void OpenPort();
@@ -196,9 +205,12 @@ class HwSerial {
   void OnPollTimer();
   void OnHeartbeatTimer();
   std::uint32_t PollTimeOutMs(std::uint8_t kind) const;
+  // Whether the poll is out on the line that is open now: packets wait for it, and its reply is listened for.
+  bool PollOnLine() const { return poll_ && !poll_->line_closed; }
   bool TakeReply();
   void CompletePoll();
   void TimeOutPoll();
+  Poll EndPoll();
   void RestoreThresholds();
   void WriteHeldBack();
   void RaisePollReply(bool success, std::uint8_t unit, std::uint8_t code, Bytes data);

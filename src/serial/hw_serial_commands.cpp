@@ -159,7 +159,7 @@ void HwSerial::XmitData(std::span<const std::uint8_t> packet) {
   }
   OpenPort();
   if (!port_open_) return;
-  if (poll_) {
+  if (PollOnLine()) {
     held_back_.pop_back();
     held_back_.insert(held_back_.end(), packet.begin(), packet.end());
     if (packet.back() != kFrameByte) held_back_.push_back(kFrameByte);

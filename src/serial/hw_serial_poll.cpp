@@ -39,7 +39,7 @@ template <typename Action>
 void IgnoreFailure(Action&& action) noexcept {
   try {
     action();
-  } catch (const std::exception&) {
+  } catch (...) {
     return;
   }
 }
@@ -51,7 +51,7 @@ bool HwSerial::cmdPollStation(std::uint8_t unit, std::uint8_t kind) {
   OpenPort();
   if (!port_open_) throw RuntimeError(kErrPortNotOpen, "No serial port is open");
 
-  poll_ = Poll{unit, kind, clock_.NowMs(), 0};
+  poll_ = Poll{.unit = unit, .kind = kind, .start_ms = clock_.NowMs(), .time_out_ms = 0};
   parser_.Start(unit);
   try {
     device_.ClearInput();
@@ -80,7 +80,7 @@ std::uint32_t HwSerial::PollTimeOutMs(std::uint8_t kind) const {
 void HwSerial::OnDeviceEvent(SerialEvent event) {
   switch (event) {
     case SerialEvent::kDataReceived:
-      if (!poll_) {
+      if (!PollOnLine()) {
         IgnoreFailure([&] { device_.ClearInput(); });
       } else if (TakeReply()) {
         CompletePoll();
@@ -124,16 +124,10 @@ void HwSerial::CompletePoll() {
     return "Poll Took - " + std::to_string(clock_.NowMs() - poll_->start_ms) + "ms, received " +
            std::to_string(parser_.pads()) + " nulls";
   });
-  if (port_open_) {
-    IgnoreFailure([&] {
-      device_.SetRts(true);
-      device_.Write(std::array{kFrameByte, kFrameByte});
-      WriteHeldBack();
-    });
-  }
-  poll_timer_->SetEnabled(false);
-  const Poll poll = *std::exchange(poll_, std::nullopt);
-  RestoreThresholds();
+  IgnoreFailure([&] { device_.SetRts(true); });
+  IgnoreFailure([&] { device_.Write(std::array{kFrameByte, kFrameByte}); });
+  WriteHeldBack();
+  const Poll poll = EndPoll();
 
   const std::uint8_t code = parser_.code();
   const Bytes& data = parser_.data();
@@ -162,9 +156,9 @@ void HwSerial::CompletePoll() {
 }
 
 void HwSerial::OnPollTimer() {
-  if (poll_ && clock_.NowMs() - poll_->start_ms < poll_->time_out_ms) return;
+  if (!poll_ || clock_.NowMs() - poll_->start_ms < poll_->time_out_ms) return;
   // What has arrived counts, even if nobody had the time to look at it.
-  if (poll_ && TakeReply()) {
+  if (PollOnLine() && TakeReply()) {
     CompletePoll();
   } else {
     TimeOutPoll();
@@ -172,18 +166,13 @@ void HwSerial::OnPollTimer() {
 }
 
 void HwSerial::TimeOutPoll() {
-  poll_timer_->SetEnabled(false);
-  if (!poll_) return;
-  if (port_open_) {
-    IgnoreFailure([&] {
-      device_.SetRts(true);
-      WriteHeldBack();
-      // Before the host hears of it: the host may poll again, and must not find this byte in the middle.
-      device_.Write(std::array{kFrameByte});
-    });
+  if (PollOnLine()) {
+    IgnoreFailure([&] { device_.SetRts(true); });
+    WriteHeldBack();
+    // Before the host hears of it: the host may poll again, and must not find this byte in the middle.
+    IgnoreFailure([&] { device_.Write(std::array{kFrameByte}); });
   }
-  const Poll poll = *std::exchange(poll_, std::nullopt);
-  RestoreThresholds();
+  const Poll poll = EndPoll();
 
   switch (poll.kind) {
     case kKindDownload:
@@ -198,6 +187,14 @@ void HwSerial::TimeOutPoll() {
   }
 }
 
+// Back to idle: from here on the host may poll again.
+HwSerial::Poll HwSerial::EndPoll() {
+  poll_timer_->SetEnabled(false);
+  const Poll poll = *std::exchange(poll_, std::nullopt);
+  RestoreThresholds();
+  return poll;
+}
+
 void HwSerial::RestoreThresholds() {
   IgnoreFailure([&] {
     device_.SetReceiveThreshold(kIdleReceiveThreshold);
@@ -208,15 +205,17 @@ void HwSerial::RestoreThresholds() {
 void HwSerial::WriteHeldBack() {
   if (held_back_.size() == 1) return;
   const Bytes held_back = std::exchange(held_back_, Bytes{kFrameByte});
-  device_.Write(held_back);
-  device_.Write(std::array{kFrameByte});
+  IgnoreFailure([&] { device_.Write(held_back); });
+  IgnoreFailure([&] { device_.Write(std::array{kFrameByte}); });
 }
 
 void HwSerial::RaisePollReply(bool success, std::uint8_t unit, std::uint8_t code, Bytes data) {
   if (poll_reply_) poll_reply_(success, unit, code, data);
 }
 
-std::uint32_t HwSerial::LastPollPads() { return parser_.pads() <= kMaxPlausiblePads ? parser_.pads() : 0; }
+std::uint32_t HwSerial::LastPollPads() const {
+  return parser_.pads() <= kMaxPlausiblePads ? parser_.pads() : 0;
+}
 
 void HwSerial::OnHeartbeatTimer() {
   if (port_open_) IgnoreFailure([&] { XmitData(HeartbeatPacket()); });

@@ -46,11 +46,12 @@ FadeRate EncodeFadeRate(std::uint8_t encoded_from, std::uint8_t encoded_to, std:
       static_cast<int>(std::nearbyint(std::abs(encoded_from - encoded_to) * 256.0 / (time * 12.0)));
   int low = rate % 256;
   int high = rate / 256;
+  // Bits that no rate uses mark the bytes that are zero.
+  if (high == 0) high |= 0x80;
   if (low == 0) {
     high |= 0x40;
     low = 1;
   }
-  if (high == 0) high = 0x80;
   return {static_cast<std::uint8_t>(high), static_cast<std::uint8_t>(low)};
 }
 

@@ -14,9 +14,10 @@ namespace tendril {
 
 // Takes one byte at a time. It belongs to one poll after another: Start() begins each.
 //
-//   AwaitZero --00--> AwaitAddress --FE, or the polled unit until the echo is over--> AwaitCode --any-->
-//   InData any state --00--> AwaitAddress    (the end of the echo, a pad, or noise) AwaitCode, InData --00,
-//   once the reply is expected--> the reply is complete
+//   AwaitAddress --FE, or the polled unit until the echo is over--> AwaitCode --any--> InData
+//   AwaitAddress --any other--> AwaitZero
+//   AwaitCode, InData --00 once the reply is expected--> the reply is complete
+//   any state --00 otherwise--> AwaitAddress (the end of the echo, a pad, or noise)
 class ReplyParser {
  public:
   enum class Verdict { kNeedMore, kEchoSeen, kReplyComplete };

@@ -35,9 +35,13 @@ void CommandProgress::OnTick() {
     timer_->SetEnabled(false);
     view_.ShowProgress(false);
     view_.SetBarWidth(kStep);
-  } else if (value_ < view_.FrameWidth()) {
+    return;
+  }
+  if (value_ < view_.FrameWidth()) {
     value_ += kStep;
     view_.SetBarWidth(value_);
+  } else {
+    timer_->SetEnabled(false);  // full: nothing moves until the command ends
   }
 }
 

@@ -9,7 +9,9 @@
 
 namespace tendril {
 
+// Blue while a command runs, green for a success, red for a failure.
 enum class ProgressColour { kBlue, kGreen, kRed };
+// How a command ended.
 enum class Outcome { kSuccess, kFailure };
 
 // What the display is drawn on. Widths are device-independent pixels.
@@ -20,9 +22,11 @@ class CommandProgressView {
   virtual void ShowProgress(bool shown) = 0;
   // The inner width of the progress frame, at which the bar is full.
   virtual int FrameWidth() const = 0;
+  // Draws the bar `width` wide, which may be a little more than the frame.
   virtual void SetBarWidth(int width) = 0;
   // Colours bar and label.
   virtual void SetColour(ProgressColour colour) = 0;
+  // Sets the label; empty for none.
   virtual void SetText(const std::string& text) = 0;
 };
 
@@ -30,6 +34,7 @@ class CommandProgressView {
 // nothing and sets no time limit.
 class CommandProgress {
  public:
+  // `view` must outlive the progress.
   CommandProgress(TimerFactory& timers, CommandProgressView& view);
 
   // Shows the empty bar and lets it grow.

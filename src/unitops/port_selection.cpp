@@ -32,8 +32,8 @@ void PortSelection::Choose(std::size_t entry) {
     link_.SetRTS(true);
   } catch (const RuntimeError& error) {
     ReportPortOpenError(error.number(), error.description());
-  } catch (const std::exception& error) {
-    ReportPortOpenError(kErrInternal, error.what());
+  } catch (...) {
+    ReportPortOpenError(kErrInternal, DescribeCurrentFault());
   }
 }
 

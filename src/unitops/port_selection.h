@@ -11,11 +11,10 @@
 
 namespace tendril {
 
-// Title of boxes that have none of their own.
-inline constexpr char kDefaultBoxTitle[] = "Tendril Configuration";
-
+// The window's comm port list asks it what to list, and tells it what was chosen.
 class PortSelection {
  public:
+  // Both must outlive it.
   PortSelection(HwSerial& link, MessageBoxes& boxes);
 
   // Looks for ports 1 to 25 and returns the lines of the list: "Select", then "Comm n" for each that exists.

@@ -7,6 +7,7 @@
 
 namespace tendril {
 
+// The commands begin and end it; the window disables what must not be used meanwhile.
 class RunningCommand {
  public:
   // Who is told of each change; called after it.
@@ -14,8 +15,10 @@ class RunningCommand {
 
   // What runs, in the words of a tool tip ("Sending the configuration to unit 01"); empty when nothing does.
   const std::string& What() const { return what_; }
+  // Whether a command is under way.
   bool Active() const { return !what_.empty(); }
 
+  // `what` is not empty.
   void Begin(std::string what) { Change(std::move(what)); }
   // Does nothing when nothing runs.
   void End() {

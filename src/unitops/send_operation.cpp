@@ -4,6 +4,7 @@
 
 #include "config/option_bytes.h"
 #include "platform/runtime_error.h"
+#include "serial/hex_text.h"
 
 namespace tendril {
 namespace {
@@ -17,11 +18,6 @@ constexpr std::uint8_t kOptionServoPort = 17;
 
 constexpr char kCommandFailed[] = "COMMAND FAILED!";
 constexpr char kSendError[] = "Send Error";
-
-std::string HexId(std::uint8_t id) {
-  constexpr char kDigits[] = "0123456789ABCDEF";
-  return {kDigits[id / 16], kDigits[id % 16]};
-}
 
 }  // namespace
 
@@ -49,7 +45,7 @@ void SendOperation::Start() {
       context_.boxes.Show({"Error sending configuration, Please retry", kSendError, BoxIcon::kCritical});
       return;
     }
-    context_.running.Begin("Sending the configuration to unit " + HexId(unit));
+    context_.running.Begin("Sending the configuration to unit " + TwoHexDigits(unit));
     context_.progress.StartCommandProgress();
   } catch (...) {
     ShowFault(DescribeCurrentFault());

@@ -32,14 +32,18 @@ bool MayStartCommand(CommandContext& context);
 // Port by port: the options, then a poll of kind "0" until the unit acknowledges (once, and twice more when
 // nothing is heard), then a pause, then the next port.
 //
-//   Idle --Start: options and poll out--> Polling --acknowledged--> Pausing --300 ms: next port out-->
-//   Polling Polling --wrong reply, or third poll unanswered--> Idle (failed) Pausing --300 ms after port 8-->
-//   Idle (success) Start, Pausing --a field is invalid, or a fault--> Idle
+//   Idle --Start: options and poll out--> Polling
+//   Polling --acknowledged--> Pausing
+//   Polling --wrong reply, or third poll unanswered--> Idle (failed)
+//   Pausing --300 ms: next port's options and poll out--> Polling
+//   Pausing --300 ms after port 8--> Idle (success)
+//   Idle, Pausing --a field is invalid, or a fault--> Idle
 class SendOperation {
  public:
   // The poll kind of an acknowledgement.
   static constexpr std::uint8_t kAcknowledgePoll = '0';
 
+  // `working` are the records that are sent; both must outlive the operation.
   SendOperation(CommandContext& context, TimerFactory& timers, const ChannelTable& working);
 
   // "SEND(write) Configuration". Shows every failure; raises none.

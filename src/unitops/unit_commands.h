@@ -14,6 +14,7 @@
 
 namespace tendril {
 
+// One object for all of them, since they share the progress display, and only one runs at a time.
 class UnitCommands {
  public:
   // Takes the link's poll replies. Everything handed in must outlive it.
@@ -29,11 +30,13 @@ class UnitCommands {
   // Stops whatever runs, and shows nothing: the window is closing.
   void Stop() { send_.Stop(); }
 
+  // Which of them runs.
   RunningCommand& Running() { return running_; }
 
- private:
+  // The reply, or its absence, to a poll of `kind`. Shows every failure; raises none. The link calls it.
   void OnPollReply(bool replied, std::uint8_t unit, std::uint8_t kind, const Bytes& data);
 
+ private:
   HwSerial& link_;
   MessageBoxes& boxes_;
   CommandProgress progress_;

@@ -5,6 +5,7 @@
 
 namespace tendril {
 
+// The connection area of the window; the unit commands ask it anew for every packet that they send.
 class UnitTarget {
  public:
   virtual ~UnitTarget() = default;

@@ -7,7 +7,6 @@
 #include <sstream>
 #include <string>
 
-#include "platform/ansi_text.h"
 #include "platform/runtime_error.h"
 
 namespace tendril {
@@ -28,10 +27,6 @@ TEST(FileCommandLog, MakesItsFolderAppendsAndTellsWhenItCannot) {
   // A folder stands where the file should be.
   EXPECT_THROW(FileCommandLog(folder / "deep").Append("Command"), RuntimeError);
   std::filesystem::remove_all(folder);
-}
-
-TEST(AnsiText, CharactersBecomeOneByteEach) {
-  EXPECT_EQ(AnsiBytes(u"A\u00B5\u20AC\u2122\u4E2D"), (Bytes{'A', 0xB5, 0x80, 0x99, '?'}));
 }
 
 }  // namespace

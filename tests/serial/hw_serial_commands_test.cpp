@@ -55,6 +55,24 @@ TEST_F(HwSerialCommands, Failures_CarryTheirTraceLines) {
             "broken\r\nTrace: SendCommand\r\nTrace: SendUnlockCmd\r\nTrace: Fade");
   EXPECT_EQ(FailureOf([&] { link_.CmdSetDMXIntensity(5, 1, 0); }).description(),
             "broken\r\nTrace: SendCommand\r\nTrace: SetIntensity\r\nTrace: SetIntensity");
+  EXPECT_THAT(FailureOf([&] { link_.cmdSetoption(5, 0, 1, 1, 1, 1, 1); }).description(),
+              EndsWith("\r\nTrace: Fade"));
+  EXPECT_THAT(FailureOf([&] { link_.cmdSetTwinkle(5, 1); }).description(), EndsWith("\r\nTrace: SetTwinkle"));
+  EXPECT_THAT(FailureOf([&] { link_.cmdSetShimmer(5, 1); }).description(), EndsWith("\r\nTrace: SetShimmer"));
+}
+
+TEST_F(HwSerialCommands, WithoutAPort_CommandsSendNothingAndDoNotFail) {
+  link_.SetCommPort(0);
+  link_.cmdSetTwinkle(5, 1);
+  link_.SendUnlockCmd(5);
+  EXPECT_THAT(device_.TakeWrites(), IsEmpty());
+}
+
+TEST_F(HwSerialCommands, FaultOfAnotherType_BecomesOneWithATrace) {
+  log_.on_append = [] { throw 7; };
+  const RuntimeError error = FailureOf([&] { link_.SendUnlockCmd(5); });
+  EXPECT_EQ(error.number(), kErrInternal);
+  EXPECT_EQ(error.description(), "Unknown error\r\nTrace: SendCommand\r\nTrace: SendUnlockCmd");
 }
 
 TEST_F(HwSerialCommands, UnitWideCommands_AreLoggedAfterTheyWentOut) {

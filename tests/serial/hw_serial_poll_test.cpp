@@ -47,6 +47,7 @@ TEST_F(HwSerialPoll, Kinds_DecideWhatIsReported) {
   for (const Case& c : std::vector<Case>{{'0', 7, {{true, 5, '0', {6, 10}}}},
                                          {100, 104, {{true, 5, 104, {6, 10}}}},
                                          {100, 105, {{false, 5, 100, {6, 10}}}},
+                                         {100, 100, {{false, 5, 100, {6, 10}}}},
                                          {111, 7, {{true, 5, 7, {6, 10}}}},
                                          {202, 7, {}},
                                          {203, 7, {}}}) {
@@ -72,8 +73,13 @@ TEST_F(HwSerialPoll, NoReply_EndsAtTheComputedTimeOut) {
     std::uint64_t time_out_ms;
   };
   // (pending + 38 + pads) bytes of 10 bits at 19200 bit/s, twice; the slow kinds get 250 ms more.
-  for (const Case& c : std::vector<Case>{
-           {'0', 6, 45, 93}, {'n', 33, 45, 121}, {'0', 0, 200, 248}, {'2', 6, 45, 343}, {'o', 6, 45, 343}}) {
+  for (const Case& c : std::vector<Case>{{'0', 6, 45, 93},
+                                         {'n', 33, 45, 121},
+                                         {'0', 0, 200, 248},
+                                         {'2', 6, 45, 343},
+                                         {'1', 6, 45, 343},
+                                         {'A', 6, 45, 343},
+                                         {'o', 6, 45, 343}}) {
     replies_.clear();
     device_.pending_output = c.pending;
     link_.SetPollPad(static_cast<std::uint8_t>(c.pads));
@@ -134,10 +140,48 @@ TEST_F(HwSerialPoll, WhileOutstanding_PacketsWaitAndASecondPollIsRefused) {
   EXPECT_EQ(device_.TakeWrites().size(), 1u);
 }
 
-TEST_F(HwSerialPoll, HeldBackPackets_GoOutAfterATimeOutToo) {
+TEST_F(HwSerialPoll, HeldBackPackets_GoOutOnceAfterATimeOutToo) {
   PollAndEcho('0');
   link_.SendUnlockCmd(5);
   time_.Advance(500);
+  EXPECT_THAT(device_.TakeWrites(), ElementsAre(Bytes{0, 5, 0x8A, 0x56, 0}, Bytes{0}, Bytes{0}));
+  PollAndEcho('0');
+  time_.Advance(500);
+  EXPECT_THAT(device_.TakeWrites(), ElementsAre(Bytes{0}));
+}
+
+TEST_F(HwSerialPoll, PortChangedInThePoll_NothingOfItReachesTheNewLine) {
+  PollAndEcho('0');
+  link_.SendUnlockCmd(5);
+  link_.SetCommPort(1);
+  ASSERT_TRUE(link_.PortOpen());
+  EXPECT_EQ(device_.receive_threshold, 4000);
+  EXPECT_FALSE(link_.cmdPollStation(6, '0'));
+  link_.cmdSetTwinkle(5, 1);  // meant for the new line: goes out at once
+  EXPECT_THAT(device_.TakeWrites(), ElementsAre(Bytes{0, 5, 6, 0x81, 0}));
+  device_.Receive({0, 0xFE, '0', 6, 10, 0});  // somebody else's
+  EXPECT_THAT(replies_, IsEmpty());
+  time_.Advance(500);
+  EXPECT_THAT(replies_, ElementsAre(ReportedReply{false, 5, '0', {}}));
+  EXPECT_THAT(device_.TakeWrites(), IsEmpty());
+  EXPECT_TRUE(link_.cmdPollStation(6, '0'));
+}
+
+TEST_F(HwSerialPoll, WhatCameBeforeThePoll_IsNoReply) {
+  link_.SetPortOpen(true);
+  device_.Receive({0, 0xFE, '0', 6, 10, 0}, /*tell=*/false);
+  PollAndEcho('0');
+  EXPECT_THAT(replies_, IsEmpty());
+  time_.Advance(500);
+  EXPECT_THAT(replies_, ElementsAre(ReportedReply{false, 5, '0', {}}));
+}
+
+TEST_F(HwSerialPoll, RtsThatFails_KeepsNothingElseFromHappening) {
+  PollAndEcho('0');
+  link_.SendUnlockCmd(5);
+  device_.rts_failure = RuntimeError(kErrReadFault, "broken");
+  time_.Advance(500);
+  EXPECT_EQ(replies_.size(), 1u);
   EXPECT_THAT(device_.TakeWrites(), ElementsAre(Bytes{0, 5, 0x8A, 0x56, 0}, Bytes{0}, Bytes{0}));
 }
 

@@ -53,6 +53,13 @@ TEST_F(HwSerialPort, FailedOpening_TellsPortErrorAndStep) {
               testing::EndsWith("\r\nTrace: Let BaudRate"));
   EXPECT_FALSE(link_.PortOpen());
   EXPECT_FALSE(device_.open);
+
+  link_.SetBaudRate(19200);
+  device_.rts_failure = RuntimeError(kErrReadFault, "broken");
+  EXPECT_THAT(FailureOf([&] { link_.SetPortOpen(true); }).description(),
+              testing::EndsWith("\r\nWhile: Setting RTS on"));
+  EXPECT_FALSE(link_.PortOpen());
+  EXPECT_FALSE(device_.open);
 }
 
 TEST_F(HwSerialPort, RawOutput_SendsTextAndBytesAndIgnoresNothing) {

@@ -47,7 +47,7 @@ TEST(Packets, FadeRate_RoundsHalfToEvenAndNeverHoldsAZeroByte) {
     std::uint8_t from, to, time, high, low;
   };
   for (const Case& c : std::vector<Case>{
-           {0xF0, 0xF0, 10, 0x40, 0x01},  // no change: low is marked, which fills high
+           {0xF0, 0xF0, 10, 0xC0, 0x01},  // no change: both bytes are zero, both are marked
            {0xF0, 0x01, 1, 0x13, 0xEB},   // 239 * 256 / 12 = 5098.67
            {0x01, 0xF0, 1, 0x13, 0xEB},   // the direction does not matter
            {3, 0, 64, 0x80, 0x01},        // exactly 1

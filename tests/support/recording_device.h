@@ -38,6 +38,7 @@ class RecordingDevice final : public SerialDevice {
   void SetTransmitThreshold(std::int32_t /*bytes*/) override {}
   void SetRts(bool asserted) override {
     RequireOpen();
+    if (rts_failure) throw RuntimeError(*rts_failure);
     rts = asserted;
     actions.push_back(asserted ? "rts on" : "rts off");
   }
@@ -72,6 +73,7 @@ class RecordingDevice final : public SerialDevice {
   std::size_t pending_output = 0;
   std::optional<RuntimeError> open_failure;
   std::optional<RuntimeError> write_failure;
+  std::optional<RuntimeError> rts_failure;
 
  private:
   void RequireOpen() const {

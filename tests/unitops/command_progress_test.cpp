@@ -22,6 +22,10 @@ TEST(CommandProgress, Bar_GrowsTenEvery15msUntilTheFrameIsFull) {
   EXPECT_EQ(view.bar_width, 20);
   time.Advance(60000);
   EXPECT_EQ(view.bar_width, 400);
+  EXPECT_EQ(time.RunningTimers(), 0);
+  progress.EndCommandProgress(Outcome::kSuccess, "done");
+  time.Advance(3000);
+  EXPECT_FALSE(view.shown);
 }
 
 TEST(CommandProgress, Outcome_StaysForThreeSecondsAndTheBarStartsOver) {

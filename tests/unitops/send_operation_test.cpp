@@ -63,6 +63,18 @@ class Send : public testing::Test {
   UnitCommands commands_{link_, world_.time, world_.boxes, progress_, target_, working_};
 };
 
+// Answers every poll with the same data.
+class ScriptedUnit final : public VirtualUnit {
+ public:
+  ScriptedUnit(std::uint8_t id, Bytes data) : VirtualUnit(id), data_(std::move(data)) {}
+
+ protected:
+  std::optional<Bytes> ReplyData(std::uint8_t /*kind*/) override { return data_; }
+
+ private:
+  Bytes data_;
+};
+
 // What the program puts on the line of Comm 1.
 Bytes Recorded(VirtualPorts& bench, const std::function<void()>& action) {
   Bytes bytes;
@@ -208,7 +220,60 @@ TEST_F(Send, BadlyBehavedUnits_EndWithTheStatedOutcome) {
   }
 }
 
-TEST_F(Send, Flood_EndsByTimeOutWithBoundedMemoryAndTheLinkRecovers) {
+TEST_F(Send, OnlyTheReplysSecondByte_Accepts) {
+  struct Case {
+    Bytes data;
+    bool accepted;
+  };
+  for (const Case& c : std::vector<Case>{{{10}, false},
+                                         {{1, 10}, true},
+                                         {{10, 1}, false},
+                                         {{1, 10, 3}, true},
+                                         {{3, 1, 10}, false},
+                                         {{}, false}}) {
+    SCOPED_TRACE(testing::PrintToString(c.data));
+    auto& unit = world_.bench.Attach<ScriptedUnit>(1, std::uint8_t{0x01}, c.data);
+    commands_.Send();
+    RunToTheEnd();
+    if (c.accepted) {
+      ExpectSuccess();
+    } else {
+      ExpectFailure(kNoResponse);
+    }
+    world_.bench.Detach(1, unit);
+  }
+}
+
+TEST_F(Send, IdSetTo00InTheMiddle_IsASendErrorAtTheNextPort) {
+  world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
+  commands_.Send();
+  target_.unit = 0;
+  RunToTheEnd();
+  ExpectFailure({"Error sending configuration, Please retry", "Send Error", BoxIcon::kCritical});
+}
+
+TEST_F(Send, PollTakenBySomebodyElse_IsASendErrorOfTheRepeat) {
+  world_.bench.Attach<MuteUnit>(1, std::uint8_t{0x01});
+  commands_.Send();
+  // Whoever hears of the missing reply first polls for something of his own.
+  auto handler = [&](bool replied, std::uint8_t unit, std::uint8_t kind, Bytes& data) {
+    link_.cmdPollStation(0x02, 'n');
+    commands_.OnPollReply(replied, unit, kind, data);
+  };
+  link_.SetPollReplyHandler(handler);
+  RunToTheEnd();
+  ExpectFailure(
+      {"Error sending option command to the controller, Please retry", "Send Error", BoxIcon::kCritical});
+}
+
+TEST_F(Send, FaultOfAnotherType_IsShownLikeAnyOther) {
+  world_.log.on_append = [] { throw 7; };
+  commands_.Send();
+  ASSERT_EQ(world_.boxes.shown.size(), 1u);
+  EXPECT_THAT(world_.boxes.shown[0].text, StartsWith("Download Failed\r\nUnknown error"));
+}
+
+TEST_F(Send, Flood_EndsByTimeOutAndTheLinkRecovers) {
   auto& flooding = world_.bench.Attach<FloodingUnit>(1, std::uint8_t{0x01});
   commands_.Send();
   RunToTheEnd();
@@ -221,7 +286,7 @@ TEST_F(Send, Flood_EndsByTimeOutWithBoundedMemoryAndTheLinkRecovers) {
   ExpectSuccess();
 }
 
-TEST_F(Send, LostPolls_AreRepeatedTwiceForEachPort) {
+TEST_F(Send, LostPolls_AreRepeated) {
   auto& unit = world_.bench.Attach<DeafUnit>(1, std::uint8_t{0x01}, std::size_t{2});
   commands_.Send();
   RunToTheEnd();
