@@ -1,6 +1,5 @@
 // An empty window, to measure a start against.
 #include <QApplication>
-#include <QScreen>
 #include <QWidget>
 
 #include "first_paint.h"
@@ -8,8 +7,7 @@
 int main(int argc, char** argv) {
   QApplication application(argc, argv);
   QWidget window;
-  window.resize(
-      QSize(1280, 800).boundedTo(window.screen()->availableSize() - QSize(8, 40)));  // as the program
+  window.resize(1280, 800);
   const tendril::FirstPaint first_paint;
   window.show();
   return QApplication::exec();

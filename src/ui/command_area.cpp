@@ -38,9 +38,8 @@ CommandArea::CommandArea(UnitCommands& commands, CommandButtons& buttons, QWidge
   auto* get =
       Named(new QPushButton(QStringLiteral("&GET(read) Configuration")), QStringLiteral("Command3_1"));
   auto* update = Named(new QPushButton(QStringLiteral("&UPDATE Unit_ID")), QStringLiteral("Command3_2"));
-  buttons.Add(send, QStringLiteral("Writes the configuration of all eight ports into the chosen unit."),
-              [&commands] { commands.Send(); });
-  Disable(get, QStringLiteral("Reading a unit's configuration is not in this version yet."));
+  buttons.Add(send, kSendTip, [&commands] { commands.Send(); });
+  Disable(get, kNoGetTip);
   Disable(update, QStringLiteral("Changing a unit's ID is not in this version yet."));
 
   auto* frame = Named(new QGroupBox(QStringLiteral("Unit")), QStringLiteral("frmUpDownLoad"));

@@ -12,6 +12,11 @@
 
 namespace tendril {
 
+// What the buttons of the unit commands do, wherever they stand.
+inline const QString kSendTip =
+    QStringLiteral("Writes the configuration of all eight ports into the chosen unit.");
+inline const QString kNoGetTip = QStringLiteral("Reading a unit's configuration is not in this version yet.");
+
 // The buttons that run unit commands, wherever they stand. Disabled while a command runs, with a tool tip
 // that says which.
 class CommandButtons {

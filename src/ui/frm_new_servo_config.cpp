@@ -8,6 +8,9 @@
 #include <QVBoxLayout>
 #include <optional>
 
+#include "ui/actuals_frame.h"
+#include "ui/summary_area.h"
+
 namespace tendril {
 namespace {
 
@@ -40,42 +43,44 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
 
 frmNewServoConfig::~frmNewServoConfig() { commands_.Running().SetObserver(nullptr); }
 
+// Stacks and scroll areas show a widget as soon as they get it, and with that lay it out. So they get theirs
+// while it is empty, and only when they are in this window themselves: without a parent, what they show would
+// be a window of its own.
 void frmNewServoConfig::LayOut() {
+  setMinimumSize(kSmallestWindow);
+  // A frame and a task bar want room too.
+  resize(kFirstSize.boundedTo(screen()->availableSize() - QSize(8, 40)));
+  auto* whole = new QVBoxLayout(this);
+  whole->setContentsMargins(0, 0, 0, 0);
+  auto* scroll = new QScrollArea;
+  scroll->setFrameShape(QFrame::NoFrame);
+  scroll->setWidgetResizable(true);
+  scroll->setFocusPolicy(Qt::NoFocus);
+  whole->addWidget(scroll);
+
   auto* content = new QWidget;
+  scroll->setWidget(content);
+  auto* column = new QVBoxLayout(content);
+  column->setContentsMargins(8, 4, 8, 8);
+  column->setSpacing(4);
   auto* top = new QHBoxLayout;
   top->addWidget(connection_);
   top->addWidget(command_area_, 1);
-
+  column->addLayout(top);
   auto* boxes_or_progress = new QStackedLayout;
+  column->addLayout(boxes_or_progress);
   progress_->SharePlace(*boxes_or_progress, apply_boxes_);
+  column->addWidget(views_, 1);
 
   auto* simulator_view = new QWidget;
+  simulator_view->installEventFilter(this);  // for its first paint
+  views_->addWidget(simulator_view);
   auto* simulator_column = new QVBoxLayout(simulator_view);
   simulator_column->setContentsMargins(0, 0, 0, 0);
   simulator_column->setSpacing(4);
   simulator_column->addWidget(channels_, 1);
   simulator_column->addWidget(editor_, 3);
   simulator_column->addWidget(live_test_);
-  views_->addWidget(simulator_view);
-
-  auto* column = new QVBoxLayout(content);
-  column->setContentsMargins(8, 4, 8, 8);
-  column->setSpacing(4);
-  column->addLayout(top);
-  column->addLayout(boxes_or_progress);
-  column->addWidget(views_, 1);
-
-  auto* scroll = new QScrollArea(this);
-  scroll->setFrameShape(QFrame::NoFrame);
-  scroll->setWidgetResizable(true);
-  scroll->setFocusPolicy(Qt::NoFocus);
-  scroll->setWidget(content);
-  auto* whole = new QVBoxLayout(this);
-  whole->setContentsMargins(0, 0, 0, 0);
-  whole->addWidget(scroll);
-  setMinimumSize(kSmallestWindow);
-  // A frame and a task bar want room too.
-  resize(kFirstSize.boundedTo(screen()->availableSize() - QSize(8, 40)));
 }
 
 void frmNewServoConfig::StartUp(const Version& version) {
@@ -108,21 +113,30 @@ void frmNewServoConfig::ShowRunning() {
   connection_->ShowRunning(running);
   command_buttons_.ShowRunning(running);
   progress_->ShowRunning(running);
-  // Disabling took the focus off the button that was pressed; whoever works by keyboard wants it back.
-  if (!running.Active() && focus_before_command_) focus_before_command_->setFocus();
+  // Disabling takes the focus off the button that was pressed. Unless the person has moved it since, it goes back.
+  if (running.Active()) {
+    focus_in_command_ = focusWidget();
+  } else if (focus_before_command_ && focusWidget() == focus_in_command_) {
+    focus_before_command_->setFocus();
+  }
 }
 
-// The summary has more controls than all the rest, and is not seen at first: the window does not wait for it.
-void frmNewServoConfig::showEvent(QShowEvent* event) {
-  QWidget::showEvent(event);
-  QTimer::singleShot(0, this, [this] { MakeSummary(); });
+// The summary has more controls than all the rest, and is not seen at first: the first picture of the window
+// does not wait for it.
+bool frmNewServoConfig::eventFilter(QObject* object, QEvent* event) {
+  if (event->type() == QEvent::Paint) {
+    object->removeEventFilter(this);
+    QTimer::singleShot(0, this, [this] { MakeUnseenParts(); });
+  }
+  return QWidget::eventFilter(object, event);
 }
 
-void frmNewServoConfig::MakeSummary() {
-  if (summary_ != nullptr) return;
-  summary_ = new SummaryArea;
-  summary_->SetRangeCaptions(QStringLiteral("1000--2000"));
-  views_->addWidget(summary_);
+void frmNewServoConfig::MakeUnseenParts() {
+  auto* summary = new SummaryArea(commands_, command_buttons_, views_);
+  summary->SetRangeCaptions(QStringLiteral("1000--2000"));
+  views_->addWidget(summary);
+  new ActualsFrame(this);  // the window owns it
+  ShowRunning();           // the buttons that came
 }
 
 void frmNewServoConfig::closeEvent(QCloseEvent* event) {

@@ -17,7 +17,6 @@
 #include "ui/editor_area.h"
 #include "ui/live_test_area.h"
 #include "ui/progress_area.h"
-#include "ui/summary_area.h"
 #include "unitops/port_selection.h"
 #include "unitops/shutdown.h"
 #include "unitops/unit_commands.h"
@@ -45,14 +44,14 @@ class frmNewServoConfig : public QWidget {
   void UpdateSimulators();
 
  protected:
-  void showEvent(QShowEvent* event) override;
+  bool eventFilter(QObject* object, QEvent* event) override;
   void closeEvent(QCloseEvent* event) override;
 
  private:
   void LayOut();
   void StartUp(const Version& version);
   void ShowRunning();
-  void MakeSummary();
+  void MakeUnseenParts();
 
   HwSerial& link_;
   ChannelTable working_;
@@ -70,8 +69,9 @@ class frmNewServoConfig : public QWidget {
   EditorArea* editor_;
   LiveTestArea* live_test_;
   QStackedWidget* views_;
-  SummaryArea* summary_ = nullptr;  // made once the window is on its way to the screen
+  // Where the focus was when the running command began, and where it went when its button was disabled.
   QPointer<QWidget> focus_before_command_;
+  QPointer<QWidget> focus_in_command_;
 
   Shutdown shutdown_;
 };

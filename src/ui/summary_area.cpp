@@ -5,6 +5,7 @@
 #include <QHBoxLayout>
 #include <QPushButton>
 #include <QRadioButton>
+#include <QSpinBox>
 #include <array>
 
 #include "config/channel_config.h"
@@ -70,7 +71,7 @@ QLabel* MakeCaption(const char* text) {
 
 }  // namespace
 
-SummaryArea::SummaryArea(QWidget* parent) : QWidget(parent) {
+SummaryArea::SummaryArea(UnitCommands& commands, CommandButtons& buttons, QWidget* parent) : QWidget(parent) {
   auto* column = new QVBoxLayout(this);
   column->setContentsMargins(0, 0, 0, 0);
   column->addWidget(MakeHeader());
@@ -78,20 +79,40 @@ SummaryArea::SummaryArea(QWidget* parent) : QWidget(parent) {
     column->addWidget(MakeRow(channel));
   column->addWidget(MakeTrailer());
 
-  auto* buttons = new QHBoxLayout;
-  buttons->addStretch();
-  int index = 3;  // after the three of the unit commands
-  for (const char* caption : {"Send to Tendril", "Get from Tendril"}) {
-    auto* button =
-        Named(new QPushButton(QString::fromUtf8(caption)), ArrayName(QStringLiteral("Command3"), index++));
-    Disable(button, QString::fromUtf8(kNotYet));
-    buttons->addWidget(button);
-  }
+  column->addLayout(MakeButtons(commands, buttons));
+  column->addStretch();
+  MakeNumberEntry();
+}
+
+QLayout* SummaryArea::MakeButtons(UnitCommands& commands, CommandButtons& buttons) {
+  // The same actions as those of the unit commands above.
+  auto* send = Named(new QPushButton(QStringLiteral("Send to Tendril")), QStringLiteral("Command3_3"));
+  buttons.Add(send, kSendTip, [&commands] { commands.Send(); });
+  auto* get = Named(new QPushButton(QStringLiteral("Get from Tendril")), QStringLiteral("Command3_4"));
+  Disable(get, kNoGetTip);
   auto* back = Named(new QPushButton(QStringLiteral("Simulator")), QStringLiteral("cmdShowConfig"));
   Disable(back, QString::fromUtf8(kNotYet));
-  buttons->addWidget(back);
-  column->addLayout(buttons);
-  column->addStretch();
+  auto* row = new QHBoxLayout;
+  row->addStretch();
+  for (QPushButton* button : {send, get, back}) row->addWidget(button);
+  return row;
+}
+
+// The panel in which a value of the table is changed; hidden until a value is pressed.
+void SummaryArea::MakeNumberEntry() {
+  auto* panel = Named(new QFrame(this), QStringLiteral("fraNumberEntry"));
+  panel->setFrameShape(QFrame::StyledPanel);
+  panel->setAutoFillBackground(true);
+  panel->hide();
+  auto* grid = new QGridLayout(panel);
+  grid->addWidget(Named(BoldLabel({}), QStringLiteral("lblDisplay")), 0, 0, 1, 2);
+  for (int index = 0; index < 2; ++index) {
+    auto* spin = Named(new QSpinBox, ArrayName(QStringLiteral("spnSumValue"), index));
+    spin->setAccessibleName(index == 0 ? QStringLiteral("New value") : QStringLiteral("New right stop"));
+    Disable(spin, QString::fromUtf8(kNotYet));
+    grid->addWidget(spin, 1, index);
+    grid->addWidget(Named(new QLabel, ArrayName(QStringLiteral("lblSumValue"), index)), 2, index);
+  }
 }
 
 QWidget* SummaryArea::MakeHeader() {

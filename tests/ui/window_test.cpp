@@ -30,6 +30,7 @@ class Window : public testing::Test {
   Window() {
     window_->show();
     [[maybe_unused]] const bool exposed = QTest::qWaitForWindowExposed(window_.get());
+    QTest::qWait(0);  // what is not seen at first is made after the first paint
   }
 
   template <typename Widget = QWidget>
