@@ -11,5 +11,6 @@ int main(int argc, char** argv) {
   qputenv("XDG_CONFIG_HOME", folder.path().toLocal8Bit());
   if (!qEnvironmentVariableIsSet("QT_QPA_PLATFORM")) qputenv("QT_QPA_PLATFORM", "offscreen");
   const QApplication app(argc, argv);
+  QApplication::setQuitOnLastWindowClosed(false);  // a box is often the only window
   return RUN_ALL_TESTS();
 }

@@ -66,10 +66,10 @@ TEST_F(HwSerialPort, RawOutput_SendsTextAndBytesAndIgnoresNothing) {
   link_.RawOutput(u"");
   link_.RawOutput(Bytes{});
   EXPECT_FALSE(link_.PortOpen());
-  link_.RawOutput(u"ab\u20AC");
+  link_.RawOutput(u"ab\u20AC\u4E2D");
   link_.RawOutput(Bytes{1, 0, 2});
-  EXPECT_THAT(device_.TakeWrites(), ElementsAre(Bytes{'a', 'b', 0x80}, Bytes{1, 0, 2}));
-  EXPECT_EQ(link_.SentByteCount(true), 4);  // one less than its length for each
+  EXPECT_THAT(device_.TakeWrites(), ElementsAre(Bytes{'a', 'b', 0x80, '?'}, Bytes{1, 0, 2}));
+  EXPECT_EQ(link_.SentByteCount(true), 5);  // one less than its length for each
   EXPECT_EQ(link_.SentByteCount(), 0);
 }
 
