@@ -1,3 +1,4 @@
+// The main function of tests that need widgets: on the offscreen platform unless the environment names another.
 #include <gtest/gtest.h>
 
 #include <QApplication>
