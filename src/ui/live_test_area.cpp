@@ -53,7 +53,6 @@ LiveTestArea::LiveTestArea(QWidget* parent) : QGroupBox(QStringLiteral("Live Tes
     QFont font = value->font();
     font.setPointSizeF(font.pointSizeF() * 1.5);
     value->setFont(font);
-    value->setAccessibleName(title);
     value->setMinimumWidth(value->fontMetrics().horizontalAdvance(QStringLiteral("0000")));
     grid->addWidget(new QLabel(title), 0, column);
     grid->addWidget(value, 1, column);

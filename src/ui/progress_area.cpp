@@ -28,8 +28,8 @@ QColor Shade(ProgressColour colour, bool dark) {
 }  // namespace
 
 ProgressArea::ProgressArea(QWidget* parent)
-    : QGroupBox(QStringLiteral("Progress"),
-                parent),  // until there is more to say; it keeps room for the title
+    // The title stands until there is more to say, and keeps room for that.
+    : QGroupBox(QStringLiteral("Progress"), parent),
       pctProgress_(Named(new QWidget(this), QStringLiteral("pctProgress"))),
       ShapeProgress_(Named(new QWidget(pctProgress_), QStringLiteral("ShapeProgress"))),
       lblProgress_(Named(new QLabel(this), QStringLiteral("lblProgress"))) {
@@ -41,7 +41,6 @@ ProgressArea::ProgressArea(QWidget* parent)
   ShapeProgress_->setAutoFillBackground(true);
   ShapeProgress_->setBackgroundRole(QPalette::Window);  // not the trough's, which it would inherit
   lblProgress_->setAlignment(Qt::AlignCenter);
-  lblProgress_->setAccessibleName(QStringLiteral("Outcome of the command"));
   QFont font = lblProgress_->font();
   font.setBold(true);
   lblProgress_->setFont(font);

@@ -13,13 +13,9 @@
 #include <string>
 #include <vector>
 
-#include "app/qt_platform.h"
+#include "app/utility_program.h"
 #include "platform/posix/paths.h"
-#include "platform/qt/qt_serial_device.h"
-#include "serial/command_log.h"
-#include "serial/hw_serial.h"
 #include "support/bench_process.h"
-#include "ui/frm_new_servo_config.h"
 
 namespace tendril::test {
 namespace {
@@ -28,15 +24,10 @@ constexpr int kGenerousMs = 20000;
 
 class RealLine : public testing::Test {
  protected:
-  // Makes the program, as its main function does. Call it when Comm 1 is there.
+  // Makes the program. Call it when Comm 1 is there.
   void StartProgram() {
-    device_ = std::make_unique<QtSerialDevice>(platform_.on_fault);
-    log_ = std::make_unique<FileCommandLog>(CommandLogPath());
-    link_ = std::make_unique<HwSerial>(*device_, platform_.timers, platform_.clock, *log_);
-    window_ =
-        std::make_unique<frmNewServoConfig>(*link_, platform_.timers, platform_.boxes, Version{1, 0, 0});
-    platform_.boxes.SetParent(window_.get());
-    window_->show();
+    program_ = std::make_unique<UtilityProgram>();
+    program_->window.show();
     // A person who reads each box and presses OK.
     reader_.setInterval(20);
     QObject::connect(&reader_, &QTimer::timeout, &reader_, [this] {
@@ -48,7 +39,7 @@ class RealLine : public testing::Test {
     reader_.start();
   }
   void ChooseComm1() {
-    auto& ports = *window_->findChild<QComboBox*>(QStringLiteral("cmbNYX"));
+    auto& ports = *program_->window.findChild<QComboBox*>(QStringLiteral("cmbNYX"));
     ports.setCurrentIndex(0);
     QTest::keyClick(&ports, Qt::Key_Down);
     ASSERT_EQ(ports.currentText().toStdString(), "Comm 1");
@@ -67,15 +58,13 @@ class RealLine : public testing::Test {
     return QTest::qWaitFor([this] { return !read_.empty() && QApplication::activeModalWidget() == nullptr; },
                            kGenerousMs);
   }
-  QAbstractButton& Button() { return *window_->findChild<QAbstractButton*>(QStringLiteral("Command3_0")); }
-  QLabel& outcome() { return *window_->findChild<QLabel*>(QStringLiteral("lblProgress")); }
+  QAbstractButton& Button() {
+    return *program_->window.findChild<QAbstractButton*>(QStringLiteral("Command3_0"));
+  }
+  QLabel& outcome() { return *program_->window.findChild<QLabel*>(QStringLiteral("lblProgress")); }
 
   BenchProcess bench_;
-  QtPlatform platform_;
-  std::unique_ptr<QtSerialDevice> device_;
-  std::unique_ptr<FileCommandLog> log_;
-  std::unique_ptr<HwSerial> link_;
-  std::unique_ptr<frmNewServoConfig> window_;
+  std::unique_ptr<UtilityProgram> program_;
   QTimer reader_;
   std::vector<std::string> read_;
 };
@@ -92,13 +81,13 @@ double CpuSeconds() {
 TEST_F(RealLine, Send_SucceedsWithAndWithoutEcho) {
   for (const QStringList& options : {QStringList{}, QStringList{QStringLiteral("--no-echo")}}) {
     bench_.Start(options);
-    if (!window_) StartProgram();
+    if (!program_) StartProgram();
     ChooseComm1();
     PressSend();
     EXPECT_EQ(Outcome(), "SUCCESS: Send Complete!") << options.join(QLatin1Char(' ')).toStdString();
     EXPECT_TRUE(read_.empty());
     bench_.Kill();
-    ASSERT_TRUE(QTest::qWaitFor([this] { return !link_->PortOpen(); }, kGenerousMs));
+    ASSERT_TRUE(QTest::qWaitFor([this] { return !program_->Serial1.PortOpen(); }, kGenerousMs));
   }
   EXPECT_TRUE(std::filesystem::exists(CommandLogPath()));
 }
@@ -134,7 +123,7 @@ TEST_F(RealLine, UnpluggedWhileIdle_SaysNothingAndCostsNothing) {
   StartProgram();
   ChooseComm1();
   bench_.Kill();
-  EXPECT_TRUE(QTest::qWaitFor([this] { return !link_->PortOpen(); }, kGenerousMs));
+  EXPECT_TRUE(QTest::qWaitFor([this] { return !program_->Serial1.PortOpen(); }, kGenerousMs));
   reader_.stop();
   const double before = CpuSeconds();
   QTest::qWait(1000);

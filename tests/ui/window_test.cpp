@@ -141,6 +141,8 @@ TEST_F(Window, Send_ByMouse_EndsGreenAndTheUnitHoldsWhatWasSent) {
 
   RunToTheEnd();
   EXPECT_EQ(Text("lblProgress"), "SUCCESS: Send Complete!");
+  EXPECT_EQ(QAccessible::queryAccessibleInterface(&Find("lblProgress"))->text(QAccessible::Name),
+            QStringLiteral("SUCCESS: Send Complete!"));
   const QColor colour = Find("ShapeProgress").palette().color(QPalette::Window);
   EXPECT_GT(colour.green(), colour.red());
   EXPECT_TRUE(Find("Command3_0").isEnabled());
