@@ -6,6 +6,39 @@
 namespace tendril {
 namespace {
 
+constexpr int kKindBits = 0x03;
+constexpr int kPowerUpToDefault = kFlagPowerUp | kFlagPowerUpDefault;
+constexpr int kPowerUpToNeutral = kFlagPowerUp | kFlagPowerUpNeutral;
+constexpr int kPowerUpBits = kPowerUpToDefault | kPowerUpToNeutral;
+constexpr int kLostCommToDefault = kFlagLostComm | kFlagLostCommDefault;
+constexpr int kLostCommToNeutral = kFlagLostComm | kFlagLostCommNeutral;
+constexpr int kLostCommBits = kLostCommToDefault | kLostCommToNeutral;
+constexpr Microseconds kByteStep = 10;
+
+std::int32_t PowerUpOption(int flags) {
+  switch (flags & kPowerUpBits) {
+    case kPowerUpToDefault:
+      return kPowerUpDefault;
+    case kPowerUpToNeutral:
+      return kPowerUpNeutral;
+    default:
+      return kPowerUpFirstCommand;
+  }
+}
+
+std::int32_t LostCommOption(int flags) {
+  switch (flags & kLostCommBits) {
+    case kFlagLostComm:
+      return kLostCommHold;
+    case kLostCommToDefault:
+      return kLostCommDefault;
+    case kLostCommToNeutral:
+      return kLostCommNeutral;
+    default:
+      return kLostCommStopPulse;
+  }
+}
+
 InvalidRecord Invalid(std::string_view field, std::int32_t value) {
   return {"Internal Error - Invalid " + std::string(field) + "=" + std::to_string(value)};
 }
@@ -18,10 +51,10 @@ std::variant<OptionBytes, InvalidRecord> EncodeOptions(const ChannelConfig& reco
 
   switch (record.PowerUPOpt) {
     case kPowerUpDefault:
-      flags |= kFlagPowerUp | kFlagPowerUpDefault;
+      flags |= kPowerUpToDefault;
       break;
     case kPowerUpNeutral:
-      flags |= kFlagPowerUp | kFlagPowerUpNeutral;
+      flags |= kPowerUpToNeutral;
       break;
     case kPowerUpFirstCommand:
       break;
@@ -34,10 +67,10 @@ std::variant<OptionBytes, InvalidRecord> EncodeOptions(const ChannelConfig& reco
       flags |= kFlagLostComm;
       break;
     case kLostCommDefault:
-      flags |= kFlagLostComm | kFlagLostCommDefault;
+      flags |= kLostCommToDefault;
       break;
     case kLostCommNeutral:
-      flags |= kFlagLostComm | kFlagLostCommNeutral;
+      flags |= kLostCommToNeutral;
       break;
     case kLostCommStopPulse:
       break;
@@ -65,9 +98,25 @@ std::variant<OptionBytes, InvalidRecord> EncodeOptions(const ChannelConfig& reco
   for (std::size_t i = 0; i < widths.size(); ++i) {
     const auto& [field, value] = widths[i];
     if (value < kMinPulseWidth || value > kMaxPulseWidth) return Invalid(field, value);
-    bytes[i + 1] = static_cast<std::uint8_t>(value / 10);
+    bytes[i + 1] = static_cast<std::uint8_t>(value / kByteStep);
   }
   return bytes;
+}
+
+ChannelConfig DecodeOptions(std::span<const std::uint8_t, kOptionByteCount> options) {
+  const int flags = options[0];
+  const auto width = [&](std::size_t i) { return options[i] * kByteStep; };
+  ChannelConfig record;
+  record.PortType = static_cast<std::int16_t>((flags & kKindBits) - 1);
+  record.ActualRange = {width(1), width(2)};
+  record.VirtualRange = {width(3), width(4)};
+  record.VirtualStops = {width(5), width(6)};
+  record.DefaultPosition = width(7);
+  record.NeutralPosition = width(8);
+  record.PowerUPOpt = PowerUpOption(flags);
+  record.LostCommOption = LostCommOption(flags);
+  record.Received = true;
+  return record;
 }
 
 }  // namespace tendril

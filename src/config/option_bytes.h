@@ -15,6 +15,7 @@
 
 #include <array>
 #include <cstdint>
+#include <span>
 #include <string>
 #include <variant>
 
@@ -32,6 +33,12 @@ inline constexpr std::uint8_t kFlagLostCommDefault = 0x20;
 inline constexpr std::uint8_t kFlagPowerUpNeutral = 0x40;
 inline constexpr std::uint8_t kFlagPowerUpDefault = 0x80;
 
+// The option of a unit that holds its servo ports. A port's number and option bytes follow it, or
+// kLivePosition.
+inline constexpr std::uint8_t kOptionServoPort = 17;
+// In the place of a port's number: a mask of ports and a position to move them to follow.
+inline constexpr std::uint8_t kLivePosition = 137;
+
 // Why a record cannot be sent, in the words that the person is shown.
 struct InvalidRecord {
   std::string text;
@@ -40,5 +47,9 @@ struct InvalidRecord {
 // Checks `record` field by field and packs it. The first field that is out of its range ends it. How the
 // fields lie to each other is not checked here: that is the editor's business.
 std::variant<OptionBytes, InvalidRecord> EncodeOptions(const ChannelConfig& record);
+
+// The inverse, up to the last digit of each pulse width, with `Received` set. Takes any bytes: flags that no
+// record has are read as no action, and without an output kind PortType is -1, which EncodeOptions refuses.
+ChannelConfig DecodeOptions(std::span<const std::uint8_t, kOptionByteCount> options);
 
 }  // namespace tendril

@@ -105,9 +105,10 @@ void HwSerial::OpenPort() {
 
 void HwSerial::ClosePort() noexcept {
   device_.Close();
-  port_open_ = false;
+  const bool was_open = std::exchange(port_open_, false);
   held_back_.assign(1, 0);
   if (poll_) poll_->line_closed = true;
+  if (was_open && port_closed_) port_closed_();
 }
 
 void HwSerial::SetRTS(bool asserted) {

@@ -62,6 +62,9 @@ class HwSerial {
 
   // Who gets the poll replies; one host.
   void SetPollReplyHandler(PollReplyHandler handler) { poll_reply_ = std::move(handler); }
+  // Who is told when the open port has been closed, by whom and for what reason ever; one host. The handler
+  // raises nothing and does not use the link.
+  void SetPortClosedHandler(std::function<void()> handler) { port_closed_ = std::move(handler); }
   // Where trace lines go while TraceOutput is on.
   void SetTraceSink(std::function<void(const std::string&)> sink) { trace_sink_ = std::move(sink); }
 
@@ -221,6 +224,7 @@ class HwSerial {
   std::unique_ptr<Timer> poll_timer_;
   std::unique_ptr<Timer> heartbeat_timer_;
   PollReplyHandler poll_reply_;
+  std::function<void()> port_closed_;
   std::function<void(const std::string&)> trace_sink_;
 
   std::int16_t comm_port_ = 0;

@@ -1,8 +1,8 @@
 // HwSerial's polls: the request, the reply or its absence, and what was held back meanwhile.
 #include <array>
-#include <cmath>
 #include <utility>
 
+#include "platform/rounding.h"
 #include "platform/runtime_error.h"
 #include "serial/hex_text.h"
 #include "serial/hw_serial.h"
@@ -74,7 +74,7 @@ bool HwSerial::cmdPollStation(std::uint8_t unit, std::uint8_t kind) {
 std::uint32_t HwSerial::PollTimeOutMs(std::uint8_t kind) const {
   const double bytes = static_cast<double>(device_.PendingOutput()) + kPollAndReplyBytes + poll_pad_;
   const double ms = bytes * kBitsPerByte * 1000 / opened_speed_ * 2;
-  return static_cast<std::uint32_t>(std::nearbyint(ms)) + (IsSlowKind(kind) ? kSlowKindExtraMs : 0);
+  return static_cast<std::uint32_t>(RoundHalfToEven(ms)) + (IsSlowKind(kind) ? kSlowKindExtraMs : 0);
 }
 
 void HwSerial::OnDeviceEvent(SerialEvent event) {

@@ -5,6 +5,7 @@
 #include <cmath>
 #include <cstdlib>
 
+#include "platform/rounding.h"
 #include "platform/runtime_error.h"
 
 namespace tendril {
@@ -41,9 +42,8 @@ std::uint8_t EncodeIntensity(std::uint8_t percent) {
 
 FadeRate EncodeFadeRate(std::uint8_t encoded_from, std::uint8_t encoded_to, std::uint8_t time) {
   if (time == 0) throw RuntimeError(kErrDivisionByZero, "Division by zero");
-  // At most 254 * 256 / 12: it fits 16 bits with a sign. nearbyint rounds halves to even.
-  const int rate =
-      static_cast<int>(std::nearbyint(std::abs(encoded_from - encoded_to) * 256.0 / (time * 12.0)));
+  // At most 254 * 256 / 12: it fits 16 bits with a sign.
+  const int rate = RoundHalfToEven(std::abs(encoded_from - encoded_to) * 256.0 / (time * 12.0));
   int low = rate % 256;
   int high = rate / 256;
   // Bits that no rate uses mark the bytes that are zero.

@@ -5,6 +5,7 @@
 #include <cstdlib>
 #include <limits>
 
+#include "platform/rounding.h"
 #include "platform/runtime_error.h"
 
 namespace tendril {
@@ -91,8 +92,7 @@ double ServoDial::Convert(std::int32_t degrees) {
 
 std::int32_t ServoDial::ToDegrees(std::int32_t microseconds) const {
   const std::int32_t below_neutral = Checked(static_cast<std::int64_t>(neutral_pulse_) - microseconds);
-  // nearbyint rounds a half to the even number, as long as nobody changes the rounding mode.
-  return static_cast<std::int32_t>(std::nearbyint(below_neutral / kMicrosecondsPerDegree));
+  return RoundHalfToEven(below_neutral / kMicrosecondsPerDegree);
 }
 
 ServoDial::Arc ServoDial::ArcOf(std::int32_t first, std::int32_t second) {

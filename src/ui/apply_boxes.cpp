@@ -36,4 +36,10 @@ ApplyBoxes::ApplyBoxes(QWidget* parent) : QGroupBox(QStringLiteral("Channels to 
   }
 }
 
+void ApplyBoxes::TickOnly(std::size_t channel) {
+  for (std::size_t index = 0; index < chkUpdate_.size(); ++index) {
+    chkUpdate_[index]->setChecked(index == channel);
+  }
+}
+
 }  // namespace tendril

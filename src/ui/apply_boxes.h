@@ -4,6 +4,7 @@
 #include <QCheckBox>
 #include <QGroupBox>
 #include <array>
+#include <cstddef>
 
 #include "config/channel_config.h"
 
@@ -13,6 +14,11 @@ namespace tendril {
 class ApplyBoxes : public QGroupBox {
  public:
   explicit ApplyBoxes(QWidget* parent = nullptr);
+
+  // Whether the box of `channel`, 0 to 7, is ticked.
+  bool Ticked(std::size_t channel) const { return chkUpdate_[channel]->isChecked(); }
+  // Ticks the box of `channel` and clears all others.
+  void TickOnly(std::size_t channel);
 
  private:
   std::array<QCheckBox*, kPortCount + 1> chkUpdate_{};  // the last is "ALL"

@@ -16,13 +16,15 @@ constexpr QSize kSmallestSimulator(96, 96);
 
 ChannelStrip::ChannelStrip(const ChannelTable& working, QWidget* parent)
     : QGroupBox(QStringLiteral("Click to Select Channel"), parent), working_(working) {
+  arms_.fill(kCentrePulseWidth);
   const QString no_editor = QStringLiteral("Editing a channel is not in this version yet.");
   QGridLayout* grid = MakeChannelColumns(this);
   for (int channel = 0; channel < kChannelColumns; ++channel) {
     const auto slot = static_cast<std::size_t>(channel);
     auto* simulator = Named(new ServoSimulator, ArrayName(QStringLiteral("ServoSimulator2"), channel));
     simulator->setMinimumSize(kSmallestSimulator);
-    Disable(simulator, no_editor);
+    Describe(simulator,
+             QStringLiteral("Chooses channel %1, to look at it and to move its servo.").arg(channel + 1));
     auto* output = Named(new QPushButton, ArrayName(QStringLiteral("cmdDigitalOutput"), channel));
     Disable(output, no_editor);
     auto* cell = new QStackedWidget;
@@ -33,7 +35,10 @@ ChannelStrip::ChannelStrip(const ChannelTable& working, QWidget* parent)
     ServoSimulator2_[slot] = simulator;
     cmdDigitalOutput_[slot] = output;
     QObject::connect(simulator, &ServoSimulator::Resized, this, [this, simulator, slot] {
-      RefeedResizedSimulator(*simulator, working_.At(slot), arm_);
+      RefeedResizedSimulator(*simulator, working_.At(slot), arms_[slot]);
+    });
+    QObject::connect(simulator, &ServoSimulator::Clicked, this, [this, slot] {
+      if (select_) select_(slot);
     });
   }
 }
@@ -48,11 +53,18 @@ void ChannelStrip::SetUpSimulators() {
   }
 }
 
-void ChannelStrip::UpdateSimulators(Microseconds arm) {
-  arm_ = arm;
-  for (std::size_t slot = 0; slot < kPortCount; ++slot) {
-    FeedSimulator(*ServoSimulator2_[slot], working_.At(slot), kSmallSimulator, arm);
-  }
+void ChannelStrip::ShowSelected(std::size_t channel) {
+  for (std::size_t slot = 0; slot < kPortCount; ++slot) ServoSimulator2_[slot]->SelectServo(slot == channel);
+}
+
+void ChannelStrip::UpdateSimulator(std::size_t channel, Microseconds arm) {
+  arms_[channel] = arm;
+  FeedSimulator(*ServoSimulator2_[channel], working_.At(channel), kSmallSimulator, arm);
+}
+
+void ChannelStrip::MoveArm(std::size_t channel, Microseconds arm) {
+  arms_[channel] = arm;
+  ServoSimulator2_[channel]->SetMovingArmPositionUS(arm);
 }
 
 }  // namespace tendril

@@ -4,6 +4,9 @@
 #include <QGroupBox>
 #include <QPushButton>
 #include <array>
+#include <cstddef>
+#include <functional>
+#include <utility>
 
 #include "config/channel_config.h"
 #include "simulator/servo_simulator.h"
@@ -17,12 +20,19 @@ class ChannelStrip : public QGroupBox {
 
   // Start-up: captions and output labels.
   void SetUpSimulators();
-  // Shows all eight records, with the arms at `arm`.
-  void UpdateSimulators(Microseconds arm);
+  // What happens when the person chooses a channel, 0 to 7.
+  void SetSelectHandler(std::function<void(std::size_t channel)> handler) { select_ = std::move(handler); }
+  // Marks `channel` as the chosen one.
+  void ShowSelected(std::size_t channel);
+  // Shows the record of `channel`, with the arm at `arm`.
+  void UpdateSimulator(std::size_t channel, Microseconds arm);
+  // Moves the arm alone.
+  void MoveArm(std::size_t channel, Microseconds arm);
 
  private:
   const ChannelTable& working_;
-  Microseconds arm_ = kCentrePulseWidth;
+  std::function<void(std::size_t)> select_;
+  std::array<Microseconds, kPortCount> arms_{};  // where each arm was drawn last
   std::array<ServoSimulator*, kPortCount> ServoSimulator2_{};
   // What stands in the servo's place when the port drives no servo.
   std::array<QPushButton*, kPortCount> cmdDigitalOutput_{};

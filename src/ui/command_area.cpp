@@ -9,25 +9,35 @@
 #include "ui/controls.h"
 
 namespace tendril {
+namespace {
 
-void CommandButtons::Add(QAbstractButton* button, const QString& tip, std::function<void()> action) {
+constexpr char kUpdateTip[] =
+    "Gives the unit on the line the chosen ID. Connect one unit only: every unit that hears it would take "
+    "the "
+    "same ID.";
+constexpr char kNoUnitZero[] = "A unit cannot have the ID 00: nothing could ever find it again.";
+
+}  // namespace
+
+void CommandButtons::Add(QAbstractButton* button, const QString& tip, std::function<void()> action,
+                         Objection objection) {
   QObject::connect(button, &QAbstractButton::clicked, button, [action = std::move(action)] { action(); });
   Describe(button, tip);
-  entries_.push_back({button, tip});
+  entries_.push_back({button, tip, std::move(objection)});
 }
 
 void CommandButtons::ShowRunning(const RunningCommand& running) {
-  for (const auto& [button, tip] : entries_) {
-    if (running.Active()) {
-      Disable(button, QString::fromStdString(running.What()));
-    } else {
-      button->setEnabled(true);
-      Describe(button, tip);
-    }
+  for (const auto& [button, tip, objection] : entries_) {
+    const QString why_not = running.Active() ? QString::fromStdString(running.What())
+                            : objection      ? objection()
+                                             : QString();
+    button->setEnabled(why_not.isEmpty());
+    Describe(button, why_not.isEmpty() ? tip : why_not);
   }
 }
 
-CommandArea::CommandArea(UnitCommands& commands, CommandButtons& buttons, QWidget* parent)
+CommandArea::CommandArea(UnitCommands& commands, const UnitTarget& target, CommandButtons& buttons,
+                         QWidget* parent)
     : QWidget(parent),
       cmdWriteConfig_(
           Named(new QPushButton(QStringLiteral("Export Config")), QStringLiteral("cmdWriteConfig"))),
@@ -39,8 +49,10 @@ CommandArea::CommandArea(UnitCommands& commands, CommandButtons& buttons, QWidge
       Named(new QPushButton(QStringLiteral("&GET(read) Configuration")), QStringLiteral("Command3_1"));
   auto* update = Named(new QPushButton(QStringLiteral("&UPDATE Unit_ID")), QStringLiteral("Command3_2"));
   buttons.Add(send, kSendTip, [&commands] { commands.Send(); });
-  Disable(get, kNoGetTip);
-  Disable(update, QStringLiteral("Changing a unit's ID is not in this version yet."));
+  buttons.Add(get, kGetTip, [&commands] { commands.Get(); });
+  buttons.Add(
+      update, QString::fromUtf8(kUpdateTip), [&commands] { commands.ChangeId(); },
+      [&target] { return target.UnitId() == 0 ? QString::fromUtf8(kNoUnitZero) : QString(); });
 
   auto* frame = Named(new QGroupBox(QStringLiteral("Unit")), QStringLiteral("frmUpDownLoad"));
   auto* commands_row = new QHBoxLayout(frame);

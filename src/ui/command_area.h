@@ -9,34 +9,43 @@
 
 #include "unitops/running_command.h"
 #include "unitops/unit_commands.h"
+#include "unitops/unit_target.h"
 
 namespace tendril {
 
 // What the buttons of the unit commands do, wherever they stand.
 inline const QString kSendTip =
     QStringLiteral("Writes the configuration of all eight ports into the chosen unit.");
-inline const QString kNoGetTip = QStringLiteral("Reading a unit's configuration is not in this version yet.");
+inline const QString kGetTip =
+    QStringLiteral("Reads the configuration of all eight ports out of the chosen unit.");
 
 // The buttons that run unit commands, wherever they stand. Disabled while a command runs, with a tool tip
 // that says which.
 class CommandButtons {
  public:
+  // Why a command cannot be run now, in the words of a tool tip; empty when it can.
+  using Objection = std::function<QString()>;
+
   // Adds a button of `Command3`, and runs `action` when it is pressed.
-  void Add(QAbstractButton* button, const QString& tip, std::function<void()> action);
+  void Add(QAbstractButton* button, const QString& tip, std::function<void()> action,
+           Objection objection = {});
+  // Enables what can be run now, and only that.
   void ShowRunning(const RunningCommand& running);
 
  private:
   struct Entry {
     QAbstractButton* button;
     QString tip;
+    Objection objection;
   };
   std::vector<Entry> entries_;
 };
 
 class CommandArea : public QWidget {
  public:
-  // `commands` must outlive the area; its buttons are added to `buttons`.
-  CommandArea(UnitCommands& commands, CommandButtons& buttons, QWidget* parent = nullptr);
+  // `commands` and `target` must outlive the area; its buttons are added to `buttons`.
+  CommandArea(UnitCommands& commands, const UnitTarget& target, CommandButtons& buttons,
+              QWidget* parent = nullptr);
 
   // Start-up: exporting and importing have no function.
   void DisableExportAndImport();

@@ -45,6 +45,9 @@ ConnectionArea::ConnectionArea(PortSelection& ports, QWidget* parent)
     box->setAccessibleName(digit == 0 ? QStringLiteral("Unit ID, first digit")
                                       : QStringLiteral("Unit ID, second digit"));
     row->addWidget(box);
+    QObject::connect(box, &QComboBox::currentIndexChanged, this, [this] {
+      if (unit_id_changed_) unit_id_changed_();
+    });
     CmbUnitID_[digit] = box;
   }
   id_label->setBuddy(CmbUnitID_[0]);

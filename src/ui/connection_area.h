@@ -5,6 +5,8 @@
 #include <QWidget>
 #include <array>
 #include <cstdint>
+#include <functional>
+#include <utility>
 
 #include "unitops/port_selection.h"
 #include "unitops/running_command.h"
@@ -24,11 +26,15 @@ class ConnectionArea : public QWidget, public UnitTarget {
   // Lets port and unit be chosen only while no command runs.
   void ShowRunning(const RunningCommand& running);
 
+  // Who is told when the person has chosen another unit ID.
+  void SetUnitIdHandler(std::function<void()> handler) { unit_id_changed_ = std::move(handler); }
+
   bool PortChosen() const override;
   std::uint8_t UnitId() const override;
 
  private:
   PortSelection& ports_;
+  std::function<void()> unit_id_changed_;
   QComboBox* cmbNYX_;
   std::array<QComboBox*, 2> CmbUnitID_{};  // the high digit, then the low one
 };

@@ -3,11 +3,11 @@
 #include <QButtonGroup>
 #include <QGridLayout>
 #include <QHBoxLayout>
-#include <QPushButton>
 #include <QRadioButton>
 #include <QStringList>
 #include <QVBoxLayout>
 
+#include "platform/rounding.h"
 #include "ui/controls.h"
 #include "ui/simulator_feed.h"
 
@@ -15,7 +15,8 @@ namespace tendril {
 namespace {
 
 constexpr char kNotYet[] = "Editing a channel is not in this version yet.";
-constexpr char kNoTestYet[] = "Testing a channel is not in this version yet.";
+// Every value that a record can give fits.
+constexpr int kWidestLimit = 2 * kMaxPulseWidth;
 
 // A frame of radio buttons `array`_0, `array`_1 ...
 QGroupBox* MakeOptions(const QString& title, const QString& array, const QStringList& captions,
@@ -35,28 +36,30 @@ QGroupBox* MakeOptions(const QString& title, const QString& array, const QString
 
 }  // namespace
 
-EditorArea::EditorArea(QWidget* parent) : QWidget(parent) {
+EditorArea::EditorArea(const ChannelTable& working,
+                       const std::array<QPushButton*, LiveTest::kTestButtons>& test_buttons, QWidget* parent)
+    : QWidget(parent), working_(working) {
   auto* row = new QHBoxLayout(this);
   row->setContentsMargins(0, 0, 0, 0);
   row->addWidget(MakeServo(), 3);
-  row->addWidget(MakeMotionParameters(), 5);
+  row->addWidget(MakeMotionParameters(test_buttons), 5);
   row->addWidget(MakeChoices(), 2);
 }
 
 QWidget* EditorArea::MakeServo() {
   servo_frame_ = new QGroupBox(QStringLiteral("Channel"));
   ServoSimulator1_ = Named(new ServoSimulator, QStringLiteral("ServoSimulator1"));
-  Disable(ServoSimulator1_,
-          QStringLiteral("The chosen channel's servo. Choosing one is not in this version yet."));
+  Disable(ServoSimulator1_, QStringLiteral("The chosen channel's servo."));
   auto* layout = new QVBoxLayout(servo_frame_);
   layout->setContentsMargins(4, 4, 4, 4);
   layout->addWidget(ServoSimulator1_);
   QObject::connect(ServoSimulator1_, &ServoSimulator::Resized, this,
-                   [this] { RefeedResizedSimulator(*ServoSimulator1_, SpinButtonValues(), arm_); });
+                   [this] { RefeedResizedSimulator(*ServoSimulator1_, Values(), arm_); });
   return servo_frame_;
 }
 
-QWidget* EditorArea::MakeMotionParameters() {
+QWidget* EditorArea::MakeMotionParameters(
+    const std::array<QPushButton*, LiveTest::kTestButtons>& test_buttons) {
   auto* frame = new QGroupBox(QStringLiteral("Motion Parameters"));
   auto* grid = new QGridLayout(frame);
   grid->setContentsMargins(12, 8, 12, 8);
@@ -97,19 +100,11 @@ QWidget* EditorArea::MakeMotionParameters() {
   // Each test stands beside the parameter that it tries; the one of the stops beside both.
   struct TestPlace {
     int row, rows;
-    const char* what;
   };
-  constexpr std::array<TestPlace, 5> kTests{{{1, 1, "virtual pulse range"},
-                                             {4, 2, "virtual stops"},
-                                             {6, 1, "default position"},
-                                             {0, 1, "actual pulse range"},
-                                             {2, 1, "centre"}}};
-  for (int index = 0; index < static_cast<int>(kTests.size()); ++index) {
-    const TestPlace& place = kTests[static_cast<std::size_t>(index)];
-    auto* test = Named(new QPushButton(QStringLiteral("Test")), ArrayName(QStringLiteral("cmdTest"), index));
-    test->setAccessibleName(QStringLiteral("Test the %1").arg(QString::fromUtf8(place.what)));
-    Disable(test, QString::fromUtf8(kNoTestYet));
-    grid->addWidget(test, place.row, kTest, place.rows, 1);
+  constexpr std::array<TestPlace, LiveTest::kTestButtons> kTestPlaces{
+      {{1, 1}, {4, 2}, {6, 1}, {0, 1}, {2, 1}}};
+  for (std::size_t test = 0; test < kTestPlaces.size(); ++test) {
+    grid->addWidget(test_buttons[test], kTestPlaces[test].row, kTest, kTestPlaces[test].rows, 1);
   }
   grid->setColumnStretch(kName, 2);
   grid->setColumnStretch(kRightValue, 1);
@@ -165,13 +160,38 @@ void EditorArea::SetUpSpinButtons() {
   set_up(spnRightVirtStop_, 0, 800, 750);
   set_up(spnNeutralTrim_, -200, 200, 0);
   set_up(spnDefaultPos_, -750, 750, 0);
-  lblActPulseLeft_->setText(QStringLiteral("600"));
-  lblActPulseRight_->setText(QStringLiteral("2400"));
-  lblVirtPulseRange_->setText(QStringLiteral("800]"));
-  lblLeftVirtStop_->setText(QStringLiteral("-750"));
-  lblRightVirtStop_->setText(QStringLiteral("+750"));
-  lblDefaultPos_->setText(QStringLiteral("0"));
-  lblNeutralTrim_->setText(QStringLiteral("0"));
+  ShowCaptions();
+}
+
+void EditorArea::ShowCaptions() {
+  const auto with_sign = [](int value) {
+    return (value < 1 ? QString() : QStringLiteral("+")) + QString::number(value);
+  };
+  lblActPulseLeft_->setNum(kCentrePulseWidth - spnActPulseRange_->value());
+  lblActPulseRight_->setNum(kCentrePulseWidth + spnActPulseRange_->value());
+  lblVirtPulseRange_->setText(QString::number(spnVirtPulseRange_->value()) + QLatin1Char(']'));
+  lblNeutralTrim_->setText(with_sign(spnNeutralTrim_->value()));
+  lblLeftVirtStop_->setNum(spnLeftVirtStop_->value());
+  lblRightVirtStop_->setText(QLatin1Char('+') + QString::number(spnRightVirtStop_->value()));
+  lblDefaultPos_->setText(with_sign(spnDefaultPos_->value()));
+}
+
+void EditorArea::LoadChannel(std::size_t channel) {
+  const ChannelConfig& record = working_.At(channel);
+  channel_ = channel;
+  const auto load = [](QSpinBox* spin, int value) {
+    spin->setRange(-kWidestLimit, kWidestLimit);
+    spin->setValue(value);
+  };
+  const auto half_width = [](const PulsePair& range) { return RoundHalfToEven((range[1] - range[0]) / 2.0); };
+  load(spnActPulseRange_, half_width(record.ActualRange));
+  load(spnVirtPulseRange_, half_width(record.VirtualRange));
+  load(spnNeutralTrim_, record.NeutralPosition - kCentrePulseWidth);
+  load(spnLeftVirtStop_, record.VirtualStops[0] - record.NeutralPosition);
+  load(spnRightVirtStop_, record.VirtualStops[1] - record.NeutralPosition);
+  load(spnDefaultPos_, record.DefaultPosition - record.NeutralPosition);
+  ShowCaptions();
+  ServoSimulator1_->DisplayCaption(QStringLiteral("CHAN %1").arg(channel + 1));
 }
 
 void EditorArea::ListPresets() {
@@ -193,9 +213,16 @@ ChannelConfig EditorArea::SpinButtonValues() const {
   return values;
 }
 
+ChannelConfig EditorArea::Values() const { return channel_ ? working_.At(*channel_) : SpinButtonValues(); }
+
 void EditorArea::UpdateSimulator(Microseconds arm) {
   arm_ = arm;
-  FeedSimulator(*ServoSimulator1_, SpinButtonValues(), kLargeSimulator, arm);
+  FeedSimulator(*ServoSimulator1_, Values(), kLargeSimulator, arm);
+}
+
+void EditorArea::MoveArm(Microseconds arm) {
+  arm_ = arm;
+  ServoSimulator1_->SetMovingArmPositionUS(arm);
 }
 
 }  // namespace tendril

@@ -26,18 +26,25 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
       ports_(link, boxes),
       connection_(new ConnectionArea(ports_)),
       progress_(new ProgressArea),
-      commands_(link, timers, boxes, *progress_, *connection_, working_),
-      command_area_(new CommandArea(commands_, command_buttons_)),
+      commands_(link, timers, boxes, *progress_, *connection_, working_,
+                {.starting = [this] { live_test_.MakeWay(); }, .replaced = [this] { ShowReplaced(); }}),
+      command_area_(new CommandArea(commands_, *connection_, command_buttons_)),
       apply_boxes_(new ApplyBoxes),
       channels_(new ChannelStrip(working_)),
-      editor_(new EditorArea),
-      live_test_(new LiveTestArea),
+      live_test_area_(new LiveTestArea),
+      editor_(new EditorArea(working_, live_test_area_->TestButtons())),
       views_(new QStackedWidget),
+      simulators_(*channels_, *editor_, *apply_boxes_),
+      live_test_(link, timers, boxes, commands_.Running(), *connection_, *editor_, *live_test_area_,
+                 simulators_),
       shutdown_(
           link, timers, [](std::int16_t) {}, [this] { close(); }) {
   setObjectName(QStringLiteral("frmNewServoConfig"));
   LayOut();
   commands_.Running().SetObserver([this] { ShowRunning(); });
+  connection_->SetUnitIdHandler([this] { command_buttons_.ShowRunning(commands_.Running()); });
+  channels_->SetSelectHandler([this](std::size_t channel) { SelectChannel(channel); });
+  live_test_area_->Connect(live_test_);
   StartUp(version);
 }
 
@@ -80,7 +87,7 @@ void frmNewServoConfig::LayOut() {
   simulator_column->setSpacing(4);
   simulator_column->addWidget(channels_, 1);
   simulator_column->addWidget(editor_, 3);
-  simulator_column->addWidget(live_test_);
+  simulator_column->addWidget(live_test_area_);
 }
 
 void frmNewServoConfig::StartUp(const Version& version) {
@@ -89,7 +96,6 @@ void frmNewServoConfig::StartUp(const Version& version) {
                      .arg(version.minor_number)
                      .arg(version.revision));
   command_area_->DisableExportAndImport();
-  arm_position_ = kCentrePulseWidth;
   editor_->SetUpSimulator();
   channels_->SetUpSimulators();
   connection_->FillUnitIds();
@@ -99,12 +105,21 @@ void frmNewServoConfig::StartUp(const Version& version) {
   for (std::size_t slot = 0; slot < kPortCount; ++slot)
     SetFromPreset(kPresets[kStartPreset], working_.At(slot));
   connection_->ListCommPorts();
-  UpdateSimulators();
+  simulators_.UpdateAll();
+  live_test_.OnSlider();
 }
 
-void frmNewServoConfig::UpdateSimulators() {
-  channels_->UpdateSimulators(arm_position_);
-  editor_->UpdateSimulator(arm_position_);
+void frmNewServoConfig::SelectChannel(std::size_t channel) {
+  apply_boxes_->TickOnly(channel);
+  channels_->ShowSelected(channel);
+  editor_->LoadChannel(channel);
+  live_test_.OnSlider();
+}
+
+void frmNewServoConfig::ShowReplaced() {
+  if (const auto channel = editor_->Channel()) editor_->LoadChannel(*channel);
+  simulators_.UpdateAll();
+  live_test_.OnSlider();
 }
 
 void frmNewServoConfig::ShowRunning() {
@@ -113,6 +128,7 @@ void frmNewServoConfig::ShowRunning() {
   connection_->ShowRunning(running);
   command_buttons_.ShowRunning(running);
   progress_->ShowRunning(running);
+  live_test_area_->ShowRunning(running);
   // Disabling takes the focus off the button that was pressed. Unless the person has moved it since, it goes back.
   if (running.Active()) {
     focus_in_command_ = focusWidget();
@@ -141,6 +157,7 @@ void frmNewServoConfig::MakeUnseenParts() {
 
 void frmNewServoConfig::closeEvent(QCloseEvent* event) {
   commands_.Stop();
+  live_test_.OnTestButton(LiveTest::kNoButton);
   if (!shutdown_.MayClose()) {
     event->ignore();
     return;

@@ -5,6 +5,7 @@
 #include <QStackedWidget>
 #include <QString>
 #include <QWidget>
+#include <cstddef>
 
 #include "config/channel_config.h"
 #include "platform/message_boxes.h"
@@ -17,6 +18,8 @@
 #include "ui/editor_area.h"
 #include "ui/live_test_area.h"
 #include "ui/progress_area.h"
+#include "ui/simulators.h"
+#include "unitops/live_test.h"
 #include "unitops/port_selection.h"
 #include "unitops/shutdown.h"
 #include "unitops/unit_commands.h"
@@ -38,10 +41,8 @@ class frmNewServoConfig : public QWidget {
   frmNewServoConfig(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes, const Version& version);
   ~frmNewServoConfig() override;
 
-  // The records that are edited, sent and shown. After a change, call UpdateSimulators().
-  ChannelTable& WorkingConfiguration() { return working_; }
-  // Pushes the working configuration into the simulators.
-  void UpdateSimulators();
+  // The records that are edited, sent and shown.
+  const ChannelTable& WorkingConfiguration() const { return working_; }
 
  protected:
   bool eventFilter(QObject* object, QEvent* event) override;
@@ -50,12 +51,13 @@ class frmNewServoConfig : public QWidget {
  private:
   void LayOut();
   void StartUp(const Version& version);
+  void SelectChannel(std::size_t channel);
+  void ShowReplaced();
   void ShowRunning();
   void MakeUnseenParts();
 
   HwSerial& link_;
   ChannelTable working_;
-  Microseconds arm_position_ = kCentrePulseWidth;
   PortSelection ports_;
   CommandButtons command_buttons_;
 
@@ -66,9 +68,12 @@ class frmNewServoConfig : public QWidget {
   CommandArea* command_area_;
   ApplyBoxes* apply_boxes_;
   ChannelStrip* channels_;
+  LiveTestArea* live_test_area_;
   EditorArea* editor_;
-  LiveTestArea* live_test_;
   QStackedWidget* views_;
+
+  Simulators simulators_;
+  LiveTest live_test_;
   // Where the focus was when the running command began, and where it went when its button was disabled.
   QPointer<QWidget> focus_before_command_;
   QPointer<QWidget> focus_in_command_;

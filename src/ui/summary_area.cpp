@@ -89,7 +89,7 @@ QLayout* SummaryArea::MakeButtons(UnitCommands& commands, CommandButtons& button
   auto* send = Named(new QPushButton(QStringLiteral("Send to Tendril")), QStringLiteral("Command3_3"));
   buttons.Add(send, kSendTip, [&commands] { commands.Send(); });
   auto* get = Named(new QPushButton(QStringLiteral("Get from Tendril")), QStringLiteral("Command3_4"));
-  Disable(get, kNoGetTip);
+  buttons.Add(get, kGetTip, [&commands] { commands.Get(); });
   auto* back = Named(new QPushButton(QStringLiteral("Simulator")), QStringLiteral("cmdShowConfig"));
   Disable(back, QString::fromUtf8(kNotYet));
   auto* row = new QHBoxLayout;

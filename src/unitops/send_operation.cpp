@@ -13,21 +13,10 @@ constexpr std::int32_t kNextPortMs = 300;
 constexpr std::int32_t kMaxPolls = 3;
 // The second byte of a reply that accepts the options.
 constexpr std::uint8_t kAccepted = 10;
-// The first option byte of every port's configuration; the port's number follows it.
-constexpr std::uint8_t kOptionServoPort = 17;
 
-constexpr char kCommandFailed[] = "COMMAND FAILED!";
 constexpr char kSendError[] = "Send Error";
 
 }  // namespace
-
-bool MayStartCommand(CommandContext& context) {
-  if (context.running.Active()) return false;
-  if (context.target.PortChosen()) return true;
-  context.boxes.Show({"No comm port selected!!!\r\n\r\nYou must select a comm port first.",
-                      "No Port Selected", BoxIcon::kExclamation});
-  return false;
-}
 
 SendOperation::SendOperation(CommandContext& context, TimerFactory& timers, const ChannelTable& working)
     : context_(context), working_(working), next_port_timer_(timers.CreateTimer([this] { OnNextPort(); })) {
@@ -45,7 +34,7 @@ void SendOperation::Start() {
       context_.boxes.Show({"Error sending configuration, Please retry", kSendError, BoxIcon::kCritical});
       return;
     }
-    context_.running.Begin("Sending the configuration to unit " + TwoHexDigits(unit));
+    context_.running.Begin(UnitCommand::kSend, "Sending the configuration to unit " + TwoHexDigits(unit));
     context_.progress.StartCommandProgress();
   } catch (...) {
     ShowFault(DescribeCurrentFault());
@@ -106,8 +95,8 @@ void SendOperation::Stop() {
 }
 
 void SendOperation::Abort() {
-  Stop();
-  context_.progress.EndCommandProgress(Outcome::kFailure, kCommandFailed);
+  next_port_timer_->SetEnabled(false);
+  EndAsFailed(context_);
 }
 
 void SendOperation::Fail(const std::string& text, const std::string& title) {
@@ -116,7 +105,7 @@ void SendOperation::Fail(const std::string& text, const std::string& title) {
 }
 
 void SendOperation::ShowFault(const std::string& description) {
-  context_.boxes.Show({"Download Failed\r\n" + description, "Comm Error!", BoxIcon::kCritical});
+  ShowCommError(context_.boxes, "Download Failed", description);
 }
 
 }  // namespace tendril

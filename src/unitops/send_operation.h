@@ -8,26 +8,10 @@
 
 #include "config/channel_config.h"
 #include "platform/bytes.h"
-#include "platform/message_boxes.h"
 #include "platform/timer.h"
-#include "serial/hw_serial.h"
-#include "unitops/command_progress.h"
-#include "unitops/running_command.h"
-#include "unitops/unit_target.h"
+#include "unitops/command_context.h"
 
 namespace tendril {
-
-// What the unit commands have in common. Everything outlives them.
-struct CommandContext {
-  HwSerial& link;
-  MessageBoxes& boxes;
-  CommandProgress& progress;
-  RunningCommand& running;
-  const UnitTarget& target;
-};
-
-// Whether a unit command may start now: none runs, and a comm port is chosen. Tells the person when none is.
-bool MayStartCommand(CommandContext& context);
 
 // Port by port: the options, then a poll of kind "0" until the unit acknowledges (once, and twice more when
 // nothing is heard), then a pause, then the next port.
@@ -50,8 +34,6 @@ class SendOperation {
   void Start();
   // The reply, or its absence, to a poll of kind "0". May raise.
   void OnPollReply(bool replied, std::uint8_t unit, const Bytes& data);
-  // Ends the send as failed, without a box. For a fault that is shown elsewhere.
-  void Abort();
   // Stops where it is and shows nothing: the window is closing.
   void Stop();
 
@@ -62,6 +44,7 @@ class SendOperation {
 
  private:
   void OnNextPort();
+  void Abort();
   void Fail(const std::string& text, const std::string& title);
   void ShowFault(const std::string& description);
 

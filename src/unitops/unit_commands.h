@@ -2,12 +2,16 @@
 #pragma once
 
 #include <cstdint>
+#include <functional>
 
 #include "config/channel_config.h"
 #include "platform/message_boxes.h"
 #include "platform/timer.h"
 #include "serial/hw_serial.h"
+#include "unitops/change_id_operation.h"
+#include "unitops/command_context.h"
 #include "unitops/command_progress.h"
+#include "unitops/get_operation.h"
 #include "unitops/running_command.h"
 #include "unitops/send_operation.h"
 #include "unitops/unit_target.h"
@@ -17,18 +21,28 @@ namespace tendril {
 // One object for all of them, since they share the progress display, and only one runs at a time.
 class UnitCommands {
  public:
+  // What the commands tell the window. Either may be empty; neither raises.
+  struct Events {
+    std::function<void()> starting;  // a command is about to start, before it sends anything
+    std::function<void()> replaced;  // a get has just replaced the working configuration, and still runs
+  };
+
   // Takes the link's poll replies. Everything handed in must outlive it.
   UnitCommands(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes, CommandProgressView& progress_view,
-               const UnitTarget& target, const ChannelTable& working);
+               const UnitTarget& target, ChannelTable& working, Events events = {});
   ~UnitCommands();
   UnitCommands(const UnitCommands&) = delete;
   UnitCommands& operator=(const UnitCommands&) = delete;
 
   // "SEND(write) Configuration".
   void Send() { send_.Start(); }
+  // "GET(read) Configuration".
+  void Get() { get_.Start(); }
+  // "UPDATE Unit_ID".
+  void ChangeId() { change_id_.Start(); }
 
   // Stops whatever runs, and shows nothing: the window is closing.
-  void Stop() { send_.Stop(); }
+  void Stop();
 
   // Which of them runs.
   RunningCommand& Running() { return running_; }
@@ -43,6 +57,8 @@ class UnitCommands {
   RunningCommand running_;
   CommandContext context_;
   SendOperation send_;
+  GetOperation get_;
+  ChangeIdOperation change_id_;
 };
 
 }  // namespace tendril

@@ -104,6 +104,46 @@ TEST(OptionBytes, InvalidField_IsNamedWithItsValue) {
   }
 }
 
+TEST(OptionBytes, EveryFlagByte_DecodesByItsExactPatterns) {
+  for (int flags = 0; flags <= 255; ++flags) {
+    const ChannelConfig record = DecodeOptions(OptionBytes{static_cast<std::uint8_t>(flags)});
+    EXPECT_EQ(record.PortType, flags % 4 - 1) << flags;
+    const int power_up = flags & 200;
+    EXPECT_EQ(record.PowerUPOpt, power_up == 136 ? 1 : power_up == 72 ? 2 : 3) << flags;
+    const int lost_comm = flags & 52;
+    EXPECT_EQ(record.LostCommOption, lost_comm == 4    ? 1
+                                     : lost_comm == 36 ? 2
+                                     : lost_comm == 20 ? 3
+                                                       : 4)
+        << flags;
+    EXPECT_TRUE(record.Received);
+  }
+}
+
+TEST(OptionBytes, Decoding_UndoesEncodingUpToTheLastDigit) {
+  ChannelConfig record;
+  record.ActualRange = {10, 2550};
+  record.VirtualRange = {209, 1505};
+  record.VirtualStops = {401, 500};
+  record.DefaultPosition = 609;
+  record.NeutralPosition = 700;
+  for (std::int16_t kind = 0; kind <= 2; ++kind) {
+    for (int power_up = 1; power_up <= 3; ++power_up) {
+      for (int lost_comm = 1; lost_comm <= 4; ++lost_comm) {
+        record.PortType = kind;
+        record.PowerUPOpt = power_up;
+        record.LostCommOption = lost_comm;
+        ChannelConfig expected = record;
+        expected.VirtualRange = {200, 1500};
+        expected.VirtualStops = {400, 500};
+        expected.DefaultPosition = 600;
+        expected.Received = true;
+        EXPECT_EQ(DecodeOptions(Encoded(record)), expected) << kind << power_up << lost_comm;
+      }
+    }
+  }
+}
+
 TEST(ChannelTable, SlotBeyondTheNinth_IsABoundsFault) {
   ChannelTable table;
   EXPECT_NO_THROW(table.At(8));

@@ -6,11 +6,7 @@
 #include <string>
 #include <vector>
 
-#include "bench/faulty_units.h"
-#include "serial/hw_serial.h"
-#include "support/recorded_progress.h"
-#include "support/simulated_world.h"
-#include "unitops/unit_commands.h"
+#include "command_fixture.h"
 
 namespace tendril::test {
 namespace {
@@ -22,57 +18,9 @@ using testing::StartsWith;
 const BoxMessage kNoResponse{"Unit did not respond to the Option Settings, Retry Command", "No Repsonse",
                              BoxIcon::kCritical};
 
-struct ChosenTarget final : public UnitTarget {
-  bool PortChosen() const override { return port_chosen; }
-  std::uint8_t UnitId() const override { return unit; }
-  bool port_chosen = true;
-  std::uint8_t unit = 0x01;
-};
-
-class Send : public testing::Test {
+class Send : public CommandTest {
  protected:
-  Send() {
-    link_.SetCommPort(1);
-    link_.SetBaudRate(19200);
-    for (std::size_t slot = 0; slot < kPortCount; ++slot)
-      SetFromPreset(kPresets[kStartPreset], working_.At(slot));
-  }
-
-  // Lets the command run until it has ended. The longest takes three polls for each port, and the pauses.
-  void RunToTheEnd() {
-    constexpr std::uint64_t kLongestMs = 12000;
-    ASSERT_TRUE(world_.time.AdvanceUntil([&] { return !commands_.Running().Active(); }, kLongestMs));
-  }
-  void ExpectFailure(const BoxMessage& box) {
-    EXPECT_THAT(world_.boxes.Take(), ElementsAre(box));
-    EXPECT_EQ(progress_.text, "COMMAND FAILED!");
-    EXPECT_EQ(progress_.colour, ProgressColour::kRed);
-    EXPECT_FALSE(commands_.Running().Active());
-  }
-  void ExpectSuccess() {
-    EXPECT_THAT(world_.boxes.Take(), IsEmpty());
-    EXPECT_EQ(progress_.text, "SUCCESS: Send Complete!");
-    EXPECT_EQ(progress_.colour, ProgressColour::kGreen);
-  }
-
-  SimulatedWorld world_;
-  HwSerial link_{*world_.device, world_.time, world_.time, world_.log};
-  RecordedProgress progress_;
-  ChosenTarget target_;
-  ChannelTable working_;
-  UnitCommands commands_{link_, world_.time, world_.boxes, progress_, target_, working_};
-};
-
-// Answers every poll with the same data.
-class ScriptedUnit final : public VirtualUnit {
- public:
-  ScriptedUnit(std::uint8_t id, Bytes data) : VirtualUnit(id), data_(std::move(data)) {}
-
- protected:
-  std::optional<Bytes> ReplyData(std::uint8_t /*kind*/) override { return data_; }
-
- private:
-  Bytes data_;
+  void ExpectSuccess() { CommandTest::ExpectSuccess("SUCCESS: Send Complete!"); }
 };
 
 // What the program puts on the line of Comm 1.
@@ -195,11 +143,7 @@ TEST_F(Send, BadlyBehavedUnits_EndWithTheStatedOutcome) {
                                          {"wrong-address", 3, false},
                                          {"unfinished", 3, false}}) {
     SCOPED_TRACE(c.unit);
-    const FaultKind* kind = FindFaultKind(c.unit);
-    ASSERT_NE(kind, nullptr);
-    auto made = kind->make(0x05);
-    VirtualUnit& unit = *made;
-    world_.bench.Attach(1, std::move(made));
+    VirtualUnit& unit = Attach(c.unit, 0x05);
     target_.unit = 0x05;
     commands_.Send();
     RunToTheEnd();

@@ -1,0 +1,27 @@
+#include "ui/simulators.h"
+
+namespace tendril {
+
+Simulators::Simulators(ChannelStrip& channels, EditorArea& editor, const ApplyBoxes& apply_boxes)
+    : channels_(channels), editor_(editor), apply_boxes_(apply_boxes) {}
+
+void Simulators::UpdateAll() {
+  for (std::size_t slot = 0; slot < kPortCount; ++slot) channels_.UpdateSimulator(slot, arm_);
+  editor_.UpdateSimulator(arm_);
+}
+
+void Simulators::UpdateSimulators(Microseconds arm) {
+  arm_ = arm;
+  for (std::size_t slot = 0; slot < kPortCount; ++slot) {
+    if (apply_boxes_.Ticked(slot)) channels_.UpdateSimulator(slot, arm);
+  }
+  editor_.UpdateSimulator(arm);
+}
+
+void Simulators::MoveArm(Microseconds position) {
+  arm_ = position;
+  if (const auto channel = editor_.Channel()) channels_.MoveArm(*channel, position);
+  editor_.MoveArm(position);
+}
+
+}  // namespace tendril

@@ -1,0 +1,31 @@
+// Simulators: the large drawn servo and the eight small ones, as one.
+#pragma once
+
+#include "config/channel_config.h"
+#include "ui/apply_boxes.h"
+#include "ui/channel_strip.h"
+#include "ui/editor_area.h"
+#include "unitops/live_test.h"
+
+namespace tendril {
+
+// The large servo shows the chosen channel, or while there is none what the editor shows.
+class Simulators : public ServoPictures {
+ public:
+  // All must outlive it.
+  Simulators(ChannelStrip& channels, EditorArea& editor, const ApplyBoxes& apply_boxes);
+
+  // Shows all records anew: at the start, and after anything that replaces them.
+  void UpdateAll();
+  // Shows the records of the ticked channels anew, and the large servo, with the arms at `arm`.
+  void UpdateSimulators(Microseconds arm) override;
+  void MoveArm(Microseconds position) override;
+
+ private:
+  ChannelStrip& channels_;
+  EditorArea& editor_;
+  const ApplyBoxes& apply_boxes_;
+  Microseconds arm_ = kCentrePulseWidth;
+};
+
+}  // namespace tendril

@@ -1,0 +1,95 @@
+// CommandTest: the unit commands on a bench, in simulated time.
+#pragma once
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <memory>
+#include <string>
+#include <utility>
+
+#include "bench/faulty_units.h"
+#include "serial/hw_serial.h"
+#include "support/recorded_progress.h"
+#include "support/simulated_world.h"
+#include "unitops/unit_commands.h"
+
+namespace tendril::test {
+
+struct ChosenTarget final : public UnitTarget {
+  bool PortChosen() const override { return port_chosen; }
+  std::uint8_t UnitId() const override { return unit; }
+  bool port_chosen = true;
+  std::uint8_t unit = 0x01;
+};
+
+// Answers every poll with the same data.
+class ScriptedUnit final : public VirtualUnit {
+ public:
+  ScriptedUnit(std::uint8_t id, Bytes data) : VirtualUnit(id), data_(std::move(data)) {}
+
+ protected:
+  std::optional<Bytes> ReplyData(std::uint8_t /*kind*/) override { return data_; }
+
+ private:
+  Bytes data_;
+};
+
+// Comm 1 and unit 01 are chosen, and nobody is on the line. The records are those of the start.
+class CommandTest : public testing::Test {
+ protected:
+  CommandTest() {
+    link_.SetCommPort(1);
+    link_.SetBaudRate(19200);
+    for (std::size_t slot = 0; slot < kPortCount; ++slot)
+      SetFromPreset(kPresets[kStartPreset], working_.At(slot));
+  }
+
+  // Puts the unit called `fault` on the line of Comm 1; an empty name is a well-behaved one.
+  VirtualUnit& Attach(const std::string& fault, std::uint8_t id) {
+    auto unit = fault.empty() ? std::make_unique<VirtualUnit>(id) : FindFaultKind(fault)->make(id);
+    VirtualUnit& attached = *unit;
+    world_.bench.Attach(1, std::move(unit));
+    return attached;
+  }
+  // Lets the command run until it has ended.
+  void RunToTheEnd() {
+    constexpr std::uint64_t kLongestMs = 12000;
+    ASSERT_TRUE(world_.time.AdvanceUntil([&] { return !commands_.Running().Active(); }, kLongestMs));
+  }
+  void ExpectFailure(const BoxMessage& box) {
+    EXPECT_THAT(world_.boxes.Take(), testing::ElementsAre(box));
+    EXPECT_EQ(progress_.text, "COMMAND FAILED!");
+    EXPECT_EQ(progress_.colour, ProgressColour::kRed);
+    EXPECT_FALSE(commands_.Running().Active());
+  }
+  void ExpectSuccess(const std::string& text) {
+    EXPECT_THAT(world_.boxes.Take(), testing::IsEmpty());
+    EXPECT_EQ(progress_.text, text);
+    EXPECT_EQ(progress_.colour, ProgressColour::kGreen);
+  }
+
+  SimulatedWorld world_;
+  HwSerial link_{*world_.device, world_.time, world_.time, world_.log};
+  RecordedProgress progress_;
+  ChosenTarget target_;
+  ChannelTable working_;
+  std::function<void()> on_starting_;
+  std::function<void()> on_replaced_;
+  UnitCommands commands_{link_,
+                         world_.time,
+                         world_.boxes,
+                         progress_,
+                         target_,
+                         working_,
+                         {.starting =
+                              [this] {
+                                if (on_starting_) on_starting_();
+                              },
+                          .replaced =
+                              [this] {
+                                if (on_replaced_) on_replaced_();
+                              }}};
+};
+
+}  // namespace tendril::test

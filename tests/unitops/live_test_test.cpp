@@ -1,0 +1,480 @@
+#include "unitops/live_test.h"
+
+#include <array>
+#include <optional>
+#include <utility>
+#include <vector>
+
+#include "command_fixture.h"
+
+namespace tendril::test {
+namespace {
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+using testing::StartsWith;
+
+struct FakeChoice final : public ChannelChoice {
+  std::optional<std::size_t> Channel() const override { return channel; }
+  ChannelConfig Values() const override { return values; }
+  std::optional<std::size_t> channel = 2;
+  ChannelConfig values;
+};
+
+// The controls, which do what the real ones do: a slider or box that is set tells the test.
+struct FakeView final : public LiveTestView {
+  void ShowTestRunning(int button, bool running) override {
+    captions[static_cast<std::size_t>(button)] = running;
+  }
+  int SliderValue() const override { return slider; }
+  void SetSlider(int value) override { slider = value; }
+  void ShowReadOut(const SliderReadOut& now) override { read_out = now; }
+  bool SliderSends() const override { return sends; }
+  void ClearSliderSends() override { sends = false; }
+
+  std::array<bool, LiveTest::kTestButtons> captions{};
+  int slider = 500;
+  bool sends = false;
+  SliderReadOut read_out{};
+};
+
+struct FakePictures final : public ServoPictures {
+  void MoveArm(Microseconds position) override { drawn.push_back(position); }
+  void UpdateSimulators(Microseconds arm) override {
+    ++updates;
+    updated_to = arm;
+  }
+  std::vector<Microseconds> drawn;
+  int updates = 0;
+  Microseconds updated_to = 0;
+};
+
+// A live command as it crossed the line.
+struct LiveCommand {
+  std::uint64_t ms;  // when it was written, since the test's start
+  int unit, mask, position;
+  friend bool operator==(const LiveCommand&, const LiveCommand&) = default;
+};
+
+class Live : public CommandTest {
+ protected:
+  static constexpr std::uint8_t kChannel3 = 4;
+
+  Live() {
+    on_starting_ = [this] { test_.MakeWay(); };
+    choice_.values = working_.At(2);
+    world_.bench.Line(1).SetTap([this](const LineByte& byte) { Hear(byte); });
+  }
+
+  // Collects live commands: an unlock, then 0A 11 89 <mask> <position> FF <checksum>.
+  void Hear(const LineByte& byte) {
+    if (byte.from != LineSide::kProgram) return;
+    if (byte.value != 0) {
+      packet_.push_back(byte.value);
+      return;
+    }
+    if (packet_.empty()) started_us_ = byte.at_us - 521;  // the first bit of the first zero
+    const Bytes packet = std::exchange(packet_, {});
+    if (packet.size() == 3 && packet[1] == 0x8A) unlock_us_ = started_us_;
+    if (packet.size() < 8 || packet[1] != 0x0A || packet[3] != 137) return;
+    EXPECT_EQ(packet[2], 17);
+    EXPECT_EQ(packet[6], 255);
+    arrived_ms_.push_back(world_.time.ElapsedMs());
+    const std::uint64_t unlock_ms = (unlock_us_ + 500) / 1000;
+    sent_.push_back({unlock_ms - start_ms_, packet[0], packet[4], packet[5]});
+  }
+  std::vector<int> SentPositions() {
+    std::vector<int> positions;
+    for (const LiveCommand& command : sent_) positions.push_back(command.position);
+    return positions;
+  }
+  // Lets what is on its way arrive.
+  void Settle() { world_.time.Advance(50); }
+  void MoveSliderTo(int value) {
+    view_.slider = value;
+    test_.OnSlider();
+  }
+  void SetSliderSends(bool sends) {
+    view_.sends = sends;
+    test_.OnSliderSends();
+  }
+
+  FakeChoice choice_;
+  FakeView view_;
+  FakePictures pictures_;
+  std::vector<LiveCommand> sent_;
+  std::vector<std::uint64_t> arrived_ms_;
+  std::uint64_t start_ms_ = world_.time.ElapsedMs();
+  LiveTest test_{link_, world_.time, world_.boxes, commands_.Running(), target_, choice_, view_, pictures_};
+
+ private:
+  Bytes packet_;
+  std::uint64_t started_us_ = 0;
+  std::uint64_t unlock_us_ = 0;
+};
+
+TEST_F(Live, Sweeps_StepAndRestToTheMillisecond) {
+  struct Case {
+    int button;
+    Microseconds low, high;
+  };
+  choice_.values.ActualRange = {710, 2290};
+  choice_.values.VirtualRange = {1000, 2000};
+  choice_.values.VirtualStops = {1425, 1635};
+  auto& unit = Attach("", 0x01);
+  for (const Case& c : {Case{0, 1000, 2000}, Case{1, 1425, 1635}, Case{3, 710, 2290}}) {
+    SCOPED_TRACE(c.button);
+    sent_.clear();
+    pictures_.drawn.clear();
+    start_ms_ = world_.time.ElapsedMs();
+    test_.OnTestButton(c.button);
+    EXPECT_TRUE(view_.captions[static_cast<std::size_t>(c.button)]);
+
+    // Up, down, and up again to the middle; each end is reached exactly, and rested at.
+    std::vector<LiveCommand> expected{{0, 1, kChannel3, 150}};
+    std::uint64_t ms = 250;
+    const auto step_to = [&](Microseconds position, std::uint64_t until_next) {
+      // In tenths, of two equally near ones the even one: 1425 is 142, 1635 is 164.
+      expected.push_back({ms, 1, kChannel3,
+                          position % 10 == 5 ? position / 20 * 2 + (position / 10 % 2) * 2 : position / 10});
+      ms += until_next;
+    };
+    Microseconds position = 1500;
+    while ((position += 50) < c.high) step_to(position, 100);
+    step_to(c.high, 1000);
+    for (position = c.high - 50; position > c.low; position -= 50) step_to(position, 100);
+    step_to(c.low, 1000);
+    for (position = c.low + 50; position < 1500; position += 50) step_to(position, 100);
+
+    world_.time.Advance(ms + 20);
+    ASSERT_GE(sent_.size(), expected.size());
+    sent_.resize(expected.size());
+    EXPECT_EQ(sent_, expected);
+    EXPECT_EQ(pictures_.drawn[1], std::min(1550, c.high));
+
+    test_.OnTestButton(c.button);
+    Settle();
+    EXPECT_EQ(unit.LivePosition(3), 150);
+    EXPECT_EQ(test_.ShownPosition(), 1500);
+    EXPECT_FALSE(view_.captions[static_cast<std::size_t>(c.button)]);
+    world_.time.Advance(5000);
+    EXPECT_EQ(test_.ShownPosition(), 1500);
+  }
+  EXPECT_EQ(world_.time.RunningTimers(), 0);
+  EXPECT_THAT(unit.rejections(), IsEmpty());
+}
+
+TEST_F(Live, Buttons_SwitchMoveAndReset) {
+  choice_.values.DefaultPosition = 1515;
+  test_.OnTestButton(0);
+  world_.time.Advance(450);  // 1500 1550 1600 1650
+  test_.OnTestButton(3);     // another sweep begins in the middle again
+  EXPECT_THAT(view_.captions, ElementsAre(false, false, false, true, false));
+  world_.time.Advance(260);
+  test_.OnTestButton(2);  // a single move ends a sweep
+  EXPECT_THAT(view_.captions, testing::Each(false));
+  Settle();
+  test_.OnTestButton(4);
+  world_.time.Advance(2000);
+  EXPECT_THAT(SentPositions(), ElementsAre(150, 155, 160, 165, 150, 155, 152, 150));
+  EXPECT_THAT(pictures_.drawn, ElementsAre(1500, 1550, 1600, 1650, 1500, 1550, 1515, 1500));
+
+  // No button: everything is reset, nothing is moved or sent.
+  test_.OnTestButton(1);
+  world_.time.Advance(260);
+  sent_.clear();
+  test_.OnTestButton(LiveTest::kNoButton);
+  world_.time.Advance(2000);
+  EXPECT_THAT(view_.captions, testing::Each(false));
+  EXPECT_THAT(sent_, IsEmpty());
+  EXPECT_EQ(test_.ShownPosition(), 1550);
+  test_.OnTestButton(1);  // and the button starts a sweep again
+  EXPECT_TRUE(view_.captions[1]);
+}
+
+TEST_F(Live, OnlyTheChosenChannel_IsMoved) {
+  auto& unit = Attach("", 0x7F);
+  target_.unit = 0x7F;
+  for (std::size_t channel = 0; channel < 8; ++channel) {
+    choice_.channel = channel;
+    choice_.values.DefaultPosition = 1600 + 10 * static_cast<Microseconds>(channel);
+    test_.OnTestButton(2);
+    Settle();
+    for (int port = 1; port <= 8; ++port) {
+      EXPECT_EQ(unit.LivePosition(port).has_value(), port <= static_cast<int>(channel) + 1);
+    }
+    EXPECT_EQ(unit.LivePosition(static_cast<int>(channel) + 1), 160 + channel);
+  }
+
+  // A sweep goes on with the channel that is chosen in the middle of it.
+  sent_.clear();
+  test_.OnTestButton(0);
+  world_.time.Advance(300);
+  choice_.channel = 0;
+  choice_.values.VirtualRange = {1400, 1600};
+  world_.time.Advance(1100);
+  test_.OnTestButton(0);
+  Settle();
+  std::vector<std::pair<int, int>> masks_and_positions;
+  for (const LiveCommand& command : sent_) masks_and_positions.emplace_back(command.mask, command.position);
+  EXPECT_THAT(masks_and_positions, ElementsAre(std::pair(128, 150), std::pair(128, 155), std::pair(1, 160),
+                                               std::pair(1, 155), std::pair(1, 150)));
+}
+
+TEST_F(Live, WithoutChannelOrPort_OnlyTheDrawingMoves) {
+  const auto expect_drawing_only = [&] {
+    pictures_.drawn.clear();
+    test_.OnTestButton(0);
+    world_.time.Advance(1000);
+    EXPECT_GE(pictures_.drawn.size(), 8u);
+    test_.OnTestButton(0);
+    SetSliderSends(true);
+    MoveSliderTo(600);
+    Settle();
+    SetSliderSends(false);
+    EXPECT_THAT(sent_, IsEmpty());
+    EXPECT_THAT(world_.boxes.Take(), IsEmpty());
+  };
+  choice_.channel.reset();
+  expect_drawing_only();
+  choice_.channel = 2;
+  link_.SetCommPort(0);
+  expect_drawing_only();
+}
+
+TEST_F(Live, Slider_SpansTheVirtualRange) {
+  struct Case {
+    PulsePair range;
+    int slider, percent, dmx;
+    Microseconds pulse;
+    int sent;
+  };
+  for (const Case& c : std::vector<Case>{{{1000, 2000}, 0, 0, 0, 1000, 100},
+                                         {{1000, 2000}, 1000, 100, 255, 2000, 200},
+                                         {{1000, 2000}, 500, 50, 128, 1500, 150},  // 127.5
+                                         {{1000, 2000}, 515, 52, 131, 1515, 152},  // 51.5, 131.325, 151.5
+                                         {{1000, 2000}, 525, 52, 134, 1525, 152},  // 52.5, 133.875, 152.5
+                                         {{1000, 1001}, 500, 50, 128, 1000, 100},
+                                         {{1001, 1004}, 500, 50, 128, 1003, 100},  // 1001 + 1.5
+                                         {{2000, 1000}, 250, 25, 64, 1750, 175}}) {
+    SCOPED_TRACE(c.slider);
+    sent_.clear();
+    choice_.values.VirtualRange = c.range;
+    choice_.values.VirtualStops = {10, 2550};
+    SetSliderSends(true);
+    MoveSliderTo(c.slider);
+    Settle();
+    EXPECT_EQ(view_.read_out.percent, c.percent);
+    EXPECT_EQ(view_.read_out.dmx, c.dmx);
+    EXPECT_EQ(view_.read_out.pulse_width, c.pulse);
+    EXPECT_EQ(pictures_.updated_to, c.pulse);
+    EXPECT_THAT(SentPositions(), ElementsAre(c.sent));
+
+    sent_.clear();
+    SetSliderSends(false);
+    MoveSliderTo(c.slider);
+    Settle();
+    EXPECT_THAT(sent_, IsEmpty()) << "the box is not ticked";
+  }
+}
+
+TEST_F(Live, Slider_IsPushedBackIntoTheStops) {
+  struct Case {
+    PulsePair range, stops;
+    int slider, pushed;
+    std::optional<int> sent;
+  };
+  SetSliderSends(true);
+  for (const Case& c : std::vector<Case>{
+           {{1000, 2000}, {1205, 1800}, 100, 205, 120},
+           {{1000, 2000}, {1205, 1800}, 205, 205, 120},
+           {{1000, 2000}, {1205, 1795}, 1000, 795, 180},
+           {{1000, 2000}, {900, 2100}, 0, 0, 100},
+           {{1000, 1100}, {1050, 1100}, 0, 495, 105},  // 49.5 rounds to 50: several positions have one width
+           // Nowhere to go: the stops lie beyond the range, are crossed over, or between two positions.
+           {{1000, 2000}, {2100, 2200}, 500, 500, {}},
+           {{1000, 2000}, {1600, 1400}, 500, 500, {}},
+           {{500, 2500}, {1501, 1501}, 500, 500, {}},
+           // The range is crossed over: up is away from the stops.
+           {{2000, 1000}, {1200, 1800}, 900, 900, {}},
+           {{2000, 1000}, {1200, 1800}, 700, 700, 130}}) {
+    SCOPED_TRACE(c.slider);
+    sent_.clear();
+    choice_.values.VirtualRange = c.range;
+    choice_.values.VirtualStops = c.stops;
+    const int updates = pictures_.updates;
+    MoveSliderTo(c.slider);
+    Settle();
+    EXPECT_EQ(view_.slider, c.pushed);
+    EXPECT_EQ(pictures_.updates, updates + 1);
+    EXPECT_EQ(SentPositions(), c.sent ? std::vector<int>{*c.sent} : std::vector<int>{});
+  }
+}
+
+TEST_F(Live, Drag_KeepsUpWithTheHandAndEndsWhereItEnds) {
+  auto& unit = Attach("", 0x01);
+  SetSliderSends(true);
+  std::uint64_t moved_ms = 0;
+  for (int i = 0; i <= 600; ++i) {  // faster than the line
+    MoveSliderTo(200 + i);
+    moved_ms = world_.time.ElapsedMs();
+    if (i % 3 == 0) world_.time.Advance(1);
+  }
+  Settle();
+  EXPECT_EQ(unit.LivePosition(3), 180);
+  EXPECT_LE(arrived_ms_.back() - moved_ms, 30u);
+  EXPECT_GE(sent_.size(), 20u);
+  for (std::size_t i = 1; i < sent_.size(); ++i) EXPECT_GE(sent_[i].ms - sent_[i - 1].ms, 8u);
+  EXPECT_EQ(world_.time.RunningTimers(), 0);
+}
+
+TEST_F(Live, WaitingPosition_GoesOutWhateverComesNext) {
+  const auto drag = [&] {
+    sent_.clear();
+    for (const int value : {400, 410, 420}) MoveSliderTo(value);  // 140 goes out, 142 waits
+  };
+  SetSliderSends(true);
+
+  // Another channel, another unit: their positions take no other servo's place.
+  drag();
+  choice_.channel = 5;
+  MoveSliderTo(430);
+  target_.unit = 0x0A;
+  MoveSliderTo(440);
+  Settle();
+  std::vector<std::array<int, 3>> sent;
+  for (const LiveCommand& command : sent_) sent.push_back({command.unit, command.mask, command.position});
+  EXPECT_EQ(sent, (std::vector<std::array<int, 3>>{{1, 4, 140}, {1, 4, 142}, {1, 32, 143}, {10, 32, 144}}));
+
+  // A test button, and a unit command.
+  drag();
+  SetSliderSends(false);
+  test_.OnTestButton(4);
+  Settle();
+  EXPECT_THAT(SentPositions(), ElementsAre(140, 142, 150));
+  SetSliderSends(true);
+  drag();
+  Attach("", 0x0A);
+  commands_.Get();
+  RunToTheEnd();
+  ExpectSuccess("SUCCESS: Upload Complete");
+  EXPECT_THAT(SentPositions(), ElementsAre(140, 142));
+}
+
+TEST_F(Live, UnitCommand_StopsASweepAndHasTheLineToItself) {
+  auto& unit = Attach("", 0x01);
+  test_.OnTestButton(0);
+  world_.time.Advance(500);
+  sent_.clear();
+  target_.port_chosen = false;
+  commands_.Send();  // refused: the sweep goes on
+  world_.boxes.Take();
+  EXPECT_TRUE(view_.captions[0]);
+  target_.port_chosen = true;
+
+  commands_.Send();
+  EXPECT_THAT(view_.captions, testing::Each(false));
+  EXPECT_EQ(test_.ShownPosition(), 1500);
+  SetSliderSends(true);
+  while (commands_.Running().Active()) {
+    MoveSliderTo(100 + static_cast<int>(world_.time.ElapsedMs() % 800));
+    world_.time.Advance(7);
+  }
+  ExpectSuccess("SUCCESS: Send Complete!");
+  EXPECT_THAT(SentPositions(), ElementsAre(150));
+  EXPECT_EQ(unit.accepted_commands(), 5u + 8u);
+  MoveSliderTo(300);
+  Settle();
+  EXPECT_THAT(SentPositions(), ElementsAre(150, 130));
+}
+
+TEST_F(Live, PortThatCloses_StopsTheSweepWithoutABox) {
+  const auto close_port = {std::function<void()>([&] { world_.bench.Unplug(1); }),
+                           std::function<void()>([&] { link_.SetPortOpen(false); }),
+                           std::function<void()>([&] { link_.SetCommPort(2); })};
+  for (const auto& close : close_port) {
+    link_.SetCommPort(1);
+    world_.bench.Replug(1);
+    test_.OnTestButton(3);
+    world_.time.Advance(330);
+    EXPECT_TRUE(link_.PortOpen());
+    close();
+    world_.time.Advance(5);
+    sent_.clear();
+    EXPECT_THAT(view_.captions, testing::Each(false));
+    const Microseconds shown = test_.ShownPosition();
+    world_.time.Advance(3000);
+    EXPECT_EQ(test_.ShownPosition(), shown);
+    EXPECT_THAT(sent_, IsEmpty());
+    EXPECT_THAT(world_.boxes.Take(), IsEmpty());
+  }
+}
+
+TEST_F(Live, Faults_StopEverythingAndAreToldOnce) {
+  struct Case {
+    std::string what;
+    std::function<void()> act;
+  };
+  for (const Case& c : std::vector<Case>{{"start of a sweep", [&] { test_.OnTestButton(0); }},
+                                         {"single move", [&] { test_.OnTestButton(4); }},
+                                         {"slider", [&] {
+                                            SetSliderSends(true);
+                                            for (int value = 300; value < 400; ++value) MoveSliderTo(value);
+                                          }}}) {
+    SCOPED_TRACE(c.what);
+    world_.bench.Unplug(1);
+    c.act();
+    world_.time.Advance(3000);
+    ASSERT_EQ(world_.boxes.shown.size(), 1u);
+    EXPECT_THAT(world_.boxes.shown[0].text, StartsWith("Open of serial port 1 has failed\r\n"));
+    EXPECT_EQ(world_.boxes.shown[0].title, "Comm Error!");
+    EXPECT_EQ(world_.boxes.Take()[0].icon, BoxIcon::kCritical);
+    EXPECT_THAT(view_.captions, testing::Each(false));
+    EXPECT_FALSE(view_.sends);
+    world_.bench.Replug(1);
+  }
+
+  // At a step: the timer has stopped before the box opens.
+  test_.OnTestButton(0);
+  world_.time.Advance(300);
+  world_.log.broken = true;
+  world_.boxes.while_open = [&] { world_.time.Advance(2000); };
+  world_.time.Advance(100);
+  EXPECT_THAT(world_.boxes.Take(), ElementsAre(testing::Field(&BoxMessage::title, "Comm Error!")));
+  EXPECT_THAT(view_.captions, testing::Each(false));
+  world_.log.broken = false;
+
+  // A position that no unit knows never becomes a byte.
+  sent_.clear();
+  for (const Microseconds position : {4, -20, 2556, 70000}) {
+    choice_.values.DefaultPosition = position;
+    test_.OnTestButton(2);
+    EXPECT_EQ(world_.boxes.Take().size(), 1u) << position;
+  }
+  Settle();
+  EXPECT_THAT(sent_, IsEmpty());
+}
+
+TEST_F(Live, FaultOfMakingWay_IsLeftToTheCommand) {
+  test_.OnTestButton(0);
+  world_.time.Advance(300);
+  world_.log.broken = true;
+  commands_.Send();
+  ASSERT_EQ(world_.boxes.shown.size(), 1u);
+  EXPECT_THAT(world_.boxes.shown[0].text, StartsWith("Download Failed\r\n"));
+  EXPECT_THAT(view_.captions, testing::Each(false));
+}
+
+TEST_F(Live, SliderTakesOver_StopsASweepWhereItIs) {
+  test_.OnTestButton(0);
+  world_.time.Advance(300);
+  sent_.clear();
+  SetSliderSends(true);
+  world_.time.Advance(2000);
+  EXPECT_THAT(view_.captions, testing::Each(false));
+  EXPECT_THAT(sent_, IsEmpty());
+  EXPECT_EQ(test_.ShownPosition(), 1550);
+}
+
+}  // namespace
+}  // namespace tendril::test
