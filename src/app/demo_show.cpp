@@ -9,6 +9,7 @@
 #include <QPixmap>
 #include <cstdio>
 #include <string>
+#include <utility>
 #include <variant>
 
 #include "bench/line_printer.h"
@@ -17,7 +18,7 @@
 namespace tendril {
 namespace {
 
-constexpr int kLongestSendMs = 30000;
+constexpr int kLongestCommandMs = 30000;
 constexpr QSize kPictureSize(1280, 800);
 
 void Print(const std::string& line) {
@@ -37,12 +38,35 @@ class Actor {
   // Lets the program run until `done`; false when it takes too long.
   template <typename Done>
   static bool RunUntil(Done done) {
-    const QDeadlineTimer deadline(kLongestSendMs);
+    const QDeadlineTimer deadline(kLongestCommandMs);
     while (!done()) {
       if (deadline.hasExpired()) return false;
       QApplication::processEvents(QEventLoop::WaitForMoreEvents);
     }
     return true;
+  }
+
+  // Chooses an entry of a list, as a person does.
+  void Choose(const char* list, int entry) const {
+    auto& box = Find<QComboBox>(list);
+    box.setCurrentIndex(entry);
+    Q_EMIT box.activated(entry);
+  }
+
+  // Presses a command's button and waits for the outcome; false when there is none.
+  bool RunCommand(const char* button) const {
+    Start(button);
+    return AwaitOutcome();
+  }
+  void Start(const char* button) const {
+    Find<QLabel>("lblProgress").clear();
+    Find<QAbstractButton>(button).click();
+  }
+  bool AwaitOutcome() const {
+    const auto& outcome = Find<QLabel>("lblProgress");
+    const bool ended = RunUntil([&] { return !outcome.text().isEmpty(); });
+    Print("The window says: " + outcome.text().toStdString());
+    return ended;
   }
 
   bool SavePicture(const char* name) const {
@@ -58,16 +82,18 @@ class Actor {
 };
 
 // Compares port by port, and prints what the unit holds.
-bool HoldsWhatWasSent(const VirtualUnit& unit, const ChannelTable& sent) {
+bool AreEqual(const VirtualUnit& unit, const ChannelTable& shown) {
+  char id[3];
+  std::snprintf(id, sizeof id, "%02X", unit.id());
   bool all_equal = true;
   for (int port = 1; port <= kUnitPorts; ++port) {
     const PortOptionBytes& held = unit.PortOptions(port);
-    const auto encoded = EncodeOptions(sent.At(static_cast<std::size_t>(port - 1)));
+    const auto encoded = EncodeOptions(shown.At(static_cast<std::size_t>(port - 1)));
     const auto* bytes = std::get_if<OptionBytes>(&encoded);
     const bool equal = bytes != nullptr && *bytes == held;
-    std::string line = "Port " + std::to_string(port) + " of unit 01 holds";
+    std::string line = "Port " + std::to_string(port) + " of unit " + id + " holds";
     for (const std::uint8_t byte : held) line += " " + std::to_string(byte);
-    Print(line + (equal ? "" : "   NOT what was sent"));
+    Print(line + (equal ? "" : "   NOT what the window shows"));
     all_equal = all_equal && equal;
   }
   return all_equal;
@@ -84,7 +110,7 @@ bool PrintedBoxes::AskYesNo(const BoxMessage& message) {
   return false;
 }
 
-int ShowWithoutDisplay(frmNewServoConfig& window, VirtualLine& line, const VirtualUnit& unit,
+int ShowWithoutDisplay(frmNewServoConfig& window, VirtualLine& line, const DemoUnits& units,
                        const QString& folder) {
   const Actor actor(window, folder);
   window.resize(kPictureSize);
@@ -93,24 +119,30 @@ int ShowWithoutDisplay(frmNewServoConfig& window, VirtualLine& line, const Virtu
 
   LinePrinter printer(Print);
   line.SetTap([&printer](const LineByte& byte) { printer.Note(byte); });
-  auto& ports = actor.Find<QComboBox>("cmbNYX");
-  ports.setCurrentIndex(1);
-  Q_EMIT ports.activated(1);
-  Print("Chosen: " + ports.currentText().toStdString() +
-        ", unit 01. Sending the configuration of eight ports ...");
-  actor.Find<QAbstractButton>("Command3_0").click();
-
-  auto& outcome = actor.Find<QLabel>("lblProgress");
+  actor.Choose("cmbNYX", 1);
+  Print("Chosen: Comm 1, unit 01. Sending the configuration of eight ports ...");
+  actor.Start("Command3_0");
   // In the pause between two ports: a picture takes longer than a unit waits for the line.
-  bool ended = Actor::RunUntil([&] { return unit.accepted_commands() >= 4 && !line.NextEventUs(); });
-  const bool saved = actor.SavePicture("window-sending.png");
-  ended = ended && Actor::RunUntil([&] { return !outcome.text().isEmpty(); });
+  bool good = Actor::RunUntil([&] { return units.first.accepted_commands() >= 4 && !line.NextEventUs(); });
+  good = actor.SavePicture("window-sending.png") && good;
+  good = actor.AwaitOutcome() && good;
   printer.Flush();
+  good = AreEqual(units.first, window.WorkingConfiguration()) && good;
+  good = actor.SavePicture("window-sent.png") && good;
+  const ChannelTable sent = window.WorkingConfiguration();
+
+  for (const auto& [digit, unit] : {std::pair(10, &units.second), std::pair(1, &units.first)}) {
+    actor.Choose("CmbUnitID_1", digit);
+    Print("Chosen: unit " + std::string(digit == 10 ? "0A" : "01") + ". Reading its configuration ...");
+    good = actor.RunCommand("Command3_1") && good;
+    printer.Flush();
+    good = AreEqual(*unit, window.WorkingConfiguration()) && good;
+    if (digit == 10) good = actor.SavePicture("window-read.png") && good;
+  }
   line.SetTap(nullptr);
-  Print("The window says: " + outcome.text().toStdString());
-  const bool equal = HoldsWhatWasSent(unit, window.WorkingConfiguration());
-  Print(equal ? "The unit holds what was sent." : "The unit does NOT hold what was sent.");
-  return actor.SavePicture("window-sent.png") && saved && ended && equal ? 0 : 1;
+  good = good && window.WorkingConfiguration() == sent;
+  Print(good ? "What was sent is what was read back." : "What was read back is NOT what was sent.");
+  return good ? 0 : 1;
 }
 
 }  // namespace tendril

@@ -17,11 +17,17 @@ class PrintedBoxes final : public MessageBoxes {
   bool AskYesNo(const BoxMessage& message) override;
 };
 
-// Does in `window` what a person would: chooses Comm 1 and unit 01, sends the configuration and waits for the
-// end. Prints what crosses `line`, compares what `unit` holds afterwards with what the window shows, and
-// saves pictures of the window in `folder`, which is created. Returns the program's exit code: 0 when the
-// unit holds what was sent.
-int ShowWithoutDisplay(frmNewServoConfig& window, VirtualLine& line, const VirtualUnit& unit,
+// The units on the line of Comm 1, at 01 and 0A.
+struct DemoUnits {
+  const VirtualUnit& first;
+  const VirtualUnit& second;
+};
+
+// Does in `window` what a person would: chooses Comm 1, sends the configuration to unit 01, reads that of unit
+// 0A, which is another, and reads unit 01 back. Prints what crosses `line`, compares what the units hold with
+// what the window shows, and saves pictures of the window in `folder`, which is created. Returns the program's
+// exit code: 0 when what was sent is what was read back.
+int ShowWithoutDisplay(frmNewServoConfig& window, VirtualLine& line, const DemoUnits& units,
                        const QString& folder);
 
 }  // namespace tendril

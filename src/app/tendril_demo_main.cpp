@@ -25,17 +25,19 @@ using namespace tendril;
 constexpr ReplyTiming kPatient{.turn_round_us = 2000, .pads = 45};
 
 // Comm 1: two working units. Comm 2: one fresh from the factory. Comm 3: in use. Comm 4: nobody answers.
-VirtualUnit& FillBench(VirtualPorts& bench) {
+DemoUnits FillBench(VirtualPorts& bench) {
   for (const int port : {1, 2, 3, 4}) bench.AddPort(port);
   auto& first = bench.Attach<VirtualUnit>(1, std::uint8_t{0x01}, kPatient);
-  bench.Attach<VirtualUnit>(1, std::uint8_t{0x0A}, kPatient);
+  auto& second = bench.Attach<VirtualUnit>(1, std::uint8_t{0x0A}, kPatient);
   bench.Attach<VirtualUnit>(2, std::uint8_t{0xFF}, kPatient);
   bench.SetHeldByAnother(3, true);
-  // Somebody has set it up before, otherwise than the window starts with.
+  // Somebody has set them up before, otherwise than the window starts with.
   for (int port = 1; port <= kUnitPorts; ++port) {
     first.SetPortOptions(port, {1, 80, 220, 125, 175, 125, 175, 150, 150});
+    const auto by = [port](int width) { return static_cast<std::uint8_t>(width + 2 * port); };
+    second.SetPortOptions(port, {1, 60, 240, by(80), by(170), by(90), by(160), by(120), by(130)});
   }
-  return first;
+  return {first, second};
 }
 
 QPalette DarkPalette() {
@@ -66,7 +68,7 @@ int main(int argc, char** argv) {
   parser.addHelpOption();
   const QCommandLineOption show(
       QStringLiteral("without-display"),
-      QStringLiteral("Send a configuration to unit 01, print what crosses the line, save "
+      QStringLiteral("Send a configuration to unit 01, read it back, print what crosses the line, save "
                      "pictures of the window in <folder>, and end."),
       QStringLiteral("folder"));
   const QCommandLineOption dark(QStringLiteral("dark"), QStringLiteral("Light text on a dark ground."));
@@ -80,7 +82,7 @@ int main(int argc, char** argv) {
   QTemporaryDir scratch;  // a demonstration leaves nothing behind
   QtPlatform platform;
   VirtualPorts bench(platform.clock, platform.timers);
-  VirtualUnit& unit = FillBench(bench);
+  const DemoUnits units = FillBench(bench);
   const std::unique_ptr<SerialDevice> device = bench.CreateDevice();
   FileCommandLog log(std::filesystem::path(scratch.filePath(QStringLiteral("HUtest.txt")).toStdString()));
   HwSerial Serial1(*device, platform.timers, platform.clock, log);
@@ -89,6 +91,6 @@ int main(int argc, char** argv) {
   frmNewServoConfig window(Serial1, platform.timers, boxes, kVersion);
   platform.boxes.SetParent(&window);
   window.show();
-  if (parser.isSet(show)) return ShowWithoutDisplay(window, bench.Line(1), unit, parser.value(show));
+  if (parser.isSet(show)) return ShowWithoutDisplay(window, bench.Line(1), units, parser.value(show));
   return QApplication::exec();
 }

@@ -9,6 +9,7 @@ namespace tendril {
 namespace {
 
 constexpr std::size_t kShownBytes = 40;      // more than any packet has; noise can be much longer
+constexpr std::size_t kShownZeros = 4;       // in a row at the beginning
 constexpr std::uint64_t kSilenceUs = 2'000;  // zero bytes this far apart do not belong together
 constexpr std::size_t kHexWidth = 47;        // of a packet of 16 bytes, as those with a port's options are
 
@@ -18,13 +19,21 @@ std::string Hex(std::uint8_t byte) {
   return text;
 }
 
+// Many zero bytes at the beginning, the pads of a patient unit, are given as a count.
 std::string HexList(const Bytes& bytes) {
+  const auto begin = std::find_if(bytes.begin(), bytes.end(), [](std::uint8_t byte) { return byte != 0; });
+  const auto zeros = static_cast<std::size_t>(begin - bytes.begin());
+  std::size_t i = 0;
   std::string text;
-  for (std::size_t i = 0; i < std::min(bytes.size(), kShownBytes); ++i) {
-    if (i > 0) text += ' ';
+  if (zeros > kShownZeros) {
+    text = std::to_string(zeros) + " x 00";
+    i = zeros;
+  }
+  for (const std::size_t shown = i + kShownBytes; i < std::min(bytes.size(), shown); ++i) {
+    if (!text.empty()) text += ' ';
     text += Hex(bytes[i]);
   }
-  if (bytes.size() > kShownBytes) text += " ... (" + std::to_string(bytes.size()) + " bytes)";
+  if (i < bytes.size()) text += " ... (" + std::to_string(bytes.size()) + " bytes)";
   return text;
 }
 

@@ -70,6 +70,8 @@ QWidget* EditorArea::MakeMotionParameters(
                                  const QString& label, QLabel*& value) {
     spin = Named(new QSpinBox, control);
     spin->setSuffix(QStringLiteral(" µs"));
+    spin->setRange(-kWidestLimit, kWidestLimit);
+    spin->setFixedWidth(spin->sizeHint().width());  // whatever its limits become, nothing around it moves
     spin->setAccessibleName(name);
     Disable(spin, QString::fromUtf8(kNotYet));
     auto* name_label = new QLabel(name);

@@ -129,8 +129,10 @@ void frmNewServoConfig::ShowRunning() {
   command_buttons_.ShowRunning(running);
   progress_->ShowRunning(running);
   live_test_area_->ShowRunning(running);
-  // Disabling takes the focus off the button that was pressed. Unless the person has moved it since, it goes back.
+  // Disabling takes the focus off what was used last, and it would fall on some servo or button. It rests on the
+  // window meanwhile and then goes back, unless the person has moved it since.
   if (running.Active()) {
+    if (focusWidget() != focus_before_command_) setFocus();
     focus_in_command_ = focusWidget();
   } else if (focus_before_command_ && focusWidget() == focus_in_command_) {
     focus_before_command_->setFocus();

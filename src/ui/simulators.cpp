@@ -6,8 +6,12 @@ Simulators::Simulators(ChannelStrip& channels, EditorArea& editor, const ApplyBo
     : channels_(channels), editor_(editor), apply_boxes_(apply_boxes) {}
 
 void Simulators::UpdateAll() {
-  for (std::size_t slot = 0; slot < kPortCount; ++slot) channels_.UpdateSimulator(slot, arm_);
-  editor_.UpdateSimulator(arm_);
+  // A servo's arcs and marker are measured from the neutral position that it had before: a record with another one
+  // is wholly shown at the second time.
+  for (int pass = 0; pass < 2; ++pass) {
+    for (std::size_t slot = 0; slot < kPortCount; ++slot) channels_.UpdateSimulator(slot, arm_);
+    editor_.UpdateSimulator(arm_);
+  }
 }
 
 void Simulators::UpdateSimulators(Microseconds arm) {

@@ -4,11 +4,13 @@
 
 #include <QAbstractButton>
 #include <QAccessible>
+#include <QCheckBox>
 #include <QComboBox>
 #include <QGroupBox>
 #include <QLabel>
 #include <QScrollArea>
 #include <QSet>
+#include <QSlider>
 #include <QSpinBox>
 #include <QTest>
 #include <QWheelEvent>
@@ -167,6 +169,157 @@ TEST_F(Window, Send_ByKeyboardAlone_LeavesTheFocusWhereItWas) {
   RunToTheEnd();
   EXPECT_EQ(Text("lblProgress"), "SUCCESS: Send Complete!");
   EXPECT_EQ(QApplication::focusWidget(), &Find("Command3_0"));
+}
+
+// What the unit called below holds in all of its ports: neither a preset nor symmetrical.
+constexpr PortOptionBytes kOtherOptions = {1, 70, 230, 90, 190, 95, 180, 130, 140};
+
+TEST_F(Window, Get_ShowsTheUnitsPortsAndLoadsTheChosenChannelAgain) {
+  auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
+  for (int port = 1; port <= 8; ++port) unit.SetPortOptions(port, kOtherOptions);
+  Click("ServoSimulator2_2");
+  EXPECT_EQ(Text("lblVirtPulseRange"), "500]");
+  ChooseByKeys("cmbNYX", 1);
+  Find<QCheckBox>("chkSendSlideCommands").setChecked(true);
+  Click("Command3_1");
+  for (const char* busy : {"Command3_0", "Command3_2", "cmdTest_0", "HScrollSendServoPosition"}) {
+    EXPECT_FALSE(Find(busy).isEnabled()) << busy;
+    EXPECT_EQ(Find(busy).toolTip().toStdString(), "Reading the configuration of unit 01") << busy;
+  }
+  RunToTheEnd();
+  EXPECT_EQ(Text("lblProgress"), "SUCCESS: Upload Complete");
+  EXPECT_FALSE(unit.LivePosition(3).has_value()) << "a get moves no servo";
+
+  ServoDial wanted;
+  wanted.SetNeutralPositionUS(1400);  // all else is measured from it
+  wanted.SetRangeUS(700, 2300);
+  wanted.SetLimitUS(900, 1900);
+  wanted.SetStopsUS(950, 1800);
+  for (const char* name : {"ServoSimulator2_0", "ServoSimulator2_7", "ServoSimulator1"}) {
+    EXPECT_EQ(Find<ServoSimulator>(name).dial().range_end(), wanted.range_end()) << name;
+    EXPECT_EQ(Find<ServoSimulator>(name).dial().limit_start(), wanted.limit_start()) << name;
+    EXPECT_EQ(Find<ServoSimulator>(name).dial().stops_start(), wanted.stops_start()) << name;
+  }
+  EXPECT_EQ(window_->WorkingConfiguration().At(7).NeutralPosition, 1400);
+  EXPECT_EQ(Text("lblVirtPulseRange"), "500]");
+  EXPECT_EQ(Text("lblNeutralTrim") + " " + Text("lblDefaultPos"), "-100 -100");
+  EXPECT_EQ(Text("lblLeftVirtStop") + " " + Text("lblRightVirtStop"), "-450 +400");
+  EXPECT_EQ(Text("txtPositionValue"), "1400");
+
+  // The same button in the summary.
+  Find<QLabel>("lblProgress").clear();
+  unit.SetPortOptions(1, kFreshPortOptions);
+  Find<QAbstractButton>("Command3_4").click();
+  RunToTheEnd();
+  EXPECT_EQ(window_->WorkingConfiguration().At(0).NeutralPosition, 1500);
+}
+
+TEST_F(Window, UpdateUnitId_GivesTheFactoryUnitItsIdButNever00) {
+  auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0xFF});
+  ChooseByKeys("cmbNYX", 1);
+  ChooseByKeys("CmbUnitID_1", 0);
+  EXPECT_FALSE(Find("Command3_2").isEnabled());
+  EXPECT_THAT(Find("Command3_2").toolTip().toStdString(), testing::HasSubstr("cannot have the ID 00"));
+  ChooseByKeys("CmbUnitID_1", 5);
+  EXPECT_TRUE(Find("Command3_2").isEnabled());
+  Click("Command3_2");
+  RunToTheEnd();
+  EXPECT_EQ(Text("lblProgress"), "SUCCESS: UnitID set to '05'");
+  EXPECT_EQ(unit.id(), 0x05);
+}
+
+TEST_F(Window, ChoosingAServo_MarksItAndShowsItsRecord) {
+  const auto expect_chosen = [&](int chosen) {
+    for (int channel = 0; channel < 8; ++channel) {
+      const std::string number = std::to_string(channel);
+      EXPECT_EQ(Find<ServoSimulator>(("ServoSimulator2_" + number).c_str()).dial().selected(),
+                channel == chosen);
+      EXPECT_EQ(Find<QCheckBox>(("chkUpdate_" + number).c_str()).isChecked(), channel == chosen);
+    }
+    EXPECT_EQ(Find<ServoSimulator>("ServoSimulator1").dial().caption(), "CHAN " + std::to_string(chosen + 1));
+  };
+  Click("ServoSimulator2_6");
+  expect_chosen(6);
+  EXPECT_EQ(Text("lblActPulseLeft") + " " + Text("lblVirtPulseRange") + " " + Text("lblRightVirtStop"),
+            "600 500] +500");
+  const QPoint before = Find("cmdTest_0").mapTo(window_.get(), QPoint());
+  QTest::keyClick(&Find("ServoSimulator2_1"), Qt::Key_Space);
+  QTest::qWait(0);
+  expect_chosen(1);
+  EXPECT_EQ(Find("cmdTest_0").mapTo(window_.get(), QPoint()), before) << "the window jumps";
+}
+
+TEST_F(Window, TestButtons_SweepTheServoDrawnAndReal) {
+  auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
+  ChooseByKeys("cmbNYX", 1);
+  Click("ServoSimulator2_3");
+  const auto& test = Find<QAbstractButton>("cmdTest_1");
+  Click("cmdTest_1");
+  EXPECT_EQ(test.text().toStdString(), "Stop");
+  world_.time.Advance(470);
+  EXPECT_EQ(unit.LivePosition(4), 165);
+  EXPECT_FALSE(unit.LivePosition(3).has_value());
+  EXPECT_EQ(Find<ServoSimulator>("ServoSimulator1").dial().arm_pulse(), 1650);
+  EXPECT_EQ(Find<ServoSimulator>("ServoSimulator2_3").dial().arm_pulse(), 1650);
+  EXPECT_EQ(Find<ServoSimulator>("ServoSimulator2_4").dial().arm_pulse(), 1500);
+  window_->resize(1100, 760);
+  QTest::qWait(0);
+  EXPECT_EQ(Find<ServoSimulator>("ServoSimulator2_3").dial().arm_pulse(), 1650) << "after a resize";
+
+  Find<QCheckBox>("chkSendSlideCommands").click();
+  EXPECT_EQ(test.text().toStdString(), "Test");
+  EXPECT_FALSE(test.isEnabled());
+  EXPECT_THAT(test.toolTip().toStdString(), testing::HasSubstr("Use Slider to Test Intensity Values"));
+  Find<QCheckBox>("chkSendSlideCommands").click();
+  EXPECT_TRUE(test.isEnabled());
+
+  // A closing window takes a running sweep with it.
+  Click("cmdTest_0");
+  EXPECT_TRUE(window_->close());
+  world_.time.Advance(5000);
+  EXPECT_EQ(world_.time.RunningTimers(), 0);
+  EXPECT_THAT(world_.boxes.shown, IsEmpty());
+}
+
+TEST_F(Window, Slider_MovesTheServoByKeysWheelAndMouseAndCanBeRead) {
+  auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
+  ChooseByKeys("cmbNYX", 1);
+  Click("ServoSimulator2_0");
+  auto& slider = Find<QSlider>("HScrollSendServoPosition");
+  QTest::keyClick(&slider, Qt::Key_Right);
+  world_.time.Advance(50);
+  EXPECT_FALSE(unit.LivePosition(1).has_value()) << "the box is not ticked";
+  Find<QCheckBox>("chkSendSlideCommands").click();
+
+  const auto expect_at = [&](int value, const std::string& read_outs) {
+    world_.time.Advance(50);
+    EXPECT_EQ(slider.value(), value);
+    EXPECT_EQ(Text("lblPositionValue_0") + " " + Text("lblPositionValue_1") + " " + Text("txtPositionValue"),
+              read_outs);
+    EXPECT_EQ(unit.LivePosition(1), (1000 + value) / 10);
+    EXPECT_EQ(Find<ServoSimulator>("ServoSimulator1").dial().arm_pulse(), 1000 + value);
+    const auto* accessible = QAccessible::queryAccessibleInterface(&slider);
+    EXPECT_THAT(accessible->text(QAccessible::Description).toStdString(),
+                testing::HasSubstr(std::to_string(1000 + value) + " µs"));
+  };
+  QTest::keyClick(&slider, Qt::Key_Right);
+  expect_at(520, "52 133 1520");
+  QTest::keyClick(&slider, Qt::Key_PageUp);
+  expect_at(620, "62 158 1620");
+  QTest::keyClick(&slider, Qt::Key_Home);
+  expect_at(0, "0 0 1000");
+  const QPoint middle = slider.rect().center();
+  QWheelEvent wheel(middle, slider.mapToGlobal(middle), {}, {0, 120}, Qt::NoButton, Qt::NoModifier,
+                    Qt::NoScrollPhase, false);
+  QApplication::sendEvent(&slider, &wheel);
+  EXPECT_GT(slider.value(), 0);
+  expect_at(slider.value(), Text("lblPositionValue_0") + " " + Text("lblPositionValue_1") + " " +
+                                std::to_string(1000 + slider.value()));
+  QTest::keyClick(&slider, Qt::Key_Home);
+  QTest::mousePress(&slider, Qt::LeftButton, {}, {2, middle.y()});
+  QTest::mouseMove(&slider, {slider.width() - 2, middle.y()});
+  QTest::mouseRelease(&slider, Qt::LeftButton, {}, {slider.width() - 2, middle.y()});
+  expect_at(1000, "100 255 2000");
 }
 
 TEST_F(Window, Failures_AreToldAndTheButtonsWorkAgain) {
