@@ -9,11 +9,15 @@
 #include <QMessageBox>
 #include <QTest>
 #include <QTimer>
+#include <array>
+#include <cstdint>
+#include <filesystem>
 #include <memory>
 #include <string>
 #include <vector>
 
 #include "app/utility_program.h"
+#include "config/option_bytes.h"
 #include "platform/posix/paths.h"
 #include "support/bench_process.h"
 
@@ -22,12 +26,19 @@ namespace {
 
 constexpr int kGenerousMs = 20000;
 
+// The buttons.
+constexpr char kSend[] = "Command3_0";
+constexpr char kGet[] = "Command3_1";
+constexpr char kChangeId[] = "Command3_2";
+constexpr char kSweep[] = "cmdTest_0";
+
+// Options of the bench.
+const QStringList kFactoryFresh{QStringLiteral("--unit"), QStringLiteral("FF")};
+QStringList Fault(const char* name) { return {QStringLiteral("--fault"), QString::fromLatin1(name)}; }
+
 class RealLine : public testing::Test {
  protected:
-  // Makes the program. Call it when Comm 1 is there.
-  void StartProgram() {
-    program_ = std::make_unique<UtilityProgram>();
-    program_->window.show();
+  RealLine() {
     // A person who reads each box and presses OK.
     reader_.setInterval(20);
     QObject::connect(&reader_, &QTimer::timeout, &reader_, [this] {
@@ -38,18 +49,26 @@ class RealLine : public testing::Test {
     });
     reader_.start();
   }
+
+  // Makes the program anew. Call it when Comm 1 is there.
+  void StartProgram() {
+    program_.reset();
+    program_ = std::make_unique<UtilityProgram>();
+    program_->window.show();
+  }
   void ChooseComm1() {
     auto& ports = *program_->window.findChild<QComboBox*>(QStringLiteral("cmbNYX"));
     ports.setCurrentIndex(0);
     QTest::keyClick(&ports, Qt::Key_Down);
     ASSERT_EQ(ports.currentText().toStdString(), "Comm 1");
   }
-  void PressSend() {
+  void Press(const char* button) {
     outcome().clear();
-    QTest::mouseClick(&Button(), Qt::LeftButton);
+    QTest::mouseClick(&Button(button), Qt::LeftButton);
   }
+  // What the command that was pressed last ends with.
   std::string Outcome() {
-    return QTest::qWaitFor([this] { return !outcome().text().isEmpty() && Button().isEnabled(); },
+    return QTest::qWaitFor([this] { return !outcome().text().isEmpty() && Button(kSend).isEnabled(); },
                            kGenerousMs)
                ? outcome().text().toStdString()
                : "none";
@@ -58,8 +77,11 @@ class RealLine : public testing::Test {
     return QTest::qWaitFor([this] { return !read_.empty() && QApplication::activeModalWidget() == nullptr; },
                            kGenerousMs);
   }
-  QAbstractButton& Button() {
-    return *program_->window.findChild<QAbstractButton*>(QStringLiteral("Command3_0"));
+  bool WaitForClosedPort() {
+    return QTest::qWaitFor([this] { return !program_->Serial1.PortOpen(); }, kGenerousMs);
+  }
+  QAbstractButton& Button(const char* name) {
+    return *program_->window.findChild<QAbstractButton*>(QString::fromLatin1(name));
   }
   QLabel& outcome() { return *program_->window.findChild<QLabel*>(QStringLiteral("lblProgress")); }
 
@@ -83,39 +105,137 @@ TEST_F(RealLine, Send_SucceedsWithAndWithoutEcho) {
     bench_.Start(options);
     if (!program_) StartProgram();
     ChooseComm1();
-    PressSend();
+    Press(kSend);
     EXPECT_EQ(Outcome(), "SUCCESS: Send Complete!") << options.join(QLatin1Char(' ')).toStdString();
     EXPECT_TRUE(read_.empty());
     bench_.Kill();
-    ASSERT_TRUE(QTest::qWaitFor([this] { return !program_->Serial1.PortOpen(); }, kGenerousMs));
+    ASSERT_TRUE(WaitForClosedPort());
   }
   EXPECT_TRUE(std::filesystem::exists(CommandLogPath()));
 }
 
 TEST_F(RealLine, NoisyUnits_AreHeardThroughTheNoise) {
-  bench_.Start({QStringLiteral("--fault"), QStringLiteral("rambling")});
+  bench_.Start(Fault("rambling"));
   StartProgram();
   ChooseComm1();
-  PressSend();
+  Press(kSend);
   EXPECT_EQ(Outcome(), "SUCCESS: Send Complete!");
+  Press(kGet);
+  EXPECT_EQ(Outcome(), "SUCCESS: Upload Complete");
+}
+
+// A unit whose ports 3 and 8 differ from what the window starts with; the others hold just that.
+TEST_F(RealLine, Get_TakesOverAllPortsOrNone) {
+  struct Case {
+    QStringList options;
+    const char* outcome;
+    std::vector<std::string> boxes;
+  };
+  const std::string retry = "Error:1  Uploading Configuration, Please retry";
+  const Case cases[] = {{Fault("missing-port"), "COMMAND FAILED!", {retry}},
+                        {QStringList{}, "SUCCESS: Upload Complete", {}},
+                        {QStringList{QStringLiteral("--no-echo")}, "SUCCESS: Upload Complete", {}},
+                        {Fault("scrambled"), "SUCCESS: Upload Complete", {}}};
+  for (const auto& [options, expected_outcome, boxes] : cases) {
+    SCOPED_TRACE(options.join(QLatin1Char(' ')).toStdString());
+    bench_.Start(options);
+    read_.clear();
+    StartProgram();
+    const ChannelTable before = program_->window.WorkingConfiguration();
+    ChooseComm1();
+    const auto set_port = [this](std::uint8_t port, std::uint8_t flags, std::uint8_t low, std::uint8_t high,
+                                 const std::array<std::uint8_t, 6>& others) {
+      program_->Serial1.cmdSetManyOptions(0x01, 0, kOptionServoPort, port, flags, low, high, others);
+    };
+    set_port(3, 159, 61, 239, {101, 199, 102, 198, 149, 151});
+    set_port(8, 1, 50, 250, {70, 230, 80, 220, 140, 160});
+
+    Press(kGet);
+    EXPECT_EQ(Outcome(), expected_outcome);
+    ASSERT_TRUE(boxes.empty() || WaitForBox());
+    EXPECT_EQ(read_, boxes);
+    ChannelTable expected = before;
+    if (boxes.empty()) {
+      expected.At(2) = {kPortPwm, {610, 2390}, {1010, 1990},    {1020, 1980},
+                        1490,     1510,        kPowerUpDefault, kLostCommNeutral};
+      expected.At(7) = {kPortServo, {500, 2500}, {700, 2300},          {800, 2200},
+                        1400,       1600,        kPowerUpFirstCommand, kLostCommStopPulse};
+    }
+    EXPECT_TRUE(program_->window.WorkingConfiguration() == expected);
+    bench_.Kill();
+  }
+}
+
+TEST_F(RealLine, ChangedId_IsWhereTheUnitAnswersFromThenOn) {
+  bench_.Start(kFactoryFresh);
+  StartProgram();
+  ChooseComm1();
+  QTest::keyClick(program_->window.findChild<QComboBox*>(QStringLiteral("CmbUnitID_1")), Qt::Key_A);
+  Press(kGet);
+  ASSERT_TRUE(WaitForBox());  // nobody is at 0A yet
+  Press(kChangeId);
+  EXPECT_EQ(Outcome(), "SUCCESS: UnitID set to '0A'");
+  Press(kGet);
+  EXPECT_EQ(Outcome(), "SUCCESS: Upload Complete");
+  EXPECT_EQ(read_.size(), 1u);
 }
 
 TEST_F(RealLine, UnpluggedInTheMiddle_IsToldOnceAndThePortWorksAfterReplugging) {
+  struct Case {
+    const char* button;
+    QStringList units;
+    QStringList fault;  // keeps the command running
+    const char* success;
+  };
+  for (const auto& [button, units, fault, success] :
+       {Case{kSend, {}, {}, "SUCCESS: Send Complete!"},
+        Case{kGet, {}, Fault("slow"), "SUCCESS: Upload Complete"},
+        Case{kChangeId, kFactoryFresh, Fault("mute"), "SUCCESS: UnitID set to '01'"}}) {
+    SCOPED_TRACE(success);
+    bench_.Start(units + fault);
+    read_.clear();
+    if (!program_) StartProgram();
+    ChooseComm1();
+    Press(button);
+    QTest::qWait(400);
+    ASSERT_FALSE(Button(button).isEnabled());  // it runs
+    bench_.Kill();
+    ASSERT_TRUE(WaitForBox());
+    EXPECT_EQ(outcome().text().toStdString(), "COMMAND FAILED!");
+    EXPECT_EQ(read_.size(), 1u);
+    EXPECT_NE(read_[0].find("Open of serial port 1 has failed"), std::string::npos) << read_[0];
+
+    bench_.Start(units);
+    ChooseComm1();
+    Press(button);
+    EXPECT_EQ(Outcome(), success);
+    bench_.Kill();
+    ASSERT_TRUE(WaitForClosedPort());
+  }
+}
+
+TEST_F(RealLine, UnpluggedInASweep_EndsItSilentlyAndItCanBeStartedAgain) {
   bench_.Start();
   StartProgram();
   ChooseComm1();
-  PressSend();
-  QTest::qWait(500);
-  bench_.Kill();
-  ASSERT_TRUE(WaitForBox());
-  EXPECT_EQ(outcome().text().toStdString(), "COMMAND FAILED!");
-  EXPECT_EQ(read_.size(), 1u);
-  EXPECT_NE(read_[0].find("Open of serial port 1 has failed"), std::string::npos) << read_[0];
-
-  bench_.Start();
+  QTest::mouseClick(program_->window.findChild<QWidget*>(QStringLiteral("ServoSimulator2_0")),
+                    Qt::LeftButton);
+  for (int run = 0; run < 2; ++run) {
+    Press(kSweep);
+    program_->Serial1.SentByteCount(true);
+    QTest::qWait(600);
+    EXPECT_GT(program_->Serial1.SentByteCount(false), 0);
+    EXPECT_EQ(Button(kSweep).text().toStdString(), "Stop");
+    bench_.Kill();
+    EXPECT_TRUE(WaitForClosedPort());
+    EXPECT_EQ(Button(kSweep).text().toStdString(), "Test");
+    QTest::qWait(300);  // no step comes any more
+    EXPECT_TRUE(read_.empty());
+    bench_.Start();
+  }
   ChooseComm1();
-  PressSend();
-  EXPECT_EQ(Outcome(), "SUCCESS: Send Complete!");
+  Press(kGet);
+  EXPECT_EQ(Outcome(), "SUCCESS: Upload Complete");
 }
 
 TEST_F(RealLine, UnpluggedWhileIdle_SaysNothingAndCostsNothing) {
@@ -123,7 +243,7 @@ TEST_F(RealLine, UnpluggedWhileIdle_SaysNothingAndCostsNothing) {
   StartProgram();
   ChooseComm1();
   bench_.Kill();
-  EXPECT_TRUE(QTest::qWaitFor([this] { return !program_->Serial1.PortOpen(); }, kGenerousMs));
+  EXPECT_TRUE(WaitForClosedPort());
   reader_.stop();
   const double before = CpuSeconds();
   QTest::qWait(1000);

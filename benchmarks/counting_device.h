@@ -1,0 +1,56 @@
+// CountingDevice: a serial device that counts what passes through it.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <functional>
+#include <span>
+#include <string>
+#include <utility>
+
+#include "platform/serial_device.h"
+
+namespace tendril {
+
+// Hands everything on to another device. On an echoing line the bytes that come in are all bytes on the wire,
+// each once.
+class CountingDevice final : public SerialDevice {
+ public:
+  // `device` must outlive this object.
+  explicit CountingDevice(SerialDevice& device) : device_(device) {}
+
+  void SetEventHandler(std::function<void(SerialEvent)> handler) override {
+    device_.SetEventHandler(std::move(handler));
+  }
+  bool Exists(std::int32_t number) const override { return device_.Exists(number); }
+  void SetSettings(const std::string& settings) override { device_.SetSettings(settings); }
+  void SetPortNumber(std::int32_t number) override { device_.SetPortNumber(number); }
+  void SetLineOptions(const LineOptions& options) override { device_.SetLineOptions(options); }
+  void Open() override { device_.Open(); }
+  void Close() noexcept override { device_.Close(); }
+  bool IsOpen() const override { return device_.IsOpen(); }
+  void SetReceiveThreshold(std::int32_t bytes) override { device_.SetReceiveThreshold(bytes); }
+  void SetTransmitThreshold(std::int32_t bytes) override { device_.SetTransmitThreshold(bytes); }
+  void SetRts(bool asserted) override { device_.SetRts(asserted); }
+  void Write(std::span<const std::uint8_t> bytes) override {
+    sent += bytes.size();
+    if (on_write) on_write(bytes);
+    device_.Write(bytes);
+  }
+  Bytes ReadAll() override {
+    Bytes bytes = device_.ReadAll();
+    received += bytes.size();
+    return bytes;
+  }
+  void ClearInput() override { received += device_.ReadAll().size(); }
+  std::size_t PendingOutput() const override { return device_.PendingOutput(); }
+
+  std::size_t sent = 0;
+  std::size_t received = 0;
+  std::function<void(std::span<const std::uint8_t>)> on_write;  // shown each packet when it is written
+
+ private:
+  SerialDevice& device_;
+};
+
+}  // namespace tendril

@@ -1,0 +1,101 @@
+// MeasuredWindow: the program's window with its real adapters, on a bench in a process of its own.
+#pragma once
+
+#include <QAbstractButton>
+#include <QApplication>
+#include <QComboBox>
+#include <QElapsedTimer>
+#include <QEventLoop>
+#include <QLabel>
+#include <QString>
+#include <QTimer>
+#include <stdexcept>
+#include <string>
+
+#include "app/qt_platform.h"
+#include "counting_device.h"
+#include "platform/posix/paths.h"
+#include "platform/qt/qt_serial_device.h"
+#include "serial/command_log.h"
+#include "serial/hw_serial.h"
+#include "support/bench_process.h"
+#include "ui/frm_new_servo_config.h"
+
+namespace tendril {
+
+// Steady, and of high resolution.
+class Stopwatch {
+ public:
+  Stopwatch() { timer_.start(); }
+  double Ms() const { return static_cast<double>(timer_.nsecsElapsed()) / 1e6; }
+
+ private:
+  QElapsedTimer timer_;
+};
+
+// Shown, and with Comm 1 open, from the start. Unit 01 is chosen and well-behaved.
+class MeasuredWindow {
+ public:
+  MeasuredWindow() {
+    bench_.Start();
+    window_.show();
+    auto& ports = Child<QComboBox>("cmbNYX");
+    ports.setCurrentIndex(1);
+    Q_EMIT ports.activated(1);
+    RunFor(kSettleMs);
+  }
+
+  // Raises std::runtime_error when the window has no such control.
+  template <typename Control>
+  Control& Child(const char* name) {
+    auto* child = window_.findChild<Control*>(QString::fromLatin1(name));
+    if (child == nullptr) throw std::runtime_error(std::string("The window has no ") + name);
+    return *child;
+  }
+
+  // Presses the button of a unit command and waits for its outcome. Returns how long that took in
+  // milliseconds; `device` has counted from the click to the outcome. Raises std::runtime_error unless the
+  // outcome is `success`.
+  double RunCommand(const char* button, const char* success) {
+    auto& outcome = Child<QLabel>("lblProgress");
+    outcome.clear();
+    RunFor(kSettleMs);  // what is still on the line does not belong to the command
+    device.ClearInput();
+    device.sent = device.received = 0;
+    const Stopwatch stopwatch;
+    Child<QAbstractButton>(button).click();
+    while (outcome.text().isEmpty() && stopwatch.Ms() < kLongestCommandMs) {
+      QApplication::processEvents(QEventLoop::WaitForMoreEvents);
+    }
+    const double taken_ms = stopwatch.Ms();
+    if (outcome.text() != QString::fromLatin1(success)) {
+      throw std::runtime_error("The command failed: " + outcome.text().toStdString());
+    }
+    return taken_ms;
+  }
+
+  // Runs the event loop for `ms` milliseconds.
+  static void RunFor(int ms) {
+    QEventLoop loop;
+    QTimer::singleShot(ms, Qt::PreciseTimer, &loop, [&loop] { loop.quit(); });
+    loop.exec();
+  }
+
+ private:
+  static constexpr int kSettleMs = 200;
+  static constexpr double kLongestCommandMs = 20000;
+
+  test::BenchProcess bench_;
+  QtPlatform platform_;
+  QtSerialDevice serial_{platform_.on_fault};
+
+ public:
+  CountingDevice device{serial_};
+
+ private:
+  FileCommandLog log_{CommandLogPath()};
+  HwSerial link_{device, platform_.timers, platform_.clock, log_};
+  frmNewServoConfig window_{link_, platform_.timers, platform_.boxes, {1, 0, 0}};
+};
+
+}  // namespace tendril
