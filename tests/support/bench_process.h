@@ -10,6 +10,7 @@
 #include <QStringList>
 #include <QTemporaryDir>
 #include <QThread>
+#include <filesystem>
 #include <stdexcept>
 
 namespace tendril::test {
@@ -26,6 +27,8 @@ class BenchProcess {
 
   // Starts the bench and waits until its device is there.
   void Start(const QStringList& options = {}) {
+    // The link of one that was killed; its device's name may belong to somebody else by now.
+    std::filesystem::remove(Link().toStdString());
     process_.setStandardOutputFile(QProcess::nullDevice());
     process_.start(QStringLiteral(TENDRIL_BENCH_PROGRAM), QStringList{QStringLiteral("--quiet")} + options);
     const QDeadlineTimer deadline(10000);
