@@ -12,9 +12,8 @@ namespace tendril {
 namespace {
 
 constexpr char kUpdateTip[] =
-    "Gives the unit on the line the chosen ID. Connect one unit only: every unit that hears it would take "
-    "the "
-    "same ID.";
+    "Gives the unit on the line the chosen ID. "
+    "Connect one unit only: every unit that hears it would take the same ID.";
 constexpr char kNoUnitZero[] = "A unit cannot have the ID 00: nothing could ever find it again.";
 
 }  // namespace

@@ -26,7 +26,7 @@ class ConnectionArea : public QWidget, public UnitTarget {
   // Lets port and unit be chosen only while no command runs.
   void ShowRunning(const RunningCommand& running);
 
-  // Who is told when the person has chosen another unit ID.
+  // Who is told when another unit ID is chosen.
   void SetUnitIdHandler(std::function<void()> handler) { unit_id_changed_ = std::move(handler); }
 
   bool PortChosen() const override;

@@ -105,7 +105,7 @@ QWidget* EditorArea::MakeMotionParameters(
   };
   constexpr std::array<TestPlace, LiveTest::kTestButtons> kTestPlaces{
       {{1, 1}, {4, 2}, {6, 1}, {0, 1}, {2, 1}}};
-  for (std::size_t test = 0; test < kTestPlaces.size(); ++test) {
+  for (const std::size_t test : {3u, 0u, 4u, 1u, 2u}) {  // from top to bottom, as the Tab key goes
     grid->addWidget(test_buttons[test], kTestPlaces[test].row, kTest, kTestPlaces[test].rows, 1);
   }
   grid->setColumnStretch(kName, 2);

@@ -26,8 +26,9 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
       ports_(link, boxes),
       connection_(new ConnectionArea(ports_)),
       progress_(new ProgressArea),
-      commands_(link, timers, boxes, *progress_, *connection_, working_,
-                {.starting = [this] { live_test_.MakeWay(); }, .replaced = [this] { ShowReplaced(); }}),
+      commands_(
+          link, timers, boxes, *progress_, *connection_, working_,
+          {.starting = [this] { return live_test_.MakeWay(); }, .replaced = [this] { ShowReplaced(); }}),
       command_area_(new CommandArea(commands_, *connection_, command_buttons_)),
       apply_boxes_(new ApplyBoxes),
       channels_(new ChannelStrip(working_)),
@@ -45,6 +46,7 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
   connection_->SetUnitIdHandler([this] { command_buttons_.ShowRunning(commands_.Running()); });
   channels_->SetSelectHandler([this](std::size_t channel) { SelectChannel(channel); });
   live_test_area_->Connect(live_test_);
+  ports_.SetOpeningHandler([this] { live_test_.OnTestButton(LiveTest::kNoButton); });
   StartUp(version);
 }
 

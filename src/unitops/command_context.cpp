@@ -9,8 +9,7 @@ bool MayStartCommand(const CommandContext& context) {
                         "No Port Selected", BoxIcon::kExclamation});
     return false;
   }
-  if (context.make_way) context.make_way();
-  return true;
+  return !context.make_way || context.make_way();
 }
 
 void EndAsFailed(CommandContext& context) {

@@ -19,12 +19,12 @@ struct CommandContext {
   CommandProgress& progress;
   RunningCommand& running;
   const UnitTarget& target;
-  // Called when a command is about to start, before it sends anything; may be empty. Raises nothing.
-  std::function<void()> make_way = {};
+  // Asked when a command is about to start, before it sends anything: false forbids it. May be empty; raises nothing.
+  std::function<bool()> make_way = {};
 };
 
 // Whether a unit command may start now: none runs, and a comm port is chosen. Tells the person when none is;
-// otherwise whoever moves a servo makes way.
+// otherwise whoever moves a servo makes way, or tells why not.
 bool MayStartCommand(const CommandContext& context);
 
 // Ends the running command as failed; the caller has stopped its timers, and shows a box afterwards.

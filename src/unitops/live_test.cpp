@@ -1,5 +1,6 @@
 #include "unitops/live_test.h"
 
+#include <algorithm>
 #include <string>
 #include <utility>
 
@@ -31,6 +32,9 @@ Microseconds SliderPulseWidth(const PulsePair& range, int slider) {
   return range[0] + RoundHalfToEven(SliderFraction(slider) * (range[1] - range[0]));
 }
 
+// A position as it is sent.
+std::int32_t Tenths(Microseconds position) { return RoundHalfToEven(position / 10.0); }
+
 const PulsePair& SweptRange(const ChannelConfig& values, int button) {
   switch (button) {
     case kSweepVirtualRange:
@@ -60,23 +64,21 @@ LiveTest::LiveTest(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes, co
         Guarded([this] { SendWaiting(); });
       })) {
   pace_timer_->SetInterval(kCommandOnLineMs);
-  link_.SetPortClosedHandler([this] {
-    waiting_.reset();
-    StopSweep();
-  });
+  link_.SetPortClosedHandler([this] { StopAll(); });
 }
 
 LiveTest::~LiveTest() { link_.SetPortClosedHandler(nullptr); }
 
-void LiveTest::Guarded(const std::function<void()>& action) {
+bool LiveTest::Guarded(const std::function<void()>& action) {
   try {
     action();
+    return true;
   } catch (...) {
     const std::string fault = DescribeCurrentFault();
-    waiting_.reset();
-    StopSweep();
+    StopAll();
     view_.ClearSliderSends();  // or the next movement would fail, and tell, all over again
     ShowCommError(boxes_, {}, fault);
+    return false;
   }
 }
 
@@ -110,6 +112,13 @@ void LiveTest::StopSweep() {
   for (int button = 0; button < kTestButtons; ++button) view_.ShowTestRunning(button, false);
   tmrTest_->SetEnabled(false);
   sweep_.reset();
+}
+
+// The same, and nothing waits to be sent any more.
+void LiveTest::StopAll() {
+  StopSweep();
+  pace_timer_->SetEnabled(false);
+  waiting_.reset();
 }
 
 void LiveTest::Step() {
@@ -154,14 +163,17 @@ void LiveTest::MoveSlider() {
   const ChannelConfig values = choice_.Values();
   const auto position_at = [&](int slider) { return SliderPulseWidth(values.VirtualRange, slider); };
   const auto [left_stop, right_stop] = values.VirtualStops;
+  // What is sent is rounded, and must lie inside too.
   const auto inside = [&](int slider) {
-    return position_at(slider) >= left_stop && position_at(slider) <= right_stop;
+    const Microseconds position = position_at(slider);
+    const Microseconds sent = Tenths(position) * 10;
+    return std::min(position, sent) >= left_stop && std::max(position, sent) <= right_stop;
   };
 
   int slider = view_.SliderValue();
   bool may_send = true;
   if (!inside(slider)) {
-    const int step = position_at(slider) < left_stop ? 1 : -1;
+    const int step = std::min(position_at(slider), Tenths(position_at(slider)) * 10) < left_stop ? 1 : -1;
     int pushed = slider + step;
     while (pushed >= 0 && pushed <= kSliderMaximum && !inside(pushed)) pushed += step;
     may_send = pushed >= 0 && pushed <= kSliderMaximum;
@@ -179,16 +191,14 @@ void LiveTest::OnSliderSends() {
   if (view_.SliderSends()) OnTestButton(kNoButton);
 }
 
-void LiveTest::MakeWay() {
-  try {
+bool LiveTest::MakeWay() {
+  return Guarded([this] {
     if (sweep_) {
       Press(*sweep_);
     } else {
       SendWaiting();
     }
-  } catch (...) {
-    waiting_.reset();  // what kept it from going out keeps the command too, which tells
-  }
+  });
 }
 
 // The position as the ports of the choice would be given it; nothing when nothing may be sent. Raises
@@ -196,7 +206,7 @@ void LiveTest::MakeWay() {
 std::optional<LiveTest::Command> LiveTest::LiveCommand(Microseconds position) const {
   const std::optional<std::size_t> channel = choice_.Channel();
   if (!channel || *channel >= kPortCount || link_.CommPort() == 0 || running_.Active()) return std::nullopt;
-  const std::int32_t tenths = RoundHalfToEven(position / 10.0);
+  const std::int32_t tenths = Tenths(position);
   if (tenths < kMinPulseWidth / 10 || tenths > kMaxPulseWidth / 10) {
     throw RuntimeError(kErrOverflow, "Overflow");
   }

@@ -96,10 +96,11 @@ class LiveTest {
   void OnSlider();
   // "Use Slider to Test Intensity Values" was ticked or cleared.
   void OnSliderSends();
-  // A unit command is about to start: a sweep ends as by its button, and nothing is left unsent.
-  void MakeWay();
+  // A unit command is about to start: a sweep ends as by its button, and nothing is left unsent. False: that failed,
+  // and the person has been told.
+  bool MakeWay();
 
-  // Where the arm was drawn last.
+  // Where the arm was drawn last, in microseconds.
   Microseconds ShownPosition() const { return shown_position_; }
 
  private:
@@ -111,10 +112,11 @@ class LiveTest {
     std::uint8_t position;  // tenths of the pulse width
   };
 
-  // Runs `action`; a fault stops everything here and is shown.
-  void Guarded(const std::function<void()>& action);
+  // Runs `action`; a fault stops everything here and is shown, and gives false.
+  bool Guarded(const std::function<void()>& action);
   void Press(int button);
   void StopSweep();
+  void StopAll();
   void Step();
   void MoveSlider();
   void ShowPosition(Microseconds position);

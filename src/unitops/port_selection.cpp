@@ -25,6 +25,7 @@ std::vector<std::string> PortSelection::ListCommPorts() {
 
 void PortSelection::Choose(std::size_t entry) {
   if (entry == 0 || entry >= port_table_.size()) return;
+  if (opening_) opening_();
   try {
     link_.SetCommPort(port_table_[entry]);
     link_.SetBaudRate(kNetworkBaudRate);

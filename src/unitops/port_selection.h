@@ -3,7 +3,9 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <functional>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "platform/message_boxes.h"
@@ -20,6 +22,9 @@ class PortSelection {
   // Looks for ports 1 to 25 and returns the lines of the list: "Select", then "Comm n" for each that exists.
   std::vector<std::string> ListCommPorts();
 
+  // Who is told when a port is about to be opened.
+  void SetOpeningHandler(std::function<void()> handler) { opening_ = std::move(handler); }
+
   // Opens the port of line `entry` at once. Line 0, "Select", leaves the port as it is. Shows a failure.
   void Choose(std::size_t entry);
 
@@ -28,6 +33,7 @@ class PortSelection {
 
   HwSerial& link_;
   MessageBoxes& boxes_;
+  std::function<void()> opening_;
   std::vector<std::int16_t> port_table_;  // the port number of each line; 0 for "Select"
 };
 

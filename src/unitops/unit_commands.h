@@ -23,8 +23,10 @@ class UnitCommands {
  public:
   // What the commands tell the window. Either may be empty; neither raises.
   struct Events {
-    std::function<void()> starting;  // a command is about to start, before it sends anything
-    std::function<void()> replaced;  // a get has just replaced the working configuration, and still runs
+    // A command is about to start, and has sent nothing yet. False: it must not; the person has been told why.
+    std::function<bool()> starting;
+    // A get has just replaced the working configuration, and still runs.
+    std::function<void()> replaced;
   };
 
   // Takes the link's poll replies. Everything handed in must outlive it.

@@ -73,6 +73,8 @@ TEST_F(Window, FreshStart_ShowsTheDefaultConfiguration) {
   EXPECT_FALSE(Find("frmProgress").isVisible());
   EXPECT_EQ(world_.time.RunningTimers(), 0);
   EXPECT_THAT(world_.boxes.shown, IsEmpty());
+  EXPECT_EQ(Text("lblPositionValue_0") + " " + Text("lblPositionValue_1") + " " + Text("txtPositionValue"),
+            "50 128 1500");
 
   for (int channel = 0; channel < 8; ++channel) {
     const ChannelConfig& record = window_->WorkingConfiguration().At(static_cast<std::size_t>(channel));
@@ -166,9 +168,17 @@ TEST_F(Window, Send_ByKeyboardAlone_LeavesTheFocusWhereItWas) {
   for (int tab = 0; tab < 3; ++tab) QTest::keyClick(QApplication::focusWidget(), Qt::Key_Tab);
   ASSERT_EQ(QApplication::focusWidget(), &Find("Command3_0"));
   QTest::keyClick(QApplication::focusWidget(), Qt::Key_Space);
+  EXPECT_EQ(QApplication::focusWidget(), window_.get()) << "on nothing that a key could set off";
   RunToTheEnd();
   EXPECT_EQ(Text("lblProgress"), "SUCCESS: Send Complete!");
   EXPECT_EQ(QApplication::focusWidget(), &Find("Command3_0"));
+
+  // Moved by the person meanwhile, it stays there.
+  Find<QLabel>("lblProgress").clear();
+  QTest::keyClick(QApplication::focusWidget(), Qt::Key_Space);
+  Find("ServoSimulator2_3").setFocus();
+  RunToTheEnd();
+  EXPECT_EQ(QApplication::focusWidget(), &Find("ServoSimulator2_3"));
 }
 
 // What the unit called below holds in all of its ports: neither a preset nor symmetrical.
@@ -249,6 +259,25 @@ TEST_F(Window, ChoosingAServo_MarksItAndShowsItsRecord) {
   EXPECT_EQ(Find("cmdTest_0").mapTo(window_.get(), QPoint()), before) << "the window jumps";
 }
 
+TEST_F(Window, ChoosingAServo_PutsItsArmWhereTheSliderStands) {
+  auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
+  unit.SetPortOptions(2, kOtherOptions);
+  ChooseByKeys("cmbNYX", 1);
+  Find<QSlider>("HScrollSendServoPosition").setValue(600);
+  // Without a channel the editor's own values stand in: 700 to 2300.
+  EXPECT_EQ(Text("txtPositionValue"), "1660");
+  EXPECT_EQ(Find<ServoSimulator>("ServoSimulator1").dial().arm_pulse(), 1660);
+  Click("Command3_1");
+  RunToTheEnd();
+  Find<QCheckBox>("chkSendSlideCommands").setChecked(true);
+  Click("ServoSimulator2_1");
+  world_.time.Advance(50);
+  EXPECT_EQ(Text("txtPositionValue"), "1500");  // 900 to 1900
+  EXPECT_EQ(unit.LivePosition(2), 150);
+  EXPECT_EQ(Find<ServoSimulator>("ServoSimulator2_1").dial().arm_pulse(), 1500);
+  EXPECT_EQ(Find<ServoSimulator>("ServoSimulator2_2").dial().arm_pulse(), 1660) << "not ticked";
+}
+
 TEST_F(Window, TestButtons_SweepTheServoDrawnAndReal) {
   auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
   ChooseByKeys("cmbNYX", 1);
@@ -273,7 +302,18 @@ TEST_F(Window, TestButtons_SweepTheServoDrawnAndReal) {
   Find<QCheckBox>("chkSendSlideCommands").click();
   EXPECT_TRUE(test.isEnabled());
 
-  // A closing window takes a running sweep with it.
+  // A unit command ends it, and so does choosing a port.
+  Click("cmdTest_1");
+  Click("Command3_1");
+  EXPECT_EQ(test.text().toStdString(), "Test");
+  RunToTheEnd();
+  Click("cmdTest_1");
+  ChooseByKeys("cmbNYX", 2);
+  EXPECT_EQ(test.text().toStdString(), "Test");
+
+  // A closing window takes a running sweep with it, also one that moves the drawing only.
+  link_.SetCommPort(0);
+  world_.time.Advance(4000);
   Click("cmdTest_0");
   EXPECT_TRUE(window_->close());
   world_.time.Advance(5000);

@@ -127,6 +127,30 @@ TEST_F(ChangeId, TwoUnitsAtFF_AreNotFoundAndKeepTheirIds) {
   EXPECT_EQ(other.id(), 0xFF);
 }
 
+TEST_F(ChangeId, RepliesOfOtherKinds_FindNoUnit) {
+  target_.unit = 0x0A;
+  commands_.ChangeId();
+  world_.time.Advance(210);
+  commands_.OnPollReply(true, 0xFF, 'n', Bytes(10, 1));
+  commands_.OnPollReply(true, 0xFF, '0', Bytes{1, 10});
+  RunToTheEnd();
+  ExpectFailure(kCannotFind);
+}
+
+TEST_F(ChangeId, LineWithoutEcho_IsNoDifferent) {
+  world_.bench.AddPort(5, {.echo = false});
+  auto& unit = world_.bench.Attach<VirtualUnit>(5, std::uint8_t{0xFF});
+  link_.SetCommPort(5);
+  target_.unit = 0xFE;  // which an echo would seem to confirm
+  commands_.ChangeId();
+  RunToTheEnd();
+  ExpectSuccess("SUCCESS: UnitID set to 'FE'");
+  EXPECT_EQ(unit.id(), 0xFE);
+  commands_.Get();
+  RunToTheEnd();
+  ExpectSuccess("SUCCESS: Upload Complete");
+}
+
 TEST_F(ChangeId, IdChosenMeanwhile_DoesNotCount) {
   auto& unit = Attach("", 0xFF);
   target_.unit = 0x0A;

@@ -74,7 +74,7 @@ class CommandTest : public testing::Test {
   RecordedProgress progress_;
   ChosenTarget target_;
   ChannelTable working_;
-  std::function<void()> on_starting_;
+  std::function<bool()> on_starting_;
   std::function<void()> on_replaced_;
   UnitCommands commands_{link_,
                          world_.time,
@@ -82,10 +82,7 @@ class CommandTest : public testing::Test {
                          progress_,
                          target_,
                          working_,
-                         {.starting =
-                              [this] {
-                                if (on_starting_) on_starting_();
-                              },
+                         {.starting = [this] { return !on_starting_ || on_starting_(); },
                           .replaced =
                               [this] {
                                 if (on_replaced_) on_replaced_();

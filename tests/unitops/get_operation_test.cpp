@@ -59,6 +59,8 @@ TEST_F(Get, Units_EndAsTheyReportTheirPorts) {
                          // Each reply is taken for the next poll's: the port is all that counts.
                          {"late", 9, true},
                          {"mute", 33, false},
+                         {"flooding", 2, false},  // talks all the time
+
                          {"missing-port", 33, false},
                          {"stuck-port", 33, false},
                          {"too-slow", 7, false},  // deaf while it talks
@@ -113,7 +115,22 @@ TEST_F(Get, PortBeyondTheEighth_EndsItAtOnce) {
     EXPECT_EQ(unit.polls_heard(), 1u);
     world_.bench.Detach(1, unit);
   }
+  // A port 0 cannot come over the line, where a zero byte ends the reply.
+  commands_.Get();
+  commands_.OnPollReply(true, 0x01, 'n', Bytes(10, 0));
+  ExpectFailure({"Upload error: Invalid Port Index Received = -1", "Error", BoxIcon::kExclamation});
   EXPECT_EQ(working_, before);
+}
+
+TEST_F(Get, RepliesOfOtherKinds_AreNotItsOwn) {
+  Attach("", 0x01);
+  for (const std::uint8_t kind : {'0', '*', '+', 'x'}) {
+    commands_.Get();
+    commands_.OnPollReply(true, 0x01, kind, Bytes(10, 9));
+    commands_.OnPollReply(false, 0x01, kind, {});
+    RunToTheEnd();
+    ExpectSuccess(kGetSuccess);
+  }
 }
 
 TEST_F(Get, PortsOfAFailedGet_DoNotCountInTheNext) {

@@ -21,7 +21,6 @@ struct FakeChoice final : public ChannelChoice {
   ChannelConfig values;
 };
 
-// The controls, which do what the real ones do: a slider or box that is set tells the test.
 struct FakeView final : public LiveTestView {
   void ShowTestRunning(int button, bool running) override {
     captions[static_cast<std::size_t>(button)] = running;
@@ -61,7 +60,7 @@ class Live : public CommandTest {
   static constexpr std::uint8_t kChannel3 = 4;
 
   Live() {
-    on_starting_ = [this] { test_.MakeWay(); };
+    on_starting_ = [this] { return test_.MakeWay(); };
     choice_.values = working_.At(2);
     world_.bench.Line(1).SetTap([this](const LineByte& byte) { Hear(byte); });
   }
@@ -179,6 +178,18 @@ TEST_F(Live, Buttons_SwitchMoveAndReset) {
   EXPECT_THAT(SentPositions(), ElementsAre(150, 155, 160, 165, 150, 155, 152, 150));
   EXPECT_THAT(pictures_.drawn, ElementsAre(1500, 1550, 1600, 1650, 1500, 1550, 1515, 1500));
 
+  // A sweep that was stopped on its way down begins upwards again.
+  sent_.clear();
+  choice_.values.VirtualStops = {1400, 1600};
+  test_.OnTestButton(1);
+  world_.time.Advance(1500);  // 155 160, and after the rest 155 150
+  test_.OnTestButton(1);
+  test_.OnTestButton(1);
+  world_.time.Advance(300);
+  EXPECT_THAT(SentPositions(), ElementsAre(150, 155, 160, 155, 150, 150, 150, 155));
+  test_.OnTestButton(1);
+  pictures_.drawn.clear();
+
   // No button: everything is reset, nothing is moved or sent.
   test_.OnTestButton(1);
   world_.time.Advance(260);
@@ -286,9 +297,14 @@ TEST_F(Live, Slider_IsPushedBackIntoTheStops) {
   };
   SetSliderSends(true);
   for (const Case& c : std::vector<Case>{
-           {{1000, 2000}, {1205, 1800}, 100, 205, 120},
-           {{1000, 2000}, {1205, 1800}, 205, 205, 120},
-           {{1000, 2000}, {1205, 1795}, 1000, 795, 180},
+           {{1000, 2000}, {1200, 1800}, 100, 200, 120},
+           {{1000, 2000}, {1200, 1800}, 200, 200, 120},
+           {{1000, 2000}, {1200, 1790}, 1000, 790, 179},
+           {{1000, 2000}, {1000, 1000}, 500, 0, 100},
+           // 1205 would go out as 1200, and 1795 as 1800.
+           {{1000, 2000}, {1205, 1795}, 100, 206, 121},
+           {{1000, 2000}, {1205, 1795}, 205, 206, 121},
+           {{1000, 2000}, {1205, 1795}, 1000, 794, 179},
            {{1000, 2000}, {900, 2100}, 0, 0, 100},
            {{1000, 1100}, {1050, 1100}, 0, 495, 105},  // 49.5 rounds to 50: several positions have one width
            // Nowhere to go: the stops lie beyond the range, are crossed over, or between two positions.
@@ -324,7 +340,7 @@ TEST_F(Live, Drag_KeepsUpWithTheHandAndEndsWhereItEnds) {
   EXPECT_EQ(unit.LivePosition(3), 180);
   EXPECT_LE(arrived_ms_.back() - moved_ms, 30u);
   EXPECT_GE(sent_.size(), 20u);
-  for (std::size_t i = 1; i < sent_.size(); ++i) EXPECT_GE(sent_[i].ms - sent_[i - 1].ms, 8u);
+  for (std::size_t i = 1; i < sent_.size(); ++i) EXPECT_GE(sent_[i].ms - sent_[i - 1].ms, 9u);
   EXPECT_EQ(world_.time.RunningTimers(), 0);
 }
 
@@ -355,10 +371,19 @@ TEST_F(Live, WaitingPosition_GoesOutWhateverComesNext) {
   SetSliderSends(true);
   drag();
   Attach("", 0x0A);
+  const std::size_t logged = world_.log.lines.size();
   commands_.Get();
+  EXPECT_EQ(world_.log.lines.size(), logged + 1) << "at once, before the command's own";
   RunToTheEnd();
   ExpectSuccess("SUCCESS: Upload Complete");
   EXPECT_THAT(SentPositions(), ElementsAre(140, 142));
+
+  // Unless the port has gone: that is not opened for it.
+  drag();
+  link_.SetPortOpen(false);
+  world_.time.Advance(1000);
+  EXPECT_FALSE(link_.PortOpen());
+  EXPECT_EQ(world_.time.RunningTimers(), 1) << "that of the progress display";
 }
 
 TEST_F(Live, UnitCommand_StopsASweepAndHasTheLineToItself) {
@@ -434,15 +459,25 @@ TEST_F(Live, Faults_StopEverythingAndAreToldOnce) {
     world_.bench.Replug(1);
   }
 
-  // At a step: the timer has stopped before the box opens.
+  // At a step, and at a position that waits: the timers have stopped before the box opens.
+  const auto expect_one_box = [&] {
+    world_.log.broken = true;
+    world_.boxes.while_open = [&] {
+      world_.time.Advance(2000);
+      EXPECT_EQ(world_.time.RunningTimers(), 0);
+    };
+    world_.time.Advance(100);
+    EXPECT_THAT(world_.boxes.Take(), ElementsAre(testing::Field(&BoxMessage::title, "Comm Error!")));
+    EXPECT_THAT(view_.captions, testing::Each(false));
+    world_.log.broken = false;
+  };
   test_.OnTestButton(0);
   world_.time.Advance(300);
-  world_.log.broken = true;
-  world_.boxes.while_open = [&] { world_.time.Advance(2000); };
-  world_.time.Advance(100);
-  EXPECT_THAT(world_.boxes.Take(), ElementsAre(testing::Field(&BoxMessage::title, "Comm Error!")));
-  EXPECT_THAT(view_.captions, testing::Each(false));
-  world_.log.broken = false;
+  expect_one_box();
+  SetSliderSends(true);
+  for (const int value : {400, 410, 420}) MoveSliderTo(value);
+  expect_one_box();
+  world_.boxes.while_open = nullptr;
 
   // A position that no unit knows never becomes a byte.
   sent_.clear();
@@ -455,14 +490,24 @@ TEST_F(Live, Faults_StopEverythingAndAreToldOnce) {
   EXPECT_THAT(sent_, IsEmpty());
 }
 
-TEST_F(Live, FaultOfMakingWay_IsLeftToTheCommand) {
+TEST_F(Live, FaultOfMakingWay_IsToldAndKeepsTheCommandFromStarting) {
+  auto& unit = Attach("", 0x01);
+  const auto expect_not_started = [&] {
+    world_.log.broken = true;
+    commands_.Get();
+    world_.time.Advance(1000);
+    EXPECT_THAT(world_.boxes.Take(), ElementsAre(testing::Field(&BoxMessage::title, "Comm Error!")));
+    EXPECT_EQ(unit.polls_heard(), 0u);
+    EXPECT_FALSE(commands_.Running().Active());
+    EXPECT_THAT(view_.captions, testing::Each(false));
+    world_.log.broken = false;
+  };
   test_.OnTestButton(0);
   world_.time.Advance(300);
-  world_.log.broken = true;
-  commands_.Send();
-  ASSERT_EQ(world_.boxes.shown.size(), 1u);
-  EXPECT_THAT(world_.boxes.shown[0].text, StartsWith("Download Failed\r\n"));
-  EXPECT_THAT(view_.captions, testing::Each(false));
+  expect_not_started();
+  SetSliderSends(true);
+  for (const int value : {400, 410, 420}) MoveSliderTo(value);
+  expect_not_started();
 }
 
 TEST_F(Live, SliderTakesOver_StopsASweepWhereItIs) {

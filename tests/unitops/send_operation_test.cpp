@@ -382,6 +382,22 @@ TEST_F(Send, StoppedByTheClosingWindow_SaysNothingMore) {
   commands_.Stop();
   world_.time.Advance(60000);
   EXPECT_THAT(world_.boxes.Take(), IsEmpty());
+
+  auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x02});
+  target_.unit = 0x02;
+  commands_.Send();
+  world_.time.Advance(200);  // the pause after the first port
+  commands_.Stop();
+  world_.time.Advance(60000);
+  EXPECT_EQ(unit.accepted_commands(), 1u);
+}
+
+TEST_F(Send, RepliesOfOtherKinds_AreNotItsOwn) {
+  world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
+  commands_.Send();
+  commands_.OnPollReply(true, 0x01, 'n', Bytes{1, 11});
+  RunToTheEnd();
+  ExpectSuccess();
 }
 
 }  // namespace
