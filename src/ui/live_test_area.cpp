@@ -90,7 +90,7 @@ LiveTestArea::LiveTestArea(QWidget* parent) : QGroupBox(QStringLiteral("Live Tes
   for (int button = 0; button < LiveTest::kTestButtons; ++button) {
     cmdTest_[static_cast<std::size_t>(button)] =
         Named(new QPushButton, ArrayName(QStringLiteral("cmdTest"), button));
-    ShowTestRunning(button, false);
+    LiveTestArea::ShowTestRunning(button, false);
   }
   EnableControls();
   ColourWarning();

@@ -162,18 +162,18 @@ void LiveTest::OnSlider() {
 void LiveTest::MoveSlider() {
   const ChannelConfig values = choice_.Values();
   const auto position_at = [&](int slider) { return SliderPulseWidth(values.VirtualRange, slider); };
-  const auto [left_stop, right_stop] = values.VirtualStops;
+  const PulsePair& stops = values.VirtualStops;
   // What is sent is rounded, and must lie inside too.
   const auto inside = [&](int slider) {
     const Microseconds position = position_at(slider);
     const Microseconds sent = Tenths(position) * 10;
-    return std::min(position, sent) >= left_stop && std::max(position, sent) <= right_stop;
+    return std::min(position, sent) >= stops[0] && std::max(position, sent) <= stops[1];
   };
 
   int slider = view_.SliderValue();
   bool may_send = true;
   if (!inside(slider)) {
-    const int step = std::min(position_at(slider), Tenths(position_at(slider)) * 10) < left_stop ? 1 : -1;
+    const int step = std::min(position_at(slider), Tenths(position_at(slider)) * 10) < stops[0] ? 1 : -1;
     int pushed = slider + step;
     while (pushed >= 0 && pushed <= kSliderMaximum && !inside(pushed)) pushed += step;
     may_send = pushed >= 0 && pushed <= kSliderMaximum;

@@ -7,7 +7,6 @@
 namespace tendril::test {
 namespace {
 
-using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::StartsWith;
 
