@@ -7,8 +7,20 @@
 #include "ui/controls.h"
 
 namespace tendril {
+namespace {
 
-ApplyBoxes::ApplyBoxes(QWidget* parent) : QGroupBox(QStringLiteral("Channels to Apply Changes"), parent) {
+QString Tip(std::size_t index) {
+  const QString who =
+      index < kPortCount ? QStringLiteral("channel %1").arg(index + 1) : QStringLiteral("all channels");
+  return QStringLiteral(
+             "Gives %1 the pulse values of the channel that is edited, and lets it follow its edits.")
+      .arg(who);
+}
+
+}  // namespace
+
+ApplyBoxes::ApplyBoxes(ChannelEditor& editor, std::function<void()> clicked, QWidget* parent)
+    : QGroupBox(QStringLiteral("Channels to Apply Changes"), parent), editor_(editor) {
   setObjectName(QStringLiteral("fraApplyChans"));
   QGridLayout* grid = MakeChannelColumns(this);
   for (int index = 0; index <= kAllColumn; ++index) {
@@ -18,7 +30,16 @@ ApplyBoxes::ApplyBoxes(QWidget* parent) : QGroupBox(QStringLiteral("Channels to 
                       ArrayName(QStringLiteral("chkUpdate"), index));
     box->setAccessibleName(all ? QStringLiteral("Apply changes to all channels")
                                : QStringLiteral("Apply changes to channel %1").arg(number));
-    Disable(box, QStringLiteral("Editing channels is not in this version yet."));
+    // "clicked" is the person's own; what the program ticks is none.
+    QObject::connect(box, &QAbstractButton::clicked, this, [this, index, all, clicked](bool ticked) {
+      if (all) {
+        editor_.ClickAllBox(ticked);
+      } else {
+        editor_.ClickApplyBox(static_cast<std::size_t>(index), ticked);
+      }
+      ShowTicks();
+      clicked();
+    });
     chkUpdate_[static_cast<std::size_t>(index)] = box;
     if (all) {
       grid->addWidget(box, 0, index);
@@ -26,7 +47,6 @@ ApplyBoxes::ApplyBoxes(QWidget* parent) : QGroupBox(QStringLiteral("Channels to 
     }
     auto* label = Named(new QLabel(number), ArrayName(QStringLiteral("lblUpdateNum"), index));
     label->setBuddy(box);
-    label->setEnabled(false);
     auto* pair = new QHBoxLayout;
     pair->addStretch();
     pair->addWidget(box);
@@ -34,12 +54,23 @@ ApplyBoxes::ApplyBoxes(QWidget* parent) : QGroupBox(QStringLiteral("Channels to 
     pair->addStretch();
     grid->addLayout(pair, 0, index);
   }
+  ShowEditing(true);
 }
 
-void ApplyBoxes::TickOnly(std::size_t channel) {
+void ApplyBoxes::ShowEditing(bool editing) {
   for (std::size_t index = 0; index < chkUpdate_.size(); ++index) {
-    chkUpdate_[index]->setChecked(index == channel);
+    chkUpdate_[index]->setEnabled(editing);
+    Describe(
+        chkUpdate_[index],
+        editing ? Tip(index) : QStringLiteral("In the summary each change goes to its own channel alone."));
   }
+}
+
+void ApplyBoxes::ShowTicks() {
+  for (std::size_t channel = 0; channel < kPortCount; ++channel) {
+    chkUpdate_[channel]->setChecked(editor_.Ticked(channel));
+  }
+  chkUpdate_.back()->setChecked(editor_.AllTicked());
 }
 
 }  // namespace tendril

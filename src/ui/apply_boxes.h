@@ -4,23 +4,26 @@
 #include <QCheckBox>
 #include <QGroupBox>
 #include <array>
-#include <cstddef>
+#include <functional>
 
 #include "config/channel_config.h"
+#include "ui/model/channel_editor.h"
 
 namespace tendril {
 
 // The frame `fraApplyChans`: a box for each channel, and "ALL".
 class ApplyBoxes : public QGroupBox {
  public:
-  explicit ApplyBoxes(QWidget* parent = nullptr);
+  // Clicks go to `editor`, which must outlive the area; `clicked` is called after each.
+  ApplyBoxes(ChannelEditor& editor, std::function<void()> clicked, QWidget* parent = nullptr);
 
-  // Whether the box of `channel`, 0 to 7, is ticked.
-  bool Ticked(std::size_t channel) const { return chkUpdate_[channel]->isChecked(); }
-  // Ticks the box of `channel` and clears all others.
-  void TickOnly(std::size_t channel);
+  // Shows which boxes are ticked.
+  void ShowTicks();
+  // Lets the boxes be clicked while the editor is shown.
+  void ShowEditing(bool editing);
 
  private:
+  ChannelEditor& editor_;
   std::array<QCheckBox*, kPortCount + 1> chkUpdate_{};  // the last is "ALL"
 };
 

@@ -3,6 +3,7 @@
 
 #include <QGroupBox>
 #include <QPushButton>
+#include <QStackedWidget>
 #include <array>
 #include <cstddef>
 #include <functional>
@@ -24,16 +25,22 @@ class ChannelStrip : public QGroupBox {
   void SetSelectHandler(std::function<void(std::size_t channel)> handler) { select_ = std::move(handler); }
   // Marks `channel` as the chosen one.
   void ShowSelected(std::size_t channel);
+  // Shows each channel as what its record's output kind says: a servo, or a button with the kind's name.
+  void ShowKinds();
   // Shows the record of `channel`, with the arm at `arm`.
   void UpdateSimulator(std::size_t channel, Microseconds arm);
   // Moves the arm alone.
   void MoveArm(std::size_t channel, Microseconds arm);
 
  private:
+  void ShowKind(std::size_t slot);
+
   const ChannelTable& working_;
   std::function<void(std::size_t)> select_;
   std::array<Microseconds, kPortCount> arms_{};  // where each arm was drawn last
   std::array<ServoSimulator*, kPortCount> ServoSimulator2_{};
+  // Each shows either of the two.
+  std::array<QStackedWidget*, kPortCount> cells_{};
   // What stands in the servo's place when the port drives no servo.
   std::array<QPushButton*, kPortCount> cmdDigitalOutput_{};
 };

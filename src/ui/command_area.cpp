@@ -36,8 +36,9 @@ void CommandButtons::ShowRunning(const RunningCommand& running) {
 }
 
 CommandArea::CommandArea(UnitCommands& commands, const UnitTarget& target, CommandButtons& buttons,
-                         QWidget* parent)
+                         std::function<void()> show_summary, QWidget* parent)
     : QWidget(parent),
+      cmdShowSummary_(Named(new QPushButton(QStringLiteral("Summar&y")), QStringLiteral("cmdShowSummary"))),
       cmdWriteConfig_(
           Named(new QPushButton(QStringLiteral("Export Config")), QStringLiteral("cmdWriteConfig"))),
       cmdReadConfig_(
@@ -59,19 +60,25 @@ CommandArea::CommandArea(UnitCommands& commands, const UnitTarget& target, Comma
   commands_row->setSpacing(5);
   for (QPushButton* button : {send, get, update}) commands_row->addWidget(button);
 
-  auto* summary = Named(new QPushButton(QStringLiteral("Summar&y")), QStringLiteral("cmdShowSummary"));
-  Disable(summary, QStringLiteral("The summary of all ports is not in this version yet."));
+  QObject::connect(cmdShowSummary_, &QAbstractButton::clicked, this, std::move(show_summary));
+  ShowSummaryButton(true);
 
   auto* row = new QHBoxLayout(this);
   row->setContentsMargins(0, 0, 0, 0);
   row->addWidget(frame);
   row->addStretch();
-  row->addWidget(summary, 0, Qt::AlignVCenter);
+  row->addWidget(cmdShowSummary_, 0, Qt::AlignVCenter);
   auto* files = new QVBoxLayout;
   files->setSpacing(3);
   files->addWidget(cmdWriteConfig_);
   files->addWidget(cmdReadConfig_);
   row->addLayout(files);
+}
+
+void CommandArea::ShowSummaryButton(bool enabled) {
+  cmdShowSummary_->setEnabled(enabled);
+  Describe(cmdShowSummary_, enabled ? QStringLiteral("Shows all eight channels in one table.")
+                                    : QStringLiteral("The summary is shown. \"Simulator\" goes back."));
 }
 
 void CommandArea::DisableExportAndImport() {

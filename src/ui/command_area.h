@@ -43,14 +43,19 @@ class CommandButtons {
 
 class CommandArea : public QWidget {
  public:
-  // `commands` and `target` must outlive the area; its buttons are added to `buttons`.
+  // `commands` and `target` must outlive the area; its buttons are added to `buttons`. `show_summary` is called when
+  // the summary is wanted.
   CommandArea(UnitCommands& commands, const UnitTarget& target, CommandButtons& buttons,
-              QWidget* parent = nullptr);
+              std::function<void()> show_summary, QWidget* parent = nullptr);
+
+  // "Summary" can be pressed while the summary is not shown.
+  void ShowSummaryButton(bool enabled);
 
   // Start-up: exporting and importing have no function.
   void DisableExportAndImport();
 
  private:
+  QAbstractButton* cmdShowSummary_;
   QAbstractButton* cmdWriteConfig_;
   QAbstractButton* cmdReadConfig_;
 };

@@ -1,11 +1,39 @@
 #include "ui/controls.h"
 
+#include <QAbstractButton>
 #include <QPalette>
+#include <QSignalBlocker>
 #include <QWheelEvent>
+#include <algorithm>
+
+#include "config/channel_config.h"
 
 namespace tendril {
 
 void CalmComboBox::wheelEvent(QWheelEvent* event) { event->ignore(); }
+
+CalmSpinBox::CalmSpinBox(QWidget* parent) : QSpinBox(parent) {
+  setKeyboardTracking(false);
+  setFocusPolicy(Qt::StrongFocus);
+  setSingleStep(10);
+  setSuffix(QStringLiteral(" µs"));
+  setRange(-BoundedValue::kWidest, BoundedValue::kWidest);
+  setFixedWidth(sizeHint().width());  // whatever its limits become, nothing around it moves
+}
+
+void CalmSpinBox::Show(const BoundedValue& value) {
+  const QSignalBlocker silent(this);
+  setRange(value.Minimum(), value.Maximum());
+  setValue(value.Value());
+}
+
+void CalmSpinBox::wheelEvent(QWheelEvent* event) {
+  if (hasFocus()) {
+    QSpinBox::wheelEvent(event);
+  } else {
+    event->ignore();
+  }
+}
 
 QString ArrayName(const QString& array, int index) { return QStringLiteral("%1_%2").arg(array).arg(index); }
 
@@ -28,6 +56,28 @@ QLabel* BoldLabel(const QString& text, QWidget* parent) {
   font.setBold(true);
   label->setFont(font);
   return label;
+}
+
+void CheckOnly(QButtonGroup& group, int id) {
+  group.setExclusive(false);  // an exclusive group does not let go of its last button
+  for (QAbstractButton* button : group.buttons()) button->setChecked(group.id(button) == id);
+  group.setExclusive(true);
+}
+
+QPoint WithinParent(const QWidget& panel, QPoint wanted) {
+  const QSize room = panel.parentWidget()->size() - panel.size();
+  return {std::max(0, std::min(wanted.x(), room.width())), std::max(0, std::min(wanted.y(), room.height()))};
+}
+
+QString OutputLabel(std::int16_t port_type) {
+  switch (port_type) {
+    case kPortDigital:
+      return QStringLiteral("DIGITAL\nPORT");
+    case kPortPwm:
+      return QStringLiteral("PWM\nPORT");
+    default:
+      return {};
+  }
 }
 
 bool IsDark(const QWidget& widget) {

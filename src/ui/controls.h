@@ -1,10 +1,16 @@
 // Small helpers that the areas of the window share.
 #pragma once
 
+#include <QButtonGroup>
 #include <QComboBox>
 #include <QLabel>
+#include <QPoint>
+#include <QSpinBox>
 #include <QString>
 #include <QWidget>
+#include <cstdint>
+
+#include "ui/model/bounded_value.h"
 
 namespace tendril {
 
@@ -12,6 +18,19 @@ namespace tendril {
 class CalmComboBox : public QComboBox {
  public:
   using QComboBox::QComboBox;
+
+ protected:
+  void wheelEvent(QWheelEvent* event) override;
+};
+
+// A spin box in microseconds. The wheel changes it only while it has the focus, and what is typed counts when it
+// is whole: at Enter, or when the focus leaves.
+class CalmSpinBox : public QSpinBox {
+ public:
+  explicit CalmSpinBox(QWidget* parent = nullptr);
+
+  // Shows a value and its limits. Runs no handler.
+  void Show(const BoundedValue& value);
 
  protected:
   void wheelEvent(QWheelEvent* event) override;
@@ -33,11 +52,23 @@ void Describe(QWidget* widget, const QString& what_it_does);
 // Disables the control; its tool tip says why.
 void Disable(QWidget* widget, const QString& why);
 
+// Checks the button of an exclusive group that has this id; none when no button has it. Runs no handler of clicks.
+void CheckOnly(QButtonGroup& group, int id);
+
 // A label in the theme's less prominent text colour.
 QLabel* DimLabel(const QString& text, QWidget* parent = nullptr);
 
 // A label in bold type.
 QLabel* BoldLabel(const QString& text, QWidget* parent = nullptr);
+
+// The unit of a form's measures is a fifteenth of a pixel.
+inline constexpr int kFormUnitsPerPixel = 15;
+
+// The place next to `wanted` at which `panel` lies wholly within its parent, as far as it fits.
+QPoint WithinParent(const QWidget& panel, QPoint wanted);
+
+// What a port that drives no servo is labelled with, on two lines; empty for a servo and for an unknown kind.
+QString OutputLabel(std::int16_t port_type);
 
 // Whether the palette in force has light text on a dark ground.
 bool IsDark(const QWidget& widget);

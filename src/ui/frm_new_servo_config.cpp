@@ -1,6 +1,8 @@
 #include "ui/frm_new_servo_config.h"
 
+#include <QAbstractSpinBox>
 #include <QCloseEvent>
+#include <QGuiApplication>
 #include <QHBoxLayout>
 #include <QScreen>
 #include <QScrollArea>
@@ -8,8 +10,7 @@
 #include <QVBoxLayout>
 #include <optional>
 
-#include "ui/actuals_frame.h"
-#include "ui/summary_area.h"
+#include "ui/freeze.h"
 
 namespace tendril {
 namespace {
@@ -17,27 +18,41 @@ namespace {
 constexpr QSize kFirstSize(1280, 800);
 // Where the content does not fit, the window scrolls.
 constexpr QSize kSmallestWindow(480, 360);
+// The table is filled, then seen.
+constexpr std::int32_t kSummaryScreenMs = 20;
 
 }  // namespace
 
 frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes,
                                      const Version& version)
     : link_(link),
+      timers_(timers),
       ports_(link, boxes),
       connection_(new ConnectionArea(ports_)),
       progress_(new ProgressArea),
-      commands_(
-          link, timers, boxes, *progress_, *connection_, working_,
-          {.starting = [this] { return live_test_.MakeWay(); }, .replaced = [this] { ShowReplaced(); }}),
-      command_area_(new CommandArea(commands_, *connection_, command_buttons_)),
-      apply_boxes_(new ApplyBoxes),
+      commands_(link, timers, boxes, *progress_, *connection_, working_,
+                {.starting =
+                     [this] {
+                       CommitTyping();
+                       return live_test_.MakeWay();
+                     },
+                 .replaced = [this] { OnReplaced(); }}),
+      command_area_(new CommandArea(commands_, *connection_, command_buttons_, [this] { ShowSummary(); })),
+      apply_boxes_(new ApplyBoxes(channel_editor_, [this] { OnApplied(); })),
       channels_(new ChannelStrip(working_)),
       live_test_area_(new LiveTestArea),
-      editor_(new EditorArea(working_, live_test_area_->TestButtons())),
+      editor_(new EditorArea(
+          channel_editor_, working_,
+          {.parameters = {.edited = [this](FollowUp follow_up) { OnEdited(follow_up); },
+                          .values_wanted = [this](const QWidget& label) { ShowActuals(label); }},
+           .choices = {.kind_chosen = [this](std::int16_t kind) { OnKindChosen(kind); },
+                       .preset_chosen = [this](std::size_t preset) { OnPresetChosen(preset); }}},
+          live_test_area_->TestButtons())),
       views_(new QStackedWidget),
-      simulators_(*channels_, *editor_, *apply_boxes_),
+      simulators_(*channels_, *editor_, channel_editor_),
       live_test_(link, timers, boxes, commands_.Running(), *connection_, *editor_, *live_test_area_,
                  simulators_),
+      tmrSummaryScreen_(timers.CreateTimer([this] { OnSummaryScreen(); })),
       shutdown_(
           link, timers, [](std::int16_t) {}, [this] { close(); }) {
   setObjectName(QStringLiteral("frmNewServoConfig"));
@@ -101,7 +116,7 @@ void frmNewServoConfig::StartUp(const Version& version) {
   editor_->SetUpSimulator();
   channels_->SetUpSimulators();
   connection_->FillUnitIds();
-  editor_->SetUpSpinButtons();
+  editor_->ShowEditor();
   progress_->ShowProgress(false);
   editor_->ListPresets();
   for (std::size_t slot = 0; slot < kPortCount; ++slot)
@@ -112,31 +127,126 @@ void frmNewServoConfig::StartUp(const Version& version) {
 }
 
 void frmNewServoConfig::SelectChannel(std::size_t channel) {
-  apply_boxes_->TickOnly(channel);
+  channel_editor_.SelectChannel(channel);
+  apply_boxes_->ShowTicks();
   channels_->ShowSelected(channel);
-  editor_->LoadChannel(channel);
+  ShowEditor();
   live_test_.OnSlider();
 }
 
-void frmNewServoConfig::ShowReplaced() {
-  if (const auto channel = editor_->Channel()) editor_->LoadChannel(*channel);
+void frmNewServoConfig::ShowEditor() {
+  Freeze freeze;
+  freeze.SetForm(this);
+  editor_->ShowEditor();
+  if (actuals_ != nullptr) actuals_->SetValues(channel_editor_.WorkingValues());
+}
+
+void frmNewServoConfig::ShowActuals(const QWidget& label) {
+  if (actuals_ != nullptr) actuals_->ShowActuals(label);
+}
+
+// The person has edited a parameter.
+void frmNewServoConfig::OnEdited(FollowUp follow_up) {
+  ShowEditor();
+  switch (follow_up) {
+    case FollowUp::kUpdateSimulators:
+      simulators_.UpdateSimulators(live_test_.ShownPosition());
+      break;
+    case FollowUp::kRefreshLivePosition:
+      live_test_.OnSlider();
+      break;
+  }
+}
+
+// The person has clicked an apply box.
+void frmNewServoConfig::OnApplied() {
+  if (channel_editor_.Channel()) simulators_.UpdateSimulators(live_test_.ShownPosition());
+}
+
+void frmNewServoConfig::OnKindChosen(std::int16_t kind) {
+  const auto channel = channel_editor_.Channel();
+  if (!channel) return;
+  channel_editor_.SetPortType(kind);
+  channels_->ShowKinds();
+  if (kind == kPortServo) {
+    SelectChannel(*channel);
+  } else {
+    ShowEditor();
+  }
+}
+
+void frmNewServoConfig::OnPresetChosen(std::size_t preset) {
+  QGuiApplication::setOverrideCursor(Qt::WaitCursor);
+  channel_editor_.ApplyPreset(kPresets.at(preset));
+  ShowRecords();
+  QGuiApplication::restoreOverrideCursor();
+}
+
+// The records were replaced: all that is seen of them is shown anew, and nothing is stored.
+void frmNewServoConfig::ShowRecords() {
+  channels_->ShowKinds();
+  ShowEditor();
   simulators_.UpdateAll();
   live_test_.OnSlider();
 }
 
+void frmNewServoConfig::OnReplaced() {
+  channel_editor_.ReloadChannel();
+  ShowRecords();
+  if (SummaryShown()) summary_->ShowRecords();
+}
+
+// What is being typed counts from now on: a key can set off what uses it without taking the focus away.
+void frmNewServoConfig::CommitTyping() {
+  if (auto* spin = qobject_cast<QAbstractSpinBox*>(focusWidget())) spin->interpretText();
+}
+
+void frmNewServoConfig::ShowSummary() {
+  CommitTyping();
+  live_test_.OnTestButton(LiveTest::kNoButton);
+  summary_->ShowRecords();
+  tmrSummaryScreen_->SetInterval(kSummaryScreenMs);
+  tmrSummaryScreen_->SetEnabled(true);
+}
+
+void frmNewServoConfig::OnSummaryScreen() {
+  tmrSummaryScreen_->SetEnabled(false);
+  views_->setCurrentWidget(summary_);
+  command_area_->ShowSummaryButton(false);
+  apply_boxes_->ShowEditing(false);
+  summary_->setFocus();
+}
+
+void frmNewServoConfig::ShowConfig() {
+  CommitTyping();
+  summary_->CloseNumberEntry();
+  OnReplaced();  // the summary has changed the records
+  views_->setCurrentIndex(0);
+  command_area_->ShowSummaryButton(true);
+  apply_boxes_->ShowEditing(true);
+}
+
+bool frmNewServoConfig::SummaryShown() const {
+  return summary_ != nullptr && views_->currentWidget() == summary_;
+}
+
 void frmNewServoConfig::ShowRunning() {
   const RunningCommand& running = commands_.Running();
-  if (running.Active()) focus_before_command_ = focusWidget();
+  // Disabling takes the focus off what was used last, and it would fall on some servo or button, and scroll there. It
+  // rests on the window meanwhile and then goes back, unless the person has moved it since.
+  if (running.Active()) {
+    focus_before_command_ = focusWidget();
+    setFocus();
+  }
   connection_->ShowRunning(running);
   command_buttons_.ShowRunning(running);
   progress_->ShowRunning(running);
   live_test_area_->ShowRunning(running);
-  // Disabling takes the focus off what was used last, and it would fall on some servo or button. It rests on the
-  // window meanwhile and then goes back, unless the person has moved it since.
+  if (!focus_before_command_) return;
   if (running.Active()) {
-    if (focusWidget() != focus_before_command_) setFocus();
+    if (focus_before_command_->isEnabled()) focus_before_command_->setFocus();
     focus_in_command_ = focusWidget();
-  } else if (focus_before_command_ && focusWidget() == focus_in_command_) {
+  } else if (focusWidget() == focus_in_command_) {
     focus_before_command_->setFocus();
   }
 }
@@ -152,11 +262,13 @@ bool frmNewServoConfig::eventFilter(QObject* object, QEvent* event) {
 }
 
 void frmNewServoConfig::MakeUnseenParts() {
-  auto* summary = new SummaryArea(commands_, command_buttons_, views_);
-  summary->SetRangeCaptions(QStringLiteral("1000--2000"));
-  views_->addWidget(summary);
-  new ActualsFrame(this);  // the window owns it
-  ShowRunning();           // the buttons that came
+  summary_ = new SummaryArea(
+      commands_, command_buttons_, timers_, working_, [this] { ShowConfig(); }, views_);
+  summary_->SetRangeCaptions(QStringLiteral("1000--2000"));
+  views_->addWidget(summary_);
+  actuals_ = new ActualsFrame(timers_, *this);
+  actuals_->SetValues(channel_editor_.WorkingValues());
+  ShowRunning();  // the buttons that came
 }
 
 void frmNewServoConfig::closeEvent(QCloseEvent* event) {

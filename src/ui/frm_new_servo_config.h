@@ -6,19 +6,24 @@
 #include <QString>
 #include <QWidget>
 #include <cstddef>
+#include <cstdint>
+#include <memory>
 
 #include "config/channel_config.h"
 #include "platform/message_boxes.h"
 #include "platform/timer.h"
 #include "serial/hw_serial.h"
+#include "ui/actuals_frame.h"
 #include "ui/apply_boxes.h"
 #include "ui/channel_strip.h"
 #include "ui/command_area.h"
 #include "ui/connection_area.h"
 #include "ui/editor_area.h"
 #include "ui/live_test_area.h"
+#include "ui/model/channel_editor.h"
 #include "ui/progress_area.h"
 #include "ui/simulators.h"
+#include "ui/summary_area.h"
 #include "unitops/live_test.h"
 #include "unitops/port_selection.h"
 #include "unitops/shutdown.h"
@@ -52,12 +57,26 @@ class frmNewServoConfig : public QWidget {
   void LayOut();
   void StartUp(const Version& version);
   void SelectChannel(std::size_t channel);
-  void ShowReplaced();
+  void ShowEditor();
+  void ShowActuals(const QWidget& label);
+  void OnEdited(FollowUp follow_up);
+  void OnApplied();
+  void OnKindChosen(std::int16_t kind);
+  void OnPresetChosen(std::size_t preset);
+  void ShowRecords();
+  void OnReplaced();
+  void CommitTyping();
+  void ShowSummary();
+  void OnSummaryScreen();
+  void ShowConfig();
+  bool SummaryShown() const;
   void ShowRunning();
   void MakeUnseenParts();
 
   HwSerial& link_;
+  TimerFactory& timers_;
   ChannelTable working_;
+  ChannelEditor channel_editor_{working_};
   PortSelection ports_;
   CommandButtons command_buttons_;
 
@@ -71,6 +90,9 @@ class frmNewServoConfig : public QWidget {
   LiveTestArea* live_test_area_;
   EditorArea* editor_;
   QStackedWidget* views_;
+  // Made after the first paint.
+  SummaryArea* summary_ = nullptr;
+  ActualsFrame* actuals_ = nullptr;
 
   Simulators simulators_;
   LiveTest live_test_;
@@ -78,6 +100,7 @@ class frmNewServoConfig : public QWidget {
   QPointer<QWidget> focus_before_command_;
   QPointer<QWidget> focus_in_command_;
 
+  std::unique_ptr<Timer> tmrSummaryScreen_;
   Shutdown shutdown_;
 };
 

@@ -2,8 +2,8 @@
 
 namespace tendril {
 
-Simulators::Simulators(ChannelStrip& channels, EditorArea& editor, const ApplyBoxes& apply_boxes)
-    : channels_(channels), editor_(editor), apply_boxes_(apply_boxes) {}
+Simulators::Simulators(ChannelStrip& channels, EditorArea& editor, const ChannelEditor& ticks)
+    : channels_(channels), editor_(editor), ticks_(ticks) {}
 
 void Simulators::UpdateAll() {
   // A servo's arcs and marker are measured from the neutral position that it had before: a record with another one
@@ -17,7 +17,7 @@ void Simulators::UpdateAll() {
 void Simulators::UpdateSimulators(Microseconds arm) {
   arm_ = arm;
   for (std::size_t slot = 0; slot < kPortCount; ++slot) {
-    if (apply_boxes_.Ticked(slot)) channels_.UpdateSimulator(slot, arm);
+    if (ticks_.Ticked(slot)) channels_.UpdateSimulator(slot, arm);
   }
   editor_.UpdateSimulator(arm);
 }

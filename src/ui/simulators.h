@@ -2,9 +2,9 @@
 #pragma once
 
 #include "config/channel_config.h"
-#include "ui/apply_boxes.h"
 #include "ui/channel_strip.h"
 #include "ui/editor_area.h"
+#include "ui/model/channel_editor.h"
 #include "unitops/live_test.h"
 
 namespace tendril {
@@ -13,7 +13,7 @@ namespace tendril {
 class Simulators : public ServoPictures {
  public:
   // All must outlive it.
-  Simulators(ChannelStrip& channels, EditorArea& editor, const ApplyBoxes& apply_boxes);
+  Simulators(ChannelStrip& channels, EditorArea& editor, const ChannelEditor& ticks);
 
   // Shows all records anew: at the start, and after anything that replaces them.
   void UpdateAll();
@@ -24,7 +24,7 @@ class Simulators : public ServoPictures {
  private:
   ChannelStrip& channels_;
   EditorArea& editor_;
-  const ApplyBoxes& apply_boxes_;
+  const ChannelEditor& ticks_;
   Microseconds arm_ = kCentrePulseWidth;
 };
 

@@ -1,44 +1,51 @@
 #include "ui/summary_area.h"
 
 #include <QFrame>
-#include <QGridLayout>
 #include <QHBoxLayout>
+#include <QKeyEvent>
 #include <QPushButton>
 #include <QRadioButton>
-#include <QSpinBox>
-#include <array>
+#include <QVBoxLayout>
+#include <utility>
 
-#include "config/channel_config.h"
 #include "ui/controls.h"
 
 namespace tendril {
 namespace {
 
-constexpr char kNotYet[] = "The summary of all ports is not in this version yet.";
+// Columns: an edge, the channel, its five values, three options for power-up, four for lost communications, an edge.
+constexpr int kChannelColumn = 1;
+constexpr int kValueColumn = 2;
+constexpr int kPowerUpColumn = 7;
+constexpr int kLostCommColumn = 10;
+constexpr int kLastColumn = 14;
+constexpr int kEdgeWidth = 4;
+constexpr int kChannelWidth = 56;
+constexpr int kValueWidth = 70;
+constexpr int kOptionWidth = 74;
 
-// Columns: the channel, its five values, three options for power-up, four for lost communications.
-constexpr int kValueColumn = 1;
-constexpr int kPowerUpColumn = 6;
-constexpr int kLostCommColumn = 9;
-constexpr int kColumns = 13;
-constexpr int kValueWidth = 80;
-constexpr int kOptionWidth = 56;
+// Lines: two of the header, the channels, the trailer.
+constexpr int kHeaderLines = 2;
+constexpr int kTrailerLine = kHeaderLines + static_cast<int>(kPortCount);
+constexpr int kTallestTable = 500;
 
+// Captions are broken into lines, so that the columns can be narrow.
 struct Value {
   const char* caption;
-  const char* box;
-  bool range;
+  const char* text;
+  SummaryField field;
 };
-constexpr std::array<Value, 5> kValues{{{"Actual Range", "txtSumActualRange", true},
-                                        {"Virtual Range", "txtSumVirtualRange", true},
-                                        {"Virtual Stops", "txtSumStopRange", true},
-                                        {"Neutral\nPosition", "txtSumNeutralPosition", false},
-                                        {"Default\nPosition", "txtSumDefaultPosition", false}}};
+constexpr std::size_t kRangeValues = 3;  // the first ones show two pulse widths
+constexpr std::array<Value, 5> kValues{
+    {{"Actual\nRange", "txtSumActualRange", SummaryField::kActualRange},
+     {"Virtual\nRange", "txtSumVirtualRange", SummaryField::kVirtualRange},
+     {"Virtual\nStops", "txtSumStopRange", SummaryField::kStops},
+     {"Neutral\nPosition", "txtSumNeutralPosition", SummaryField::kNeutralTrim},
+     {"Default\nPosition", "txtSumDefaultPosition", SummaryField::kDefaultPosition}}};
 struct Option {
   const char* caption;
   const char* button;
 };
-// Broken where the columns are narrow.
 constexpr std::array<Option, 7> kOptions{{{"Move to\nDefault\nPosition", "optSumPUDefault"},
                                           {"Move to\nNeutral\nPosition", "optSumPUNeutral"},
                                           {"Start Pulse\non First\nCommand", "optSumPUFirstCmd"},
@@ -51,124 +58,216 @@ QString OnOneLine(const char* caption) {
   return QString::fromUtf8(caption).replace(QLatin1Char('\n'), QLatin1Char(' '));
 }
 
-// The columns that header, rows and trailer have in common.
-QGridLayout* MakeColumns(QWidget* frame) {
-  auto* grid = new QGridLayout(frame);
-  grid->setContentsMargins(6, 0, 6, 0);
-  grid->setColumnMinimumWidth(0, kValueWidth);
-  for (int column = kValueColumn; column < kColumns; ++column) {
-    grid->setColumnMinimumWidth(column, column < kPowerUpColumn ? kValueWidth : kOptionWidth);
-    grid->setColumnStretch(column, 1);
+// What lies in the columns does not make them wider.
+void SetUpColumns(QGridLayout& table) {
+  table.setContentsMargins(0, 0, 0, 0);
+  table.setHorizontalSpacing(4);
+  table.setColumnMinimumWidth(0, kEdgeWidth);
+  table.setColumnMinimumWidth(kLastColumn, kEdgeWidth);
+  table.setColumnMinimumWidth(kChannelColumn, kChannelWidth);
+  for (int column = kValueColumn; column < kLastColumn; ++column) {
+    table.setColumnMinimumWidth(column, column < kPowerUpColumn ? kValueWidth : kOptionWidth);
+    table.setColumnStretch(column, 1);
   }
-  return grid;
+}
+
+// The frame of one or more lines, behind what stands in them.
+QFrame* AddFrame(QGridLayout& table, const QString& name, int line, int lines) {
+  auto* frame = Named(new QFrame, name);
+  table.addWidget(frame, line, 0, lines, kLastColumn + 1);
+  return frame;
+}
+
+void LeaveWidthToColumn(QWidget* widget) {
+  widget->setSizePolicy(QSizePolicy::Ignored, widget->sizePolicy().verticalPolicy());
 }
 
 QLabel* MakeCaption(const char* text) {
   auto* caption = BoldLabel(QString::fromUtf8(text));
-  caption->setAlignment(Qt::AlignCenter);
+  caption->setAlignment(Qt::AlignHCenter | Qt::AlignBottom);
+  LeaveWidthToColumn(caption);
   return caption;
 }
 
 }  // namespace
 
-SummaryArea::SummaryArea(UnitCommands& commands, CommandButtons& buttons, QWidget* parent) : QWidget(parent) {
+SummaryArea::SummaryArea(UnitCommands& commands, CommandButtons& buttons, TimerFactory& timers,
+                         ChannelTable& working, std::function<void()> back, QWidget* parent)
+    : QWidget(parent), working_(working), editor_(working) {
   auto* column = new QVBoxLayout(this);
   column->setContentsMargins(0, 0, 0, 0);
-  column->addWidget(MakeHeader());
-  for (int channel = 0; channel < static_cast<int>(kPortCount); ++channel)
-    column->addWidget(MakeRow(channel));
-  column->addWidget(MakeTrailer());
-
-  column->addLayout(MakeButtons(commands, buttons));
+  auto* table_area = new QWidget;
+  table_area->setMaximumHeight(kTallestTable);
+  column->addWidget(table_area, 1);
+  auto& table = *new QGridLayout(table_area);
+  SetUpColumns(table);
+  AddHeader(table);
+  for (int channel = 0; channel < static_cast<int>(kPortCount); ++channel) AddRow(table, channel);
+  AddTrailer(table);
+  column->addLayout(MakeButtons(commands, buttons, std::move(back)));
   column->addStretch();
-  MakeNumberEntry();
+  entry_ = new NumberEntry(
+      editor_, timers, [this](std::size_t channel) { ShowTexts(channel); }, this);
 }
 
-QLayout* SummaryArea::MakeButtons(UnitCommands& commands, CommandButtons& buttons) {
+QLayout* SummaryArea::MakeButtons(UnitCommands& commands, CommandButtons& buttons,
+                                  std::function<void()> back) {
   // The same actions as those of the unit commands above.
   auto* send = Named(new QPushButton(QStringLiteral("Send to Tendril")), QStringLiteral("Command3_3"));
   buttons.Add(send, kSendTip, [&commands] { commands.Send(); });
   auto* get = Named(new QPushButton(QStringLiteral("Get from Tendril")), QStringLiteral("Command3_4"));
   buttons.Add(get, kGetTip, [&commands] { commands.Get(); });
-  auto* back = Named(new QPushButton(QStringLiteral("Simulator")), QStringLiteral("cmdShowConfig"));
-  Disable(back, QString::fromUtf8(kNotYet));
+  auto* simulator = Named(new QPushButton(QStringLiteral("Si&mulator")), QStringLiteral("cmdShowConfig"));
+  Describe(simulator, QStringLiteral("Shows the servos and the editor again."));
+  QObject::connect(simulator, &QAbstractButton::clicked, this, std::move(back));
   auto* row = new QHBoxLayout;
   row->addStretch();
-  for (QPushButton* button : {send, get, back}) row->addWidget(button);
+  for (QPushButton* button : {send, get, simulator}) row->addWidget(button);
   return row;
 }
 
-// The panel in which a value of the table is changed; hidden until a value is pressed.
-void SummaryArea::MakeNumberEntry() {
-  auto* panel = Named(new QFrame(this), QStringLiteral("fraNumberEntry"));
-  panel->setFrameShape(QFrame::StyledPanel);
-  panel->setAutoFillBackground(true);
-  panel->hide();
-  auto* grid = new QGridLayout(panel);
-  grid->addWidget(Named(BoldLabel({}), QStringLiteral("lblDisplay")), 0, 0, 1, 2);
-  for (int index = 0; index < 2; ++index) {
-    auto* spin = Named(new QSpinBox, ArrayName(QStringLiteral("spnSumValue"), index));
-    spin->setAccessibleName(index == 0 ? QStringLiteral("New value") : QStringLiteral("New right stop"));
-    Disable(spin, QString::fromUtf8(kNotYet));
-    grid->addWidget(spin, 1, index);
-    grid->addWidget(Named(new QLabel, ArrayName(QStringLiteral("lblSumValue"), index)), 2, index);
-  }
-}
-
-QWidget* SummaryArea::MakeHeader() {
-  auto* header = Named(new QFrame, QStringLiteral("frmSumHeader"));
-  QGridLayout* grid = MakeColumns(header);
-  grid->addWidget(MakeCaption("Actual Motion Parameters in µs"), 0, kValueColumn, 1,
+void SummaryArea::AddHeader(QGridLayout& table) {
+  AddFrame(table, QStringLiteral("frmSumHeader"), 0, kHeaderLines);
+  table.addWidget(MakeCaption("Actual Motion Parameters in µs"), 0, kValueColumn, 1,
                   kPowerUpColumn - kValueColumn);
-  grid->addWidget(MakeCaption("Power Up Params"), 0, kPowerUpColumn, 2, kLostCommColumn - kPowerUpColumn);
-  grid->addWidget(MakeCaption("Lost Comm Params"), 0, kLostCommColumn, 2, kColumns - kLostCommColumn);
-  for (int value = 0; value < static_cast<int>(kValues.size()); ++value) {
-    grid->addWidget(MakeCaption(kValues[static_cast<std::size_t>(value)].caption), 1, kValueColumn + value);
-  }
-  return header;
-}
-
-QWidget* SummaryArea::MakeRow(int channel) {
-  auto* row = Named(new QFrame, ArrayName(QStringLiteral("frmSumTable"), channel));
-  row->setFrameShape(QFrame::StyledPanel);
-  QGridLayout* grid = MakeColumns(row);
-  const QString name = QStringLiteral("CHAN %1").arg(channel + 1);
-  grid->addWidget(Named(BoldLabel(name), ArrayName(QStringLiteral("lblSumChannel"), channel)), 0, 0);
+  table.addWidget(MakeCaption("Power Up Params"), 0, kPowerUpColumn, 2, kLostCommColumn - kPowerUpColumn);
+  table.addWidget(MakeCaption("Lost Comm Params"), 0, kLostCommColumn, 2, kLastColumn - kLostCommColumn);
   int column = kValueColumn;
-  for (const Value& value : kValues) {
-    auto* box = Named(new QLineEdit, ArrayName(QString::fromUtf8(value.box), channel));
-    box->setReadOnly(true);
-    box->setAlignment(Qt::AlignCenter);
-    box->setAccessibleName(name + QStringLiteral(", ") + OnOneLine(value.caption));
-    Disable(box, QString::fromUtf8(kNotYet));
-    if (value.range) range_boxes_.push_back(box);
-    grid->addWidget(box, 0, column++);
-  }
-  for (const Option& option : kOptions) {
-    auto* button = Named(new QRadioButton, ArrayName(QString::fromUtf8(option.button), channel));
-    const QString group =
-        column < kLostCommColumn ? QStringLiteral("power up") : QStringLiteral("lost communications");
-    button->setAccessibleName(QStringLiteral("%1, %2: %3").arg(name, group, OnOneLine(option.caption)));
-    Disable(button, QString::fromUtf8(kNotYet));
-    grid->addWidget(button, 0, column++, Qt::AlignCenter);
-  }
-  return row;
+  for (const Value& value : kValues) table.addWidget(MakeCaption(value.caption), 1, column++);
 }
 
-QWidget* SummaryArea::MakeTrailer() {
-  auto* trailer = Named(new QFrame, QStringLiteral("frmSumTrailer"));
-  QGridLayout* grid = MakeColumns(trailer);
+void SummaryArea::AddRow(QGridLayout& table, int channel) {
+  Row& row = rows_[static_cast<std::size_t>(channel)];
+  const int line = kHeaderLines + channel;
+  QFrame* frame = AddFrame(table, ArrayName(QStringLiteral("frmSumTable"), channel), line, 1);
+  frame->setFrameShape(QFrame::StyledPanel);
+  frame->setSizePolicy(QSizePolicy::Preferred, QSizePolicy::Expanding);
+  const QString name = QStringLiteral("CHAN %1").arg(channel + 1);
+  table.addWidget(Named(BoldLabel(name), ArrayName(QStringLiteral("lblSumChannel"), channel)), line,
+                  kChannelColumn);
+  const auto keep_place = [](QWidget* widget) {
+    QSizePolicy policy = widget->sizePolicy();
+    policy.setRetainSizeWhenHidden(true);
+    widget->setSizePolicy(policy);
+  };
+  int column = kValueColumn;
+  for (std::size_t value = 0; value < kValues.size(); ++value) {
+    const QString caption = OnOneLine(kValues[value].caption);
+    auto* text = Named(new QLineEdit, ArrayName(QString::fromUtf8(kValues[value].text), channel));
+    text->setReadOnly(true);
+    text->setAlignment(Qt::AlignCenter);
+    text->setAccessibleName(name + QStringLiteral(", ") + caption);
+    Describe(text, QStringLiteral("%1 of channel %2, in µs. Press on it, or Enter, to change it.")
+                       .arg(caption)
+                       .arg(channel + 1));
+    text->installEventFilter(this);
+    LeaveWidthToColumn(text);
+    keep_place(text);
+    table.addWidget(text, line, column++);
+    row.texts[value] = text;
+  }
+
+  row.power_up = new QButtonGroup(this);
+  row.lost_comm = new QButtonGroup(this);
+  for (const Option& option : kOptions) {
+    const bool power_up = column < kLostCommColumn;
+    QButtonGroup& group = power_up ? *row.power_up : *row.lost_comm;
+    auto* button = Named(new QRadioButton, ArrayName(QString::fromUtf8(option.button), channel));
+    const QString what = power_up ? QStringLiteral("power up") : QStringLiteral("lost communications");
+    button->setAccessibleName(QStringLiteral("%1, %2: %3").arg(name, what, OnOneLine(option.caption)));
+    Describe(button, button->accessibleName());
+    group.addButton(button, static_cast<int>(group.buttons().size()) + 1);
+    keep_place(button);
+    table.addWidget(button, line, column++, Qt::AlignCenter);
+    row.options.push_back(button);
+  }
+  const auto slot = static_cast<std::size_t>(channel);
+  QObject::connect(row.power_up, &QButtonGroup::idClicked, this, [this, slot](int id) {
+    entry_->Close();
+    working_.At(slot).PowerUPOpt = id;
+  });
+  QObject::connect(row.lost_comm, &QButtonGroup::idClicked, this, [this, slot](int id) {
+    entry_->Close();
+    working_.At(slot).LostCommOption = id;
+  });
+
+  row.lblSumDIOPWM = Named(BoldLabel({}), ArrayName(QStringLiteral("lblSumDIOPWM"), channel));
+  row.lblSumDIOPWM->setAlignment(Qt::AlignCenter);
+  row.lblSumDIOPWM->hide();
+  table.addWidget(row.lblSumDIOPWM, line, kValueColumn, 1, kLastColumn - kValueColumn);
+}
+
+void SummaryArea::ShowRecords() {
+  entry_->Close();
+  for (std::size_t channel = 0; channel < kPortCount; ++channel) {
+    editor_.Normalise(channel);
+    ShowRow(channel);
+  }
+}
+
+void SummaryArea::ShowRow(std::size_t channel) {
+  const ChannelConfig& record = working_.At(channel);
+  const Row& row = rows_[channel];
+  const bool servo = record.PortType == kPortServo;
+  for (QLineEdit* text : row.texts) text->setVisible(servo);
+  for (QAbstractButton* option : row.options) option->setVisible(servo);
+  row.lblSumDIOPWM->setVisible(!servo);
+  row.lblSumDIOPWM->setText(record.PortType == kPortDigital ? QStringLiteral("Digital")
+                            : record.PortType == kPortPwm   ? QStringLiteral("PWM")
+                                                            : QString());
+  CheckOnly(*row.power_up, record.PowerUPOpt);
+  CheckOnly(*row.lost_comm, record.LostCommOption);
+  ShowTexts(channel);
+}
+
+void SummaryArea::ShowTexts(std::size_t channel) {
+  const ChannelConfig& record = working_.At(channel);
+  const auto range = [](const PulsePair& pair) { return QStringLiteral("%1-%2").arg(pair[0]).arg(pair[1]); };
+  const std::array<QString, kFields> texts{
+      range(record.ActualRange), range(record.VirtualRange), range(record.VirtualStops),
+      QString::number(record.NeutralPosition), QString::number(record.DefaultPosition)};
+  for (std::size_t value = 0; value < texts.size(); ++value)
+    rows_[channel].texts[value]->setText(texts[value]);
+}
+
+bool SummaryArea::eventFilter(QObject* object, QEvent* event) {
+  bool opens = event->type() == QEvent::MouseButtonPress;
+  if (event->type() == QEvent::KeyPress) {
+    const int key = static_cast<QKeyEvent*>(event)->key();
+    opens = key == Qt::Key_Return || key == Qt::Key_Enter || key == Qt::Key_Space;
+  }
+  if (!opens) return QWidget::eventFilter(object, event);
+  OpenEntryOf(*object);
+  return true;
+}
+
+void SummaryArea::OpenEntryOf(QObject& text) {
+  for (std::size_t channel = 0; channel < kPortCount; ++channel) {
+    for (std::size_t value = 0; value < kValues.size(); ++value) {
+      QLineEdit* candidate = rows_[channel].texts[value];
+      if (candidate == &text) entry_->OpenNumberEntry(channel, kValues[value].field, *candidate);
+    }
+  }
+}
+
+void SummaryArea::AddTrailer(QGridLayout& table) {
+  AddFrame(table, QStringLiteral("frmSumTrailer"), kTrailerLine, 1);
   for (int option = 0; option < static_cast<int>(kOptions.size()); ++option) {
     auto* caption = Named(DimLabel(QString::fromUtf8(kOptions[static_cast<std::size_t>(option)].caption)),
                           ArrayName(QStringLiteral("lblParameters"), option));
     caption->setAlignment(Qt::AlignHCenter | Qt::AlignTop);
-    grid->addWidget(caption, 0, kPowerUpColumn + option);
+    QFont small = caption->font();
+    small.setPointSizeF(small.pointSizeF() * 0.9);
+    caption->setFont(small);
+    LeaveWidthToColumn(caption);
+    table.addWidget(caption, kTrailerLine, kPowerUpColumn + option);
   }
-  return trailer;
 }
 
 void SummaryArea::SetRangeCaptions(const QString& caption) {
-  for (QLineEdit* box : range_boxes_) box->setText(caption);
+  for (const Row& row : rows_) {
+    for (std::size_t value = 0; value < kRangeValues; ++value) row.texts[value]->setText(caption);
+  }
 }
 
 }  // namespace tendril

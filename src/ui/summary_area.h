@@ -1,34 +1,69 @@
 // SummaryArea: all eight channels in one table.
 #pragma once
 
+#include <QAbstractButton>
+#include <QButtonGroup>
+#include <QGridLayout>
 #include <QLabel>
 #include <QLineEdit>
-#include <QVBoxLayout>
+#include <QString>
 #include <QWidget>
+#include <array>
+#include <cstddef>
+#include <functional>
 #include <vector>
 
+#include "config/channel_config.h"
+#include "platform/timer.h"
 #include "ui/command_area.h"
+#include "ui/model/summary_editor.h"
+#include "ui/number_entry.h"
 #include "unitops/unit_commands.h"
 
 namespace tendril {
 
-// A header, a row for each channel and a trailer, in common columns, with the unit commands below.
+// A header, a row for each channel and a trailer, in common columns, with the unit commands below. A value is changed
+// by pressing on its text, or with Enter; a choice by its button.
 class SummaryArea : public QWidget {
  public:
-  // `commands` must outlive the area; its buttons are added to `buttons`.
-  SummaryArea(UnitCommands& commands, CommandButtons& buttons, QWidget* parent = nullptr);
+  // `commands` and `working`, the records that are shown, must outlive the area; its buttons are added to `buttons`.
+  // `back` is called when the simulator is wanted again.
+  SummaryArea(UnitCommands& commands, CommandButtons& buttons, TimerFactory& timers, ChannelTable& working,
+              std::function<void()> back, QWidget* parent = nullptr);
 
   // Start-up: what the range boxes read before the table is first shown.
   void SetRangeCaptions(const QString& caption);
+  // Brings all records into their bounds, and shows them.
+  void ShowRecords();
+  // Closes the number entry, if it is open.
+  void CloseNumberEntry() { entry_->Close(); }
+
+ protected:
+  bool eventFilter(QObject* object, QEvent* event) override;
 
  private:
-  QWidget* MakeHeader();
-  QWidget* MakeRow(int channel);
-  QWidget* MakeTrailer();
-  QLayout* MakeButtons(UnitCommands& commands, CommandButtons& buttons);
-  void MakeNumberEntry();
+  static constexpr std::size_t kFields = 5;
 
-  std::vector<QLineEdit*> range_boxes_;
+  struct Row {
+    std::array<QLineEdit*, kFields> texts{};
+    std::vector<QAbstractButton*> options;
+    QButtonGroup* power_up = nullptr;  // the buttons' ids are the record's values
+    QButtonGroup* lost_comm = nullptr;
+    QLabel* lblSumDIOPWM = nullptr;
+  };
+
+  void AddHeader(QGridLayout& table);
+  void AddRow(QGridLayout& table, int channel);
+  void AddTrailer(QGridLayout& table);
+  QLayout* MakeButtons(UnitCommands& commands, CommandButtons& buttons, std::function<void()> back);
+  void ShowRow(std::size_t channel);
+  void ShowTexts(std::size_t channel);
+  void OpenEntryOf(QObject& text);
+
+  ChannelTable& working_;
+  SummaryEditor editor_;
+  std::array<Row, kPortCount> rows_;
+  NumberEntry* entry_;
 };
 
 }  // namespace tendril

@@ -1,64 +1,22 @@
 // The real window on the offscreen platform, in simulated time: what a click or a key does.
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
-
 #include <QAbstractButton>
 #include <QAccessible>
 #include <QCheckBox>
-#include <QComboBox>
 #include <QGroupBox>
-#include <QLabel>
 #include <QScrollArea>
 #include <QSet>
 #include <QSlider>
 #include <QSpinBox>
-#include <QTest>
 #include <QWheelEvent>
-#include <memory>
-#include <string>
 
 #include "bench/faulty_units.h"
 #include "simulator/servo_simulator.h"
-#include "support/simulated_world.h"
-#include "ui/frm_new_servo_config.h"
+#include "window_fixture.h"
 
 namespace tendril::test {
 namespace {
 
 using testing::IsEmpty;
-
-class Window : public testing::Test {
- protected:
-  Window() {
-    window_->show();
-    [[maybe_unused]] const bool exposed = QTest::qWaitForWindowExposed(window_.get());
-    QTest::qWait(0);  // what is not seen at first is made after the first paint
-  }
-
-  template <typename Widget = QWidget>
-  Widget& Find(const char* name) {
-    auto* widget = window_->findChild<Widget*>(QString::fromUtf8(name));
-    if (widget == nullptr) throw std::logic_error(std::string("no control named ") + name);
-    return *widget;
-  }
-  std::string Text(const char* label) { return Find<QLabel>(label).text().toStdString(); }
-  void Click(const char* button) { QTest::mouseClick(&Find(button), Qt::LeftButton); }
-  // Chooses a line of a list with the keyboard, as a person without a mouse does.
-  void ChooseByKeys(const char* list, int line) {
-    auto& box = Find<QComboBox>(list);
-    box.setFocus();
-    while (box.currentIndex() < line) QTest::keyClick(&box, Qt::Key_Down);
-    while (box.currentIndex() > line) QTest::keyClick(&box, Qt::Key_Up);
-  }
-  void RunToTheEnd() {
-    ASSERT_TRUE(world_.time.AdvanceUntil([&] { return !Text("lblProgress").empty(); }, 20000));
-  }
-
-  SimulatedWorld world_;
-  HwSerial link_{*world_.device, world_.time, world_.time, world_.log};
-  std::unique_ptr<frmNewServoConfig> window_ =
-      std::make_unique<frmNewServoConfig>(link_, world_.time, world_.boxes, Version{3, 2, 1});
-};
 
 TEST_F(Window, FreshStart_ShowsTheDefaultConfiguration) {
   EXPECT_EQ(window_->windowTitle().toStdString(), "Kelvane Tendril Utility v3.2.1");
@@ -71,6 +29,7 @@ TEST_F(Window, FreshStart_ShowsTheDefaultConfiguration) {
   EXPECT_FALSE(Find("cmdReadConfig").isEnabled());
   EXPECT_TRUE(Find("fraApplyChans").isVisible());
   EXPECT_FALSE(Find("frmProgress").isVisible());
+  world_.time.Advance(1000);  // the pop-up of physical values hides itself once, shown or not
   EXPECT_EQ(world_.time.RunningTimers(), 0);
   EXPECT_THAT(world_.boxes.shown, IsEmpty());
   EXPECT_EQ(Text("lblPositionValue_0") + " " + Text("lblPositionValue_1") + " " + Text("txtPositionValue"),

@@ -1,0 +1,192 @@
+#include "ui/model/channel_editor.h"
+
+#include <algorithm>
+
+namespace tendril {
+namespace {
+
+constexpr int kMaxHalfWidth = 1000;
+
+// Sets only the fields that belong to `parameter`.
+void StoreOwnFields(Parameter parameter, const ChannelConfig& from, ChannelConfig& to) {
+  switch (parameter) {
+    case Parameter::kActualRange:
+      to.ActualRange = from.ActualRange;
+      break;
+    case Parameter::kVirtualRange:
+      to.VirtualRange = from.VirtualRange;
+      break;
+    case Parameter::kNeutralTrim:
+      to.NeutralPosition = from.NeutralPosition;
+      break;
+    case Parameter::kLeftStop:
+      to.VirtualStops[0] = from.VirtualStops[0];
+      break;
+    case Parameter::kRightStop:
+      to.VirtualStops[1] = from.VirtualStops[1];
+      break;
+    case Parameter::kDefaultPosition:
+      to.DefaultPosition = from.DefaultPosition;
+      break;
+  }
+}
+
+FollowUp FollowUpOf(Parameter parameter) {
+  switch (parameter) {
+    case Parameter::kVirtualRange:
+    case Parameter::kLeftStop:
+    case Parameter::kRightStop:
+      return FollowUp::kRefreshLivePosition;
+    case Parameter::kActualRange:
+    case Parameter::kNeutralTrim:
+    case Parameter::kDefaultPosition:
+      break;
+  }
+  return FollowUp::kUpdateSimulators;
+}
+
+}  // namespace
+
+ChannelEditor::ChannelEditor(ChannelTable& working) : working_(working) {
+  const auto start = [this](Parameter parameter, int minimum, int maximum, int value) {
+    SpinOf(parameter).SetLimits(minimum, maximum);
+    SpinOf(parameter).SetValue(value);
+  };
+  start(Parameter::kActualRange, 0, kMaxHalfWidth, 900);
+  start(Parameter::kVirtualRange, 0, kMaxHalfWidth, 800);
+  start(Parameter::kLeftStop, -800, 0, -750);
+  start(Parameter::kRightStop, 0, 800, 750);
+  start(Parameter::kNeutralTrim, -200, 200, 0);
+  start(Parameter::kDefaultPosition, -750, 750, 0);
+  StoreMotion({.actual_half_width = 900,
+               .virtual_half_width = 800,
+               .trim = 0,
+               .left_stop = -750,
+               .right_stop = 750,
+               .default_position = 0},
+              values_);
+}
+
+void ChannelEditor::RecalcParameters() {
+  BoundedValue& virtual_range = SpinOf(Parameter::kVirtualRange);
+  BoundedValue& trim = SpinOf(Parameter::kNeutralTrim);
+  BoundedValue& left_stop = SpinOf(Parameter::kLeftStop);
+  BoundedValue& right_stop = SpinOf(Parameter::kRightStop);
+  BoundedValue& default_position = SpinOf(Parameter::kDefaultPosition);
+  Motion motion{.actual_half_width = Spin(Parameter::kActualRange).Value(),
+                .virtual_half_width = virtual_range.Value(),
+                .trim = trim.Value(),
+                .left_stop = left_stop.Value(),
+                .right_stop = right_stop.Value(),
+                .default_position = default_position.Value()};
+
+  motion.LimitVirtualRange();
+  virtual_range.SetValue(motion.virtual_half_width);
+  virtual_range.SetMaximum(motion.actual_half_width);
+
+  motion.LimitTrim();
+  trim.SetValue(motion.trim);
+  trim.SetLimits(-motion.TrimRoom(), motion.TrimRoom());
+
+  motion.LimitStops();
+  left_stop.SetValue(motion.left_stop);
+  left_stop.SetMinimum(-motion.virtual_half_width);
+  right_stop.SetValue(motion.right_stop);
+  right_stop.SetMaximum(motion.virtual_half_width);
+
+  motion.LimitDefault();
+  default_position.SetMinimum(motion.left_stop);
+  default_position.SetMaximum(motion.right_stop);
+  default_position.SetValue(motion.default_position);
+
+  StoreMotion(motion, values_);
+}
+
+FollowUp ChannelEditor::Change(Parameter parameter, int value) {
+  SpinOf(parameter).SetValue(value);
+  RecalcParameters();
+  ForEachTarget([&](ChannelConfig& record) { StoreOwnFields(parameter, values_, record); });
+  return FollowUpOf(parameter);
+}
+
+template <typename Store>
+void ChannelEditor::ForEachTarget(Store&& store) {
+  if (!channel_) return;
+  for (std::size_t channel = 0; channel < kPortCount; ++channel) {
+    if (channel == channel_ || ticked_[channel]) store(working_.At(channel));
+  }
+}
+
+void ChannelEditor::ClickApplyBox(std::size_t channel, bool ticked) {
+  ticked_.at(channel) = ticked;
+  StoreInTicked();
+}
+
+void ChannelEditor::ClickAllBox(bool ticked) {
+  all_ticked_ = ticked;
+  ticked_.fill(ticked);
+  StoreInTicked();
+}
+
+void ChannelEditor::StoreInTicked() {
+  if (!channel_) return;
+  ticked_[*channel_] = true;
+  ForEachTarget([this](ChannelConfig& record) { CopyPulseFields(values_, record); });
+}
+
+void ChannelEditor::SelectChannel(std::size_t channel) {
+  if (channel_) CopyPulseFields(values_, working_.At(*channel_));
+  all_ticked_ = false;
+  ticked_.fill(false);
+  channel_ = channel;
+  ticked_.at(channel) = true;
+  ReloadChannel();
+}
+
+void ChannelEditor::ReloadChannel() {
+  if (channel_) Load(working_.At(*channel_));
+}
+
+void ChannelEditor::Load(const ChannelConfig& record) {
+  const Motion motion = MotionOf(record);
+  SpinOf(Parameter::kActualRange).Reset(motion.actual_half_width);
+  SpinOf(Parameter::kVirtualRange).Reset(motion.virtual_half_width);
+  SpinOf(Parameter::kNeutralTrim).Reset(motion.trim);
+  SpinOf(Parameter::kLeftStop).Reset(motion.left_stop);
+  SpinOf(Parameter::kRightStop).Reset(motion.right_stop);
+  SpinOf(Parameter::kDefaultPosition).Reset(motion.default_position);
+  RecalcParameters();
+
+  // The limits that follow no other parameter. A record from elsewhere may lie beyond them: that is kept until the
+  // person changes it.
+  const auto at_least = [this](Parameter parameter, int minimum) {
+    SpinOf(parameter).SetMinimum(std::min(minimum, Spin(parameter).Value()));
+  };
+  const auto at_most = [this](Parameter parameter, int maximum) {
+    SpinOf(parameter).SetMaximum(std::max(maximum, Spin(parameter).Value()));
+  };
+  at_least(Parameter::kActualRange, 0);
+  at_most(Parameter::kActualRange, kMaxHalfWidth);
+  at_least(Parameter::kVirtualRange, 0);
+  at_most(Parameter::kLeftStop, 0);
+  at_least(Parameter::kRightStop, 0);
+}
+
+void ChannelEditor::SetPortType(std::int16_t kind) {
+  if (channel_) working_.At(*channel_).PortType = kind;
+}
+
+void ChannelEditor::SetPowerUpOption(std::int32_t option) {
+  ForEachTarget([&](ChannelConfig& record) { record.PowerUPOpt = option; });
+}
+
+void ChannelEditor::SetLostCommOption(std::int32_t option) {
+  ForEachTarget([&](ChannelConfig& record) { record.LostCommOption = option; });
+}
+
+void ChannelEditor::ApplyPreset(const Preset& preset) {
+  for (std::size_t channel = 0; channel < kPortCount; ++channel) SetFromPreset(preset, working_.At(channel));
+  Load(working_.At(channel_.value_or(0)));
+}
+
+}  // namespace tendril

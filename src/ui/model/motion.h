@@ -1,0 +1,47 @@
+// How the motion parameters of a channel lie to each other, and how a record holds them.
+//
+//   actual half width a     ActualRange = 1500 -/+ a: always about the centre
+//   virtual half width v    at most a
+//   trim t                  NeutralPosition = 1500 + t; between -m and +m, the room m = a - v
+//   stops L, R              relative to the neutral position, at least -v and at most +v
+//   default D               relative to the neutral position, between the stops
+//
+// The trim moves virtual range, stops and default together.
+#pragma once
+
+#include "config/channel_config.h"
+
+namespace tendril {
+
+// All in microseconds.
+struct Motion {
+  int actual_half_width = 0;
+  int virtual_half_width = 0;
+  int trim = 0;
+  int left_stop = 0;
+  int right_stop = 0;
+  int default_position = 0;
+
+  // The room that the trim has, to each side.
+  int TrimRoom() const { return actual_half_width - virtual_half_width; }
+
+  // Each brings its parameter into the bounds that the ones before it set. In this order.
+  void LimitVirtualRange();
+  void LimitTrim();
+  void LimitStops();
+  void LimitDefault();
+
+  friend bool operator==(const Motion&, const Motion&) = default;
+};
+
+// Half of the distance between the ends of `range`, halves rounded to even.
+int HalfWidth(const PulsePair& range);
+// The parameters as `record` gives them, whether they keep the bounds or not. Stops and default are measured
+// from the record's own neutral position, so that loading and storing it leaves it as it was.
+Motion MotionOf(const ChannelConfig& record);
+// Sets the eight pulse fields of `record`, and no other.
+void StoreMotion(const Motion& motion, ChannelConfig& record);
+// Copies the eight pulse fields, and no other.
+void CopyPulseFields(const ChannelConfig& from, ChannelConfig& to);
+
+}  // namespace tendril

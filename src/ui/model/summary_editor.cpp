@@ -1,0 +1,128 @@
+#include "ui/model/summary_editor.h"
+
+namespace tendril {
+
+void SummaryEditor::Normalise(std::size_t channel) { ApplySummaryEntry(channel, std::nullopt); }
+
+void SummaryEditor::OpenNumberEntry(std::size_t channel, SummaryField field) {
+  const ChannelConfig& record = working_.At(channel);
+  entry_ = Entry{channel, field};
+  for (BoundedValue& spin : spins_) spin.Reset();
+  const Motion motion = MotionOf(record);
+  const int actual_width = record.ActualRange[1] - record.ActualRange[0];
+  const int virtual_width = record.VirtualRange[1] - record.VirtualRange[0];
+  const int half = motion.virtual_half_width;
+  const auto start = [](BoundedValue& spin, int minimum, int maximum, int value) {
+    spin.SetMinimum(minimum);
+    spin.SetMaximum(maximum);
+    spin.SetValue(value);
+  };
+  switch (field) {
+    case SummaryField::kActualRange:
+      start(spins_[0], 0, 1000, motion.actual_half_width);
+      break;
+    case SummaryField::kVirtualRange:
+      start(spins_[0], 0, actual_width, half);
+      break;
+    case SummaryField::kStops:
+      start(spins_[0], -half, 0, motion.left_stop);
+      start(spins_[1], 0, half, motion.right_stop);
+      break;
+    case SummaryField::kDefaultPosition:
+      start(spins_[0], -half, half, motion.default_position);
+      break;
+    case SummaryField::kNeutralTrim:
+      start(spins_[0], -(actual_width - virtual_width), actual_width - virtual_width, motion.trim);
+      break;
+  }
+}
+
+void SummaryEditor::ChangeEntry(std::size_t index, int value) {
+  if (!entry_) return;
+  spins_[index].SetValue(value);
+  ApplySummaryEntry(entry_->channel, entry_->field);
+}
+
+void SummaryEditor::ApplySummaryEntry(std::size_t channel, std::optional<SummaryField> field) {
+  ChannelConfig& record = working_.At(channel);
+  Motion motion = MotionOf(record);
+
+  if (field == SummaryField::kActualRange) motion.actual_half_width = spins_[0].Value();
+
+  if (field == SummaryField::kVirtualRange) motion.virtual_half_width = spins_[0].Value();
+  motion.LimitVirtualRange();
+  if (field == SummaryField::kVirtualRange) {
+    spins_[0].SetValue(motion.virtual_half_width);
+    spins_[0].SetMaximum(motion.actual_half_width);
+  }
+
+  if (field == SummaryField::kNeutralTrim) motion.trim = spins_[0].Value();
+  motion.LimitTrim();
+  if (field == SummaryField::kNeutralTrim) {
+    spins_[0].SetValue(motion.trim);
+    spins_[0].SetLimits(-motion.TrimRoom(), motion.TrimRoom());
+  }
+
+  // Stops and default stay where they are: they are measured anew, from the neutral position as it is now.
+  const Microseconds neutral = kCentrePulseWidth + motion.trim;
+  motion.left_stop = field == SummaryField::kStops ? spins_[0].Value() : record.VirtualStops[0] - neutral;
+  motion.right_stop = field == SummaryField::kStops ? spins_[1].Value() : record.VirtualStops[1] - neutral;
+  motion.LimitStops();
+  if (field == SummaryField::kStops) {
+    spins_[0].SetValue(motion.left_stop);
+    spins_[0].SetMinimum(-motion.virtual_half_width);
+    spins_[1].SetValue(motion.right_stop);
+    spins_[1].SetMaximum(motion.virtual_half_width);
+  }
+
+  motion.default_position =
+      field == SummaryField::kDefaultPosition ? spins_[0].Value() : record.DefaultPosition - neutral;
+  motion.LimitDefault();
+  if (field == SummaryField::kDefaultPosition) {
+    spins_[0].SetValue(motion.default_position);
+    spins_[0].SetMinimum(-motion.virtual_half_width);
+    spins_[0].SetMaximum(motion.virtual_half_width);
+  }
+
+  StoreMotion(motion, record);
+}
+
+std::string SummaryEditor::Title() const {
+  if (!entry_) return {};
+  const std::string channel = "Channel " + std::to_string(entry_->channel + 1);
+  switch (entry_->field) {
+    case SummaryField::kActualRange:
+      return channel + " Actual Range";
+    case SummaryField::kVirtualRange:
+      return channel + " Virtual Range";
+    case SummaryField::kStops:
+      return channel + " Stops";
+    case SummaryField::kDefaultPosition:
+      return channel + " Default Position";
+    case SummaryField::kNeutralTrim:
+      return channel + " Neutral Trim";
+  }
+  return channel;
+}
+
+std::array<std::string, 2> SummaryEditor::Readings() const {
+  if (!entry_) return {};
+  const ChannelConfig& record = working_.At(entry_->channel);
+  const Motion motion = MotionOf(record);
+  const auto text = [](int value) { return std::to_string(value); };
+  switch (entry_->field) {
+    case SummaryField::kActualRange:
+      return {text(record.ActualRange[0]), text(record.ActualRange[1])};
+    case SummaryField::kVirtualRange:
+      return {"+/-" + text(motion.virtual_half_width), ""};
+    case SummaryField::kStops:
+      return {text(motion.left_stop), "+" + text(motion.right_stop)};
+    case SummaryField::kDefaultPosition:
+      return {text(motion.default_position), ""};
+    case SummaryField::kNeutralTrim:
+      return {text(motion.trim), text(record.NeutralPosition)};
+  }
+  return {};
+}
+
+}  // namespace tendril

@@ -1,0 +1,43 @@
+// MotionParameters: the six parameters that spin buttons set, each with its test beside it.
+#pragma once
+
+#include <QGroupBox>
+#include <QLabel>
+#include <QPushButton>
+#include <array>
+#include <functional>
+
+#include "ui/controls.h"
+#include "ui/model/channel_editor.h"
+#include "unitops/live_test.h"
+
+namespace tendril {
+
+// Shows what ChannelEditor holds, and brings it what the person sets.
+class MotionParameters : public QGroupBox {
+ public:
+  struct Events {
+    std::function<void(FollowUp)> edited;                     // the records have changed
+    std::function<void(const QWidget& label)> values_wanted;  // a parameter's label was pressed
+  };
+
+  // `editor` must outlive the area. `test_buttons` find their places here.
+  MotionParameters(ChannelEditor& editor, Events events,
+                   const std::array<QPushButton*, LiveTest::kTestButtons>& test_buttons,
+                   QWidget* parent = nullptr);
+
+  // Shows values, limits and captions. Runs no handler.
+  void ShowValues();
+
+ protected:
+  bool eventFilter(QObject* object, QEvent* event) override;
+
+ private:
+  ChannelEditor& editor_;
+  Events events_;
+  std::array<CalmSpinBox*, kParameterCount> spins_{};
+  std::array<QLabel*, kParameterCount> captions_{};
+  QLabel* lblActPulseLeft_;
+};
+
+}  // namespace tendril
