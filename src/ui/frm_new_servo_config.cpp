@@ -123,7 +123,7 @@ void frmNewServoConfig::StartUp(const Version& version) {
     SetFromPreset(kPresets[kStartPreset], working_.At(slot));
   connection_->ListCommPorts();
   simulators_.UpdateAll();
-  live_test_.OnSlider();
+  live_test_.ShowSlider();
 }
 
 void frmNewServoConfig::SelectChannel(std::size_t channel) {
@@ -187,7 +187,7 @@ void frmNewServoConfig::ShowRecords() {
   channels_->ShowKinds();
   ShowEditor();
   simulators_.UpdateAll();
-  live_test_.OnSlider();
+  live_test_.ShowSlider();
 }
 
 void frmNewServoConfig::OnReplaced() {
@@ -204,6 +204,7 @@ void frmNewServoConfig::CommitTyping() {
 void frmNewServoConfig::ShowSummary() {
   CommitTyping();
   live_test_.OnTestButton(LiveTest::kNoButton);
+  MakeUnseenParts();
   summary_->ShowRecords();
   tmrSummaryScreen_->SetInterval(kSummaryScreenMs);
   tmrSummaryScreen_->SetEnabled(true);
@@ -211,6 +212,7 @@ void frmNewServoConfig::ShowSummary() {
 
 void frmNewServoConfig::OnSummaryScreen() {
   tmrSummaryScreen_->SetEnabled(false);
+  focus_before_summary_ = focusWidget();
   views_->setCurrentWidget(summary_);
   command_area_->ShowSummaryButton(false);
   apply_boxes_->ShowEditing(false);
@@ -220,10 +222,11 @@ void frmNewServoConfig::OnSummaryScreen() {
 void frmNewServoConfig::ShowConfig() {
   CommitTyping();
   summary_->CloseNumberEntry();
-  OnReplaced();  // the summary has changed the records
   views_->setCurrentIndex(0);
   command_area_->ShowSummaryButton(true);
   apply_boxes_->ShowEditing(true);
+  if (focus_before_summary_) focus_before_summary_->setFocus();
+  OnReplaced();  // the summary has changed the records
 }
 
 bool frmNewServoConfig::SummaryShown() const {
@@ -262,6 +265,7 @@ bool frmNewServoConfig::eventFilter(QObject* object, QEvent* event) {
 }
 
 void frmNewServoConfig::MakeUnseenParts() {
+  if (summary_ != nullptr) return;
   summary_ = new SummaryArea(
       commands_, command_buttons_, timers_, working_, [this] { ShowConfig(); }, views_);
   summary_->SetRangeCaptions(QStringLiteral("1000--2000"));

@@ -99,6 +99,7 @@ class frmNewServoConfig : public QWidget {
   // Where the focus was when the running command began, and where it went when its button was disabled.
   QPointer<QWidget> focus_before_command_;
   QPointer<QWidget> focus_in_command_;
+  QPointer<QWidget> focus_before_summary_;
 
   std::unique_ptr<Timer> tmrSummaryScreen_;
   Shutdown shutdown_;

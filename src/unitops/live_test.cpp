@@ -156,10 +156,17 @@ void LiveTest::ShowPosition(Microseconds position) {
 }
 
 void LiveTest::OnSlider() {
-  Guarded([this] { MoveSlider(); });
+  Guarded([this] {
+    const auto position = PlaceSlider();
+    if (position && view_.SliderSends()) SendPaced(*position);
+  });
 }
 
-void LiveTest::MoveSlider() {
+void LiveTest::ShowSlider() {
+  Guarded([this] { PlaceSlider(); });
+}
+
+std::optional<Microseconds> LiveTest::PlaceSlider() {
   const ChannelConfig values = choice_.Values();
   const auto position_at = [&](int slider) { return SliderPulseWidth(values.VirtualRange, slider); };
   const PulsePair& stops = values.VirtualStops;
@@ -184,7 +191,7 @@ void LiveTest::MoveSlider() {
   const double fraction = SliderFraction(slider);
   view_.ShowReadOut({RoundHalfToEven(fraction * 100), RoundHalfToEven(fraction * kMaxDmx), shown_position_});
   pictures_.UpdateSimulators(shown_position_);
-  if (may_send && view_.SliderSends()) SendPaced(shown_position_);
+  return may_send ? std::optional(shown_position_) : std::nullopt;
 }
 
 void LiveTest::OnSliderSends() {

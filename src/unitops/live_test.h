@@ -92,8 +92,10 @@ class LiveTest {
   // the actual range, move to the centre. kNoButton resets the captions and stops a sweep where it is. Shows
   // every failure; raises none.
   void OnTestButton(int button);
-  // The slider was moved, by whom ever.
+  // The slider was moved, or the range that it spans has changed by an edit.
   void OnSlider();
+  // The records were replaced: the same, but nothing is sent.
+  void ShowSlider();
   // "Use Slider to Test Intensity Values" was ticked or cleared.
   void OnSliderSends();
   // A unit command is about to start: a sweep ends as by its button, and nothing is left unsent. False: that failed,
@@ -118,7 +120,8 @@ class LiveTest {
   void StopSweep();
   void StopAll();
   void Step();
-  void MoveSlider();
+  // Pushes the slider back if needed and shows where it stands; gives the position when it may be sent.
+  std::optional<Microseconds> PlaceSlider();
   void ShowPosition(Microseconds position);
 
   std::optional<Command> LiveCommand(Microseconds position) const;

@@ -152,6 +152,7 @@ TEST_F(Summary, BackToTheSimulator_TheChannelIsTheEditorsAgain) {
   EXPECT_TRUE(Find("ServoSimulator1").isVisible());
   EXPECT_EQ(simulator_values(), before);
   EXPECT_TRUE(window_->WorkingConfiguration() == records) << "nothing stored on the way";
+  EXPECT_EQ(window_->focusWidget(), &Find("ServoSimulator2_1"));
 
   ShowSummary();
   Click("txtSumActualRange_1");
