@@ -12,7 +12,10 @@ namespace {
 // Eight of them fit into a window 1024 wide.
 constexpr QSize kSmallestSimulator(96, 96);
 
-constexpr QColor kSelectedColour(0, 0, 0xFF);  // as the servos have it
+// The background that selected servos have.
+constexpr char kSelectedOutput[] =
+    "QPushButton { background-color: #0000ff; color: white; border: 2px solid #0000ff; }"
+    "QPushButton:focus { border-color: white; }";
 
 }  // namespace
 
@@ -63,12 +66,8 @@ void ChannelStrip::SetUpSimulators() {
 void ChannelStrip::ShowSelected(std::size_t channel) {
   for (std::size_t slot = 0; slot < kPortCount; ++slot) {
     ServoSimulator2_[slot]->SelectServo(slot == channel);
-    QPalette palette;
-    if (slot == channel) {
-      palette.setColor(QPalette::Button, kSelectedColour);
-      palette.setColor(QPalette::ButtonText, Qt::white);
-    }
-    cmdDigitalOutput_[slot]->setPalette(palette);
+    cmdDigitalOutput_[slot]->setStyleSheet(slot == channel ? QString::fromLatin1(kSelectedOutput)
+                                                           : QString());
   }
 }
 

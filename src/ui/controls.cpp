@@ -17,14 +17,33 @@ CalmSpinBox::CalmSpinBox(QWidget* parent) : QSpinBox(parent) {
   setFocusPolicy(Qt::StrongFocus);
   setSingleStep(10);
   setSuffix(QStringLiteral(" µs"));
-  setRange(-BoundedValue::kWidest, BoundedValue::kWidest);
+  ApplyLimits();
   setFixedWidth(sizeHint().width());  // whatever its limits become, nothing around it moves
 }
 
 void CalmSpinBox::Show(const BoundedValue& value) {
   const QSignalBlocker silent(this);
-  setRange(value.Minimum(), value.Maximum());
+  shown_ = value;
+  if (!held_) ApplyLimits();
   setValue(value.Value());
+}
+
+void CalmSpinBox::ApplyLimits() {
+  if (minimum() != shown_.Minimum() || maximum() != shown_.Maximum()) {
+    setRange(shown_.Minimum(), shown_.Maximum());
+  }
+}
+
+void CalmSpinBox::mousePressEvent(QMouseEvent* event) {
+  held_ = true;
+  QSpinBox::mousePressEvent(event);
+}
+
+void CalmSpinBox::mouseReleaseEvent(QMouseEvent* event) {
+  QSpinBox::mouseReleaseEvent(event);
+  held_ = false;
+  const QSignalBlocker silent(this);
+  ApplyLimits();
 }
 
 void CalmSpinBox::wheelEvent(QWheelEvent* event) {
@@ -59,9 +78,15 @@ QLabel* BoldLabel(const QString& text, QWidget* parent) {
 }
 
 void CheckOnly(QButtonGroup& group, int id) {
+  QAbstractButton* checked = group.button(id);
   group.setExclusive(false);  // an exclusive group does not let go of its last button
-  for (QAbstractButton* button : group.buttons()) button->setChecked(group.id(button) == id);
+  for (QAbstractButton* button : group.buttons()) button->setChecked(button == checked);
   group.setExclusive(true);
+  // The Tab key stops at one of them; arrow keys go on from there.
+  const QAbstractButton* stop = checked != nullptr ? checked : group.buttons().constFirst();
+  for (QAbstractButton* button : group.buttons()) {
+    button->setFocusPolicy(button == stop ? Qt::StrongFocus : Qt::ClickFocus);
+  }
 }
 
 QPoint WithinParent(const QWidget& panel, QPoint wanted) {

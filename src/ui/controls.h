@@ -34,6 +34,14 @@ class CalmSpinBox : public QSpinBox {
 
  protected:
   void wheelEvent(QWheelEvent* event) override;
+  void mousePressEvent(QMouseEvent* event) override;
+  void mouseReleaseEvent(QMouseEvent* event) override;
+
+ private:
+  void ApplyLimits();
+
+  BoundedValue shown_;
+  bool held_ = false;  // an arrow may be: new limits would end its repetition
 };
 
 // Gives `widget` its design name, and returns it.

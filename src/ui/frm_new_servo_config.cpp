@@ -65,7 +65,10 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
   StartUp(version);
 }
 
-frmNewServoConfig::~frmNewServoConfig() { commands_.Running().SetObserver(nullptr); }
+frmNewServoConfig::~frmNewServoConfig() {
+  hide();  // what is being typed is taken over now, and not when half of the window is gone
+  commands_.Running().SetObserver(nullptr);
+}
 
 // Stacks and scroll areas show a widget as soon as they get it, and with that lay it out. So they get theirs
 // while it is empty, and only when they are in this window themselves: without a parent, what they show would
@@ -127,7 +130,9 @@ void frmNewServoConfig::StartUp(const Version& version) {
 }
 
 void frmNewServoConfig::SelectChannel(std::size_t channel) {
+  const auto left = channel_editor_.Channel();
   channel_editor_.SelectChannel(channel);
+  if (left) channels_->UpdateSimulator(*left, live_test_.ShownPosition());
   apply_boxes_->ShowTicks();
   channels_->ShowSelected(channel);
   ShowEditor();
@@ -205,7 +210,6 @@ void frmNewServoConfig::ShowSummary() {
   CommitTyping();
   live_test_.OnTestButton(LiveTest::kNoButton);
   MakeUnseenParts();
-  summary_->ShowRecords();
   tmrSummaryScreen_->SetInterval(kSummaryScreenMs);
   tmrSummaryScreen_->SetEnabled(true);
 }
@@ -213,10 +217,12 @@ void frmNewServoConfig::ShowSummary() {
 void frmNewServoConfig::OnSummaryScreen() {
   tmrSummaryScreen_->SetEnabled(false);
   focus_before_summary_ = focusWidget();
+  actuals_->hide();
+  summary_->ShowRecords();
   views_->setCurrentWidget(summary_);
   command_area_->ShowSummaryButton(false);
   apply_boxes_->ShowEditing(false);
-  summary_->setFocus();
+  summary_->TakeFocus();
 }
 
 void frmNewServoConfig::ShowConfig() {
@@ -276,6 +282,7 @@ void frmNewServoConfig::MakeUnseenParts() {
 }
 
 void frmNewServoConfig::closeEvent(QCloseEvent* event) {
+  CommitTyping();  // later it would set off what has been stopped
   commands_.Stop();
   live_test_.OnTestButton(LiveTest::kNoButton);
   if (!shutdown_.MayClose()) {

@@ -112,11 +112,8 @@ MotionParameters::MotionParameters(ChannelEditor& editor, Events events,
     grid->addWidget(name, row.row, kName);
     grid->addWidget(captions_[i], row.row, kRightValue);
     grid->addWidget(spin, row.row, kSpin);
-    QObject::connect(spin, &QSpinBox::valueChanged, this, [this, parameter](int value) {
-      const FollowUp follow_up = editor_.Change(parameter, value);
-      ShowValues();
-      events_.edited(follow_up);
-    });
+    QObject::connect(spin, &QSpinBox::valueChanged, this,
+                     [this, parameter](int value) { events_.edited(editor_.Change(parameter, value)); });
   }
   auto* bracket = Named(BoldLabel(QStringLiteral("[ +/-")), QStringLiteral("Label13"));
   grid->addWidget(lblActPulseLeft_, 0, kLeftValue, Qt::AlignRight | Qt::AlignVCenter);

@@ -14,13 +14,13 @@ constexpr QPoint kBesideText(200 / kFormUnitsPerPixel, 300 / kFormUnitsPerPixel)
 }  // namespace
 
 NumberEntry::NumberEntry(SummaryEditor& editor, TimerFactory& timers,
-                         std::function<void(std::size_t channel)> changed, QWidget* parent)
-    : QFrame(parent),
+                         std::function<void(std::size_t channel)> changed, QWidget& window)
+    : QFrame(&window),
       editor_(editor),
-      tmrAdjustDual_(timers.CreateTimer([this] { Close(); })),
+      tmrAdjustDual_(timers.CreateTimer([this] { OnAdjustDual(); })),
       lblDisplay_(Named(BoldLabel({}), QStringLiteral("lblDisplay"))) {
   setObjectName(QStringLiteral("fraNumberEntry"));
-  setFrameShape(QFrame::StyledPanel);
+  setFrameStyle(QFrame::Box | QFrame::Plain);
   setAutoFillBackground(true);
   hide();
   tmrAdjustDual_->SetInterval(kOpenMs);
@@ -55,6 +55,9 @@ void NumberEntry::OpenNumberEntry(std::size_t channel, SummaryField field, QWidg
   move(WithinParent(*this, text.mapTo(parentWidget(), QPoint()) + kBesideText));
   raise();
   show();
+  // The Tab key goes on from here as it would from the text.
+  setTabOrder(&text, spnSumValue_[0]);
+  setTabOrder(spnSumValue_[0], spnSumValue_[1]);
   spnSumValue_[0]->setFocus();
   spnSumValue_[0]->selectAll();
 }
@@ -75,6 +78,12 @@ void NumberEntry::ShowEntry() {
         QStringLiteral("From %1 to %2 µs. Escape closes the entry.").arg(spin.minimum()).arg(spin.maximum()));
     lblSumValue_[i]->setText(QString::fromStdString(readings[i]));
   }
+}
+
+void NumberEntry::OnAdjustDual() {
+  tmrAdjustDual_->SetEnabled(false);
+  for (CalmSpinBox* spin : spnSumValue_) spin->interpretText();  // what is being typed is a change, too
+  if (!tmrAdjustDual_->Enabled()) Close();
 }
 
 void NumberEntry::Close() {

@@ -15,13 +15,13 @@
 
 namespace tendril {
 
-// The frame `fraNumberEntry`, with one spin button or two. It opens beside the text that was pressed and closes
-// 3.5 s after the last change, or by Escape; the focus then goes back to the text.
+// The frame `fraNumberEntry`, with one spin button or two. It floats over the window, opens beside the text that was
+// pressed, and closes 3.5 s after the last change, or by Escape; the focus then goes back to the text.
 class NumberEntry : public QFrame {
  public:
-  // `editor` must outlive it; `changed` is called after each change of a record.
+  // `editor` must outlive it; `changed` is called after each change of a record. `window` owns it.
   NumberEntry(SummaryEditor& editor, TimerFactory& timers, std::function<void(std::size_t channel)> changed,
-              QWidget* parent);
+              QWidget& window);
 
   // Opens beside `text`, which shows `field` of `channel`, 0 to 7.
   void OpenNumberEntry(std::size_t channel, SummaryField field, QWidget& text);
@@ -33,6 +33,7 @@ class NumberEntry : public QFrame {
 
  private:
   void ShowEntry();
+  void OnAdjustDual();
 
   SummaryEditor& editor_;
   std::unique_ptr<Timer> tmrAdjustDual_;

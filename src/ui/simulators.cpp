@@ -6,12 +6,8 @@ Simulators::Simulators(ChannelStrip& channels, EditorArea& editor, const Channel
     : channels_(channels), editor_(editor), ticks_(ticks) {}
 
 void Simulators::UpdateAll() {
-  // A servo's arcs and marker are measured from the neutral position that it had before: a record with another one
-  // is wholly shown at the second time.
-  for (int pass = 0; pass < 2; ++pass) {
-    for (std::size_t slot = 0; slot < kPortCount; ++slot) channels_.UpdateSimulator(slot, arm_);
-    editor_.UpdateSimulator(arm_);
-  }
+  for (std::size_t slot = 0; slot < kPortCount; ++slot) channels_.UpdateSimulator(slot, arm_);
+  editor_.UpdateSimulator(arm_);
 }
 
 void Simulators::UpdateSimulators(Microseconds arm) {

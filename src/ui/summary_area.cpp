@@ -3,6 +3,7 @@
 #include <QFrame>
 #include <QHBoxLayout>
 #include <QKeyEvent>
+#include <QMouseEvent>
 #include <QPushButton>
 #include <QRadioButton>
 #include <QVBoxLayout>
@@ -107,7 +108,7 @@ SummaryArea::SummaryArea(UnitCommands& commands, CommandButtons& buttons, TimerF
   column->addLayout(MakeButtons(commands, buttons, std::move(back)));
   column->addStretch();
   entry_ = new NumberEntry(
-      editor_, timers, [this](std::size_t channel) { ShowTexts(channel); }, this);
+      editor_, timers, [this](std::size_t channel) { ShowTexts(channel); }, *window());
 }
 
 QLayout* SummaryArea::MakeButtons(UnitCommands& commands, CommandButtons& buttons,
@@ -231,7 +232,10 @@ void SummaryArea::ShowTexts(std::size_t channel) {
 }
 
 bool SummaryArea::eventFilter(QObject* object, QEvent* event) {
-  bool opens = event->type() == QEvent::MouseButtonPress;
+  bool opens = false;
+  if (event->type() == QEvent::MouseButtonPress || event->type() == QEvent::MouseButtonDblClick) {
+    opens = static_cast<QMouseEvent*>(event)->button() == Qt::LeftButton;
+  }
   if (event->type() == QEvent::KeyPress) {
     const int key = static_cast<QKeyEvent*>(event)->key();
     opens = key == Qt::Key_Return || key == Qt::Key_Enter || key == Qt::Key_Space;
@@ -239,6 +243,22 @@ bool SummaryArea::eventFilter(QObject* object, QEvent* event) {
   if (!opens) return QWidget::eventFilter(object, event);
   OpenEntryOf(*object);
   return true;
+}
+
+void SummaryArea::keyPressEvent(QKeyEvent* event) {
+  if (event->key() == Qt::Key_Escape) {
+    entry_->Close();
+  } else {
+    QWidget::keyPressEvent(event);
+  }
+}
+
+void SummaryArea::TakeFocus() {
+  for (const Row& row : rows_) {
+    if (row.texts[0]->isHidden()) continue;
+    row.texts[0]->setFocus();
+    return;
+  }
 }
 
 void SummaryArea::OpenEntryOf(QObject& text) {
@@ -253,7 +273,7 @@ void SummaryArea::OpenEntryOf(QObject& text) {
 void SummaryArea::AddTrailer(QGridLayout& table) {
   AddFrame(table, QStringLiteral("frmSumTrailer"), kTrailerLine, 1);
   for (int option = 0; option < static_cast<int>(kOptions.size()); ++option) {
-    auto* caption = Named(DimLabel(QString::fromUtf8(kOptions[static_cast<std::size_t>(option)].caption)),
+    auto* caption = Named(new QLabel(QString::fromUtf8(kOptions[static_cast<std::size_t>(option)].caption)),
                           ArrayName(QStringLiteral("lblParameters"), option));
     caption->setAlignment(Qt::AlignHCenter | Qt::AlignTop);
     QFont small = caption->font();

@@ -35,11 +35,14 @@ class SummaryArea : public QWidget {
   void SetRangeCaptions(const QString& caption);
   // Brings all records into their bounds, and shows them.
   void ShowRecords();
+  // Gives the focus to the first value, where there is one.
+  void TakeFocus();
   // Closes the number entry, if it is open.
   void CloseNumberEntry() { entry_->Close(); }
 
  protected:
   bool eventFilter(QObject* object, QEvent* event) override;
+  void keyPressEvent(QKeyEvent* event) override;
 
  private:
   static constexpr std::size_t kFields = 5;

@@ -48,6 +48,8 @@ TEST_F(Editor, Stepping_MovesCaptionsRecordAndServos) {
   EXPECT_NE(Dial("ServoSimulator2_2").range_start(), Dial("ServoSimulator2_3").range_start());
 
   Click("ServoSimulator2_0");
+  EXPECT_EQ(Dial("ServoSimulator2_2").limit_start(), Dial("ServoSimulator2_2").range_start())
+      << "drawn when it is left";
   EXPECT_EQ(Record(2).VirtualRange, (PulsePair{1200, 1800}));
   EXPECT_EQ(Text("lblActPulseLeft"), "600");
 }
@@ -70,6 +72,38 @@ TEST_F(Editor, TypedValue_CountsWhenItIsWhole) {
   Find<QAbstractButton>("Command3_0").click();
   RunToTheEnd();
   EXPECT_EQ(unit.PortOptions(1), (PortOptionBytes{1, 62, 238, 100, 200, 100, 200, 175, 150}));
+
+  // Closing takes it over too, and opens no port for it.
+  Find<QCheckBox>("chkSendSlideCommands").click();
+  Spin("spnRightVirtStop").setFocus();
+  Spin("spnRightVirtStop").selectAll();
+  QTest::keyClicks(&Spin("spnRightVirtStop"), QStringLiteral("123"));
+  EXPECT_TRUE(window_->close());
+  world_.time.Advance(5000);
+  EXPECT_FALSE(link_.PortOpen());
+  EXPECT_EQ(Record(0).VirtualStops[1], 1623);
+}
+
+TEST_F(Editor, WindowThatGoesWhileSomethingIsTyped_GoesQuietly) {
+  Click("ServoSimulator2_0");
+  Find<QCheckBox>("chkSendSlideCommands").click();
+  Spin("spnRightVirtStop").setFocus();
+  Spin("spnRightVirtStop").selectAll();
+  QTest::keyClicks(&Spin("spnRightVirtStop"), QStringLiteral("123"));
+  window_.reset();
+  EXPECT_EQ(world_.time.RunningTimers(), 0);
+}
+
+TEST_F(Editor, HeldArrow_GoesOnStepping) {
+  Click("ServoSimulator2_0");
+  for (const char* name : {"spnDefaultPos", "spnVirtPulseRange"}) {
+    auto& spin = Spin(name);
+    const int before = spin.value();
+    const QPoint down(spin.width() - 5, spin.height() - 5);
+    QTest::mousePress(&spin, Qt::LeftButton, {}, down);
+    EXPECT_TRUE(QTest::qWaitFor([&] { return spin.value() <= before - 30; }, 5000)) << name;
+    QTest::mouseRelease(&spin, Qt::LeftButton, {}, down);
+  }
 }
 
 TEST_F(Editor, ApplyBoxes_LetOtherChannelsFollow) {
@@ -95,6 +129,9 @@ TEST_F(Editor, ApplyBoxes_LetOtherChannelsFollow) {
   EXPECT_FALSE(Checked("chkUpdate_8"));
   EXPECT_FALSE(Checked("chkUpdate_0"));
   EXPECT_TRUE(Checked("optPowerUp_1"));
+  // The Tab key stops at the button that is checked.
+  EXPECT_EQ(Find("optPowerUp_1").focusPolicy() & Qt::TabFocus, Qt::TabFocus);
+  EXPECT_EQ(Find("optPowerUp_0").focusPolicy() & Qt::TabFocus, 0);
 }
 
 TEST_F(Editor, WithoutAChannel_TheChoicesAreInert) {
@@ -126,7 +163,10 @@ TEST_F(Editor, OutputKinds_StandInTheServosPlace) {
   Click("ServoSimulator2_0");
   EXPECT_TRUE(Checked("optChannelType_0"));
   EXPECT_TRUE(Find("ServoSimulator1").isVisible());
+  const auto background = [&] { return Find("cmdDigitalOutput_4").grab().toImage().pixelColor(8, 8); };
+  EXPECT_NE(background(), QColor(Qt::blue));
   Click("cmdDigitalOutput_4");
+  EXPECT_EQ(background(), QColor(Qt::blue));
   EXPECT_TRUE(Checked("optChannelType_2"));
   Find<QRadioButton>("optChannelType_0").click();
   EXPECT_TRUE(Find("ServoSimulator2_4").isVisible());
@@ -134,9 +174,14 @@ TEST_F(Editor, OutputKinds_StandInTheServosPlace) {
 }
 
 TEST_F(Editor, Presets_GoToAllChannelsAndCanBeChosenAgain) {
+  auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
+  ChooseByKeys("cmbNYX", 1);
   Click("ServoSimulator2_6");
+  Find<QCheckBox>("chkSendSlideCommands").click();
   Find<QRadioButton>("optLostComm_0").click();
   ChooseByKeys("cmbPresets", 2);
+  world_.time.Advance(100);
+  EXPECT_FALSE(unit.LivePosition(7).has_value()) << "a preset moves no servo";
   for (std::size_t channel = 0; channel < 8; ++channel) {
     EXPECT_EQ(Record(channel).ActualRange, (PulsePair{500, 2500}));
     EXPECT_EQ(Record(channel).LostCommOption, kLostCommStopPulse);

@@ -101,8 +101,50 @@ TEST_F(Summary, NumberEntry_ByMouse) {
   Find<QRadioButton>("optSumLCcurrent_2").click();
   EXPECT_FALSE(EntryShown());
   EXPECT_EQ(Record(2).LostCommOption, kLostCommHold);
+  Click("txtSumActualRange_0");
   Find<QRadioButton>("optSumPUDefault_2").click();
+  EXPECT_FALSE(EntryShown());
   EXPECT_EQ(Record(2).PowerUPOpt, kPowerUpDefault);
+  EXPECT_FALSE(Find("chkUpdate_0").isEnabled()) << "each change goes to its own channel";
+}
+
+TEST_F(Summary, TypedNumber_IsNotLostWhenTheEntryCloses) {
+  ShowSummary();
+  Click("txtSumNeutralPosition_0");
+  auto& spin = Find<QSpinBox>("spnSumValue_0");
+  QTest::keyClick(&spin, Qt::Key_Up);
+  world_.time.Advance(3000);
+  spin.selectAll();
+  QTest::keyClicks(&spin, QStringLiteral("250"));
+  world_.time.Advance(500);
+  EXPECT_EQ(Record(0).NeutralPosition, 1750);
+  world_.time.Advance(3500);
+  EXPECT_FALSE(EntryShown());
+
+  Click("txtSumNeutralPosition_0");
+  spin.selectAll();
+  QTest::keyClicks(&spin, QStringLiteral("50"));
+  Find<QAbstractButton>("cmdShowConfig").click();
+  EXPECT_EQ(Record(0).NeutralPosition, 1550);
+}
+
+TEST_F(Summary, DoubleClickAndEscape_LeaveNoPanelBehind) {
+  ShowSummary();
+  QTest::mouseDClick(&Find("txtSumStopRange_4"), Qt::LeftButton);
+  EXPECT_TRUE(EntryShown());
+  EXPECT_EQ(window_->focusWidget(), &Find("spnSumValue_0"));
+  Find("txtSumActualRange_1").setFocus();
+  QTest::keyClick(&Find("txtSumActualRange_1"), Qt::Key_Escape);
+  EXPECT_FALSE(EntryShown());
+  QTest::mouseClick(&Find("txtSumStopRange_4"), Qt::RightButton);
+  EXPECT_FALSE(EntryShown());
+}
+
+TEST_F(Summary, PressedAtOnce_IsThere) {
+  frmNewServoConfig window(link_, world_.time, world_.boxes, Version{1, 0, 0});
+  window.findChild<QAbstractButton*>(QStringLiteral("cmdShowSummary"))->click();
+  world_.time.Advance(20);
+  EXPECT_FALSE(window.findChild<QWidget*>(QStringLiteral("frmSumHeader"))->isHidden());
 }
 
 TEST_F(Summary, NumberEntry_ByKeyboardAlone) {
@@ -129,13 +171,18 @@ TEST_F(Summary, NumberEntry_ByKeyboardAlone) {
 }
 
 TEST_F(Summary, NumberEntry_LiesWhollyInsideTheWindow) {
-  window_->resize(1024, 720);
   ShowSummary();
-  for (const char* text : {"txtSumActualRange_0", "txtSumDefaultPosition_7", "txtSumStopRange_7"}) {
-    Click(text);
-    const QWidget& entry = Find("fraNumberEntry");
-    EXPECT_TRUE(window_->rect().contains(QRect(entry.mapTo(window_.get(), QPoint()), entry.size()))) << text;
-    EXPECT_TRUE(Find("lblDisplay").isVisible());
+  for (const QSize& size : {QSize(1024, 720), QSize(700, 430)}) {
+    window_->resize(size);
+    QTest::qWait(0);
+    for (const char* text : {"txtSumActualRange_0", "txtSumDefaultPosition_7", "txtSumStopRange_7"}) {
+      Find(text).setFocus();
+      QTest::keyClick(&Find(text), Qt::Key_Return);
+      const QWidget& entry = Find("fraNumberEntry");
+      EXPECT_TRUE(window_->rect().contains(entry.geometry())) << text;
+      EXPECT_TRUE(entry.rect().contains(Find("spnSumValue_0").geometry()));
+      EXPECT_GE(entry.height(), entry.sizeHint().height());
+    }
   }
 }
 
@@ -171,12 +218,14 @@ TEST_F(Summary, Get_FillsTheTableAndAnUnknownKindShowsNothing) {
   unit.SetPortOptions(3, {0, 60, 240, 100, 200, 100, 200, 150, 150});
   ChooseByKeys("cmbNYX", 1);
   ShowSummary();
+  Click("txtSumStopRange_0");
   Click("Command3_4");
   // A flag byte of 0 ends the reply before its port: such a kind can only come with other flags.
   unit.SetPortOptions(3, {4, 60, 240, 100, 200, 100, 200, 150, 150});
   RunToTheEnd();
   EXPECT_EQ(Text("lblProgress"), "SUCCESS: Upload Complete");
   EXPECT_EQ(Cell("txtSumActualRange_1") + " " + Cell("txtSumNeutralPosition_1"), "700-2300 1400");
+  EXPECT_FALSE(EntryShown());
   EXPECT_EQ(Record(2).PortType, -1);
   EXPECT_FALSE(Find("txtSumActualRange_2").isVisible());
   EXPECT_EQ(Text("lblSumDIOPWM_2"), "");

@@ -3,6 +3,7 @@
 #include <QAccessible>
 #include <QCheckBox>
 #include <QGroupBox>
+#include <QLineEdit>
 #include <QScrollArea>
 #include <QSet>
 #include <QSlider>
@@ -379,10 +380,10 @@ TEST_F(Window, ClosedWhileABoxIsOpen_EndsQuietly) {
 TEST_F(Window, EveryControl_HasANameAndSaysWhatItDoes) {
   QSet<QString> names;
   for (QWidget* widget : window_->findChildren<QWidget*>()) {
-    const bool control = qobject_cast<QAbstractButton*>(widget) != nullptr ||
-                         qobject_cast<QComboBox*>(widget) != nullptr ||
-                         qobject_cast<QAbstractSpinBox*>(widget) != nullptr ||
-                         qobject_cast<QAbstractSlider*>(widget) != nullptr;
+    const bool control =
+        qobject_cast<QAbstractButton*>(widget) != nullptr || qobject_cast<QComboBox*>(widget) != nullptr ||
+        qobject_cast<QLineEdit*>(widget) != nullptr || qobject_cast<QAbstractSpinBox*>(widget) != nullptr ||
+        qobject_cast<QAbstractSlider*>(widget) != nullptr;
     if (!control || widget->objectName().startsWith(QStringLiteral("qt_")) || widget->inherits("QScrollBar"))
       continue;
     const std::string object = widget->objectName().toStdString();

@@ -157,8 +157,7 @@ void ChannelEditor::Load(const ChannelConfig& record) {
   SpinOf(Parameter::kDefaultPosition).Reset(motion.default_position);
   RecalcParameters();
 
-  // The limits that follow no other parameter. A record from elsewhere may lie beyond them: that is kept until the
-  // person changes it.
+  // The limits that follow no other parameter, wide enough for a record from elsewhere that lies beyond them.
   const auto at_least = [this](Parameter parameter, int minimum) {
     SpinOf(parameter).SetMinimum(std::min(minimum, Spin(parameter).Value()));
   };

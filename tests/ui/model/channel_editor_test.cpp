@@ -120,9 +120,11 @@ TEST_F(ChannelEditorTest, Edit_StoresItsOwnFieldsAloneInTheTickedChannels) {
       EXPECT_EQ(working_.At(channel), channel == 2 || channel == 5 ? expected : before) << channel;
     }
     // Leaving the channel stores the rest, in its own record alone.
+    const ChannelConfig values = editor_.WorkingValues();
     editor_.SelectChannel(3);
-    expected = before;
-    editor_.ReloadChannel();
+    EXPECT_EQ(working_.At(5), expected);
+    CopyPulseFields(values, expected);
+    EXPECT_EQ(working_.At(2), expected);
     EXPECT_EQ(working_.At(3), before);
   }
 }
@@ -178,6 +180,8 @@ TEST_F(ChannelEditorTest, WithoutAChannel_NothingIsStored) {
   editor_.SetLostCommOption(kLostCommHold);
   EXPECT_EQ(working_, before);
   ExpectConsistent(editor_);
+  editor_.ApplyPreset(kPresets[0]);
+  ExpectSpin(Parameter::kActualRange, 700, 0, 1000);
 }
 
 TEST_F(ChannelEditorTest, Preset_GoesToAllRecordsWhateverIsTicked) {
