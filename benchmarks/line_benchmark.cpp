@@ -2,7 +2,6 @@
 // send, a get, and the steps of a test sweep.
 #include <QAbstractButton>
 #include <QApplication>
-#include <algorithm>
 #include <cstddef>
 #include <cstdint>
 #include <cstdio>
@@ -15,6 +14,7 @@
 #include "bench/virtual_unit.h"
 #include "config/option_bytes.h"
 #include "measured_window.h"
+#include "measuring.h"
 #include "simulator/servo_simulator.h"
 
 namespace tendril {
@@ -27,12 +27,6 @@ constexpr std::uint8_t kPoll = 0x88;
 constexpr std::uint8_t kSetOption = 0x0A;
 
 double WireMs(std::size_t bytes) { return static_cast<double>(bytes) * kWireMsPerByte; }
-
-// Of a copy, which is sorted.
-double Median(std::vector<double> values) {
-  std::sort(values.begin(), values.end());
-  return values.at(values.size() / 2);
-}
 
 // Eight ports. The floor: what is on the wire, and the eight steps of 300 ms.
 bool MeasureSend(MeasuredWindow& window) {

@@ -4,7 +4,6 @@
 #include <QAbstractButton>
 #include <QApplication>
 #include <QComboBox>
-#include <QElapsedTimer>
 #include <QEventLoop>
 #include <QLabel>
 #include <QString>
@@ -14,6 +13,7 @@
 
 #include "app/qt_platform.h"
 #include "counting_device.h"
+#include "measuring.h"
 #include "platform/posix/paths.h"
 #include "platform/qt/qt_serial_device.h"
 #include "serial/command_log.h"
@@ -22,16 +22,6 @@
 #include "ui/frm_new_servo_config.h"
 
 namespace tendril {
-
-// Steady, and of high resolution.
-class Stopwatch {
- public:
-  Stopwatch() { timer_.start(); }
-  double Ms() const { return static_cast<double>(timer_.nsecsElapsed()) / 1e6; }
-
- private:
-  QElapsedTimer timer_;
-};
 
 // Shown, and with Comm 1 open, from the start. Unit 01 is chosen and well-behaved.
 class MeasuredWindow {

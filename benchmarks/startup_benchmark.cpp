@@ -2,15 +2,17 @@
 // against an empty Qt window. Each run is a process of its own; the two kinds take turns.
 #include <QCoreApplication>
 #include <QDir>
-#include <QElapsedTimer>
 #include <QProcess>
 #include <QTemporaryDir>
-#include <algorithm>
 #include <cstdio>
 #include <cstdlib>
 #include <vector>
 
+#include "measuring.h"
+
 namespace {
+
+using tendril::Median;
 
 constexpr int kRuns = 25;
 constexpr double kMaxRatio = 1.5;
@@ -22,21 +24,15 @@ struct Measure {
 void RunOnce(const char* program, Measure& measure) {
   const QString path = QDir(QCoreApplication::applicationDirPath()).filePath(QString::fromLatin1(program));
   QProcess child;
-  QElapsedTimer timer;
-  timer.start();
+  const tendril::Stopwatch stopwatch;
   child.start(path, QStringList());
   if (!child.waitForReadyRead(20000)) {
     std::printf("%s does not paint its window\n", program);
     std::exit(EXIT_FAILURE);
   }
-  measure.ms.push_back(static_cast<double>(timer.nsecsElapsed()) / 1e6);
+  measure.ms.push_back(stopwatch.Ms());
   measure.mib.push_back(child.readAllStandardOutput().trimmed().toDouble() / 1024);
   child.waitForFinished();
-}
-
-double Median(std::vector<double> values) {
-  std::sort(values.begin(), values.end());
-  return values[values.size() / 2];
 }
 
 bool Report(const char* what, const char* unit, double program, double empty) {

@@ -6,7 +6,9 @@
 #include <QDeadlineTimer>
 #include <QDir>
 #include <QLabel>
+#include <QMouseEvent>
 #include <QPixmap>
+#include <QSpinBox>
 #include <cstdio>
 #include <string>
 #include <utility>
@@ -28,7 +30,11 @@ void Print(const std::string& line) {
 
 class Actor {
  public:
-  Actor(frmNewServoConfig& window, const QString& folder) : window_(window), folder_(folder) {}
+  Actor(frmNewServoConfig& window, const QString& folder) : window_(window), folder_(folder) {
+    window_.resize(kPictureSize);
+    QApplication::processEvents();
+    QDir().mkpath(folder_);
+  }
 
   template <typename Widget>
   Widget& Find(const char* name) const {
@@ -51,6 +57,25 @@ class Actor {
     auto& box = Find<QComboBox>(list);
     box.setCurrentIndex(entry);
     Q_EMIT box.activated(entry);
+  }
+
+  // Presses a button, which takes the focus as it does under the mouse.
+  void Press(const char* button) const {
+    auto& pressed = Find<QAbstractButton>(button);
+    pressed.setFocus(Qt::MouseFocusReason);
+    pressed.click();
+  }
+  void PressOnText(const char* name) const {
+    auto& text = Find<QWidget>(name);
+    const QPointF middle = QRectF(text.rect()).center();
+    QMouseEvent press(QEvent::MouseButtonPress, middle, text.mapToGlobal(middle), Qt::LeftButton,
+                      Qt::LeftButton, Qt::NoModifier);
+    QApplication::sendEvent(&text, &press);
+  }
+  void Step(const char* spin, int steps) const {
+    auto& stepped = Find<QSpinBox>(spin);
+    stepped.setFocus(Qt::MouseFocusReason);
+    stepped.stepBy(steps);
   }
 
   // Presses a command's button and waits for the outcome; false when there is none.
@@ -113,9 +138,7 @@ bool PrintedBoxes::AskYesNo(const BoxMessage& message) {
 int ShowWithoutDisplay(frmNewServoConfig& window, VirtualLine& line, const DemoUnits& units,
                        const QString& folder) {
   const Actor actor(window, folder);
-  window.resize(kPictureSize);
-  QApplication::processEvents();
-  if (!QDir().mkpath(folder) || !actor.SavePicture("window-start.png")) return 1;
+  if (!actor.SavePicture("window-start.png")) return 1;
 
   LinePrinter printer(Print);
   line.SetTap([&printer](const LineByte& byte) { printer.Note(byte); });
@@ -142,6 +165,30 @@ int ShowWithoutDisplay(frmNewServoConfig& window, VirtualLine& line, const DemoU
   line.SetTap(nullptr);
   good = good && window.WorkingConfiguration() == sent;
   Print(good ? "What was sent is what was read back." : "What was read back is NOT what was sent.");
+  return good ? 0 : 1;
+}
+
+int TakePictures(frmNewServoConfig& window, const QString& folder) {
+  const Actor actor(window, folder);
+  actor.Press("ServoSimulator2_2");
+  actor.Press("chkUpdate_6");
+  actor.Step("spnNeutralTrim", 10);
+  actor.Step("spnLeftVirtStop", 15);
+  actor.Step("spnDefaultPos", -20);
+  bool good = actor.SavePicture("window-servo.png");
+  actor.Press("ServoSimulator2_4");
+  actor.Press("optChannelType_1");
+  good = actor.SavePicture("window-digital.png") && good;
+  actor.Press("ServoSimulator2_5");
+  actor.Press("optChannelType_2");
+  good = actor.SavePicture("window-pwm.png") && good;
+
+  actor.Press("cmdShowSummary");
+  const auto& text = actor.Find<QWidget>("txtSumStopRange_3");
+  good = Actor::RunUntil([&text] { return text.isVisible(); }) && good;
+  good = actor.SavePicture("window-summary.png") && good;
+  actor.PressOnText("txtSumStopRange_3");
+  good = actor.SavePicture("window-number-entry.png") && good;
   return good ? 0 : 1;
 }
 

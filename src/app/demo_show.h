@@ -1,4 +1,4 @@
-// The demonstration for a machine without a display.
+// What the demonstration does by itself: a show for a machine without a display, and pictures.
 #pragma once
 
 #include <QString>
@@ -29,5 +29,10 @@ struct DemoUnits {
 // exit code: 0 when what was sent is what was read back.
 int ShowWithoutDisplay(frmNewServoConfig& window, VirtualLine& line, const DemoUnits& units,
                        const QString& folder);
+
+// Edits channels in `window` and saves pictures of the editor with a servo, a digital and a PWM channel, of the
+// summary, and of a number entry open in it, in `folder`, which is created. Returns the program's exit code: 0 when
+// all are saved.
+int TakePictures(frmNewServoConfig& window, const QString& folder);
 
 }  // namespace tendril

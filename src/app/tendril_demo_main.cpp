@@ -42,7 +42,7 @@ DemoUnits FillBench(VirtualPorts& bench) {
 
 QPalette DarkPalette() {
   const QColor text(0xE6, 0xE6, 0xE6);
-  QPalette dark(QColor(0x35, 0x37, 0x3A), QColor(0x2B, 0x2D, 0x30));
+  QPalette dark(QColor(0x50, 0x53, 0x57), QColor(0x3C, 0x3F, 0x43));
   dark.setColor(QPalette::Base, QColor(0x1F, 0x21, 0x24));
   dark.setColor(QPalette::AlternateBase, QColor(0x2B, 0x2D, 0x30));
   for (const auto role :
@@ -71,8 +71,12 @@ int main(int argc, char** argv) {
       QStringLiteral("Send a configuration to unit 01, read it back, print what crosses the line, save "
                      "pictures of the window in <folder>, and end."),
       QStringLiteral("folder"));
+  const QCommandLineOption pictures(
+      QStringLiteral("pictures"),
+      QStringLiteral("Save pictures of the editor and of the summary in <folder>, and end."),
+      QStringLiteral("folder"));
   const QCommandLineOption dark(QStringLiteral("dark"), QStringLiteral("Light text on a dark ground."));
-  parser.addOptions({show, dark});
+  parser.addOptions({show, pictures, dark});
   parser.process(application);
   if (parser.isSet(dark)) {
     QApplication::setStyle(QStyleFactory::create(QStringLiteral("Fusion")));
@@ -92,5 +96,6 @@ int main(int argc, char** argv) {
   platform.boxes.SetParent(&window);
   window.show();
   if (parser.isSet(show)) return ShowWithoutDisplay(window, bench.Line(1), units, parser.value(show));
+  if (parser.isSet(pictures)) return TakePictures(window, parser.value(pictures));
   return QApplication::exec();
 }

@@ -1,7 +1,6 @@
 #include "ui/apply_boxes.h"
 
 #include <QHBoxLayout>
-#include <QLabel>
 
 #include "ui/channel_columns.h"
 #include "ui/controls.h"
@@ -47,6 +46,7 @@ ApplyBoxes::ApplyBoxes(ChannelEditor& editor, std::function<void()> clicked, QWi
     }
     auto* label = Named(new QLabel(number), ArrayName(QStringLiteral("lblUpdateNum"), index));
     label->setBuddy(box);
+    lblUpdateNum_[static_cast<std::size_t>(index)] = label;
     auto* pair = new QHBoxLayout;
     pair->addStretch();
     pair->addWidget(box);
@@ -58,6 +58,7 @@ ApplyBoxes::ApplyBoxes(ChannelEditor& editor, std::function<void()> clicked, QWi
 }
 
 void ApplyBoxes::ShowEditing(bool editing) {
+  for (QLabel* label : lblUpdateNum_) label->setEnabled(editing);
   for (std::size_t index = 0; index < chkUpdate_.size(); ++index) {
     chkUpdate_[index]->setEnabled(editing);
     Describe(

@@ -3,6 +3,7 @@
 
 #include <QCheckBox>
 #include <QGroupBox>
+#include <QLabel>
 #include <array>
 #include <functional>
 
@@ -24,6 +25,7 @@ class ApplyBoxes : public QGroupBox {
 
  private:
   ChannelEditor& editor_;
+  std::array<QLabel*, kPortCount> lblUpdateNum_{};
   std::array<QCheckBox*, kPortCount + 1> chkUpdate_{};  // the last is "ALL"
 };
 

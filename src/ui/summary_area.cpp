@@ -162,6 +162,8 @@ void SummaryArea::AddRow(QGridLayout& table, int channel) {
                        .arg(caption)
                        .arg(channel + 1));
     text->installEventFilter(this);
+    // Selected, it would look as if it could be typed over.
+    QObject::connect(text, &QLineEdit::selectionChanged, text, &QLineEdit::deselect);
     LeaveWidthToColumn(text);
     keep_place(text);
     table.addWidget(text, line, column++);
