@@ -18,7 +18,7 @@ QString Tip(std::size_t index) {
 
 }  // namespace
 
-ApplyBoxes::ApplyBoxes(ChannelEditor& editor, std::function<void()> clicked, QWidget* parent)
+ApplyBoxes::ApplyBoxes(ChannelEditor& editor, const std::function<void()>& clicked, QWidget* parent)
     : QGroupBox(QStringLiteral("Channels to Apply Changes"), parent), editor_(editor) {
   setObjectName(QStringLiteral("fraApplyChans"));
   QGridLayout* grid = MakeChannelColumns(this);

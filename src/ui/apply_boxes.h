@@ -16,7 +16,7 @@ namespace tendril {
 class ApplyBoxes : public QGroupBox {
  public:
   // Clicks go to `editor`, which must outlive the area; `clicked` is called after each.
-  ApplyBoxes(ChannelEditor& editor, std::function<void()> clicked, QWidget* parent = nullptr);
+  ApplyBoxes(ChannelEditor& editor, const std::function<void()>& clicked, QWidget* parent = nullptr);
 
   // Shows which boxes are ticked.
   void ShowTicks();

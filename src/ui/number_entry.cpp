@@ -14,7 +14,7 @@ constexpr QPoint kBesideText(200 / kFormUnitsPerPixel, 300 / kFormUnitsPerPixel)
 }  // namespace
 
 NumberEntry::NumberEntry(SummaryEditor& editor, TimerFactory& timers,
-                         std::function<void(std::size_t channel)> changed, QWidget& window)
+                         const std::function<void(std::size_t channel)>& changed, QWidget& window)
     : QFrame(&window),
       editor_(editor),
       tmrAdjustDual_(timers.CreateTimer([this] { OnAdjustDual(); })),

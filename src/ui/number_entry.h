@@ -20,8 +20,8 @@ namespace tendril {
 class NumberEntry : public QFrame {
  public:
   // `editor` must outlive it; `changed` is called after each change of a record. `window` owns it.
-  NumberEntry(SummaryEditor& editor, TimerFactory& timers, std::function<void(std::size_t channel)> changed,
-              QWidget& window);
+  NumberEntry(SummaryEditor& editor, TimerFactory& timers,
+              const std::function<void(std::size_t channel)>& changed, QWidget& window);
 
   // Opens beside `text`, which shows `field` of `channel`, 0 to 7.
   void OpenNumberEntry(std::size_t channel, SummaryField field, QWidget& text);

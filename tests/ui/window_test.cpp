@@ -389,7 +389,10 @@ TEST_F(Window, EveryControl_HasANameAndSaysWhatItDoes) {
     const std::string object = widget->objectName().toStdString();
     EXPECT_NE(object, "");
     EXPECT_FALSE(widget->toolTip().isEmpty()) << object;
-    const QString name = QAccessible::queryAccessibleInterface(widget)->text(QAccessible::Name);
+    QAccessibleInterface* accessible = QAccessible::queryAccessibleInterface(widget);
+    EXPECT_NE(accessible->role(), QAccessible::NoRole) << object;
+    EXPECT_NE(accessible->role(), QAccessible::Client) << object;
+    const QString name = accessible->text(QAccessible::Name);
     EXPECT_FALSE(name.isEmpty()) << object;
     EXPECT_FALSE(names.contains(name)) << object << " shares the name " << name.toStdString();
     names.insert(name);

@@ -89,7 +89,7 @@ void SummaryEditor::ApplySummaryEntry(std::size_t channel, std::optional<Summary
 
 std::string SummaryEditor::Title() const {
   if (!entry_) return {};
-  const std::string channel = "Channel " + std::to_string(entry_->channel + 1);
+  std::string channel = "Channel " + std::to_string(entry_->channel + 1);
   switch (entry_->field) {
     case SummaryField::kActualRange:
       return channel + " Actual Range";
