@@ -1,12 +1,9 @@
 // How close the program comes, over a paced pseudo-terminal, to the times that the protocol itself sets: a
 // send, a get, and the steps of a test sweep.
 #include <QAbstractButton>
-#include <QApplication>
 #include <cstddef>
 #include <cstdint>
 #include <cstdio>
-#include <cstdlib>
-#include <exception>
 #include <span>
 #include <stdexcept>
 #include <vector>
@@ -15,6 +12,7 @@
 #include "config/option_bytes.h"
 #include "measured_window.h"
 #include "measuring.h"
+#include "run_benchmark.h"
 #include "simulator/servo_simulator.h"
 
 namespace tendril {
@@ -145,13 +143,4 @@ bool MeasureAll() {
 }  // namespace
 }  // namespace tendril
 
-int main(int argc, char** argv) {
-  if (!qEnvironmentVariableIsSet("QT_QPA_PLATFORM")) qputenv("QT_QPA_PLATFORM", "offscreen");
-  QApplication application(argc, argv);
-  try {
-    return tendril::MeasureAll() ? EXIT_SUCCESS : EXIT_FAILURE;
-  } catch (const std::exception& fault) {
-    std::printf("%s\n", fault.what());
-    return EXIT_FAILURE;
-  }
-}
+int main(int argc, char** argv) { return tendril::RunBenchmark(argc, argv, tendril::MeasureAll); }

@@ -10,8 +10,6 @@
 #include <array>
 #include <cmath>
 #include <cstdio>
-#include <cstdlib>
-#include <exception>
 #include <functional>
 #include <set>
 #include <stdexcept>
@@ -19,6 +17,7 @@
 #include <vector>
 
 #include "measuring.h"
+#include "run_benchmark.h"
 #include "serial/hw_serial.h"
 #include "simulator/servo_simulator.h"
 #include "support/simulated_world.h"
@@ -292,19 +291,14 @@ bool MeasurePainting(EditedWindow& window) {
   return ratio <= kMaxRatio;
 }
 
+bool MeasureAll() {
+  EditedWindow window;
+  const bool edits_fast = MeasureEdit(window);
+  const bool paints_fast = MeasurePainting(window);
+  return edits_fast && paints_fast;
+}
+
 }  // namespace
 }  // namespace tendril
 
-int main(int argc, char** argv) {
-  if (!qEnvironmentVariableIsSet("QT_QPA_PLATFORM")) qputenv("QT_QPA_PLATFORM", "offscreen");
-  QApplication application(argc, argv);
-  try {
-    tendril::EditedWindow window;
-    const bool edits_fast = tendril::MeasureEdit(window);
-    const bool paints_fast = tendril::MeasurePainting(window);
-    return edits_fast && paints_fast ? EXIT_SUCCESS : EXIT_FAILURE;
-  } catch (const std::exception& fault) {
-    std::printf("%s\n", fault.what());
-    return EXIT_FAILURE;
-  }
-}
+int main(int argc, char** argv) { return tendril::RunBenchmark(argc, argv, tendril::MeasureAll); }
