@@ -23,6 +23,7 @@ class CountingDevice final : public SerialDevice {
     device_.SetEventHandler(std::move(handler));
   }
   bool Exists(std::int32_t number) const override { return device_.Exists(number); }
+  std::string Describe(std::int32_t number) const override { return device_.Describe(number); }
   void SetSettings(const std::string& settings) override { device_.SetSettings(settings); }
   void SetPortNumber(std::int32_t number) override { device_.SetPortNumber(number); }
   void SetLineOptions(const LineOptions& options) override { device_.SetLineOptions(options); }

@@ -5,6 +5,8 @@ cd "$(dirname "${BASH_SOURCE[0]}")/.."
 # What building, running and testing needs on Debian 12 and its relatives.
 build_packages=(g++ cmake ninja-build qt6-base-dev qt6-serialport-dev libgl-dev libgtest-dev libgmock-dev
                 fonts-dejavu-core)
+# What building and testing for Windows needs; GoogleTest is compiled along.
+windows_packages=(cmake ninja-build g++-mingw-w64-x86-64-posix googletest wine64)
 check_packages=(clang-format-14 clang-tidy-14)
 
 say() { printf '%s\n' "== $*" >&2; }

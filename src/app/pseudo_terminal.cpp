@@ -110,10 +110,14 @@ std::uint32_t PseudoTerminal::ProgramBaud() const {
 
 #ifdef __linux__
 
-bool PseudoTerminal::ProgramHasGone() const {
+void PseudoTerminal::ForgetClosings() const {
   alignas(inotify_event) char events[4096];
   while (::read(closings_, events, sizeof events) > 0) {
   }
+}
+
+bool PseudoTerminal::ProgramHasGone() const {
+  ForgetClosings();
   if (OpenElsewhere()) return false;
   ::tcflush(near_end_, TCIOFLUSH);
   ::tcflush(far_end_, TCIFLUSH);
@@ -142,6 +146,7 @@ bool PseudoTerminal::OpenElsewhere() const {
 
 #else
 
+void PseudoTerminal::ForgetClosings() const {}
 bool PseudoTerminal::ProgramHasGone() const { return false; }
 bool PseudoTerminal::OpenElsewhere() const { return false; }
 

@@ -42,6 +42,9 @@ class PseudoTerminal {
   // To be called when closing_descriptor() is readable. True when no program has the device open any more:
   // what nobody has read yet, at either end, is dropped then, and the device is as at the beginning.
   bool ProgramHasGone() const;
+  // Forgets who has closed the device so far. To be called when this process itself has just let go of it: the
+  // next program may be there already.
+  void ForgetClosings() const;
 
  private:
   void MakeRaw() const;

@@ -103,6 +103,7 @@ class VirtualPorts::Device final : public SerialDevice {
 
   void SetEventHandler(std::function<void(SerialEvent)> handler) override { handler_ = std::move(handler); }
   bool Exists(std::int32_t number) const override;
+  std::string Describe(std::int32_t number) const override;
 
   void SetSettings(const std::string& settings) override;
   void SetPortNumber(std::int32_t number) override;
@@ -149,6 +150,10 @@ class VirtualPorts::Device final : public SerialDevice {
   bool overflowed_ = false;  // kReceiveOverflow is due
   bool lost_ = false;        // kDeviceLost is due; port_ is null then
 };
+
+std::string VirtualPorts::Device::Describe(std::int32_t number) const {
+  return Exists(number) ? "Virtual serial line " + std::to_string(number) : std::string();
+}
 
 bool VirtualPorts::Device::Exists(std::int32_t number) const {
   const auto port = ports_.ports_.find(number);

@@ -21,6 +21,15 @@ Bytes AnsiBytes(std::u16string_view text) {
   return bytes;
 }
 
+std::u16string AnsiText(std::span<const std::uint8_t> bytes) {
+  const auto* data = reinterpret_cast<const char*>(bytes.data());
+  const int length = static_cast<int>(bytes.size());
+  const int size = MultiByteToWideChar(CP_ACP, 0, data, length, nullptr, 0);
+  std::u16string text(static_cast<std::size_t>(size), u'\0');
+  MultiByteToWideChar(CP_ACP, 0, data, length, reinterpret_cast<wchar_t*>(text.data()), size);
+  return text;
+}
+
 #else
 
 namespace {
@@ -46,6 +55,14 @@ Bytes AnsiBytes(std::u16string_view text) {
   Bytes bytes(text.size());
   std::transform(text.begin(), text.end(), bytes.begin(), AnsiByte);
   return bytes;
+}
+
+std::u16string AnsiText(std::span<const std::uint8_t> bytes) {
+  std::u16string text(bytes.size(), u'\0');
+  std::transform(bytes.begin(), bytes.end(), text.begin(), [](std::uint8_t byte) -> char16_t {
+    return byte >= 0x80 && byte < 0xA0 ? kHighControls[byte - 0x80U] : byte;
+  });
+  return text;
 }
 
 #endif

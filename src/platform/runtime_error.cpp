@@ -14,6 +14,16 @@ void RuntimeError::SetHelp(std::string file, std::int32_t context) {
 
 void RuntimeError::AddLine(std::string_view line) { description_.append("\r\n").append(line); }
 
+RuntimeError CurrentFault() {
+  try {
+    throw;
+  } catch (const RuntimeError& error) {
+    return error;
+  } catch (...) {
+    return {kErrInternal, DescribeCurrentFault()};
+  }
+}
+
 std::string DescribeCurrentFault() {
   try {
     throw;

@@ -52,6 +52,10 @@ class RuntimeError : public std::exception {
   std::int32_t help_context_ = 0;
 };
 
+// The exception that is being handled; one that is no RuntimeError becomes one (kErrInternal) with its own
+// description. Call it in a catch block only.
+RuntimeError CurrentFault();
+
 // Describes the exception that is being handled: a RuntimeError's description, any other exception's what(),
 // or "Unknown error". Call it in a catch block only.
 std::string DescribeCurrentFault();

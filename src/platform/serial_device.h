@@ -41,6 +41,10 @@ class SerialDevice {
   // Whether a device stands behind port `number` (1 = the first). Does not open it.
   virtual bool Exists(std::int32_t number) const = 0;
 
+  // Which device stands behind port `number`, for a person: what its maker calls it, as far as that is known,
+  // and its path, as in "FT232R USB UART, FTDI, /dev/ttyUSB0". Empty when there is none. Does not open it.
+  virtual std::string Describe(std::int32_t number) const = 0;
+
   // The settings text, "speed,parity,data bits,stop bits" as in "19200,N,8,1". Raises
   // kErrInvalidPropertyValue for a text without a speed and kErrSettingsRefused for one that the port cannot
   // do.

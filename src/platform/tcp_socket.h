@@ -20,6 +20,9 @@ struct TcpEvents {
   std::function<void(std::int32_t number, const std::string& description)> ended;
 };
 
+// The states of a socket that its owner tells apart, with the numbers of the platform's published list.
+enum class TcpState : std::int32_t { kClosed = 0, kConnecting = 6, kConnected = 7 };
+
 // One connection at a time; Connect() may be called again after the connection has ended.
 class TcpSocket {
  public:
@@ -31,10 +34,15 @@ class TcpSocket {
   virtual void Connect(const std::string& host, std::uint16_t port) = 0;
   // Closes at once, without an event; what was sent before still goes out.
   virtual void Close() = 0;
-  virtual bool IsConnected() const = 0;
+  // As its owner knows it: it changes with Connect(), Close() and the events.
+  virtual TcpState State() const = 0;
+  // The local port that the next Connect() uses; 0, as in a fresh socket, lets the system choose.
+  virtual void SetLocalPort(std::uint16_t port) = 0;
+  // The local port of the connection; without one, what SetLocalPort() set.
+  virtual std::uint16_t LocalPort() const = 0;
   // Queues all of `bytes`. Ignored when not connected.
   virtual void Send(std::span<const std::uint8_t> bytes) = 0;
-  // Takes at most `limit` bytes of what has arrived. What is not taken is held back at the sender once a
+  // Takes at most `limit` bytes of what has arrived; empty when there is nothing more. What is not taken is held back at the sender once a
   // bounded buffer is full.
   virtual Bytes Receive(std::size_t limit) = 0;
 };

@@ -1,21 +1,8 @@
 #include "prefs/saved_err.h"
 
 namespace tendril {
-namespace {
 
-RuntimeError CurrentError() {
-  try {
-    throw;
-  } catch (const RuntimeError& error) {
-    return error;
-  } catch (...) {
-    return {kErrInternal, DescribeCurrentFault()};
-  }
-}
-
-}  // namespace
-
-SavedErr::SavedErr() : error_(CurrentError()) {}
+SavedErr::SavedErr() : error_(CurrentFault()) {}
 
 void SavedErr::Raise() const { throw RuntimeError(error_); }
 

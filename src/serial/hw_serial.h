@@ -79,6 +79,8 @@ class HwSerial {
   void SetBaudRate(std::int32_t baud);
   // Whether a device stands behind port `number`. Does not open it.
   bool ComPortExists(std::int16_t number) const { return device_.Exists(number); }
+  // Which device that is, for a person; empty when it does not exist.
+  std::string DescribeComPort(std::int16_t number) const { return device_.Describe(number); }
   // Whether the port is open.
   bool PortOpen() const { return port_open_; }
   // True opens the port with the current settings, and does nothing when it is open with them already or when

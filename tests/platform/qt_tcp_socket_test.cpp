@@ -22,7 +22,7 @@ TEST(QtTcpSocket, RefusedAttempt_EndsOnce) {
     QtTcpSocket socket([](const std::string& fault) { ADD_FAILURE() << fault; });
     socket.SetEvents({[&] { events.push_back("connected"); }, [&] { events.push_back("data"); },
                       [&](std::int32_t number, const std::string& description) {
-                        EXPECT_FALSE(socket.IsConnected());
+                        EXPECT_EQ(socket.State(), TcpState::kClosed);
                         events.push_back(std::to_string(number) + (description.empty() ? " untold" : ""));
                       }});
     const std::uint16_t port = ClosedPort();
@@ -44,7 +44,7 @@ TEST(QtTcpSocket, Bytes_PassBothWaysUntilThePeerCloses) {
   socket.SetEvents(
       {{}, [&] { received = socket.Receive(100); }, [&](std::int32_t number, const auto&) { end = number; }});
   socket.Connect("127.0.0.1", server.serverPort());
-  ASSERT_TRUE(WaitFor([&] { return socket.IsConnected() && server.hasPendingConnections(); }));
+  ASSERT_TRUE(WaitFor([&] { return socket.State() == TcpState::kConnected && server.hasPendingConnections(); }));
   QTcpSocket* peer = server.nextPendingConnection();
   socket.Send(Bytes{0, 1, 255});
   EXPECT_TRUE(WaitFor([&] { return peer->bytesAvailable() == 3; }));

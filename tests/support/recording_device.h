@@ -17,6 +17,7 @@ class RecordingDevice final : public SerialDevice {
  public:
   void SetEventHandler(std::function<void(SerialEvent)> handler) override { handler_ = std::move(handler); }
   bool Exists(std::int32_t number) const override { return number == 1 || number == 3; }
+  std::string Describe(std::int32_t /*number*/) const override { return {}; }
   void SetSettings(const std::string& settings) override {
     actions.push_back("settings " + settings);
     if (settings.front() == ',') throw RuntimeError(kErrInvalidPropertyValue, "Invalid property value");

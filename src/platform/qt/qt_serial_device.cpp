@@ -1,6 +1,8 @@
 #include "platform/qt/qt_serial_device.h"
 
+#include <QSerialPortInfo>
 #include <QString>
+#include <QStringList>
 #include <algorithm>
 #include <charconv>
 #include <string_view>
@@ -39,6 +41,15 @@ void QtSerialDevice::SetEventHandler(std::function<void(SerialEvent)> handler) {
 }
 
 bool QtSerialDevice::Exists(std::int32_t number) const { return FindSerialDevice(number).has_value(); }
+
+std::string QtSerialDevice::Describe(std::int32_t number) const {
+  const auto device = FindSerialDevice(number);
+  if (!device) return {};
+  const QSerialPortInfo info(QString::fromStdString(device->filename().string()));
+  QStringList parts{info.description(), info.manufacturer(), QString::fromStdString(device->string())};
+  parts.removeAll(QString());
+  return parts.join(QStringLiteral(", ")).toStdString();
+}
 
 void QtSerialDevice::SetSettings(const std::string& settings) {
   const std::string_view text = settings;

@@ -30,6 +30,7 @@ class QtSerialDevice final : public SerialDevice {
 
   void SetEventHandler(std::function<void(SerialEvent)> handler) override;
   bool Exists(std::int32_t number) const override;
+  std::string Describe(std::int32_t number) const override;
 
   // Also raises kErrSettingsRefused for anything but no parity, 8 data bits and 1 stop bit. On an open port
   // the speed changes at once.

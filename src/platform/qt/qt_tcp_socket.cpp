@@ -104,7 +104,10 @@ void QtTcpSocket::Close() {
   end_noted_.reset();
 }
 
-bool QtTcpSocket::IsConnected() const { return connected_; }
+TcpState QtTcpSocket::State() const {
+  if (connected_) return TcpState::kConnected;
+  return socket_ ? TcpState::kConnecting : TcpState::kClosed;
+}
 
 void QtTcpSocket::Send(std::span<const std::uint8_t> bytes) {
   if (!connected_ || socket_->state() != QAbstractSocket::ConnectedState) return;

@@ -24,14 +24,11 @@ class QtTcpSocket final : public TcpSocket {
   // Ends a connection or attempt that there still is, as Close() does.
   void Connect(const std::string& host, std::uint16_t port) override;
   void Close() override;
-  bool IsConnected() const override;
+  TcpState State() const override;
+  void SetLocalPort(std::uint16_t port) override { local_port_ = port; }
+  std::uint16_t LocalPort() const override;
   void Send(std::span<const std::uint8_t> bytes) override;
   Bytes Receive(std::size_t limit) override;
-
-  // The local port that the next Connect() uses; 0, as in a fresh socket, lets the system choose.
-  void SetLocalPort(std::uint16_t port) { local_port_ = port; }
-  // The local port of the connection; without one, what SetLocalPort() set.
-  std::uint16_t LocalPort() const;
 
  private:
   // Why an attempt or a connection ended.

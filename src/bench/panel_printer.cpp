@@ -1,0 +1,85 @@
+#include "bench/panel_printer.h"
+
+#include <algorithm>
+#include <cstdio>
+#include <optional>
+
+namespace tendril {
+namespace {
+
+constexpr std::size_t kShownBytes = 24;  // more than any frame but those with a text or lighting data
+constexpr std::size_t kHexWidth = 47;    // as on a serial line
+
+std::string HexList(std::span<const std::uint8_t> bytes) {
+  std::string text;
+  for (const std::uint8_t byte : bytes.first(std::min(bytes.size(), kShownBytes))) {
+    char hex[4];
+    std::snprintf(hex, sizeof hex, text.empty() ? "%02X" : " %02X", byte);
+    text += hex;
+  }
+  if (bytes.size() > kShownBytes) text += " ... (" + std::to_string(bytes.size()) + " bytes)";
+  return text;
+}
+
+std::string Printable(std::span<const std::uint8_t> text) {
+  std::string printable;
+  for (const std::uint8_t byte : text.first(std::min(text.size(), kShownBytes))) {
+    printable += byte >= ' ' && byte < 0x7F ? static_cast<char>(byte) : '.';
+  }
+  return printable;
+}
+
+std::string CountBytes(std::size_t count) {
+  return std::to_string(count) + (count == 1 ? " byte" : " bytes");
+}
+
+std::string OnOff(std::uint8_t value) { return value != 0 ? "on" : "off"; }
+
+std::string DescribeRequest(const PanelRequest& request) {
+  const Bytes& payload = request.payload;
+  const std::string sized = ", " + CountBytes(payload.size());
+  switch (request.identifier) {
+    case 'I':
+      return "here is \"" + Printable(payload) + "\"";
+    case 'C':
+      if (payload.size() != 2) return "port control" + sized;
+      return (payload[1] != 0 ? "take back Comm " : "give up Comm ") + std::to_string(payload[0]);
+    case 'P':
+      return "physical lights control " + (payload.size() == 1 ? OnOff(payload[0]) : sized.substr(2));
+    case 'A':
+      return "all lights off on disconnect";
+    case 'L':
+      return "lighting data" + sized;
+    default:
+      return "unknown" + sized;
+  }
+}
+
+}  // namespace
+
+std::string DescribePanelBytes(PanelSide from, std::span<const std::uint8_t> bytes) {
+  const std::optional<PanelRequest> frame = ParsePanelFrame(bytes);
+  if (from == PanelSide::kPanel) {
+    if (!frame) return CountBytes(bytes.size());
+    const std::string reply = std::string("reply to ") + static_cast<char>(frame->sequence) + ": ";
+    if (frame->identifier == '1') return reply + "done";
+    return reply + (frame->identifier == '0' ? "refused" : "neither done nor refused");
+  }
+  if (!frame) return "no request";
+  std::string text = std::string("request ") + static_cast<char>(frame->sequence) + ": ";
+  if (!frame->nested) return text + DescribeRequest(*frame);
+  const std::optional<PanelRequest> inner = ParsePanelFrame(frame->payload);
+  return text + "repeats " + static_cast<char>(inner->sequence) +
+         " inside, to no effect: " + DescribeRequest(*inner);
+}
+
+std::string PrintPanelBytes(std::uint64_t at_us, PanelSide from, std::span<const std::uint8_t> bytes) {
+  char time_and_side[32];
+  std::snprintf(time_and_side, sizeof time_and_side, "%12.6f  %-9s", static_cast<double>(at_us) / 1e6,
+                from == PanelSide::kProgram ? "program" : "panel");
+  std::string hex = HexList(bytes);
+  hex.resize(std::max(hex.size(), kHexWidth), ' ');
+  return time_and_side + hex + "  " + DescribePanelBytes(from, bytes);
+}
+
+}  // namespace tendril

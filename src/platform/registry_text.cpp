@@ -1,0 +1,393 @@
+#include "platform/registry_text.h"
+
+#include <algorithm>
+#include <optional>
+#include <utility>
+
+#include "platform/registry_store.h"
+#include "platform/unicode.h"
+
+namespace tendril {
+namespace {
+
+constexpr std::u16string_view kEditorHeader = u"Windows Registry Editor Version 5.00";
+constexpr std::u16string_view kOldHeader = u"REGEDIT4";
+constexpr std::string_view kUtf16Mark = "\xFF\xFE";
+constexpr std::string_view kUtf8Mark = "\xEF\xBB\xBF";
+
+std::u16string Decode(std::string_view bytes, RegistryEncoding& encoding) {
+  if (!bytes.starts_with(kUtf16Mark)) {
+    encoding = bytes.starts_with(kUtf8Mark) ? RegistryEncoding::kUtf8WithMark : RegistryEncoding::kUtf8;
+    if (encoding == RegistryEncoding::kUtf8WithMark) bytes.remove_prefix(kUtf8Mark.size());
+    return Utf16(bytes);
+  }
+  encoding = RegistryEncoding::kUtf16;
+  bytes.remove_prefix(kUtf16Mark.size());
+  std::u16string text(bytes.size() / 2, u'\0');
+  for (std::size_t i = 0; i < text.size(); ++i) {
+    text[i] = static_cast<char16_t>(static_cast<std::uint8_t>(bytes[2 * i]) |
+                                    static_cast<std::uint8_t>(bytes[2 * i + 1]) << 8);
+  }
+  return text;
+}
+
+void AppendUtf16(Bytes& bytes, std::u16string_view text) {
+  for (const char16_t unit : text) {
+    bytes.push_back(static_cast<std::uint8_t>(unit & 0xFF));
+    bytes.push_back(static_cast<std::uint8_t>(unit >> 8));
+  }
+}
+
+Bytes Encode(std::u16string_view text, RegistryEncoding encoding) {
+  Bytes bytes;
+  if (encoding == RegistryEncoding::kUtf16) {
+    bytes.reserve(kUtf16Mark.size() + 2 * text.size());
+    bytes.assign(kUtf16Mark.begin(), kUtf16Mark.end());
+    AppendUtf16(bytes, text);
+    return bytes;
+  }
+  if (encoding == RegistryEncoding::kUtf8WithMark) bytes.assign(kUtf8Mark.begin(), kUtf8Mark.end());
+  const std::string utf8 = Utf8(text);
+  bytes.insert(bytes.end(), utf8.begin(), utf8.end());
+  return bytes;
+}
+
+// What separates words, and begins the next line of a value.
+bool IsBlank(char16_t unit) { return unit == u' ' || unit == u'\t'; }
+
+std::u16string_view Trimmed(std::u16string_view text) {
+  while (!text.empty() && IsBlank(text.front())) text.remove_prefix(1);
+  while (!text.empty() && IsBlank(text.back())) text.remove_suffix(1);
+  return text;
+}
+
+// Takes `prefix` off the front of `text`, if it is there.
+bool Take(std::u16string_view& text, std::u16string_view prefix) {
+  if (!text.starts_with(prefix)) return false;
+  text.remove_prefix(prefix.size());
+  return true;
+}
+
+// The value of exactly `digits` hexadecimal digits, taken off the front of `text`.
+std::optional<std::uint32_t> TakeHex(std::u16string_view& text, std::size_t digits) {
+  if (text.size() < digits) return std::nullopt;
+  std::uint32_t value = 0;
+  for (const char16_t unit : text.substr(0, digits)) {
+    value <<= 4;
+    if (unit >= u'0' && unit <= u'9') {
+      value += static_cast<std::uint32_t>(unit - u'0');
+    } else if (unit >= u'a' && unit <= u'f') {
+      value += static_cast<std::uint32_t>(unit - u'a' + 10);
+    } else if (unit >= u'A' && unit <= u'F') {
+      value += static_cast<std::uint32_t>(unit - u'A' + 10);
+    } else {
+      return std::nullopt;
+    }
+  }
+  text.remove_prefix(digits);
+  return value;
+}
+
+// The text between quotes at the front of `text`, taken off it with them. A backslash that escapes nothing stands for
+// itself.
+std::optional<std::u16string> TakeQuoted(std::u16string_view& text) {
+  if (!Take(text, u"\"")) return std::nullopt;
+  std::u16string quoted;
+  while (!text.empty()) {
+    const char16_t unit = text.front();
+    text.remove_prefix(1);
+    if (unit == u'"') return quoted;
+    if (unit == u'\\' && Take(text, u"n")) {
+      quoted += u'\n';
+    } else if (unit == u'\\' && Take(text, u"r")) {
+      quoted += u'\r';
+    } else if (unit == u'\\' && (text.starts_with(u'\\') || text.starts_with(u'"'))) {
+      quoted += text.front();
+      text.remove_prefix(1);
+    } else {
+      quoted += unit;
+    }
+  }
+  return std::nullopt;
+}
+
+std::optional<RegistryValue> ReadText(std::u16string_view data) {
+  std::optional<std::u16string> text = TakeQuoted(data);
+  if (!text || !data.empty()) return std::nullopt;
+  text->push_back(u'\0');
+  RegistryValue value{kRegSz, {}};
+  AppendUtf16(value.data, *text);
+  return value;
+}
+
+std::optional<RegistryValue> ReadNumber(std::u16string_view data) {
+  const std::optional<std::uint32_t> number = TakeHex(data, 8);
+  if (!number || !data.empty()) return std::nullopt;
+  RegistryValue value{kRegDword, {}};
+  for (const int shift : {0, 8, 16, 24})
+    value.data.push_back(static_cast<std::uint8_t>(*number >> shift & 0xFF));
+  return value;
+}
+
+// What stands behind "hex".
+std::optional<RegistryValue> ReadHex(std::u16string_view data) {
+  RegistryValue value{kRegBinary, {}};
+  if (Take(data, u"(")) {
+    const std::size_t end = data.find(u')');
+    if (end == 0 || end > 8) return std::nullopt;
+    const std::optional<std::uint32_t> type = TakeHex(data, end);
+    if (!type) return std::nullopt;
+    value.type = *type;
+    data.remove_prefix(1);
+  }
+  if (!Take(data, u":")) return std::nullopt;
+  for (bool first = true; !data.empty(); first = false) {
+    if (!first && !Take(data, u",")) return std::nullopt;
+    const std::optional<std::uint32_t> byte = TakeHex(data, 2);
+    if (!byte) return std::nullopt;
+    value.data.push_back(static_cast<std::uint8_t>(*byte));
+  }
+  return value;
+}
+
+// Reads line after line.
+class Reader {
+ public:
+  Reader(RegistryForm& form, RegistryTree& tree, const UnreadLineSink& unread)
+      : form_(form), tree_(tree), unread_(unread) {}
+
+  void Read(std::u16string_view text);
+
+ private:
+  // The next line, without its end and the blanks at either side.
+  std::u16string_view NextLine();
+  void ReadHeader();
+  bool ReadLine(std::u16string_view line);
+  bool ReadKey(std::u16string_view line);
+  bool ReadValue(std::u16string_view line);
+
+  RegistryForm& form_;
+  RegistryTree& tree_;
+  const UnreadLineSink& unread_;
+  std::u16string_view rest_;
+  std::size_t line_number_ = 0;  // of the line read last
+  bool line_has_end_ = false;
+  RegistryKey* key_ = nullptr;  // that the lines belong to
+};
+
+std::u16string_view Reader::NextLine() {
+  const std::size_t end = rest_.find(u'\n');
+  std::u16string_view line = rest_.substr(0, end);
+  line_has_end_ = end != rest_.npos;
+  rest_.remove_prefix(line_has_end_ ? end + 1 : rest_.size());
+  ++line_number_;
+  if (line.ends_with(u'\r')) line.remove_suffix(1);
+  return Trimmed(line);
+}
+
+void Reader::ReadHeader() {
+  const std::size_t end = rest_.find(u'\n');
+  if (end != rest_.npos && (end == 0 || rest_[end - 1] != u'\r')) form_.line_end = u"\n";
+  const std::u16string_view at_first_line = rest_;
+  const std::u16string_view line = NextLine();
+  if (line == kEditorHeader || line == kOldHeader) {
+    form_.header = line;
+  } else {
+    rest_ = at_first_line;
+    line_number_ = 0;
+  }
+}
+
+void Reader::Read(std::u16string_view text) {
+  rest_ = text;
+  ReadHeader();
+  while (!rest_.empty()) {
+    std::u16string_view line = NextLine();
+    const std::size_t first_number = line_number_;
+    const char16_t* const begin = line.data();
+    std::u16string joined;
+    bool read = false;
+    if (line.starts_with(u'"') || line.starts_with(u'@')) {
+      if (line.ends_with(u'\\') && !rest_.empty() && IsBlank(rest_.front())) joined = line;
+      while (joined.ends_with(u'\\') && !rest_.empty() && IsBlank(rest_.front())) {
+        joined.pop_back();
+        line = NextLine();
+        joined += line;
+      }
+      read = ReadValue(joined.empty() ? line : joined);
+    } else {
+      read = ReadLine(line);
+    }
+    if (read) continue;
+    // What was passed over is kept as it stands.
+    const std::u16string_view whole(begin, static_cast<std::size_t>(line.data() + line.size() - begin));
+    (key_ != nullptr ? key_->other_lines : form_.lines_outside).emplace_back(whole);
+    if (!whole.starts_with(u';')) unread_(first_number);
+  }
+}
+
+bool Reader::ReadLine(std::u16string_view line) {
+  if (line.empty()) return true;
+  if (!line.starts_with(u'[')) return false;
+  key_ = nullptr;  // below a key that cannot be read, nothing can
+  return ReadKey(line);
+}
+
+bool Reader::ReadKey(std::u16string_view line) {
+  if (line.size() < 3 || !line.ends_with(u']')) return false;
+  line = line.substr(1, line.size() - 2);
+  if (Take(line, u"-")) {
+    tree_.Remove(line);
+    return true;
+  }
+  key_ = tree_.Create(line);
+  return key_ != nullptr;
+}
+
+bool Reader::ReadValue(std::u16string_view line) {
+  if (key_ == nullptr) return false;
+  std::optional<std::u16string> name = Take(line, u"@") ? std::u16string() : TakeQuoted(line);
+  line = Trimmed(line);
+  if (!name || !Take(line, u"=")) return false;
+  line = Trimmed(line);
+  if (line == u"-") {
+    key_->values.erase(*name);
+    return true;
+  }
+  std::optional<RegistryValue> value;
+  if (line.starts_with(u'"')) {
+    value = ReadText(line);
+  } else if (Take(line, u"dword:")) {
+    value = ReadNumber(line);
+  } else if (Take(line, u"hex") && line_has_end_) {
+    // Of a file that was cut off, nobody can tell whether its last bytes are all there.
+    value = ReadHex(line);
+  }
+  if (!value) return false;
+  key_->values.insert_or_assign(*std::move(name), *std::move(value));
+  return true;
+}
+
+// The text of data that can be written between quotes: a line's worth of characters and their terminator.
+std::optional<std::u16string> PlainText(const RegistryValue& value) {
+  const Bytes& data = value.data;
+  if (value.type != kRegSz || data.size() % 2 != 0 || data.empty()) return std::nullopt;
+  std::u16string text;
+  for (std::size_t i = 0; i < data.size(); i += 2) {
+    text += static_cast<char16_t>(data[i] | data[i + 1] << 8);
+  }
+  if (text.back() != u'\0') return std::nullopt;
+  text.pop_back();
+  const bool has_controls = std::any_of(text.begin(), text.end(), [](char16_t unit) { return unit < u' '; });
+  if (has_controls || Utf16(Utf8(text)) != text) return std::nullopt;
+  return text;
+}
+
+std::u16string HexDigits(std::uint32_t value, int digits) {
+  std::u16string text;
+  for (int shift = 4 * (digits - 1); shift >= 0; shift -= 4)
+    text += u"0123456789abcdef"[value >> shift & 0xF];
+  return text;
+}
+
+// Writes line after line.
+class Writer {
+ public:
+  explicit Writer(std::u16string_view line_end) : line_end_(line_end) {}
+
+  void Line(std::u16string_view line) { text_.append(line).append(line_end_); }
+  void Lines(const std::vector<std::u16string>& lines) {
+    for (const std::u16string& line : lines) Line(line);
+  }
+  // `path` is the key's own.
+  void Key(const std::u16string& path, const RegistryKey& key);
+
+  const std::u16string& text() const { return text_; }
+
+ private:
+  void Quoted(std::u16string_view text);
+  void Value(std::u16string_view name, const RegistryValue& value);
+  void Hex(const RegistryValue& value);
+
+  std::u16string_view line_end_;
+  std::u16string text_;
+};
+
+void Writer::Quoted(std::u16string_view text) {
+  text_ += u'"';
+  for (const char16_t unit : text) {
+    if (unit == u'\\' || unit == u'"' || unit == u'\n' || unit == u'\r') text_ += u'\\';
+    text_ += unit == u'\n' ? u'n' : unit == u'\r' ? u'r' : unit;
+  }
+  text_ += u'"';
+}
+
+void Writer::Hex(const RegistryValue& value) {
+  text_ += u"hex";
+  if (value.type != kRegBinary) {
+    text_.append(u"(").append(HexDigits(value.type, value.type < 0x10 ? 1 : 8)).append(u")");
+  }
+  text_ += u':';
+  constexpr std::size_t kBytesPerLine = 25;  // as in an export
+  for (std::size_t i = 0; i < value.data.size(); ++i) {
+    if (i != 0) text_ += u',';
+    if (i != 0 && i % kBytesPerLine == 0) text_.append(u"\\").append(line_end_).append(u"  ");
+    text_ += HexDigits(value.data[i], 2);
+  }
+  text_ += line_end_;
+}
+
+void Writer::Value(std::u16string_view name, const RegistryValue& value) {
+  if (name.empty()) {
+    text_ += u'@';
+  } else {
+    Quoted(name);
+  }
+  text_ += u'=';
+  const Bytes& data = value.data;
+  if (const std::optional<std::u16string> text = PlainText(value)) {
+    Quoted(*text);
+    text_ += line_end_;
+  } else if (value.type == kRegDword && data.size() == 4) {
+    text_ += u"dword:";
+    for (const std::size_t byte : {3U, 2U, 1U, 0U}) text_ += HexDigits(data[byte], 2);
+    text_ += line_end_;
+  } else {
+    Hex(value);
+  }
+}
+
+void Writer::Key(const std::u16string& path, const RegistryKey& key) {
+  // A key without anything of its own is there as a part of its subkeys' paths; a root key is there anyhow.
+  const bool is_root = path.find(u'\\') == path.npos;
+  const bool has_content = !key.values.empty() || !key.other_lines.empty();
+  if (has_content || (key.subkeys.empty() && !is_root)) {
+    Line(u"");
+    Line(u"[" + path + u"]");
+    Lines(key.other_lines);
+    for (const auto& [name, value] : key.values) Value(name, value);
+  }
+  for (const auto& [name, subkey] : key.subkeys) Key(path + u"\\" + name, *subkey);
+}
+
+}  // namespace
+
+RegistryForm ReadRegistryText(std::span<const std::uint8_t> bytes, RegistryTree& tree,
+                              const UnreadLineSink& unread) {
+  RegistryForm form;
+  const std::u16string text =
+      Decode({reinterpret_cast<const char*>(bytes.data()), bytes.size()}, form.encoding);
+  Reader(form, tree, unread).Read(text);
+  return form;
+}
+
+Bytes WriteRegistryText(const RegistryForm& form, const RegistryTree& tree) {
+  Writer writer(form.line_end);
+  writer.Line(form.header);
+  writer.Lines(form.lines_outside);
+  for (const auto& [name, root] : tree.top().subkeys) writer.Key(name, *root);
+  writer.Line(u"");
+  return Encode(writer.text(), form.encoding);
+}
+
+}  // namespace tendril

@@ -1,0 +1,332 @@
+#include "bench/virtual_control_panel.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <map>
+#include <string>
+#include <string_view>
+#include <utility>
+
+#include "bench/panel_printer.h"
+#include "bench/virtual_tcp_socket.h"
+#include "support/simulated_time.h"
+
+namespace tendril {
+namespace {
+
+using namespace std::string_literals;
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::IsEmpty;
+using testing::Pair;
+
+Bytes Raw(std::string_view text) { return {text.begin(), text.end()}; }
+
+std::string Text(std::span<const std::uint8_t> bytes) { return {bytes.begin(), bytes.end()}; }
+
+constexpr std::string_view kPhysicalLightsOn = "P700001\1";
+
+// A panel that holds Comm 3, and a program that is connected to it.
+class VirtualControlPanelTest : public testing::Test {
+ protected:
+  VirtualControlPanelTest() {
+    panel_.AddPort(3);
+    panel_.SetPortHandler([this](std::uint8_t port, bool held) { port_changes_.emplace_back(port, held); });
+    panel_.SetTap([this](PanelSide from, std::span<const std::uint8_t> bytes) {
+      shown_ += (from == PanelSide::kProgram ? ">" : "<") + Text(bytes);
+    });
+  }
+
+  PanelConnection Connection() {
+    return {.send = [this](std::span<const std::uint8_t> bytes) { said_ += Text(bytes); },
+            .hang_up = [this] { said_ += "<end>"; }};
+  }
+
+  // What the panel says to `text` at once.
+  std::string Say(std::string_view text) {
+    session_.Receive(Raw(text));
+    return std::exchange(said_, {});
+  }
+
+  test::SimulatedTime time_;
+  VirtualControlPanel panel_{time_};
+  std::vector<std::pair<int, bool>> port_changes_;
+  std::string said_;
+  std::string shown_;
+  PanelSession session_{panel_, Connection()};
+};
+
+TEST_F(VirtualControlPanelTest, Requests_AreDoneOrRefused) {
+  const std::string two_records = "\3\0\x0B\0\1\0\2\0\5\0abcde\0"s + "\1\0\0\0"s;
+  const struct {
+    std::string request;
+    std::string reply;
+  } cases[] = {
+      {"I000015Tendril Utility", "1000000"},
+      {"C100002\3\0"s, "1100000"},
+      {"C200002\7\0"s, "1200000"},         // not one of its ports
+      {"C300009C200002\7\1"s, "1300000"},  // a repeated request
+      {"C400002\3\2", "0400000"},
+      {"C500001\3", "0500000"},
+      {"P600001\1", "1600000"},
+      {"P700001\2", "0700000"},
+      {"A800000", "1800000"},
+      {"A900001x", "0900000"},
+      {"L000020" + two_records, "1000000"},
+      {"L100019" + two_records.substr(0, 19), "0100000"},
+      {"L200016" + two_records.substr(0, 15) + "x", "0200000"},  // padded with something
+      {"Z300002??", "0300000"},
+  };
+  for (const auto& each : cases) EXPECT_EQ(Say(each.request), each.reply) << each.request;
+
+  EXPECT_EQ(panel_.requests().size(), std::size(cases));
+  EXPECT_EQ(panel_.requests()[0],
+            (PanelRequest{.identifier = 'I', .sequence = '0', .payload = Raw("Tendril Utility")}));
+  EXPECT_TRUE(panel_.requests()[3].nested);
+}
+
+TEST_F(VirtualControlPanelTest, Requests_ComeInAnyPieces) {
+  const std::string three = "C100002\3\0"s + "A200000" + "C300002\3\1";
+  EXPECT_EQ(Say(three), "110000012000001300000");
+  std::string byte_by_byte;
+  for (const char byte : three) byte_by_byte += Say({&byte, 1});
+  EXPECT_EQ(byte_by_byte, "110000012000001300000");
+  EXPECT_EQ(Say("I199999" + std::string(99'999, 'x')), "1100000");
+}
+
+TEST_F(VirtualControlPanelTest, Garbage_EndsTheConnectionAtItsFirstByte) {
+  for (const std::string begin : {"\1", "1", "Cx", "C0-", "C0000x"}) {
+    PanelSession session(panel_, Connection());
+    shown_.clear();
+    session.Receive(Raw("A100000" + begin));
+    EXPECT_EQ(std::exchange(said_, {}), "1100000<end>");
+    EXPECT_EQ(shown_, ">A100000<1100000>" + begin);
+    session.Receive(Raw("A200000"));
+    EXPECT_EQ(said_, "");
+  }
+}
+
+TEST_F(VirtualControlPanelTest, Port_IsGivenUpAndTakenBackOnce) {
+  EXPECT_TRUE(panel_.Holds(3));
+  Say("C000002\3\1");  // held anyway
+  Say("C100002\3\0"s);
+  EXPECT_FALSE(panel_.Holds(3));
+  Say("C200002\3\0"s);
+  Say("C300009C100002\3\1");  // repeated inside another: to no effect
+  Say("C400002\4\0"s);
+  { PanelSession(panel_, Connection()).Receive(Raw("C500002\3\1")); }  // whoever asks
+  EXPECT_TRUE(panel_.Holds(3));
+  EXPECT_FALSE(panel_.Holds(4));
+  EXPECT_THAT(port_changes_, ElementsAre(Pair(3, false), Pair(3, true)));
+}
+
+TEST_F(VirtualControlPanelTest, Behaviours_ShowInTheReply) {
+  const struct {
+    std::string_view name;
+    std::map<std::uint64_t, std::string> said;  // by the millisecond in which the last of it came
+  } cases[] = {
+      {"refuse", {{0, "0900000"}}},
+      {"silent", {}},
+      {"slow", {{600, "1900000"}}},
+      {"too-slow", {{1500, "1900000"}}},
+      {"byte-by-byte", {{50, "1"}, {100, "9"}, {150, "0"}, {200, "0"}, {250, "0"}, {300, "0"}, {350, "0"}}},
+      {"wrong-sequence", {{0, "1000000"}}},
+      {"wrong-identifier", {{0, "2900000"}}},
+      {"letter-in-length", {{0, "1900A00"}}},
+      {"close-in-middle", {{0, "190<end>"}}},
+  };
+  for (const auto& each : cases) {
+    SCOPED_TRACE(each.name);
+    panel_.SetBehaviour(FindPanelBehaviour(each.name)->behaviour, 1);
+    PanelSession session(panel_, Connection());
+    session.Receive(Raw("A900000"));
+    std::map<std::uint64_t, std::string> said;
+    for (std::uint64_t ms = 0; ms < 2000; ++ms) {
+      if (!said_.empty()) said[ms] = std::exchange(said_, {});
+      time_.Advance(1);
+    }
+    EXPECT_EQ(said, each.said);
+    EXPECT_EQ(Say("A200000"), "1200000");  // only the first reply was bad
+  }
+  EXPECT_EQ(std::size(cases) + 1, PanelBehaviourKinds().size());  // all but the flood
+  EXPECT_EQ(FindPanelBehaviour("polite"), nullptr);
+}
+
+TEST_F(VirtualControlPanelTest, Flood_IsFarMoreThanAFrameAndEndsWithTheConnection) {
+  panel_.SetBehaviour(PanelBehaviour::kFlood);
+  {
+    PanelSession session(panel_, Connection());
+    session.Receive(Raw("A400000"));
+    time_.Advance(500);
+    EXPECT_EQ(said_.substr(0, 7), "1499999");
+    EXPECT_GT(said_.size(), 900'000u);
+    session.Receive(Raw("A500000"));
+    EXPECT_EQ(time_.RunningTimers(), 1);
+  }
+  EXPECT_EQ(time_.RunningTimers(), 0);
+}
+
+TEST_F(VirtualControlPanelTest, Refused_IsNotDone) {
+  panel_.SetBehaviour(PanelBehaviour::kRefuse, 1);
+  Say("C100002\3\0"s);
+  EXPECT_TRUE(panel_.Holds(3));
+  panel_.SetBehaviour(PanelBehaviour::kSilent, 1);
+  Say("C100002\3\0"s);  // heard and done
+  EXPECT_FALSE(panel_.Holds(3));
+}
+
+TEST_F(VirtualControlPanelTest, SlowReplies_KeepTheirOrder) {
+  panel_.SetBehaviour(PanelBehaviour::kSlow, 1);
+  Say("A100000A200000");
+  time_.Advance(599);
+  EXPECT_EQ(said_, "");
+  time_.Advance(1);
+  EXPECT_EQ(said_, "11000001200000");
+}
+
+TEST(PanelPrinter, Lines_SayWhatTheBytesMean) {
+  const struct {
+    PanelSide from;
+    std::string bytes;
+    std::string meaning;
+  } cases[] = {
+      {PanelSide::kProgram, "C100002\3\0"s, "43 31 30 30 30 30 32 03 00  "},
+      {PanelSide::kProgram, "C100002\3\0"s, "request 1: give up Comm 3"},
+      {PanelSide::kProgram, "C200009C100002\3\1",
+       "request 2: repeats 1 inside, to no effect: take back Comm 3"},
+      {PanelSide::kProgram, "I000002a\n", "request 0: here is \"a.\""},
+      {PanelSide::kProgram, "P000001\1", "request 0: physical lights control on"},
+      {PanelSide::kProgram, "GE", "no request"},
+      {PanelSide::kPanel, "0100000", "reply to 1: refused"},
+      {PanelSide::kPanel, "19000", "5 bytes"},
+      {PanelSide::kPanel, std::string(10'000, 'x'), "78 78 ... (10000 bytes)"},
+  };
+  for (const auto& each : cases) {
+    EXPECT_THAT(PrintPanelBytes(1'500'000, each.from, Raw(each.bytes)), HasSubstr(each.meaning));
+  }
+}
+
+class VirtualTcpSocketTest : public testing::Test {
+ protected:
+  static constexpr std::uint16_t kPort = 8837;
+
+  VirtualTcpSocketTest() {
+    socket_.SetEvents(
+        {.connected = [this] { Note("connected"); },
+         .data_arrived = [this] { Note("data " + Text(socket_.Receive(7))); },
+         .ended = [this](std::int32_t number,
+                         const std::string& /*description*/) { Note("ended " + std::to_string(number)); }});
+  }
+
+  void Note(const std::string& event) {
+    EXPECT_FALSE(in_call_) << event;
+    events_.push_back(event);
+  }
+  // Calls the socket, which must not tell anything meanwhile.
+  template <typename Call>
+  void Quietly(const Call& call) {
+    in_call_ = true;
+    call();
+    in_call_ = false;
+  }
+  std::vector<std::string> EventsOf(std::uint64_t ms) {
+    time_.Advance(ms);
+    return std::exchange(events_, {});
+  }
+  void ConnectAndWait() {
+    Quietly([&] { socket_.Connect("127.0.0.1", kPort); });
+    ASSERT_THAT(EventsOf(5), ElementsAre("connected"));
+  }
+
+  test::SimulatedTime time_;
+  VirtualControlPanel panel_{time_};
+  VirtualTcpSocket socket_{panel_, kPort, time_};
+  std::vector<std::string> events_;
+  bool in_call_ = false;
+};
+
+TEST_F(VirtualTcpSocketTest, RequestAndReply_CrossAfterTheConnect) {
+  socket_.SetLocalPort(4000);
+  Quietly([&] { socket_.Connect("127.0.0.1", kPort); });
+  EXPECT_EQ(socket_.State(), TcpState::kConnecting);
+  socket_.Send(Raw(kPhysicalLightsOn));  // too early: ignored
+  EXPECT_THAT(EventsOf(5), ElementsAre("connected"));
+  EXPECT_EQ(socket_.State(), TcpState::kConnected);
+  EXPECT_EQ(socket_.LocalPort(), 4000);
+
+  Quietly([&] { socket_.Send(Raw(kPhysicalLightsOn)); });
+  EXPECT_THAT(EventsOf(5), ElementsAre("data 1700000"));
+  EXPECT_THAT(socket_.Receive(100), IsEmpty());
+  EXPECT_EQ(panel_.requests().size(), 1u);
+
+  Quietly([&] { socket_.Close(); });
+  EXPECT_THAT(EventsOf(100), IsEmpty());
+  EXPECT_EQ(panel_.connections(), 0u);
+  socket_.SetLocalPort(0);
+  ConnectAndWait();
+  EXPECT_NE(socket_.LocalPort(), 0);
+}
+
+TEST_F(VirtualTcpSocketTest, NoPanel_RefusesOrStaysSilent) {
+  const struct {
+    std::string host;
+    std::uint16_t port;
+    PanelListener listener;
+    std::vector<std::string> events;
+    TcpState state;
+  } cases[] = {
+      {"127.0.0.1", kPort, PanelListener::kOff, {"ended 10061"}, TcpState::kClosed},
+      {"127.0.0.1", 1, PanelListener::kOpen, {"ended 10061"}, TcpState::kClosed},
+      {"192.0.2.1", kPort, PanelListener::kOpen, {"ended 10061"}, TcpState::kClosed},
+      {"127.0.0.1", kPort, PanelListener::kStuck, {}, TcpState::kConnecting},
+  };
+  for (const auto& each : cases) {
+    panel_.SetListener(each.listener);
+    Quietly([&] { socket_.Connect(each.host, each.port); });
+    EXPECT_EQ(EventsOf(60'000), each.events);
+    EXPECT_EQ(socket_.State(), each.state);
+  }
+  EXPECT_EQ(time_.RunningTimers(), 0);
+  panel_.SetListener(PanelListener::kOpen);
+  ConnectAndWait();  // once more, from within an attempt
+}
+
+TEST_F(VirtualTcpSocketTest, PanelThatEnds_IsToldAfterItsLastWords) {
+  ConnectAndWait();
+  Quietly([&] {
+    socket_.Send(Raw(kPhysicalLightsOn));
+    panel_.SetListener(PanelListener::kOff);
+  });
+  EXPECT_EQ(socket_.State(), TcpState::kConnected);
+  EXPECT_THAT(EventsOf(5), ElementsAre("data 1700000", "ended 10054"));
+  EXPECT_EQ(socket_.State(), TcpState::kClosed);
+}
+
+TEST_F(VirtualTcpSocketTest, Close_LetsTheLastRequestThroughAndNoEvent) {
+  panel_.AddPort(3);
+  ConnectAndWait();
+  Quietly([&] {
+    socket_.Send(Raw("C100002\3\0"s));
+    socket_.Close();
+  });
+  EXPECT_FALSE(panel_.Holds(3));
+  EXPECT_THAT(EventsOf(100), IsEmpty());
+
+  // From within an event, with another one due.
+  ConnectAndWait();
+  TcpEvents reconnecting;
+  reconnecting.data_arrived = [this] {
+    Note("data");
+    socket_.Connect("127.0.0.1", kPort);
+  };
+  reconnecting.ended = [this](std::int32_t, const std::string&) { Note("ended"); };
+  socket_.SetEvents(std::move(reconnecting));
+  panel_.SetBehaviour(PanelBehaviour::kCloseInMiddle);
+  socket_.Send(Raw(kPhysicalLightsOn));
+  EXPECT_THAT(EventsOf(100), ElementsAre("data"));
+  EXPECT_EQ(socket_.State(), TcpState::kConnected);
+}
+
+}  // namespace
+}  // namespace tendril

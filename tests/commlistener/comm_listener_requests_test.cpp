@@ -1,0 +1,124 @@
+// What the client's requests carry, and in which order they go out.
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "client_fixture.h"
+
+namespace tendril::test {
+namespace {
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+class RequestsTest : public ClientTest {
+ protected:
+  // Acknowledges request after request until nothing is sent any more; what was sent, in its order.
+  std::vector<Bytes> AcknowledgeAll() {
+    std::vector<Bytes> all;
+    for (;;) {
+      const std::vector<Bytes> sent = socket.Take();
+      if (sent.empty()) return all;
+      EXPECT_EQ(sent.size(), 1u);  // at most one is outstanding
+      all.push_back(sent.back());
+      socket.Deliver(Bytes{'1', sent.back()[1], '0', '0', '0', '0', '0'});
+    }
+  }
+};
+
+TEST_F(RequestsTest, PendingRequests_GoOutInTheStatedOrder) {
+  client.SendAllOffCommand();
+  client.RequestCommPortControl(3);
+  client.RelinquishCommPortControl(3);
+  client.RequestCommPortControl(255);
+  client.Connect(true, "Käte €", true, false);
+  EXPECT_THAT(socket.Take(), IsEmpty());
+  socket.Accept();
+  EXPECT_THAT(AcknowledgeAll(),
+              ElementsAre(Frame("P000001", {0}), BytesOf("I100006K\xE4te \x80"), BytesOf("A200000"),
+                          Frame("C300002", {3, 0}), Frame("C400002", {3, 1}), Frame("C500002", {255, 0}),
+                          Frame("L600004", {1, 0, 0, 0})));
+  EXPECT_FALSE(client.PhysicalLightsControl());
+}
+
+TEST_F(RequestsTest, SequenceCharacter_ComesRoundAgain) {
+  ConnectIdle();
+  for (const char sequence : std::string("1234567890")) {
+    client.SendAllOffOnDisconnect();
+    EXPECT_THAT(AcknowledgeAll(), ElementsAre(BytesOf(std::string("A") + sequence + "00000")));
+  }
+}
+
+TEST_F(RequestsTest, PhysicalLights_AreToldWhenSetAndNotWhenOnlyKept) {
+  ConnectIdle();
+  client.SetPhysicalLightsControl(false);
+  client.SetPhysicalLightsControl(true);  // waits, and goes out with what holds then
+  EXPECT_THAT(AcknowledgeAll(), ElementsAre(Frame("P100001", {0}), Frame("P200001", {1})));
+  client.Reconnect(false, "y", false, false);
+  socket.Accept();
+  EXPECT_THAT(AcknowledgeAll(), ElementsAre(BytesOf("I300001y")));
+  EXPECT_FALSE(client.PhysicalLightsControl());
+}
+
+TEST_F(RequestsTest, OutOfTurn_NothingIsSentAndNothingForgotten) {
+  client.Connect(true, "x", false, true);
+  socket.Accept();
+  socket.Take();
+  client.SendClientIdentification();
+  client.SendAllOffOnDisconnect();  // still to come, since it is not lost by being asked for too early
+  EXPECT_THAT(socket.Take(), IsEmpty());
+  socket.Deliver("1000000");
+  EXPECT_THAT(AcknowledgeAll(), ElementsAre(BytesOf("A100000")));
+}
+
+TEST_F(RequestsTest, LightingData_IsLaidOutByRecordType) {
+  ConnectIdle();
+  client.RequestCommPortControl(1);  // outstanding meanwhile, so that all of them share one message
+  socket.Take();
+  client.SendDMXEffectForAddressCommand(0x0102, 0x0304, 5, 6, 7, -2);
+  client.SendNyxEffectForCircuit(1, 2, 0x0304, 5, 6, 7, 0x01020304);
+  client.SendDMXIntensities(0x0102, 0x0304, 5, Bytes{1, 2, 3, 4, 5, 6});
+  client.SendNyxIntensities(1, 2, 0x0304, 2, Bytes{9, 8});
+  client.SendNyxIntensities(1, 2, 0x0304, 0, Bytes{});
+  socket.Deliver("1100000");
+  EXPECT_THAT(
+      socket.Take(),
+      ElementsAre(Frame("L200072", {0,  0, 12, 0, 2, 1, 4, 3, 5, 6, 7, 0, 0xFE, 0xFF, 0xFF, 0xFF, 2,  0,
+                                    12, 0, 1,  2, 4, 3, 5, 6, 7, 0, 4, 3, 2,    1,    3,    0,    11, 0,
+                                    2,  1, 4,  3, 5, 0, 1, 2, 3, 4, 5, 0, 4,    0,    8,    0,    1,  2,
+                                    4,  3, 2,  0, 9, 8, 4, 0, 6, 0, 1, 2, 4,    3,    0,    0,    0,  0})));
+}
+
+TEST_F(RequestsTest, LightingData_BeyondOneMessageGoesOutBatchByBatch) {
+  ConnectIdle();
+  client.RequestCommPortControl(1);
+  socket.Take();
+  const Bytes values(30000, 7);
+  for (int record = 0; record < 4; ++record) client.SendDMXIntensities(0, 0, 30000, values);
+  socket.Deliver("1100000");
+  const auto sent = AcknowledgeAll();
+  ASSERT_EQ(sent.size(), 2u);
+  EXPECT_EQ(sent[0].size(), 7u + 3 * 30012);
+  EXPECT_EQ(sent[1].size(), 7u + 30012);
+  EXPECT_EQ(std::string(sent[1].begin(), sent[1].begin() + 7), "L330012");
+}
+
+TEST(CommListenerRequests, FaultyArguments_FailWithTheNameOfTheRequest) {
+  const Bytes values(32767);
+  for (const std::int16_t count : {std::int16_t{-1}, std::int16_t{32762}}) {
+    for (const bool dmx : {true, false}) {
+      ClientWorld world;
+      world.ConnectIdle();
+      if (dmx) world.client.SendDMXIntensities(0, 0, count, values);
+      if (!dmx) world.client.SendNyxIntensities(0, 0, 0, count, values);
+      EXPECT_THAT(world.Events(), ElementsAre("error 4 Error in SendDMXIntensities|0|", "state"));
+      world.Reconnected();
+      EXPECT_THAT(world.socket.Take(), IsEmpty());
+    }
+  }
+}
+
+}  // namespace
+}  // namespace tendril::test

@@ -1,0 +1,85 @@
+#include "platform/process_list.h"
+
+#include <gtest/gtest.h>
+#include <signal.h>
+#include <spawn.h>
+#include <stdlib.h>
+#include <sys/stat.h>
+#include <sys/wait.h>
+
+#include <filesystem>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "platform/posix/system_processes.h"
+
+namespace tendril::test {
+namespace {
+
+namespace fs = std::filesystem;
+
+class Process {
+ public:
+  Process(const std::string& program, std::vector<std::string> arguments) {
+    std::vector<char*> pointers;
+    for (std::string& argument : arguments) pointers.push_back(argument.data());
+    pointers.push_back(nullptr);
+    char* no_environment[] = {nullptr};
+    if (::posix_spawn(&id_, program.c_str(), nullptr, nullptr, pointers.data(), no_environment) != 0)
+      id_ = -1;
+  }
+  ~Process() {
+    End();
+    if (id_ > 0) ::waitpid(id_, nullptr, 0);
+  }
+  Process(const Process&) = delete;
+  Process& operator=(const Process&) = delete;
+
+  // Ends it, and leaves its entry in the system's list.
+  void End() const {
+    if (id_ <= 0) return;
+    ::kill(id_, SIGKILL);
+    siginfo_t about;
+    ::waitid(P_PID, static_cast<id_t>(id_), &about, WEXITED | WNOWAIT);
+  }
+
+ private:
+  pid_t id_ = -1;
+};
+
+TEST(ProcessList, RunningProgram_IsFoundByItsNameOrTheFileThatItRuns) {
+  std::string name = fs::temp_directory_path() / "tendril-processes-XXXXXX";
+  const fs::path folder = ::mkdtemp(name.data());
+  const fs::path copy = folder / "TestTray.exe";
+  const fs::path sleep = fs::canonical("/bin/sleep");
+  fs::copy_file(sleep, copy);
+
+  const std::unique_ptr<ProcessList> processes = OpenProcessList();
+  struct Case {
+    const char* what;
+    std::string program;
+    std::vector<std::string> arguments;
+    bool found;
+  };
+  const Case cases[] = {
+      {"its name", copy, {"x", "60"}, true},
+      {"what it was started as", sleep, {"Z:\\opt\\show\\TESTTRAY.EXE", "60"}, true},
+      {"what it was started as, without folders", sleep, {"testtray.exe", "60"}, true},
+      {"what it interprets", "/bin/sh", {"sh", folder / "testtray.exe"}, true},
+      {"a part of a name", sleep, {"/opt/NotTestTray.exe", "60"}, false},
+  };
+  // An interpreter that reads its program waits for the other end of the pipe.
+  ASSERT_EQ(::mkfifo((folder / "testtray.exe").c_str(), 0600), 0);
+  EXPECT_FALSE(processes->IsRunning("TestTray.exe"));
+  for (const Case& process : cases) {
+    const Process running(process.program, process.arguments);
+    EXPECT_EQ(processes->IsRunning("TestTray.exe"), process.found) << process.what;
+    running.End();
+    EXPECT_FALSE(processes->IsRunning("TestTray.exe")) << "it has ended: " << process.what;
+  }
+  fs::remove_all(folder);
+}
+
+}  // namespace
+}  // namespace tendril::test

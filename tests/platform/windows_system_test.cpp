@@ -1,0 +1,33 @@
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <fstream>
+#include <string>
+
+#include "platform/posix/paths.h"
+#include "platform/posix/port_names.h"
+#include "platform/posix/serial_hold.h"
+#include "serial/command_log.h"
+
+namespace tendril {
+namespace {
+
+TEST(WindowsSystem, CommandLog_StandsWhereToolsLookForIt) {
+  const std::filesystem::path folder = "C:\\NYXDev";
+  std::filesystem::remove_all(folder);
+  EXPECT_EQ(CommandLogPath().string(), "C:\\\\NYXDev\\HUtest.txt");
+  FileCommandLog(CommandLogPath()).Append("Command-0-5");
+  std::string line;
+  std::getline(std::ifstream(folder / "HUtest.txt"), line);
+  EXPECT_EQ(line, "Command-0-5");
+  std::filesystem::remove_all(folder);
+}
+
+TEST(WindowsSystem, DevicesAreToldFromNamesWithoutOne) {
+  for (const int number : {-1, 0, 251}) EXPECT_EQ(FindSerialDevice(number), std::nullopt) << number;
+  EXPECT_TRUE(SerialHold("COM251").DeviceGone());
+  EXPECT_FALSE(SerialHold("C:").DeviceGone()) << "any device with a name will do";
+}
+
+}  // namespace
+}  // namespace tendril

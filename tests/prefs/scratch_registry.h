@@ -1,0 +1,125 @@
+// Registries for tests: one that can be told to fail, and the system's own with nothing in it.
+#pragma once
+
+#include <gtest/gtest.h>
+
+#include <cstdint>
+#include <filesystem>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "platform/memory_registry.h"
+#include "platform/posix/system_registry.h"
+#include "prefs/registry.h"
+
+#ifdef _WIN32
+#include <windows.h>
+#else
+#include <cstdlib>
+#endif
+
+namespace tendril::test {
+
+#ifdef _WIN32
+
+// While it lives, the current user's hive is an empty key, which goes with it.
+class EmptyHive {
+ public:
+  EmptyHive() {
+    RegCreateKeyExA(HKEY_CURRENT_USER, kPath, 0, nullptr, REG_OPTION_VOLATILE, KEY_ALL_ACCESS, nullptr, &key_,
+                    nullptr);
+    RegOverridePredefKey(HKEY_CURRENT_USER, key_);
+  }
+  ~EmptyHive() {
+    RegOverridePredefKey(HKEY_CURRENT_USER, nullptr);
+    RegCloseKey(key_);
+    RegDeleteTreeA(HKEY_CURRENT_USER, kPath);
+  }
+  EmptyHive(const EmptyHive&) = delete;
+  EmptyHive& operator=(const EmptyHive&) = delete;
+
+ private:
+  static constexpr char kPath[] = "Software\\Tendril test";
+  HKEY key_ = nullptr;
+};
+
+#else
+
+// While it lives, the configuration folder is an empty one, which goes with it.
+class EmptyHive {
+ public:
+  EmptyHive() {
+    std::string folder = std::filesystem::temp_directory_path() / "tendril-hive-XXXXXX";
+    folder_ = ::mkdtemp(folder.data());
+    ::setenv("XDG_CONFIG_HOME", folder_.c_str(), 1);
+  }
+  ~EmptyHive() {
+    ::unsetenv("XDG_CONFIG_HOME");
+    std::filesystem::remove_all(folder_);
+  }
+  EmptyHive(const EmptyHive&) = delete;
+  EmptyHive& operator=(const EmptyHive&) = delete;
+
+ private:
+  std::filesystem::path folder_;
+};
+
+#endif
+
+// Passes every call on, counts calls and open keys, and fails where it is told to.
+class UnreliableStore final : public RegistryStore {
+ public:
+  explicit UnreliableStore(RegistryStore& store) : store_(store) {}
+
+  std::int32_t OpenKey(RootKey root, const std::string& path, std::uint32_t access,
+                       RegistryHandle& key) override {
+    return Opened(Fails() ? code : store_.OpenKey(root, path, access, key));
+  }
+  std::int32_t CreateKey(RootKey root, const std::string& path, RegistryHandle& key) override {
+    return Opened(Fails() ? code : store_.CreateKey(root, path, key));
+  }
+  std::int32_t QueryValue(RegistryHandle key, const std::string& name, std::uint32_t& type,
+                          std::uint8_t* data, std::uint32_t& size) override {
+    return Fails() ? code : store_.QueryValue(key, name, type, data, size);
+  }
+  std::int32_t SetValue(RegistryHandle key, const std::string& name, std::uint32_t type,
+                        std::span<const std::uint8_t> data) override {
+    return Fails() ? code : store_.SetValue(key, name, type, data);
+  }
+  std::int32_t DeleteKey(RegistryHandle key, const std::string& subkey) override {
+    return Fails() ? code : store_.DeleteKey(key, subkey);
+  }
+  std::int32_t CloseKey(RegistryHandle key) override {
+    --open_keys;
+    const std::int32_t closed = store_.CloseKey(key);
+    return Fails() ? code : closed;
+  }
+
+  int failing_call = 0;  // the number of the call that fails, counted from 1; -1 for all of them
+  std::int32_t code = kRegIoFailed;
+  int calls = 0;
+  int open_keys = 0;
+
+ private:
+  bool Fails() { return ++calls == failing_call || failing_call < 0; }
+  std::int32_t Opened(std::int32_t result) {
+    if (result == kRegSuccess) ++open_keys;
+    return result;
+  }
+
+  RegistryStore& store_;
+};
+
+// What every registry must do alike; the parameter is "memory" or "system".
+class EveryRegistry : public testing::TestWithParam<const char*> {
+ protected:
+  bool is_system = GetParam() == std::string("system");
+  std::unique_ptr<EmptyHive> hive = is_system ? std::make_unique<EmptyHive>() : nullptr;
+  std::vector<std::string> warnings;
+  std::unique_ptr<RegistryStore> store =
+      is_system ? OpenSystemRegistry({}) : std::make_unique<MemoryRegistry>();
+  Registry registry{*store, [this](const std::string& warning) { warnings.push_back(warning); }};
+};
+
+}  // namespace tendril::test
