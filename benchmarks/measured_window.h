@@ -8,6 +8,7 @@
 #include <QLabel>
 #include <QString>
 #include <QTimer>
+#include <memory>
 #include <stdexcept>
 #include <string>
 
@@ -15,11 +16,16 @@
 #include "counting_device.h"
 #include "measuring.h"
 #include "platform/posix/paths.h"
+#include "platform/posix/system_processes.h"
+#include "platform/posix/system_registry.h"
 #include "platform/qt/qt_serial_device.h"
+#include "platform/qt/qt_tcp_socket.h"
+#include "prefs/registry.h"
 #include "serial/command_log.h"
 #include "serial/hw_serial.h"
 #include "support/bench_process.h"
 #include "ui/frm_new_servo_config.h"
+#include "unitops/control_panel.h"
 
 namespace tendril {
 
@@ -85,7 +91,13 @@ class MeasuredWindow {
  private:
   FileCommandLog log_{CommandLogPath()};
   HwSerial link_{device, platform_.timers, platform_.clock, log_};
-  frmNewServoConfig window_{link_, platform_.timers, platform_.boxes, {1, 0, 0}};
+  // The client goes on trying to connect meanwhile, as it does without a Control Panel.
+  QtTcpSocket wsCLI_{platform_.on_fault};
+  const std::unique_ptr<RegistryStore> registry_store_ = OpenSystemRegistry({});
+  Registry registry_{*registry_store_, {}};
+  const std::unique_ptr<ProcessList> processes_ = OpenProcessList();
+  ControlPanel control_panel_{platform_.timers, platform_.boxes, wsCLI_, registry_, *processes_};
+  frmNewServoConfig window_{link_, platform_.timers, platform_.boxes, control_panel_, {1, 0, 0}};
 };
 
 }  // namespace tendril

@@ -20,7 +20,7 @@
 #include "run_benchmark.h"
 #include "serial/hw_serial.h"
 #include "simulator/servo_simulator.h"
-#include "support/simulated_world.h"
+#include "support/simulated_control_panel.h"
 #include "ui/frm_new_servo_config.h"
 
 namespace tendril {
@@ -90,7 +90,8 @@ class EditedWindow : public QObject {
 
   test::SimulatedWorld world_;
   HwSerial link_{*world_.device, world_.time, world_.time, world_.log};
-  frmNewServoConfig window_{link_, world_.time, world_.boxes, {1, 0, 0}};
+  test::SimulatedControlPanel panel_{world_};
+  frmNewServoConfig window_{link_, world_.time, world_.boxes, panel_.control_panel, {1, 0, 0}};
   std::vector<ServoSimulator*> servos_;
   std::set<QObject*> painted_;  // the servos, since the last step began
   bool any_painted_ = false;

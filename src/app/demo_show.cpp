@@ -5,16 +5,20 @@
 #include <QComboBox>
 #include <QDeadlineTimer>
 #include <QDir>
+#include <QElapsedTimer>
 #include <QLabel>
 #include <QMouseEvent>
 #include <QPixmap>
 #include <QSpinBox>
+#include <cstdint>
 #include <cstdio>
+#include <span>
 #include <string>
 #include <utility>
 #include <variant>
 
 #include "bench/line_printer.h"
+#include "bench/panel_printer.h"
 #include "config/option_bytes.h"
 
 namespace tendril {
@@ -124,6 +128,27 @@ bool AreEqual(const VirtualUnit& unit, const ChannelTable& shown) {
   return all_equal;
 }
 
+// Takes a port from the Control Panel and gives it back, which ends the window; false when it does not change hands.
+bool PassPortBackAndForth(const Actor& actor, frmNewServoConfig& window, VirtualControlPanel& panel) {
+  constexpr int kPort = 3;
+  QElapsedTimer since;
+  since.start();
+  panel.SetTap([&since](PanelSide from, std::span<const std::uint8_t> bytes) {
+    Print(PrintPanelBytes(static_cast<std::uint64_t>(since.nsecsElapsed() / 1000), from, bytes));
+  });
+  Print("Choosing Comm 3, which the Control Panel holds ...");
+  actor.Choose("cmbNYX", kPort);
+  const bool given_up = Actor::RunUntil([&] { return !panel.Holds(kPort); });
+  Print("Choosing Comm 3 again, and closing the window ...");
+  actor.Choose("cmbNYX", kPort);
+  const bool closed_at_once = window.close();
+  const bool given_back = Actor::RunUntil([&] { return panel.Holds(kPort) && !window.isVisible(); });
+  panel.SetTap(nullptr);
+  const bool good = given_up && !closed_at_once && given_back;
+  Print(good ? "The Control Panel has given up Comm 3, and has it back." : "Comm 3 did NOT change hands.");
+  return good;
+}
+
 }  // namespace
 
 void PrintedBoxes::Show(const BoxMessage& message) {
@@ -132,11 +157,12 @@ void PrintedBoxes::Show(const BoxMessage& message) {
 
 bool PrintedBoxes::AskYesNo(const BoxMessage& message) {
   Show(message);
-  return false;
+  Print("The answer: Yes");
+  return true;
 }
 
 int ShowWithoutDisplay(frmNewServoConfig& window, VirtualLine& line, const DemoUnits& units,
-                       const QString& folder) {
+                       VirtualControlPanel& panel, const QString& folder) {
   const Actor actor(window, folder);
   if (!actor.SavePicture("window-start.png")) return 1;
 
@@ -165,7 +191,7 @@ int ShowWithoutDisplay(frmNewServoConfig& window, VirtualLine& line, const DemoU
   line.SetTap(nullptr);
   good = good && window.WorkingConfiguration() == sent;
   Print(good ? "What was sent is what was read back." : "What was read back is NOT what was sent.");
-  return good ? 0 : 1;
+  return PassPortBackAndForth(actor, window, panel) && good ? 0 : 1;
 }
 
 int TakePictures(frmNewServoConfig& window, const QString& folder) {

@@ -3,6 +3,7 @@
 
 #include <QString>
 
+#include "bench/virtual_control_panel.h"
 #include "bench/virtual_line.h"
 #include "bench/virtual_unit.h"
 #include "platform/message_boxes.h"
@@ -10,7 +11,7 @@
 
 namespace tendril {
 
-// Prints boxes, where nobody could press a button.
+// Prints boxes, where nobody could press a button, and says Yes.
 class PrintedBoxes final : public MessageBoxes {
  public:
   void Show(const BoxMessage& message) override;
@@ -24,11 +25,12 @@ struct DemoUnits {
 };
 
 // Does in `window` what a person would: chooses Comm 1, sends the configuration to unit 01, reads that of unit
-// 0A, which is another, and reads unit 01 back. Prints what crosses `line`, compares what the units hold with
-// what the window shows, and saves pictures of the window in `folder`, which is created. Returns the program's
-// exit code: 0 when what was sent is what was read back.
+// 0A, which is another, and reads unit 01 back. Then asks `panel` for Comm 3, opens it, and closes the window, which
+// gives it back. Prints what crosses `line` and the connection to the panel, compares what the units hold with what
+// the window shows, and saves pictures of the window in `folder`, which is created. Returns the program's exit code: 0
+// when what was sent is what was read back, and the port changed hands.
 int ShowWithoutDisplay(frmNewServoConfig& window, VirtualLine& line, const DemoUnits& units,
-                       const QString& folder);
+                       VirtualControlPanel& panel, const QString& folder);
 
 // Edits channels in `window` and saves pictures of the editor with a servo, a digital and a PWM channel, of the
 // summary, and of a number entry open in it, in `folder`, which is created. Returns the program's exit code: 0 when

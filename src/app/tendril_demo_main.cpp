@@ -7,15 +7,23 @@
 #include <cstdint>
 #include <filesystem>
 #include <memory>
+#include <string>
+#include <string_view>
 
 #include "app/demo_show.h"
 #include "app/qt_platform.h"
 #include "app/version.h"
+#include "bench/virtual_control_panel.h"
 #include "bench/virtual_serial_device.h"
+#include "bench/virtual_tcp_socket.h"
 #include "bench/virtual_unit.h"
+#include "platform/memory_registry.h"
+#include "platform/process_list.h"
+#include "prefs/registry.h"
 #include "serial/command_log.h"
 #include "serial/hw_serial.h"
 #include "ui/frm_new_servo_config.h"
+#include "unitops/control_panel.h"
 
 namespace {
 
@@ -24,13 +32,27 @@ using namespace tendril;
 // Pads enough for the program to release the line in time even when its window has just been painting.
 constexpr ReplyTiming kPatient{.turn_round_us = 2000, .pads = 45};
 
-// Comm 1: two working units. Comm 2: one fresh from the factory. Comm 3: in use. Comm 4: nobody answers.
-DemoUnits FillBench(VirtualPorts& bench) {
+// Where the demonstration's Control Panel listens: what the preferences say when nothing is in them.
+constexpr std::uint16_t kListenerPort = 8837;
+constexpr std::uint8_t kPanelPort = 3;
+
+// The Control Panel runs, and nothing else does.
+class DemoProcesses final : public ProcessList {
+ public:
+  bool IsRunning(std::string_view program) const override { return program == "NyxTray.exe"; }
+};
+
+// Comm 1: two working units. Comm 2: one fresh from the factory. Comm 3: a working unit, held by the Control Panel
+// until it is asked for. Comm 4: nobody answers.
+DemoUnits FillBench(VirtualPorts& bench, VirtualControlPanel& panel) {
   for (const int port : {1, 2, 3, 4}) bench.AddPort(port);
   auto& first = bench.Attach<VirtualUnit>(1, std::uint8_t{0x01}, kPatient);
   auto& second = bench.Attach<VirtualUnit>(1, std::uint8_t{0x0A}, kPatient);
   bench.Attach<VirtualUnit>(2, std::uint8_t{0xFF}, kPatient);
-  bench.SetHeldByAnother(3, true);
+  bench.Attach<VirtualUnit>(kPanelPort, std::uint8_t{0x01}, kPatient);
+  panel.AddPort(kPanelPort);
+  bench.SetHeldByAnother(kPanelPort, true);
+  panel.SetPortHandler([&bench](std::uint8_t port, bool held) { bench.SetHeldByAnother(port, held); });
   // Somebody has set them up before, otherwise than the window starts with.
   for (int port = 1; port <= kUnitPorts; ++port) {
     first.SetPortOptions(port, {1, 80, 220, 125, 175, 125, 175, 150, 150});
@@ -64,7 +86,9 @@ int main(int argc, char** argv) {
   QCommandLineParser parser;
   parser.setApplicationDescription(QStringLiteral(
       "The Tendril Configuration Utility on a virtual bench. Comm 1 has working units at 01 and 0A, Comm 2 "
-      "one fresh from the factory at FF, Comm 3 is in use, and on Comm 4 nobody answers."));
+      "one fresh from the factory at FF, Comm 3 is held by a Control Panel that can be asked for it, and on "
+      "Comm 4 "
+      "nobody answers."));
   parser.addHelpOption();
   const QCommandLineOption show(
       QStringLiteral("without-display"),
@@ -86,16 +110,22 @@ int main(int argc, char** argv) {
   QTemporaryDir scratch;  // a demonstration leaves nothing behind
   QtPlatform platform;
   VirtualPorts bench(platform.clock, platform.timers);
-  const DemoUnits units = FillBench(bench);
+  VirtualControlPanel panel(platform.timers);
+  const DemoUnits units = FillBench(bench, panel);
   const std::unique_ptr<SerialDevice> device = bench.CreateDevice();
   FileCommandLog log(std::filesystem::path(scratch.filePath(QStringLiteral("HUtest.txt")).toStdString()));
   HwSerial Serial1(*device, platform.timers, platform.clock, log);
   PrintedBoxes printed_boxes;
   MessageBoxes& boxes = parser.isSet(show) ? static_cast<MessageBoxes&>(printed_boxes) : platform.boxes;
-  frmNewServoConfig window(Serial1, platform.timers, boxes, kVersion);
+  VirtualTcpSocket wsCLI(panel, kListenerPort, platform.timers);
+  MemoryRegistry registry_store;
+  Registry registry(registry_store, [](const std::string& /*warning*/) {});
+  const DemoProcesses processes;
+  ControlPanel control_panel(platform.timers, boxes, wsCLI, registry, processes);
+  frmNewServoConfig window(Serial1, platform.timers, boxes, control_panel, kVersion);
   platform.boxes.SetParent(&window);
   window.show();
-  if (parser.isSet(show)) return ShowWithoutDisplay(window, bench.Line(1), units, parser.value(show));
+  if (parser.isSet(show)) return ShowWithoutDisplay(window, bench.Line(1), units, panel, parser.value(show));
   if (parser.isSet(pictures)) return TakePictures(window, parser.value(pictures));
   return QApplication::exec();
 }

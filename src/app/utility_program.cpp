@@ -5,13 +5,18 @@
 
 #include "app/version.h"
 #include "platform/posix/paths.h"
+#include "platform/posix/system_processes.h"
+#include "platform/posix/system_registry.h"
 
 namespace tendril {
 namespace {
 
 Q_LOGGING_CATEGORY(serial_trace, "tendril.serial", QtInfoMsg)
+Q_LOGGING_CATEGORY(preferences, "tendril.preferences")
 
 void Trace(const std::string& line) { qCDebug(serial_trace, "%s", line.c_str()); }
+
+void Warn(const std::string& line) { qCWarning(preferences, "%s", line.c_str()); }
 
 }  // namespace
 
@@ -19,7 +24,12 @@ UtilityProgram::UtilityProgram()
     : device(platform.on_fault, Trace),
       log(CommandLogPath()),
       Serial1(device, platform.timers, platform.clock, log),
-      window(Serial1, platform.timers, platform.boxes, kVersion) {
+      wsCLI(platform.on_fault),
+      registry_store(OpenSystemRegistry(Warn)),
+      registry(*registry_store, Warn),
+      processes(OpenProcessList()),
+      control_panel(platform.timers, platform.boxes, wsCLI, registry, *processes),
+      window(Serial1, platform.timers, platform.boxes, control_panel, kVersion) {
   Serial1.SetTraceSink(Trace);
   Serial1.SetTraceOutput(serial_trace().isDebugEnabled());
   platform.boxes.SetParent(&window);

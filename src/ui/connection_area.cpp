@@ -3,6 +3,9 @@
 #include <QGroupBox>
 #include <QHBoxLayout>
 #include <QLabel>
+#include <QSignalBlocker>
+#include <functional>
+#include <utility>
 
 #include "ui/controls.h"
 
@@ -13,16 +16,33 @@ constexpr int kDigits = 16;
 constexpr std::array kUnitIdTips{
     "First hexadecimal digit of the unit's ID, 0 to F. A unit fresh from the factory has FF.",
     "Second hexadecimal digit of the unit's ID, 0 to F. A unit fresh from the factory has FF."};
+constexpr int kLongestPortLine = 7;  // "Comm 25"
 constexpr char kPortTip[] = "The serial port that the units are connected to. Choosing it opens it at once.";
+
+// Says when it is about to be opened.
+class PortList final : public CalmComboBox {
+ public:
+  explicit PortList(std::function<void()> opening) : opening_(std::move(opening)) {}
+
+  void showPopup() override {
+    opening_();
+    CalmComboBox::showPopup();
+  }
+
+ private:
+  std::function<void()> opening_;
+};
 
 }  // namespace
 
 ConnectionArea::ConnectionArea(PortSelection& ports, QWidget* parent)
-    : QWidget(parent), ports_(ports), cmbNYX_(Named(new CalmComboBox, QStringLiteral("cmbNYX"))) {
+    : QWidget(parent),
+      ports_(ports),
+      cmbNYX_(Named(new PortList([this] { RereadCommPorts(); }), QStringLiteral("cmbNYX"))) {
   auto* port_label = new QLabel(QStringLiteral("&Comm Port"));
   port_label->setBuddy(cmbNYX_);
   cmbNYX_->setSizeAdjustPolicy(QComboBox::AdjustToContents);
-  cmbNYX_->setMinimumContentsLength(6);
+  cmbNYX_->setMinimumContentsLength(kLongestPortLine);
   cmbNYX_->setSizePolicy(QSizePolicy::Fixed, QSizePolicy::Fixed);
   cmbNYX_->setAccessibleName(QStringLiteral("Comm Port"));
 
@@ -69,10 +89,25 @@ void ConnectionArea::FillUnitIds() {
   CmbUnitID_[1]->setCurrentIndex(1);
 }
 
-void ConnectionArea::ListCommPorts() {
+void ConnectionArea::ListCommPorts() { ShowPorts(ports_.ListCommPorts(), 0); }
+
+void ConnectionArea::ShowPorts(const std::vector<std::string>& lines, std::size_t selected) {
   cmbNYX_->clear();
-  for (const std::string& line : ports_.ListCommPorts()) cmbNYX_->addItem(QString::fromStdString(line));
-  cmbNYX_->setCurrentIndex(0);
+  for (const std::string& line : lines) cmbNYX_->addItem(QString::fromStdString(line));
+  cmbNYX_->setCurrentIndex(static_cast<int>(selected));
+}
+
+// An adapter that was plugged in since then is found by whoever looks for it. The ports are described now, since
+// asking the system about each takes a moment that the start-up does not have.
+void ConnectionArea::RereadCommPorts() {
+  const QSignalBlocker nothing_is_chosen(cmbNYX_);
+  auto selected = static_cast<std::size_t>(cmbNYX_->currentIndex());
+  const std::vector<std::string> lines = ports_.RereadCommPorts(selected);
+  ShowPorts(lines, selected);
+  for (std::size_t entry = 0; entry < lines.size(); ++entry) {
+    cmbNYX_->setItemData(static_cast<int>(entry), QString::fromStdString(ports_.DescribePort(entry)),
+                         Qt::ToolTipRole);
+  }
 }
 
 void ConnectionArea::ShowRunning(const RunningCommand& running) {

@@ -4,9 +4,12 @@
 #include <QComboBox>
 #include <QWidget>
 #include <array>
+#include <cstddef>
 #include <cstdint>
 #include <functional>
+#include <string>
 #include <utility>
+#include <vector>
 
 #include "unitops/port_selection.h"
 #include "unitops/running_command.h"
@@ -33,6 +36,9 @@ class ConnectionArea : public QWidget, public UnitTarget {
   std::uint8_t UnitId() const override;
 
  private:
+  void ShowPorts(const std::vector<std::string>& lines, std::size_t selected);
+  void RereadCommPorts();
+
   PortSelection& ports_;
   std::function<void()> unit_id_changed_;
   QComboBox* cmbNYX_;

@@ -24,10 +24,11 @@ constexpr std::int32_t kSummaryScreenMs = 20;
 }  // namespace
 
 frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes,
-                                     const Version& version)
+                                     ControlPanel& control_panel, const Version& version)
     : link_(link),
       timers_(timers),
-      ports_(link, boxes),
+      control_panel_(control_panel),
+      ports_(link, boxes, control_panel),
       connection_(new ConnectionArea(ports_)),
       progress_(new ProgressArea),
       commands_(link, timers, boxes, *progress_, *connection_, working_,
@@ -53,8 +54,7 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
       live_test_(link, timers, boxes, commands_.Running(), *connection_, *editor_, *live_test_area_,
                  simulators_),
       tmrSummaryScreen_(timers.CreateTimer([this] { OnSummaryScreen(); })),
-      shutdown_(
-          link, timers, [](std::int16_t) {}, [this] { close(); }) {
+      shutdown_(link, timers, control_panel, [this] { close(); }) {
   setObjectName(QStringLiteral("frmNewServoConfig"));
   LayOut();
   commands_.Running().SetObserver([this] { ShowRunning(); });
@@ -125,6 +125,8 @@ void frmNewServoConfig::StartUp(const Version& version) {
   for (std::size_t slot = 0; slot < kPortCount; ++slot)
     SetFromPreset(kPresets[kStartPreset], working_.At(slot));
   connection_->ListCommPorts();
+  control_panel_.ReadPreferences();
+  control_panel_.InitializeCommListenerInterface();
   simulators_.UpdateAll();
   live_test_.ShowSlider();
 }

@@ -24,6 +24,7 @@
 #include "ui/progress_area.h"
 #include "ui/simulators.h"
 #include "ui/summary_area.h"
+#include "unitops/control_panel.h"
 #include "unitops/live_test.h"
 #include "unitops/port_selection.h"
 #include "unitops/shutdown.h"
@@ -42,8 +43,9 @@ struct Version {
 // care of itself.
 class frmNewServoConfig : public QWidget {
  public:
-  // Everything handed in must outlive the window. `link` is not to be used by anyone else.
-  frmNewServoConfig(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes, const Version& version);
+  // Everything handed in must outlive the window. `link` and `control_panel` are not to be used by anyone else.
+  frmNewServoConfig(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes, ControlPanel& control_panel,
+                    const Version& version);
   ~frmNewServoConfig() override;
 
   // The records that are edited, sent and shown.
@@ -75,6 +77,7 @@ class frmNewServoConfig : public QWidget {
 
   HwSerial& link_;
   TimerFactory& timers_;
+  ControlPanel& control_panel_;
   ChannelTable working_;
   ChannelEditor channel_editor_{working_};
   PortSelection ports_;

@@ -10,29 +10,38 @@
 
 #include "platform/message_boxes.h"
 #include "serial/hw_serial.h"
+#include "unitops/control_panel.h"
 
 namespace tendril {
 
 // The window's comm port list asks it what to list, and tells it what was chosen.
 class PortSelection {
  public:
-  // Both must outlive it.
-  PortSelection(HwSerial& link, MessageBoxes& boxes);
+  // All must outlive it.
+  PortSelection(HwSerial& link, MessageBoxes& boxes, ControlPanel& control_panel);
 
   // Looks for ports 1 to 25 and returns the lines of the list: "Select", then "Comm n" for each that exists.
-  std::vector<std::string> ListCommPorts();
+  std::vector<std::string> ListCommPorts() { return ReadCommPorts(0); }
+  // The same when the list is opened while line `selected` is selected: that line is there in any case, and
+  // `selected` becomes its place. Opens nothing.
+  std::vector<std::string> RereadCommPorts(std::size_t& selected);
+  // Which device the port of line `entry` is: what its maker calls it, and its path. Empty for "Select".
+  std::string DescribePort(std::size_t entry) const;
 
   // Who is told when a port is about to be opened.
   void SetOpeningHandler(std::function<void()> handler) { opening_ = std::move(handler); }
 
-  // Opens the port of line `entry` at once. Line 0, "Select", leaves the port as it is. Shows a failure.
+  // Opens the port of line `entry` at once. Line 0, "Select", leaves the port as it is. Shows a failure; a port
+  // that the Control Panel holds can be asked for.
   void Choose(std::size_t entry);
 
  private:
+  std::vector<std::string> ReadCommPorts(std::int16_t always);
   void ReportPortOpenError(std::int32_t number, const std::string& description);
 
   HwSerial& link_;
   MessageBoxes& boxes_;
+  ControlPanel& control_panel_;
   std::function<void()> opening_;
   std::vector<std::int16_t> port_table_;  // the port number of each line; 0 for "Select"
 };

@@ -9,10 +9,10 @@ constexpr std::int32_t kUnloadDelayMs = 100;
 
 }  // namespace
 
-Shutdown::Shutdown(HwSerial& link, TimerFactory& timers, std::function<void(std::int16_t port)> give_back,
+Shutdown::Shutdown(HwSerial& link, TimerFactory& timers, ControlPanel& control_panel,
                    std::function<void()> unload)
     : link_(link),
-      give_back_(std::move(give_back)),
+      control_panel_(control_panel),
       tmrPostQueryUnload_(timers.CreateTimer([this, unload = std::move(unload)] {
         tmrPostQueryUnload_->SetEnabled(false);
         unload();
@@ -21,10 +21,10 @@ Shutdown::Shutdown(HwSerial& link, TimerFactory& timers, std::function<void(std:
 }
 
 bool Shutdown::MayClose() {
-  if (std::exchange(closing_, true) || !taken_port_) return true;
+  if (std::exchange(closing_, true) || !control_panel_.RequestedPort()) return true;
   link_.SetCommPort(0);
   tmrPostQueryUnload_->SetEnabled(true);
-  give_back_(*taken_port_);
+  control_panel_.RelinquishPort();
   return false;
 }
 

@@ -141,7 +141,8 @@ TEST_F(Summary, DoubleClickAndEscape_LeaveNoPanelBehind) {
 }
 
 TEST_F(Summary, PressedAtOnce_IsThere) {
-  frmNewServoConfig window(link_, world_.time, world_.boxes, Version{1, 0, 0});
+  SimulatedControlPanel panel(world_);
+  frmNewServoConfig window(link_, world_.time, world_.boxes, panel.control_panel, Version{1, 0, 0});
   window.findChild<QAbstractButton*>(QStringLiteral("cmdShowSummary"))->click();
   world_.time.Advance(20);
   EXPECT_FALSE(window.findChild<QWidget*>(QStringLiteral("frmSumHeader"))->isHidden());

@@ -11,7 +11,7 @@
 #include <stdexcept>
 #include <string>
 
-#include "support/simulated_world.h"
+#include "support/simulated_control_panel.h"
 #include "ui/frm_new_servo_config.h"
 
 namespace tendril::test {
@@ -22,7 +22,8 @@ class Window : public testing::Test {
   Window() {
     window_->show();
     [[maybe_unused]] const bool exposed = QTest::qWaitForWindowExposed(window_.get());
-    QTest::qWait(0);  // what is not seen at first is made after the first paint
+    world_.time.Advance(10);  // the comm listener client has connected and identified itself
+    QTest::qWait(0);          // what is not seen at first is made after the first paint
   }
 
   template <typename Widget = QWidget>
@@ -45,9 +46,10 @@ class Window : public testing::Test {
   }
 
   SimulatedWorld world_;
+  SimulatedControlPanel panel_{world_};
   HwSerial link_{*world_.device, world_.time, world_.time, world_.log};
-  std::unique_ptr<frmNewServoConfig> window_ =
-      std::make_unique<frmNewServoConfig>(link_, world_.time, world_.boxes, Version{3, 2, 1});
+  std::unique_ptr<frmNewServoConfig> window_ = std::make_unique<frmNewServoConfig>(
+      link_, world_.time, world_.boxes, panel_.control_panel, Version{3, 2, 1});
 };
 
 }  // namespace tendril::test

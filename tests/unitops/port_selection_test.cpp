@@ -4,18 +4,47 @@
 #include <gtest/gtest.h>
 
 #include "serial/hw_serial.h"
-#include "support/simulated_world.h"
+#include "support/simulated_control_panel.h"
 
 namespace tendril::test {
 namespace {
 
 using testing::ElementsAre;
 
+BoxMessage InUse(int port) {
+  return {"The serial port (Comm" + std::to_string(port) +
+              ") is in use.\r\nClose other programs that may have it open.",
+          "Tendril Configuration", BoxIcon::kExclamation};
+}
+
+BoxMessage Question(int port) {
+  return {
+      "This serial port (Comm" + std::to_string(port) +
+          ") is in use by the Control Panel.\r\n\r\nThe Tendril Utility can tell the Control Panel to stop "
+          "using the port, but this would cause your shows to be unable to control the lights on the port "
+          "(until the Tendril Utility stops using the port).\r\n\r\nWould you like the Tendril Utility to "
+          "tell the Control Panel to stop using the port?",
+      "Port In Use", BoxIcon::kNone};
+}
+
+const BoxMessage kAsked{
+    "The Tendril Utility has asked the Control Panel to stop using the port.\r\n\r\nTry selecting the port "
+    "again.",
+    "Port Control Requested", BoxIcon::kNone};
+
 class PortSelectionTest : public testing::Test {
  protected:
+  PortSelectionTest() {
+    panel_.control_panel.ReadPreferences();
+    panel_.control_panel.InitializeCommListenerInterface();
+    world_.time.Advance(100);
+    selection_.ListCommPorts();
+  }
+
   SimulatedWorld world_;
+  SimulatedControlPanel panel_{world_};
   HwSerial link_{*world_.device, world_.time, world_.time, world_.log};
-  PortSelection selection_{link_, world_.boxes};
+  PortSelection selection_{link_, world_.boxes, panel_.control_panel};
 };
 
 TEST_F(PortSelectionTest, List_HoldsThePortsThatExistUpTo25) {
@@ -29,7 +58,6 @@ TEST_F(PortSelectionTest, List_HoldsThePortsThatExistUpTo25) {
 }
 
 TEST_F(PortSelectionTest, Select_LeavesThePortAsItIs) {
-  selection_.ListCommPorts();
   selection_.Choose(2);
   selection_.Choose(0);
   EXPECT_EQ(link_.CommPort(), 2);
@@ -37,13 +65,10 @@ TEST_F(PortSelectionTest, Select_LeavesThePortAsItIs) {
 }
 
 TEST_F(PortSelectionTest, FailedOpening_IsToldAndTheSameLineTriesAgain) {
-  selection_.ListCommPorts();
+  panel_.processes.running = "NyxTray2.exe";
   world_.bench.SetHeldByAnother(3, true);
   selection_.Choose(3);
-  EXPECT_THAT(world_.boxes.Take(),
-              ElementsAre(BoxMessage{
-                  "The serial port (Comm3) is in use.\r\nClose other programs that may have it open.",
-                  "Tendril Configuration", BoxIcon::kExclamation}));
+  EXPECT_THAT(world_.boxes.Take(), ElementsAre(InUse(3)));
   EXPECT_FALSE(link_.PortOpen());
   world_.bench.SetHeldByAnother(3, false);
   selection_.Choose(3);
@@ -51,17 +76,118 @@ TEST_F(PortSelectionTest, FailedOpening_IsToldAndTheSameLineTriesAgain) {
   EXPECT_THAT(world_.boxes.Take(), ElementsAre());
 }
 
+// Two readings of the list: what is selected stays selected, also when the rest moves or it is gone itself.
+TEST_F(PortSelectionTest, OpenedList_IsReadAgainAndKeepsTheSelection) {
+  selection_.Choose(3);
+  world_.bench.Unplug(1);
+  world_.bench.AddPort(7);
+  std::size_t selected = 3;
+  EXPECT_THAT(selection_.RereadCommPorts(selected),
+              ElementsAre("Select", "Comm 2", "Comm 3", "Comm 4", "Comm 7"));
+  EXPECT_EQ(selected, 2u);
+  EXPECT_EQ(selection_.DescribePort(selected), "Virtual serial line 3");
+  world_.bench.Unplug(3);
+  EXPECT_THAT(selection_.RereadCommPorts(selected),
+              ElementsAre("Select", "Comm 2", "Comm 3", "Comm 4", "Comm 7"));
+  EXPECT_EQ(selected, 2u);
+  EXPECT_EQ(selection_.DescribePort(selected), "The device is not there at the moment.");
+  selected = 0;
+  EXPECT_THAT(selection_.RereadCommPorts(selected), ElementsAre("Select", "Comm 2", "Comm 4", "Comm 7"));
+  EXPECT_EQ(selected, 0u);
+  EXPECT_EQ(selection_.DescribePort(0), "");
+  selection_.Choose(3);
+  EXPECT_EQ(link_.CommPort(), 7);
+}
+
+TEST_F(PortSelectionTest, PortOfTheControlPanel_IsAskedForAndOpensWhenItIsChosenAgain) {
+  panel_.Take(3);
+  selection_.Choose(3);  // the answer is No
+  EXPECT_THAT(world_.boxes.Take(), ElementsAre(Question(3)));
+  EXPECT_EQ(panel_.control_panel.RequestedPort(), std::nullopt);
+
+  world_.boxes.answer_yes = true;
+  selection_.Choose(3);
+  EXPECT_THAT(world_.boxes.Take(), ElementsAre(Question(3), kAsked));
+  EXPECT_FALSE(link_.PortOpen());
+  world_.time.Advance(100);
+  EXPECT_FALSE(link_.PortOpen());  // that is for the person to do
+  EXPECT_THAT(panel_.PortRequests(), ElementsAre("3:0"));
+  selection_.Choose(3);
+  EXPECT_TRUE(link_.PortOpen());
+  EXPECT_THAT(world_.boxes.Take(), ElementsAre());
+
+  // A port that is free changes nothing; the next one that is asked for does.
+  selection_.Choose(1);
+  EXPECT_TRUE(link_.PortOpen());
+  world_.time.Advance(1000);
+  EXPECT_THAT(panel_.PortRequests(), ElementsAre("3:0"));
+  EXPECT_EQ(panel_.control_panel.RequestedPort(), 3);
+  panel_.Take(4);
+  selection_.Choose(4);
+  world_.time.Advance(100);
+  EXPECT_THAT(panel_.PortRequests(), ElementsAre("3:0", "3:1", "4:0"));
+  EXPECT_TRUE(panel_.panel.Holds(3));
+  EXPECT_FALSE(panel_.panel.Holds(4));
+  EXPECT_EQ(panel_.control_panel.RequestedPort(), 4);
+}
+
+TEST_F(PortSelectionTest, PortThatIsNotGivenUp_IsAskedForAgainWithoutGivingItBack) {
+  panel_.Take(3);
+  world_.boxes.answer_yes = true;
+  panel_.panel.SetBehaviour(PanelBehaviour::kRefuse, 1);
+  selection_.Choose(3);
+  world_.time.Advance(1000);
+  selection_.Choose(3);
+  world_.time.Advance(1000);
+  EXPECT_EQ(world_.boxes.Take().size(), 4u);
+  EXPECT_FALSE(panel_.panel.Holds(3));
+  EXPECT_EQ(panel_.panel.requests().back().payload, (Bytes{3, 0}));
+}
+
+TEST_F(PortSelectionTest, ListenerPortZero_MeansThatNobodyCanBeAsked) {
+  Registry& registry = panel_.registry;
+  registry.CreateKey(RootKey::kCurrentUser, "Software\\Kelvane\\Shared\\Network");
+  registry.SetNumber(RootKey::kCurrentUser, "Software\\Kelvane\\Shared\\Network", "DMXListenerPort", 0);
+  ControlPanel without(world_.time, world_.boxes, panel_.wsCLI, registry, panel_.processes);
+  without.ReadPreferences();
+  PortSelection selection(link_, world_.boxes, without);
+  selection.ListCommPorts();
+  panel_.Take(3);
+  selection.Choose(3);
+  EXPECT_THAT(world_.boxes.Take(), ElementsAre(InUse(3)));
+}
+
+TEST(ControlPanelStart, Fault_IsShownAndTheProgramGoesOn) {
+  struct BrokenSocket final : public TcpSocket {
+    void SetEvents(TcpEvents /*events*/) override {}
+    void Connect(const std::string& /*host*/, std::uint16_t /*port*/) override {}
+    void Close() override {}
+    TcpState State() const override { return TcpState::kClosed; }
+    void SetLocalPort(std::uint16_t /*port*/) override { throw RuntimeError(10050, "The network is down"); }
+    std::uint16_t LocalPort() const override { return 0; }
+    void Send(std::span<const std::uint8_t> /*bytes*/) override {}
+    Bytes Receive(std::size_t /*limit*/) override { return {}; }
+  };
+  SimulatedWorld world;
+  SimulatedControlPanel panel(world);
+  BrokenSocket broken;
+  ControlPanel control_panel(world.time, world.boxes, broken, panel.registry, panel.processes);
+  control_panel.InitializeCommListenerInterface();
+  EXPECT_THAT(world.boxes.Take(),
+              ElementsAre(BoxMessage{"Error in InitializeCommListenerInterface (10050): The network is down",
+                                     "Tendril Configuration", BoxIcon::kNone}));
+}
+
 TEST_F(PortSelectionTest, OtherProblems_CarryTheirDescription) {
-  selection_.ListCommPorts();
   world_.bench.Unplug(2);
   selection_.Choose(2);
   world_.bench.SetAllowed(1, false);
   selection_.Choose(1);
   ASSERT_EQ(world_.boxes.shown.size(), 2u);
-  EXPECT_THAT(world_.boxes.shown[0].text,
-              testing::MatchesRegex(
-                  "The serial port \\(Comm2\\) has a problem.\r\nYou may need to select another port."
-                  "\r\n\r\nOpen of serial port 2 has failed\r\n\r\nError: \\(8002\\) .+"));
+  EXPECT_THAT(
+      world_.boxes.shown[0].text,
+      testing::StartsWith("The serial port (Comm2) has a problem.\r\nYou may need to select another port."
+                          "\r\n\r\nOpen of serial port 2 has failed\r\n\r\nError: (8002) Comm 2 "));
   EXPECT_THAT(world_.boxes.shown[1].text, testing::HasSubstr("Error: (70) "));
   EXPECT_EQ(world_.boxes.shown[1].icon, BoxIcon::kExclamation);
 }

@@ -2,29 +2,32 @@
 
 #include <gtest/gtest.h>
 
+#include <string>
 #include <vector>
 
 #include "serial/hw_serial.h"
-#include "support/simulated_world.h"
+#include "support/simulated_control_panel.h"
 
 namespace tendril::test {
 namespace {
 
-TEST(Shutdown, TakenPort_IsClosedAndGivenBackBeforeTheWindowGoes) {
+TEST(Shutdown, RequestedPort_IsClosedAndGivenBackBeforeTheWindowGoes) {
   SimulatedWorld world;
   HwSerial link(*world.device, world.time, world.time, world.log);
   link.SetCommPort(1);
   link.SetBaudRate(19200);
   link.SetPortOpen(true);
-  std::vector<int> given_back;
+  SimulatedControlPanel panel(world);
+  panel.control_panel.InitializeCommListenerInterface();
+  world.boxes.answer_yes = true;
+  panel.control_panel.AskControlPanelForPort(1);
+  world.time.Advance(100);
   int unloads = 0;
-  Shutdown shutdown(
-      link, world.time, [&](std::int16_t port) { given_back.push_back(port); }, [&] { ++unloads; });
-  shutdown.SetTakenPort(1);
+  Shutdown shutdown(link, world.time, panel.control_panel, [&] { ++unloads; });
 
   EXPECT_FALSE(shutdown.MayClose());
   EXPECT_FALSE(link.PortOpen());
-  EXPECT_EQ(given_back, std::vector<int>{1});
+  EXPECT_EQ(panel.PortRequests(), (std::vector<std::string>{"1:0", "1:1"}));  // it is out already
   world.time.Advance(99);
   EXPECT_EQ(unloads, 0);
   world.time.Advance(1);
@@ -32,14 +35,14 @@ TEST(Shutdown, TakenPort_IsClosedAndGivenBackBeforeTheWindowGoes) {
   EXPECT_TRUE(shutdown.MayClose());  // the unload's own request, or the person's second one
   world.time.Advance(1000);
   EXPECT_EQ(unloads, 1);
-  EXPECT_EQ(given_back.size(), 1u);
+  EXPECT_EQ(panel.PortRequests().size(), 2u);
 }
 
-TEST(Shutdown, WithoutATakenPort_ClosesAtOnce) {
+TEST(Shutdown, WithoutARequestedPort_ClosesAtOnce) {
   SimulatedWorld world;
   HwSerial link(*world.device, world.time, world.time, world.log);
-  Shutdown shutdown(
-      link, world.time, [](std::int16_t) { FAIL(); }, [] { FAIL(); });
+  SimulatedControlPanel panel(world);
+  Shutdown shutdown(link, world.time, panel.control_panel, [] { FAIL(); });
   EXPECT_TRUE(shutdown.MayClose());
   EXPECT_EQ(world.time.RunningTimers(), 0);
 }
