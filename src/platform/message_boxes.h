@@ -28,7 +28,7 @@ class MessageBoxes {
 
   // A box with an OK button.
   virtual void Show(const BoxMessage& message) = 0;
-  // A box with Yes and No; true for Yes. Closing it by any other way is a No.
+  // A box with Yes and No; true for Yes. No is what Enter gives; closing it by any other way is a No too.
   virtual bool AskYesNo(const BoxMessage& message) = 0;
 };
 

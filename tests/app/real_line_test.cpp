@@ -3,13 +3,17 @@
 #include <sys/resource.h>
 
 #include <QAbstractButton>
+#include <QAbstractItemView>
 #include <QApplication>
 #include <QComboBox>
+#include <QHostAddress>
 #include <QLabel>
 #include <QMessageBox>
+#include <QTcpServer>
 #include <QTest>
 #include <QTimer>
 #include <array>
+#include <cstddef>
 #include <cstdint>
 #include <filesystem>
 #include <memory>
@@ -39,12 +43,12 @@ QStringList Fault(const char* name) { return {QStringLiteral("--fault"), QString
 class RealLine : public testing::Test {
  protected:
   RealLine() {
-    // A person who reads each box and presses OK.
+    // A person who reads each box and presses OK or Yes.
     reader_.setInterval(20);
     QObject::connect(&reader_, &QTimer::timeout, &reader_, [this] {
       if (auto* box = qobject_cast<QMessageBox*>(QApplication::activeModalWidget())) {
         read_.push_back(box->text().toStdString());
-        box->accept();
+        box->button(box->button(QMessageBox::Yes) != nullptr ? QMessageBox::Yes : QMessageBox::Ok)->click();
       }
     });
     reader_.start();
@@ -61,6 +65,12 @@ class RealLine : public testing::Test {
     ports.setCurrentIndex(0);
     QTest::keyClick(&ports, Qt::Key_Down);
     ASSERT_EQ(ports.currentText().toStdString(), "Comm 1");
+  }
+  // Chooses the line that is chosen already.
+  void ChooseAgain() {
+    auto& ports = *program_->window.findChild<QComboBox*>(QStringLiteral("cmbNYX"));
+    ports.showPopup();
+    QTest::keyClick(ports.view(), Qt::Key_Return);
   }
   void Press(const char* button) {
     outcome().clear();
@@ -90,6 +100,57 @@ class RealLine : public testing::Test {
   QTimer reader_;
   std::vector<std::string> read_;
 };
+
+// The registry as its editor exports it, with the comm listener's TCP port.
+QByteArray ExportedRegistry(std::uint16_t listener_port) {
+  const QString text =
+      QStringLiteral(
+          "\ufeffWindows Registry Editor Version 5.00\r\n\r\n"
+          "[HKEY_CURRENT_USER\\Software\\Kelvane\\Shared\\NetVersion]\r\n\"Ver\"=\"2\"\r\n\r\n"
+          "[HKEY_CURRENT_USER\\Software\\Kelvane\\Shared\\Network2]\r\n\"DMXListenerPort\"=dword:%1\r\n\r\n")
+          .arg(listener_port, 8, 16, QLatin1Char('0'));
+  return {reinterpret_cast<const char*>(text.utf16()), text.size() * 2};
+}
+
+TEST_F(RealLine, PortOfTheControlPanel_ChangesHandsAndBack) {
+  std::uint16_t listener_port = 0;
+  {
+    QTcpServer finder;
+    ASSERT_TRUE(finder.listen(QHostAddress::LocalHost));
+    listener_port = finder.serverPort();
+  }
+  bench_.WriteRegistry(ExportedRegistry(listener_port));
+  bench_.Start({QStringLiteral("--control-panel"), QString::number(listener_port)}, true);
+  StartProgram();
+  ChooseComm1();
+  ASSERT_TRUE(QTest::qWaitFor([this] { return read_.size() == 2; }, kGenerousMs));
+  EXPECT_EQ(read_[0].substr(0, 62), "This serial port (Comm1) is in use by the Control Panel.\n\nThe ");
+  EXPECT_FALSE(program_->Serial1.PortOpen());
+  ASSERT_TRUE(QTest::qWaitFor(
+      [this] { return bench_.Printed().find("reply to 1: done") != std::string::npos; }, kGenerousMs));
+
+  ChooseAgain();
+  ASSERT_TRUE(program_->Serial1.PortOpen());
+  Press(kSend);
+  EXPECT_EQ(Outcome(), "SUCCESS: Send Complete!");
+  EXPECT_FALSE(program_->window.close());
+  EXPECT_FALSE(program_->Serial1.PortOpen());
+  ASSERT_TRUE(QTest::qWaitFor([this] { return !program_->window.isVisible(); }, kGenerousMs));
+  program_.reset();
+  ASSERT_TRUE(QTest::qWaitFor(
+      [this] { return bench_.Printed().find("reply to 2: done") != std::string::npos; }, kGenerousMs));
+
+  // The frames, to the byte.
+  std::size_t at = 0;
+  for (const char* frame : {"program  49 30 30 30 30 31 35 54 65 6E 64 72 69 6C 20 55 74 69 6C 69 74 79 ",
+                            "panel    31 30 30 30 30 30 30 ", "program  43 31 30 30 30 30 32 01 00 ",
+                            "panel    31 31 30 30 30 30 30 ", "program  43 32 30 30 30 30 32 01 01 ",
+                            "panel    31 32 30 30 30 30 30 "}) {
+    const std::size_t found = bench_.Printed().find(frame, at);
+    ASSERT_NE(found, std::string::npos) << frame << bench_.Printed();
+    at = found;
+  }
+}
 
 double CpuSeconds() {
   rusage usage{};

@@ -46,6 +46,7 @@ TEST(QtMessageBoxes, Question_IsYesOnlyForYes) {
   } rows[] = {
       {"Yes", [](QMessageBox& box) { box.button(QMessageBox::Yes)->click(); }, true},
       {"No", [](QMessageBox& box) { box.button(QMessageBox::No)->click(); }, false},
+      {"Enter", [](QMessageBox& box) { QTest::keyClick(&box, Qt::Key_Return); }, false},
       {"Escape", [](QMessageBox& box) { QTest::keyClick(&box, Qt::Key_Escape); }, false},
       {"its window destroyed", [&](QMessageBox&) { window.reset(); }, false},
   };

@@ -27,8 +27,8 @@ namespace tendril::test {
 class EmptyHive {
  public:
   EmptyHive() {
-    RegCreateKeyExA(HKEY_CURRENT_USER, kPath, 0, nullptr, REG_OPTION_VOLATILE, KEY_ALL_ACCESS, nullptr, &key_,
-                    nullptr);
+    RegCreateKeyExA(HKEY_CURRENT_USER, kPath, 0, nullptr, REG_OPTION_NON_VOLATILE, KEY_ALL_ACCESS, nullptr,
+                    &key_, nullptr);
     RegOverridePredefKey(HKEY_CURRENT_USER, key_);
   }
   ~EmptyHive() {

@@ -2,8 +2,10 @@
 // device.
 #pragma once
 
+#include <QByteArray>
 #include <QDeadlineTimer>
 #include <QDir>
+#include <QFile>
 #include <QFileInfo>
 #include <QProcess>
 #include <QString>
@@ -12,6 +14,7 @@
 #include <QThread>
 #include <filesystem>
 #include <stdexcept>
+#include <string>
 
 namespace tendril::test {
 
@@ -25,12 +28,13 @@ class BenchProcess {
   }
   ~BenchProcess() { Kill(); }
 
-  // Starts the bench and waits until its device is there.
-  void Start(const QStringList& options = {}) {
+  // Starts the bench and waits until its device is there. `printing`: it says what crosses the line.
+  void Start(const QStringList& options = {}, bool printing = false) {
     // The link of one that was killed; its device's name may belong to somebody else by now.
     std::filesystem::remove(Link().toStdString());
-    process_.setStandardOutputFile(QProcess::nullDevice());
-    process_.start(QStringLiteral(TENDRIL_BENCH_PROGRAM), QStringList{QStringLiteral("--quiet")} + options);
+    process_.setStandardOutputFile(folder_.filePath(QStringLiteral("bench.txt")));
+    const QStringList quiet = printing ? QStringList() : QStringList{QStringLiteral("--quiet")};
+    process_.start(QStringLiteral(TENDRIL_BENCH_PROGRAM), quiet + options);
     const QDeadlineTimer deadline(10000);
     while (!QFileInfo::exists(Link())) {
       if (deadline.hasExpired()) throw std::runtime_error("tendril-bench does not start");
@@ -42,6 +46,19 @@ class BenchProcess {
   void Kill() {
     process_.kill();
     process_.waitForFinished();
+  }
+  // What it has printed so far.
+  std::string Printed() const {
+    QFile file(folder_.filePath(QStringLiteral("bench.txt")));
+    return file.open(QIODevice::ReadOnly) ? file.readAll().toStdString() : std::string();
+  }
+  // Makes `bytes` the registry of this process.
+  void WriteRegistry(const QByteArray& bytes) {
+    QDir(folder_.path()).mkpath(QStringLiteral("kelvane"));
+    QFile file(folder_.filePath(QStringLiteral("kelvane/registry.reg")));
+    if (!file.open(QIODevice::WriteOnly) || file.write(bytes) != bytes.size()) {
+      throw std::runtime_error("the registry cannot be written");
+    }
   }
   // Where the link to the device stands.
   QString Link() const { return folder_.filePath(QStringLiteral("kelvane/ports/com1")); }

@@ -33,7 +33,8 @@ class SystemRegistry final : public RegistryStore {
   std::int32_t OpenKey(RootKey root, const std::string& path, std::uint32_t access,
                        RegistryHandle& key) override {
     HKEY opened = nullptr;
-    return Opened(RegOpenKeyExA(PredefinedKey(root), path.c_str(), 0, access, &opened), opened, key);
+    const LSTATUS code = RegOpenKeyExA(PredefinedKey(root), path.c_str(), 0, access, &opened);
+    return Opened(code, opened, key);
   }
 
   std::int32_t CreateKey(RootKey root, const std::string& path, RegistryHandle& key) override {
