@@ -105,8 +105,9 @@ void ConnectionArea::RereadCommPorts() {
   const std::vector<std::string> lines = ports_.RereadCommPorts(selected);
   ShowPorts(lines, selected);
   for (std::size_t entry = 0; entry < lines.size(); ++entry) {
-    cmbNYX_->setItemData(static_cast<int>(entry), QString::fromStdString(ports_.DescribePort(entry)),
-                         Qt::ToolTipRole);
+    const QString device = QString::fromStdString(ports_.DescribePort(entry));
+    for (const int role : {Qt::ToolTipRole, Qt::AccessibleDescriptionRole})
+      cmbNYX_->setItemData(static_cast<int>(entry), device, role);
   }
 }
 
