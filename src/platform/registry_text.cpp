@@ -328,7 +328,7 @@ void Writer::Hex(const RegistryValue& value) {
     text_.append(u"(").append(HexDigits(value.type, value.type < 0x10 ? 1 : 8)).append(u")");
   }
   text_ += u':';
-  constexpr std::size_t kBytesPerLine = 25;  // as in an export
+  constexpr std::size_t kBytesPerLine = 25;  // no wider than an export
   for (std::size_t i = 0; i < value.data.size(); ++i) {
     if (i != 0) text_ += u',';
     if (i != 0 && i % kBytesPerLine == 0) text_.append(u"\\").append(line_end_).append(u"  ");
@@ -367,7 +367,10 @@ void Writer::Key(const std::u16string& path, const RegistryKey& key) {
     Lines(key.other_lines);
     for (const auto& [name, value] : key.values) Value(name, value);
   }
-  for (const auto& [name, subkey] : key.subkeys) Key(path + u"\\" + name, *subkey);
+  for (const auto& [name, subkey] : key.subkeys) {
+    std::u16string subkey_path = path;
+    Key(subkey_path.append(u"\\").append(name), *subkey);
+  }
 }
 
 }  // namespace

@@ -1,6 +1,14 @@
 #include "platform/process_list.h"
 
 #include <gtest/gtest.h>
+
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "platform/posix/system_processes.h"
+
+#ifndef _WIN32
 #include <signal.h>
 #include <spawn.h>
 #include <stdlib.h>
@@ -8,14 +16,22 @@
 #include <sys/wait.h>
 
 #include <filesystem>
-#include <memory>
-#include <string>
-#include <vector>
-
-#include "platform/posix/system_processes.h"
+#endif
 
 namespace tendril::test {
 namespace {
+
+TEST(ProcessList, OwnProgram_Runs) {
+#ifdef _WIN32
+  const std::string name = "Platform_Core_Tests.EXE";
+#else
+  const std::string name = "Platform_Core_Tests";
+#endif
+  EXPECT_TRUE(OpenProcessList()->IsRunning(name));
+  EXPECT_FALSE(OpenProcessList()->IsRunning("x" + name));
+}
+
+#ifndef _WIN32
 
 namespace fs = std::filesystem;
 
@@ -23,6 +39,7 @@ class Process {
  public:
   Process(const std::string& program, std::vector<std::string> arguments) {
     std::vector<char*> pointers;
+    pointers.reserve(arguments.size() + 1);
     for (std::string& argument : arguments) pointers.push_back(argument.data());
     pointers.push_back(nullptr);
     char* no_environment[] = {nullptr};
@@ -80,6 +97,8 @@ TEST(ProcessList, RunningProgram_IsFoundByItsNameOrTheFileThatItRuns) {
   }
   fs::remove_all(folder);
 }
+
+#endif
 
 }  // namespace
 }  // namespace tendril::test

@@ -22,7 +22,6 @@ namespace fs = std::filesystem;
 using testing::AllOf;
 using testing::ElementsAre;
 using testing::HasSubstr;
-using testing::IsEmpty;
 using testing::SizeIs;
 
 constexpr char kText[] =
@@ -31,7 +30,7 @@ constexpr char kText[] =
     "[HKEY_USERS\\x]\n\"Data\"=hex(7):61,00,00,00,00,00\n\n";
 
 class RegistryFiles : public testing::Test {
- protected:
+ public:
   RegistryFiles() {
     std::string name = fs::temp_directory_path() / "tendril-registry-XXXXXX";
     folder = ::mkdtemp(name.data());

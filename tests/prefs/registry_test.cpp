@@ -90,7 +90,9 @@ TEST_P(EveryRegistry, KeyOpenedToBeRead_CannotBeChanged) {
 
 TEST_P(EveryRegistry, ValuesThatCannotBeUsed_GiveTheDefaultAndAWarning) {
   const Bytes too_long(Registry::kMostTextBytes + 1, 'x');
-  const Bytes longest(Registry::kMostTextBytes, 'x');
+  Bytes longest = too_long;
+  longest.pop_back();
+  longest.back() = 0;
   struct Case {
     const char* name;
     std::uint32_t type;
@@ -102,7 +104,7 @@ TEST_P(EveryRegistry, ValuesThatCannotBeUsed_GiveTheDefaultAndAWarning) {
       {"text", kRegSz, {'1', '2', '3', 0}, -7, "123"},
       {"text without terminator", kRegSz, {'1', '2', '3'}, -7, "123"},
       {"text without anything", kRegSz, {}, -7, ""},
-      {"longest text", kRegSz, longest, -7, std::string(longest.begin(), longest.end())},
+      {"longest text", kRegSz, longest, -7, std::string(longest.size() - 1, 'x')},
       {"too long a text", kRegSz, too_long, -7, "default"},
       {"text with variables", kRegExpandSz, {'%', 'X', '%', 0}, -7, "default"},
       {"number", kRegDword, {1, 2, 3, 4}, 0x04030201, "default"},

@@ -27,20 +27,21 @@ namespace tendril::test {
 class EmptyHive {
  public:
   EmptyHive() {
-    RegCreateKeyExA(HKEY_CURRENT_USER, kPath, 0, nullptr, REG_OPTION_NON_VOLATILE, KEY_ALL_ACCESS, nullptr,
-                    &key_, nullptr);
+    RegCreateKeyExA(HKEY_CURRENT_USER, path_.c_str(), 0, nullptr, REG_OPTION_NON_VOLATILE, KEY_ALL_ACCESS,
+                    nullptr, &key_, nullptr);
     RegOverridePredefKey(HKEY_CURRENT_USER, key_);
   }
   ~EmptyHive() {
     RegOverridePredefKey(HKEY_CURRENT_USER, nullptr);
     RegCloseKey(key_);
-    RegDeleteTreeA(HKEY_CURRENT_USER, kPath);
+    RegDeleteTreeA(HKEY_CURRENT_USER, path_.c_str());
   }
   EmptyHive(const EmptyHive&) = delete;
   EmptyHive& operator=(const EmptyHive&) = delete;
 
  private:
-  static constexpr char kPath[] = "Software\\Tendril test";
+  // Tests that run at the same time have a key each.
+  const std::string path_ = "Software\\Tendril test " + std::to_string(GetCurrentProcessId());
   HKEY key_ = nullptr;
 };
 
