@@ -69,7 +69,7 @@ struct ClientWorld {
   std::unique_ptr<Timer> connect_timer_ = time.CreateTimer([this] { client.OnConnectTimer(); });
   std::unique_ptr<Timer> reconnect_timer_ = time.CreateTimer([this] { client.OnReconnectTimer(); });
   std::unique_ptr<Timer> request_timer_ = time.CreateTimer([this] { client.OnRequestTimer(); });
-  CommListenerInterface client;  // lets go of the timers before they go
+  CommListenerInterface client;     // lets go of the timers before they go
   std::vector<std::string> events;  // since Events() was called last
 };
 

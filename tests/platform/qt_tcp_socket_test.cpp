@@ -44,7 +44,8 @@ TEST(QtTcpSocket, Bytes_PassBothWaysUntilThePeerCloses) {
   socket.SetEvents(
       {{}, [&] { received = socket.Receive(100); }, [&](std::int32_t number, const auto&) { end = number; }});
   socket.Connect("127.0.0.1", server.serverPort());
-  ASSERT_TRUE(WaitFor([&] { return socket.State() == TcpState::kConnected && server.hasPendingConnections(); }));
+  ASSERT_TRUE(
+      WaitFor([&] { return socket.State() == TcpState::kConnected && server.hasPendingConnections(); }));
   QTcpSocket* peer = server.nextPendingConnection();
   socket.Send(Bytes{0, 1, 255});
   EXPECT_TRUE(WaitFor([&] { return peer->bytesAvailable() == 3; }));
