@@ -8,7 +8,6 @@
 #endif
 
 #include <QCoreApplication>
-#include <QSocketNotifier>
 #include <csignal>
 #include <cstdint>
 #include <cstdio>
@@ -23,6 +22,7 @@
 #include "app/console.h"
 #include "app/paced_line.h"
 #include "app/pseudo_terminal.h"
+#include "app/quit_on_signal.h"
 #include "bench/virtual_line.h"
 #include "bench/virtual_unit.h"
 #include "platform/posix/paths.h"
@@ -33,28 +33,6 @@ namespace {
 
 constexpr int kExitUsage = 1;
 constexpr int kExitSetup = 2;
-
-// Ends the event loop when the process is told to end, so that everything is put away.
-class QuitOnSignal {
- public:
-  QuitOnSignal() {
-    if (::pipe(pipe_) != 0) throw std::runtime_error("The system has no pipe to give.");
-    notifier_ = std::make_unique<QSocketNotifier>(pipe_[0], QSocketNotifier::Read);
-    QObject::connect(notifier_.get(), &QSocketNotifier::activated, QCoreApplication::instance(),
-                     [] { QCoreApplication::quit(); });
-    struct sigaction action = {};
-    action.sa_handler = [](int) {
-      const char wake = 0;
-      (void)!::write(pipe_[1], &wake, 1);
-    };
-    for (const int signal : {SIGINT, SIGTERM, SIGHUP}) ::sigaction(signal, &action, nullptr);
-    std::signal(SIGPIPE, SIG_IGN);  // nobody reads what is printed: go on
-  }
-
- private:
-  static inline int pipe_[2] = {-1, -1};  // a signal handler reaches nothing else
-  std::unique_ptr<QSocketNotifier> notifier_;
-};
 
 // The process's name in the list of processes, by which programs see that a Control Panel runs. (macOS has no
 // call for that; --help says what to do there.)
@@ -102,7 +80,8 @@ int Run(QCoreApplication& application, const BenchOptions& options) {
 #ifdef __linux__
   ::prctl(PR_SET_TIMERSLACK, 1'000);  // ns; by default waits are 50 us longer, a tenth of a byte
 #endif
-  const QuitOnSignal quit_on_signal;
+  const QuitOnSignal quit_on_signal;  // so that everything is put away
+  std::signal(SIGPIPE, SIG_IGN);      // nobody reads what is printed: go on
   const PseudoTerminal terminal;
   // A pseudo-terminal has no RTS: the adapter at its far end goes by what the program sends.
   VirtualLine line({.echo = options.echo, .driver_follows_rts = false});

@@ -93,15 +93,22 @@ void CommListenerInterface::Disconnect() {
 }
 
 void CommListenerInterface::PrepareForShutdown() {
-  for (Timer* timer : {TCPConnectTimer_, TCPReconnectTimer_, TCPRequestTimer_}) {
-    if (timer != nullptr) timer->SetEnabled(false);
-  }
+  StopTimers();
   if (TCPCommWinsock_ != nullptr) {
     Disconnect();
+    // The owner may have connected again when it was told.
     TCPCommWinsock_->SetEvents({});
+    TCPCommWinsock_->Close();
+    StopTimers();
   }
   TCPCommWinsock_ = nullptr;
   TCPConnectTimer_ = TCPReconnectTimer_ = TCPRequestTimer_ = nullptr;
+}
+
+void CommListenerInterface::StopTimers() {
+  for (Timer* timer : {TCPConnectTimer_, TCPReconnectTimer_, TCPRequestTimer_}) {
+    if (timer != nullptr) timer->SetEnabled(false);
+  }
 }
 
 std::int32_t CommListenerInterface::LocalPort() const {
@@ -141,6 +148,7 @@ void CommListenerInterface::OnSocketConnected() {
       last_request_.reset();
     }
     Raise(events_.CommConnected);
+    if (!IsConnected()) return;  // the owner has disconnected
     SetConnectedFlag(true);
     WorkOffPendingRequests();
   } catch (...) {
@@ -177,7 +185,7 @@ void CommListenerInterface::Fail(std::int32_t code, const std::string& message, 
   request_outstanding_ = false;
   Raise(events_.CommError, code, message, tcp_error, tcp_error_message);
   SetConnectedFlag(false);
-  if (TCPReconnectTimer_ == nullptr) return;  // the owner has ended it all in one of the events
+  if (TCPReconnectTimer_ == nullptr || !Closed()) return;  // the owner has ended it all, or connects already
   TCPReconnectTimer_->SetInterval(comm_reconnect_time_);
   TCPReconnectTimer_->SetEnabled(true);
 }

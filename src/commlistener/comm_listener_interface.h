@@ -28,7 +28,7 @@ enum CLIErrorCode : std::int32_t {
   kCLICannotConnect = 8
 };
 
-// What the client tells its owner. Each may call the client again.
+// What the client tells its owner. Each may call the client again, but for SetEvents().
 struct CommListenerEvents {
   // A request was acknowledged. The status is always 0.
   std::function<void(const Bytes& payload, std::int32_t status)> CommReply = {};
@@ -78,7 +78,7 @@ class CommListenerInterface {
   // The same, closing the connection first that there is.
   void Reconnect(bool send_all_off_on_disconnect, const std::string& client_identification,
                  bool send_physical_lights_control, bool physical_lights_control);
-  // Closes the connection. A reconnect that is on its way still comes.
+  // Closes the connection. A time-out or a reconnect that is on its way still comes, and connects again.
   void Disconnect();
   // Ends everything, and lets go of the socket and the timers.
   void PrepareForShutdown();
@@ -115,7 +115,8 @@ class CommListenerInterface {
   // The socket's local port. What is set is used at the next connect; 0 lets the system choose.
   std::int32_t LocalPort() const;
   void SetLocalPort(std::int32_t port) { local_port_ = port; }
-  // Milliseconds: allowed for a connect, between a failure and the next attempt, and allowed for a reply.
+  // Milliseconds: allowed for a connect, between a failure and the next attempt, and allowed for a reply. 0 is
+  // never: no time-out, no next attempt.
   std::int32_t ConnectTimeout() const { return connect_timeout_; }
   void SetConnectTimeout(std::int32_t ms) { connect_timeout_ = ms; }
   std::int32_t CommReconnectTime() const { return comm_reconnect_time_; }
@@ -145,6 +146,7 @@ class CommListenerInterface {
   void OnRequestTimer();
 
  private:
+  void StopTimers();
   void StartConnecting();
   void OnSocketConnected();
   void OnDataArrived();

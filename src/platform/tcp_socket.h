@@ -42,8 +42,8 @@ class TcpSocket {
   virtual std::uint16_t LocalPort() const = 0;
   // Queues all of `bytes`. Ignored when not connected.
   virtual void Send(std::span<const std::uint8_t> bytes) = 0;
-  // Takes at most `limit` bytes of what has arrived; empty when there is nothing more. What is not taken is held back at the sender once a
-  // bounded buffer is full.
+  // Takes at most `limit` bytes of what has arrived; empty when there is nothing more. What is not taken is held
+  // back at the sender once a bounded buffer is full.
   virtual Bytes Receive(std::size_t limit) = 0;
 };
 

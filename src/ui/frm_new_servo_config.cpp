@@ -288,6 +288,7 @@ void frmNewServoConfig::closeEvent(QCloseEvent* event) {
   commands_.Stop();
   live_test_.OnTestButton(LiveTest::kNoButton);
   if (!shutdown_.MayClose()) {
+    setEnabled(false);  // nothing opens the port again while it is given back
     event->ignore();
     return;
   }

@@ -45,6 +45,7 @@ struct ClientWorld {
     socket.Accept();
     socket.Deliver("1000000");
     EXPECT_TRUE(client.ReadyToTransmit());
+    EXPECT_EQ(time.RunningTimers(), 0);
     socket.Take();
     Events();
   }
@@ -52,6 +53,7 @@ struct ClientWorld {
   // The next connection after a failure, within the time that it takes.
   void Reconnected() {
     EXPECT_TRUE(client.Closed());
+    EXPECT_EQ(time.RunningTimers(), 1);
     time.Advance(static_cast<std::uint64_t>(client.CommReconnectTime()));
     EXPECT_EQ(client.TCPState(), TcpState::kConnecting);
     socket.Accept();

@@ -313,6 +313,59 @@ TEST_F(ClientTest, Disconnect_ClosesAndAShutdownStopsEverything) {
   client.PrepareForShutdown();
 }
 
+TEST_F(ClientTest, Settings_CountFromTheNextConnect) {
+  client.SetRemoteAddress("10.0.0.1");
+  client.SetConnectTimeout(40);
+  client.SetCommReconnectTime(30);
+  client.SetRequestTimeout(20);
+  client.Connect(false, "x", false, true);
+  time.Advance(40);
+  EXPECT_EQ(client.CLIError(), kCLIConnectTimedOut);
+  time.Advance(30);
+  EXPECT_THAT(socket.attempts, ElementsAre("10.0.0.1:3738", "10.0.0.1:3738"));
+  socket.Accept();
+  time.Advance(20);
+  EXPECT_EQ(client.CLIError(), kCLIRequestTimedOut);
+}
+
+TEST_F(ClientTest, Reconnect_StartsAfreshWhateverWasGoingOn) {
+  ConnectIdle();
+  client.RequestCommPortControl(3);
+  client.Reconnect(true, "y", false, true);
+  socket.Take();
+  socket.Accept();
+  EXPECT_THAT(socket.Take(), ElementsAre(Frame("C200009C100002", {3, 0})));
+  socket.Deliver("10");  // cut off
+  socket.End(10054, "closed");
+  client.Reconnect(false, "z", false, true);
+  socket.Accept();
+  EXPECT_THAT(socket.Take(), ElementsAre(BytesOf("I300001z")));
+  socket.Deliver("1300000");
+  EXPECT_THAT(socket.Take(), IsEmpty());  // no "A" any more
+  time.Advance(100);
+  EXPECT_TRUE(client.ReadyToTransmit());  // the retry was called off
+  socket.Deliver("1");                    // half of something that nobody asked for
+  client.RequestCommPortControl(4);
+  socket.Deliver("1400000");
+  EXPECT_TRUE(client.ReadyToTransmit());
+}
+
+TEST_F(ClientTest, OwnerThatConnectsInsideAnEvent_GetsWhatItAskedFor) {
+  ConnectIdle();
+  client.SetEvents({.CommError = [this](std::int32_t, const std::string&, std::int32_t, const std::string&) {
+    client.Connect(false, "y", false, true);
+  }});
+  socket.End(10054, "closed");
+  socket.Accept();
+  time.Advance(200);
+  EXPECT_TRUE(client.IsConnected());
+
+  client.SetEvents({.CommClosed = [this] { client.Connect(false, "z", false, true); }});
+  client.PrepareForShutdown();
+  EXPECT_EQ(time.RunningTimers(), 0);
+  EXPECT_EQ(socket.State(), TcpState::kClosed);
+}
+
 TEST_F(ClientTest, ShutdownInsideAnEvent_EndsTheFailureThere) {
   ConnectIdle();
   client.SetEvents({.CommError = [this](std::int32_t, const std::string&, std::int32_t, const std::string&) {

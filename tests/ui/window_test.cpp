@@ -400,6 +400,7 @@ TEST_F(WindowAndControlPanel, PortThatItHolds_IsTakenAndGivenBackOnClosing) {
   world_.time.Advance(150);
 
   EXPECT_FALSE(window_->close());
+  QTest::keyClick(&Find("cmbNYX"), Qt::Key_Up);
   EXPECT_FALSE(link_.PortOpen());
   EXPECT_EQ(panel_.PortRequests(), (std::vector<std::string>{"3:0", "3:1"}));
   EXPECT_TRUE(panel_.panel.Holds(3));
@@ -410,6 +411,18 @@ TEST_F(WindowAndControlPanel, PortThatItHolds_IsTakenAndGivenBackOnClosing) {
   world_.time.Advance(60000);
   EXPECT_THAT(world_.boxes.shown, IsEmpty());
   EXPECT_EQ(panel_.PortRequests().size(), 2u);
+}
+
+TEST_F(Window, SweepOfTheDrawing_DoesNotReachAPortThatIsChosenThen) {
+  world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
+  int bytes = 0;
+  world_.bench.Line(1).SetTap([&bytes](const LineByte&) { ++bytes; });
+  Click("ServoSimulator2_0");
+  Click("cmdTest_0");
+  world_.time.Advance(600);
+  ChooseByKeys("cmbNYX", 1);
+  world_.time.Advance(3000);
+  EXPECT_EQ(bytes, 0);
 }
 
 TEST_F(WindowAndControlPanel, SecondCloseRequest_IsNotKeptWaiting) {

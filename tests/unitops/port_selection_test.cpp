@@ -104,6 +104,7 @@ TEST_F(PortSelectionTest, PortOfTheControlPanel_IsAskedForAndOpensWhenItIsChosen
   selection_.Choose(3);  // the answer is No
   EXPECT_THAT(world_.boxes.Take(), ElementsAre(Question(3)));
   EXPECT_EQ(panel_.control_panel.RequestedPort(), std::nullopt);
+  EXPECT_TRUE(panel_.control_panel.Client().PhysicalLightsControl());
 
   world_.boxes.answer_yes = true;
   selection_.Choose(3);
@@ -142,19 +143,22 @@ TEST_F(PortSelectionTest, PortThatIsNotGivenUp_IsAskedForAgainWithoutGivingItBac
   EXPECT_EQ(world_.boxes.Take().size(), 4u);
   EXPECT_FALSE(panel_.panel.Holds(3));
   EXPECT_EQ(panel_.panel.requests().back().payload, (Bytes{3, 0}));
+  EXPECT_THAT(panel_.PortRequests(), testing::Not(testing::Contains("3:1")));
 }
 
-TEST_F(PortSelectionTest, ListenerPortZero_MeansThatNobodyCanBeAsked) {
-  Registry& registry = panel_.registry;
-  registry.CreateKey(RootKey::kCurrentUser, "Software\\Kelvane\\Shared\\Network");
-  registry.SetNumber(RootKey::kCurrentUser, "Software\\Kelvane\\Shared\\Network", "DMXListenerPort", 0);
-  ControlPanel without(world_.time, world_.boxes, panel_.wsCLI, registry, panel_.processes);
-  without.ReadPreferences();
-  PortSelection selection(link_, world_.boxes, without);
-  selection.ListCommPorts();
+TEST_F(PortSelectionTest, ListenerPortBelowOne_MeansThatNobodyCanBeAsked) {
+  const RegistryBranch network = RegistryBranch::Shared(panel_.registry).Below("Network");
+  network.CreateKey();
   panel_.Take(3);
-  selection.Choose(3);
-  EXPECT_THAT(world_.boxes.Take(), ElementsAre(InUse(3)));
+  for (const int listener_port : {0, -1}) {
+    network.SetNumber("DMXListenerPort", listener_port);
+    ControlPanel without(world_.time, world_.boxes, panel_.wsCLI, panel_.registry, panel_.processes);
+    without.ReadPreferences();
+    PortSelection selection(link_, world_.boxes, without);
+    selection.ListCommPorts();
+    selection.Choose(3);
+    EXPECT_THAT(world_.boxes.Take(), ElementsAre(InUse(3)));
+  }
 }
 
 TEST(ControlPanelStart, Fault_IsShownAndTheProgramGoesOn) {

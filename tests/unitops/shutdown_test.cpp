@@ -19,6 +19,8 @@ TEST(Shutdown, RequestedPort_IsClosedAndGivenBackBeforeTheWindowGoes) {
   link.SetPortOpen(true);
   SimulatedControlPanel panel(world);
   panel.control_panel.InitializeCommListenerInterface();
+  panel.panel.AddPort(1);
+  panel.panel.SetPortHandler([&](std::uint8_t, bool held) { EXPECT_FALSE(held && link.PortOpen()); });
   world.boxes.answer_yes = true;
   panel.control_panel.AskControlPanelForPort(1);
   world.time.Advance(100);
@@ -27,6 +29,8 @@ TEST(Shutdown, RequestedPort_IsClosedAndGivenBackBeforeTheWindowGoes) {
 
   EXPECT_FALSE(shutdown.MayClose());
   EXPECT_FALSE(link.PortOpen());
+  EXPECT_EQ(link.CommPort(), 0);
+  EXPECT_EQ(panel.control_panel.RequestedPort(), std::nullopt);
   EXPECT_EQ(panel.PortRequests(), (std::vector<std::string>{"1:0", "1:1"}));  // it is out already
   world.time.Advance(99);
   EXPECT_EQ(unloads, 0);

@@ -1,0 +1,52 @@
+#include "app/quit_on_signal.h"
+
+#include <unistd.h>
+
+#include <array>
+#include <cerrno>
+#include <csignal>
+#include <system_error>
+
+namespace tendril {
+namespace {
+
+constexpr std::array kSignals{SIGINT, SIGTERM, SIGHUP};
+
+// A signal handler reaches nothing else.
+std::array<int, 2> wake_pipe{-1, -1};
+
+int OpenPipe() {
+  if (::pipe(wake_pipe.data()) != 0) throw std::system_error(errno, std::generic_category());
+  return wake_pipe[0];
+}
+
+}  // namespace
+
+QuitOnSignal::QuitOnSignal() : notifier_(OpenPipe(), QSocketNotifier::Read) {
+  QObject::connect(&notifier_, &QSocketNotifier::activated, &notifier_, [] {
+    char wake = 0;
+    (void)!::read(wake_pipe[0], &wake, 1);  // the application may go on for a while
+    QCoreApplication::quit();
+  });
+  struct sigaction action = {};
+  action.sa_handler = [](int) {
+    const char wake = 0;
+    (void)!::write(wake_pipe[1], &wake, 1);
+  };
+  for (const int signal : kSignals) {
+    struct sigaction before = {};
+    ::sigaction(signal, nullptr, &before);
+    if (before.sa_handler != SIG_IGN) ::sigaction(signal, &action, nullptr);
+  }
+}
+
+QuitOnSignal::~QuitOnSignal() {
+  for (const int signal : kSignals) {
+    struct sigaction now = {};
+    ::sigaction(signal, nullptr, &now);
+    if (now.sa_handler != SIG_IGN) std::signal(signal, SIG_DFL);
+  }
+  for (const int descriptor : wake_pipe) ::close(descriptor);
+}
+
+}  // namespace tendril
