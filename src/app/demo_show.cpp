@@ -10,6 +10,7 @@
 #include <QMouseEvent>
 #include <QPixmap>
 #include <QSpinBox>
+#include <QTimer>
 #include <cstdint>
 #include <cstdio>
 #include <span>
@@ -98,9 +99,10 @@ class Actor {
     return ended;
   }
 
-  bool SavePicture(const char* name) const {
+  bool SavePicture(const char* name) const { return SavePicture(window_, name); }
+  bool SavePicture(QWidget& shown, const char* name) const {
     const QString path = QDir(folder_).filePath(QString::fromUtf8(name));
-    const bool saved = window_.grab().save(path);
+    const bool saved = shown.grab().save(path);
     Print(saved ? "Picture: " + path.toStdString() : "This picture cannot be saved: " + path.toStdString());
     return saved;
   }
@@ -147,6 +149,19 @@ bool PassPortBackAndForth(const Actor& actor, frmNewServoConfig& window, Virtual
   const bool good = given_up && !closed_at_once && given_back;
   Print(good ? "The Control Panel has given up Comm 3, and has it back." : "Comm 3 did NOT change hands.");
   return good;
+}
+
+// Of the box that comes up for the port that the Control Panel holds.
+bool SavePictureOfQuestion(const Actor& actor) {
+  bool saved = false;
+  QTimer::singleShot(0, qApp, [&] {
+    QWidget* const box = QApplication::activeModalWidget();
+    if (box == nullptr) return;
+    saved = actor.SavePicture(*box, "window-port-in-use.png");
+    box->close();
+  });
+  actor.Choose("cmbNYX", 3);
+  return saved;
 }
 
 }  // namespace
@@ -215,7 +230,7 @@ int TakePictures(frmNewServoConfig& window, const QString& folder) {
   good = actor.SavePicture("window-summary.png") && good;
   actor.PressOnText("txtSumStopRange_3");
   good = actor.SavePicture("window-number-entry.png") && good;
-  return good ? 0 : 1;
+  return SavePictureOfQuestion(actor) && good ? 0 : 1;
 }
 
 }  // namespace tendril

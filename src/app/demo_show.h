@@ -33,8 +33,8 @@ int ShowWithoutDisplay(frmNewServoConfig& window, VirtualLine& line, const DemoU
                        VirtualControlPanel& panel, const QString& folder);
 
 // Edits channels in `window` and saves pictures of the editor with a servo, a digital and a PWM channel, of the
-// summary, and of a number entry open in it, in `folder`, which is created. Returns the program's exit code: 0 when
-// all are saved.
+// summary, of a number entry open in it, and of the question for a port, in `folder`, which is created. Returns the
+// program's exit code: 0 when all are saved.
 int TakePictures(frmNewServoConfig& window, const QString& folder);
 
 }  // namespace tendril
