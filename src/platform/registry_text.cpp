@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <optional>
+#include <stdexcept>
 #include <utility>
 
 #include "platform/registry_store.h"
@@ -11,11 +12,24 @@ namespace tendril {
 namespace {
 
 constexpr std::u16string_view kEditorHeader = u"Windows Registry Editor Version 5.00";
-constexpr std::u16string_view kOldHeader = u"REGEDIT4";
 constexpr std::string_view kUtf16Mark = "\xFF\xFE";
 constexpr std::string_view kUtf8Mark = "\xEF\xBB\xBF";
 
+// Keys, values and lines that a file may have. A path of two bytes makes a key of two hundred.
+constexpr std::size_t kMostItems = 1'000'000;
+
+// Read as something else and written again, a file in another encoding would be lost.
+void RefuseOtherForms(std::string_view bytes) {
+  const std::string_view begin = bytes.substr(0, 4);
+  const bool mark_of_utf16 = bytes.starts_with(kUtf16Mark) && begin != std::string_view("\xFF\xFE\0\0", 4);
+  const bool zeros = begin.find('\0') != begin.npos && !mark_of_utf16;
+  if (zeros || bytes.starts_with("\xFE\xFF") || bytes.starts_with("REGEDIT4")) {
+    throw std::runtime_error("it is neither UTF-16 with a byte order mark, low byte first, nor UTF-8.");
+  }
+}
+
 std::u16string Decode(std::string_view bytes, RegistryEncoding& encoding) {
+  RefuseOtherForms(bytes);
   if (!bytes.starts_with(kUtf16Mark)) {
     encoding = bytes.starts_with(kUtf8Mark) ? RegistryEncoding::kUtf8WithMark : RegistryEncoding::kUtf8;
     if (encoding == RegistryEncoding::kUtf8WithMark) bytes.remove_prefix(kUtf8Mark.size());
@@ -165,6 +179,7 @@ class Reader {
   bool ReadLine(std::u16string_view line);
   bool ReadKey(std::u16string_view line);
   bool ReadValue(std::u16string_view line);
+  void Count(std::size_t items);
 
   RegistryForm& form_;
   RegistryTree& tree_;
@@ -172,6 +187,7 @@ class Reader {
   std::u16string_view rest_;
   std::size_t line_number_ = 0;  // of the line read last
   bool line_has_end_ = false;
+  std::size_t items_ = 0;       // so far, at most kMostItems
   RegistryKey* key_ = nullptr;  // that the lines belong to
 };
 
@@ -190,7 +206,7 @@ void Reader::ReadHeader() {
   if (end != rest_.npos && (end == 0 || rest_[end - 1] != u'\r')) form_.line_end = u"\n";
   const std::u16string_view at_first_line = rest_;
   const std::u16string_view line = NextLine();
-  if (line == kEditorHeader || line == kOldHeader) {
+  if (line == kEditorHeader) {
     form_.header = line;
   } else {
     rest_ = at_first_line;
@@ -218,12 +234,19 @@ void Reader::Read(std::u16string_view text) {
     } else {
       read = ReadLine(line);
     }
+    if (!line.empty()) Count(1);
     if (read) continue;
     // What was passed over is kept as it stands.
     const std::u16string_view whole(begin, static_cast<std::size_t>(line.data() + line.size() - begin));
     (key_ != nullptr ? key_->other_lines : form_.lines_outside).emplace_back(whole);
     if (!whole.starts_with(u';')) unread_(first_number);
   }
+}
+
+void Reader::Count(std::size_t items) {
+  items_ += items;
+  if (items_ > kMostItems)
+    throw std::length_error("it has more than a million keys, values and other lines.");
 }
 
 bool Reader::ReadLine(std::u16string_view line) {
@@ -241,7 +264,9 @@ bool Reader::ReadKey(std::u16string_view line) {
     return true;
   }
   key_ = tree_.Create(line);
-  return key_ != nullptr;
+  if (key_ == nullptr) return false;
+  Count(static_cast<std::size_t>(std::count(line.begin(), line.end(), u'\\')));
+  return true;
 }
 
 bool Reader::ReadValue(std::u16string_view line) {

@@ -23,6 +23,8 @@ bool CanBeKey(std::u16string_view path) {
   while (!path.empty()) {
     const std::u16string_view part = NextPart(path);
     if (part.empty() || part.size() > RegistryTree::kMostNameUnits) return false;
+    // The registry would take them, a line of text would not.
+    if (std::any_of(part.begin(), part.end(), [](char16_t unit) { return unit < u' '; })) return false;
     if (++parts > RegistryTree::kMostParts) return false;
   }
   return true;

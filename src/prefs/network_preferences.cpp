@@ -6,8 +6,8 @@
 namespace tendril {
 namespace {
 
-constexpr std::uint8_t kRegularPort =
-    1;  // the serial port of the regular network, unless it is said otherwise
+// The serial port of the regular network, unless it is said otherwise.
+constexpr std::uint8_t kRegularPort = 1;
 
 // "NetworkKelvane" holds the port: the network has had the maker's name all along.
 constexpr PreferenceTable<NyxNetworkPreferences, 9> kNyxTable = {{
@@ -121,8 +121,10 @@ NetworkPreferences::NetworkPreferences(Registry& registry)
     : registry_(registry), networks_(kNetworks), universes_(kUniverses) {}
 
 RegistryBranch NetworkPreferences::NetworkKey() const {
+  // No key has a longer name, and the paths of a thousand keys are made with it.
+  constexpr std::size_t kLongestName = 255;
   const RegistryBranch shared = RegistryBranch::Shared(registry_);
-  return shared.Below("Network" + shared.Below("NetVersion").GetString("Ver", ""));
+  return shared.Below("Network" + shared.Below("NetVersion").GetString("Ver", "").substr(0, kLongestName));
 }
 
 void NetworkPreferences::InitFromRegistry(bool force) {

@@ -66,6 +66,15 @@ void Registry::WithKey(RegistryHandle key, const char* failure_text, const Call&
   Check(closing_code, failure_text);  // what was changed could not be kept
 }
 
+void Registry::Warn(const std::string& where, const SavedErr& failure) {
+  if (!warn_ || ++warnings_ > kMostWarnings) return;
+  try {
+    warn_(where + ": " + failure.description() + " (error " + std::to_string(failure.number()) + ").");
+  } catch (...) {
+    // That nobody hears of it changes nothing.
+  }
+}
+
 template <typename Query>
 void Registry::Get(RootKey root, const std::string& path, const std::string& name, const Query& query) {
   try {
@@ -75,10 +84,7 @@ void Registry::Get(RootKey root, const std::string& path, const std::string& nam
     Check(code, kOpenFailure);
     WithKey(key, kCloseFailure, [&] { query(key); });
   } catch (...) {
-    const SavedErr failure;
-    if (!warn_ || ++warnings_ > kMostWarnings) return;
-    warn_("Registry key \"" + path + "\", value \"" + name + "\": " + failure.description() + " (error " +
-          std::to_string(failure.number()) + ").");
+    Warn("Registry key \"" + path + "\", value \"" + name + "\"", SavedErr());
   }
 }
 

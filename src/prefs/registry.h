@@ -7,6 +7,7 @@
 #include <string_view>
 
 #include "platform/registry_store.h"
+#include "prefs/saved_err.h"
 
 namespace tendril {
 
@@ -61,6 +62,7 @@ class Registry {
   void WithKey(RegistryHandle key, const char* failure_text, const Call& call);
   template <typename Query>
   void Get(RootKey root, const std::string& path, const std::string& name, const Query& query);
+  void Warn(const std::string& where, const SavedErr& failure);
   void Set(RootKey root, const std::string& path, const std::string& name, std::uint32_t type,
            std::string_view data);
 

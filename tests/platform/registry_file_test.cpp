@@ -108,6 +108,16 @@ TEST_F(RegistryFiles, FileChangedByAnotherProgram_IsReadAgainAndNothingOfItIsLos
             "[HKEY_USERS\\x]\n\"Data\"=hex(7):61,00,00,00,00,00\n\n");
 }
 
+TEST_F(RegistryFiles, KeyLeftOpen_KeepsItsChangesAtTheEnd) {
+  {
+    Program program(path, note);
+    program.company.CreateKey();
+    program.company.OpenKey(kKeyRead);
+    program.company.SetNumber("Port", 3);
+  }
+  EXPECT_EQ(Program(path, note).company.GetNumber("Port", 7), 3);
+}
+
 TEST_F(RegistryFiles, LinkAndPermissions_Stay) {
   const fs::path real = folder / "elsewhere" / "real.reg";
   fs::create_directories(path.parent_path());
@@ -122,6 +132,17 @@ TEST_F(RegistryFiles, LinkAndPermissions_Stay) {
   EXPECT_EQ(Program(real, note).company.GetNumber("Port", 7), 4);
 }
 
+// Two thousand keys, each at the end of a path of 510 others.
+std::string DeepKeys() {
+  std::string text = "Windows Registry Editor Version 5.00\n";
+  for (int i = 0; i < 2000; ++i) {
+    text += "[HKEY_CURRENT_USER\\" + std::to_string(i);
+    for (int part = 0; part < 510; ++part) text += "\\a";
+    text += "]\n";
+  }
+  return text;
+}
+
 TEST_F(RegistryFiles, FileThatCannotBeRead_HasNoKeysAndIsNotReplaced) {
   const auto make_large = [this] {
     Write(path, kText);
@@ -130,7 +151,14 @@ TEST_F(RegistryFiles, FileThatCannotBeRead_HasNoKeysAndIsNotReplaced) {
   const auto make_pipe = [this] { ::mkfifo(path.c_str(), 0600); };
   const auto make_folder = [this] { fs::create_directory(path); };
   const std::pair<const char*, std::function<void()>> cases[] = {
-      {"larger than 64 MiB", make_large}, {"is not read", make_pipe}, {"is not read", make_folder}};
+      {"larger than 64 MiB", make_large},
+      {"is not read", make_pipe},
+      {"is not read", make_folder},
+      {"neither UTF-16", [&] { Write(path, std::string("\xFE\xFF\0W\0i", 6)); }},
+      {"neither UTF-16", [&] { Write(path, std::string("W\0i\0n\0", 6)); }},
+      {"neither UTF-16", [&] { Write(path, std::string("\xFF\xFE\0\0W\0\0\0", 8)); }},
+      {"neither UTF-16", [&] { Write(path, "REGEDIT4\r\n\"K\xE4te\"=dword:00000001\r\n"); }},
+      {"more than a million", [&] { Write(path, DeepKeys()); }}};
   for (const auto& [text, make] : cases) {
     fs::remove_all(path);
     fs::create_directories(path.parent_path());

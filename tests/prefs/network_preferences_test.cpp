@@ -2,6 +2,8 @@
 
 #include <gmock/gmock.h>
 
+#include <chrono>
+#include <string>
 #include <variant>
 
 #include "platform/runtime_error.h"
@@ -159,8 +161,9 @@ TEST(NetworkPreferences, SerialPortThatSeveralClaim_IsLeftToTheFirst) {
     int regular_left, third_left, fifteenth_left, x10_left, brisk_left;
   };
   const Case cases[] = {
-      {4, 4, 4, 4, 4, 4, 0, 0, 0, 0},         {1, 2, 3, 4, 5, 1, 2, 3, 4, 5}, {1, 2, 2, 3, 3, 1, 2, 0, 3, 0},
-      {1, 2, 3, 2, 3, 1, 2, 3, 0, 0},         {0, 0, 0, 0, 0, 0, 0, 0, 0, 0}, {0, 0, 0, 9, 9, 0, 0, 0, 9, 0},
+      {4, 4, 4, 4, 4, 4, 0, 0, 0, 0},         {1, 2, 3, 4, 5, 1, 2, 3, 4, 5},
+      {1, 2, 2, 3, 3, 1, 2, 0, 3, 0},         {1, 2, 3, 2, 3, 1, 2, 3, 0, 0},
+      {0, 0, 255, 0, 0, 0, 0, 255, 0, 0},     {0, 0, 0, 9, 9, 0, 0, 0, 9, 0},
       {256, 256, -1, 300, -1, 1, 0, 0, 0, 0},  // no bytes: as if they were missing
   };
   for (const Case& ports : cases) {
@@ -180,6 +183,32 @@ TEST(NetworkPreferences, SerialPortThatSeveralClaim_IsLeftToTheFirst) {
     EXPECT_EQ(preferences.X10Port(), ports.x10_left);
     EXPECT_EQ(preferences.BriskPort(), ports.brisk_left);
   }
+}
+
+TEST(NetworkPreferences, VersionBeyondAnyKeysName_CostsNoTime) {
+  MemoryRegistry store;
+  Registry registry(store, {});
+  const RegistryBranch version = RegistryBranch::Shared(registry).Below("NetVersion");
+  version.CreateKey();
+  version.SetString("Ver", std::string(1'000'000, '2'));
+  NetworkPreferences preferences(registry);
+  const auto begin = std::chrono::steady_clock::now();
+  preferences.InitFromRegistry(false);
+  EXPECT_LT(std::chrono::steady_clock::now() - begin, std::chrono::seconds(2));
+  EXPECT_EQ(preferences.CommListenerPort(), 8837);
+}
+
+TEST(NetworkPreferences, NetworkLoadedAlone_HasTheDefaultsThatItWasGiven) {
+  MemoryRegistry store;
+  Registry registry(store, {});
+  NyxNetworkPreferences network;
+  network.InitFromRegistry(RegistryBranch::Shared(registry), 5, true, true, 6, "10.0.0.1", 7);
+  EXPECT_EQ(network.Port, 5);
+  EXPECT_TRUE(network.OldMCP);
+  EXPECT_TRUE(network.UsesACN);
+  EXPECT_EQ(network.ACNIPType, 6);
+  EXPECT_EQ(network.ACNIPAddress, "10.0.0.1");
+  EXPECT_EQ(network.ACNSendToPort, 7);
 }
 
 TEST(NetworkPreferences, OldMcpOfTheRegularNetwork_HasADefaultOfItsOwn) {

@@ -103,6 +103,7 @@ TEST_P(EveryRegistry, ValuesThatCannotBeUsed_GiveTheDefaultAndAWarning) {
   const Case cases[] = {
       {"text", kRegSz, {'1', '2', '3', 0}, -7, "123"},
       {"text without terminator", kRegSz, {'1', '2', '3'}, -7, "123"},
+      {"text that ends with a zero", kRegSz, {'1', 0, 0}, -7, std::string("1\0", 2)},
       {"text without anything", kRegSz, {}, -7, ""},
       {"longest text", kRegSz, longest, -7, std::string(longest.size() - 1, 'x')},
       {"too long a text", kRegSz, too_long, -7, "default"},

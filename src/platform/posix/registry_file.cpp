@@ -150,7 +150,11 @@ RegistryFile::~RegistryFile() {
 }
 
 void RegistryFile::Warn(const std::string& text) const {
-  if (warn_) warn_(path_.string() + text);
+  try {
+    if (warn_) warn_(path_.string() + text);
+  } catch (...) {
+    // That nobody hears of it changes nothing.
+  }
 }
 
 RegistryFile::Stamp RegistryFile::CurrentStamp() const {
@@ -181,6 +185,7 @@ void RegistryFile::Load() {
   const Descriptor file(::open(path_.c_str(), O_RDONLY | O_NONBLOCK | O_CLOEXEC));
   const std::optional<Bytes> bytes = file.number() >= 0 ? ReadWhole(file.number(), kMostBytes) : std::nullopt;
   if (bytes) {
+    if (bytes->empty()) Warn(" is empty.");
     Parse(*bytes);
     writable_ = true;
   } else if (file.number() < 0 && (errno == ENOENT || errno == ENOTDIR)) {
@@ -209,7 +214,7 @@ std::int32_t RegistryFile::Lock() {
   std::error_code ignored;  // a folder that cannot be made shows when the lock file is
   const fs::path real = BehindLinks(path_);
   fs::create_directories(real.parent_path(), ignored);
-  Descriptor lock(::open((real.string() + ".lock").c_str(), O_RDWR | O_CREAT | O_CLOEXEC, 0644));
+  Descriptor lock(::open((real.string() + ".lock").c_str(), O_RDONLY | O_CREAT | O_CLOEXEC, 0644));
   if (lock.number() < 0) return CodeOf(errno);
   // The others hold it while they write a file: for moments.
   constexpr int kMostTries = 200;
@@ -250,7 +255,12 @@ std::int32_t RegistryFile::Settle() {
     // What could not be kept is forgotten too.
     stamp_.reset();
     try {
-      if (!Replace(BehindLinks(path_), WriteRegistryText(form_, memory_.tree()))) code = CodeOf(errno);
+      const Bytes bytes = WriteRegistryText(form_, memory_.tree());
+      if (bytes.size() > kMostBytes) {
+        code = kRegDiskFull;  // it could not be read again
+      } else if (!Replace(BehindLinks(path_), bytes)) {
+        code = CodeOf(errno);
+      }
     } catch (...) {
       code = kRegIoFailed;
     }
