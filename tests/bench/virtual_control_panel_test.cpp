@@ -8,7 +8,6 @@
 #include <string_view>
 #include <utility>
 
-#include "bench/panel_printer.h"
 #include "bench/virtual_tcp_socket.h"
 #include "support/simulated_time.h"
 
@@ -17,7 +16,6 @@ namespace {
 
 using namespace std::string_literals;
 using testing::ElementsAre;
-using testing::HasSubstr;
 using testing::IsEmpty;
 using testing::Pair;
 
@@ -183,28 +181,6 @@ TEST_F(VirtualControlPanelTest, SlowReplies_KeepTheirOrder) {
   EXPECT_EQ(said_, "");
   time_.Advance(1);
   EXPECT_EQ(said_, "11000001200000");
-}
-
-TEST(PanelPrinter, Lines_SayWhatTheBytesMean) {
-  const struct {
-    PanelSide from;
-    std::string bytes;
-    std::string meaning;
-  } cases[] = {
-      {PanelSide::kProgram, "C100002\3\0"s, "43 31 30 30 30 30 32 03 00  "},
-      {PanelSide::kProgram, "C100002\3\0"s, "request 1: give up Comm 3"},
-      {PanelSide::kProgram, "C200009C100002\3\1",
-       "request 2: repeats 1 inside, to no effect: take back Comm 3"},
-      {PanelSide::kProgram, "I000002a\n", "request 0: here is \"a.\""},
-      {PanelSide::kProgram, "P000001\1", "request 0: physical lights control on"},
-      {PanelSide::kProgram, "GE", "no request"},
-      {PanelSide::kPanel, "0100000", "reply to 1: refused"},
-      {PanelSide::kPanel, "19000", "5 bytes"},
-      {PanelSide::kPanel, std::string(10'000, 'x'), "78 78 ... (10000 bytes)"},
-  };
-  for (const auto& each : cases) {
-    EXPECT_THAT(PrintPanelBytes(1'500'000, each.from, Raw(each.bytes)), HasSubstr(each.meaning));
-  }
 }
 
 class VirtualTcpSocketTest : public testing::Test {

@@ -16,18 +16,6 @@ namespace {
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-TEST_F(ClientTest, FreshClient_HasTheStatedDefaults) {
-  EXPECT_EQ(client.RemoteAddress(), "127.0.0.1");
-  EXPECT_EQ(client.RemotePort(), 3738);
-  EXPECT_EQ(client.LocalPort(), 0);
-  EXPECT_EQ(client.ConnectTimeout(), 5000);
-  EXPECT_EQ(client.CommReconnectTime(), 100);
-  EXPECT_EQ(client.RequestTimeout(), 1000);
-  EXPECT_TRUE(client.PhysicalLightsControl());
-  EXPECT_FALSE(client.Active());
-  EXPECT_TRUE(client.Closed());
-}
-
 TEST(CommListenerControls, MissingOnes_AreNamedInTheirOrder) {
   SimulatedTime time;
   ScriptedSocket socket;
