@@ -60,8 +60,10 @@ class HwSerial {
   HwSerial(const HwSerial&) = delete;
   HwSerial& operator=(const HwSerial&) = delete;
 
-  // Who gets the poll replies; one host.
-  void SetPollReplyHandler(PollReplyHandler handler) { poll_reply_ = std::move(handler); }
+  // Who gets the poll replies; one host. Returns the one before, for who listens in and passes them on.
+  PollReplyHandler SetPollReplyHandler(PollReplyHandler handler) {
+    return std::exchange(poll_reply_, std::move(handler));
+  }
   // Who is told when the open port has been closed, by whom and for what reason ever; one host. The handler
   // raises nothing and does not use the link.
   void SetPortClosedHandler(std::function<void()> handler) { port_closed_ = std::move(handler); }

@@ -81,6 +81,7 @@ void SimulatedTime::Advance(std::uint64_t ms) {
   while (SimulatedTimer* timer = NextDue(until_ms)) {
     elapsed_ms_ = std::max(elapsed_ms_, timer->due_ms());
     timer->Tick();
+    if (observer_) observer_();
   }
   elapsed_ms_ = std::max(elapsed_ms_, until_ms);
 }

@@ -4,6 +4,7 @@
 #include <cstdint>
 #include <functional>
 #include <memory>
+#include <utility>
 #include <vector>
 
 #include "platform/clock.h"
@@ -29,6 +30,9 @@ class SimulatedTime final : public Clock, public TimerFactory {
   // Advances by single milliseconds until `done` or until `limit_ms` have passed; tells whether `done` held.
   bool AdvanceUntil(const std::function<bool()>& done, std::uint64_t limit_ms);
 
+  // Who is called after each tick, when all of it is over.
+  void SetObserver(std::function<void()> observer) { observer_ = std::move(observer); }
+
   std::uint64_t ElapsedMs() const { return elapsed_ms_; }
   // Timers that would tick if time went on.
   int RunningTimers() const;
@@ -44,6 +48,7 @@ class SimulatedTime final : public Clock, public TimerFactory {
   std::uint64_t periods_begun_ = 0;
   int open_period_requests_ = 0;
   std::vector<SimulatedTimer*> timers_;
+  std::function<void()> observer_;
 };
 
 }  // namespace tendril::test
