@@ -19,7 +19,7 @@ QString Tip(std::size_t index) {
 }  // namespace
 
 ApplyBoxes::ApplyBoxes(ChannelEditor& editor, const std::function<void()>& clicked, QWidget* parent)
-    : QGroupBox(QStringLiteral("Channels to Apply Changes"), parent), editor_(editor) {
+    : FrameBox(QStringLiteral("Channels to Apply Changes"), parent), editor_(editor) {
   setObjectName(QStringLiteral("fraApplyChans"));
   QGridLayout* grid = MakeChannelColumns(this);
   for (int index = 0; index <= kAllColumn; ++index) {

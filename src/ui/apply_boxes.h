@@ -2,18 +2,18 @@
 #pragma once
 
 #include <QCheckBox>
-#include <QGroupBox>
 #include <QLabel>
 #include <array>
 #include <functional>
 
 #include "config/channel_config.h"
+#include "ui/controls.h"
 #include "ui/model/channel_editor.h"
 
 namespace tendril {
 
 // The frame `fraApplyChans`: a box for each channel, and "ALL".
-class ApplyBoxes : public QGroupBox {
+class ApplyBoxes : public FrameBox {
  public:
   // Clicks go to `editor`, which must outlive the area; `clicked` is called after each.
   ApplyBoxes(ChannelEditor& editor, const std::function<void()>& clicked, QWidget* parent = nullptr);

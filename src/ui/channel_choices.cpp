@@ -1,6 +1,5 @@
 #include "ui/channel_choices.h"
 
-#include <QGroupBox>
 #include <QHBoxLayout>
 #include <QRadioButton>
 #include <QVBoxLayout>
@@ -30,7 +29,7 @@ ChannelChoices::ChannelChoices(ChannelEditor& editor, const ChannelTable& workin
   auto* column = new QVBoxLayout(this);
   column->setContentsMargins(0, 0, 0, 0);
   column->setSpacing(3);
-  auto* presets = new QGroupBox(QStringLiteral("Standard Preset Values"));
+  auto* presets = new FrameBox(QStringLiteral("Standard Preset Values"));
   cmbPresets_->setAccessibleName(presets->title());
   Describe(cmbPresets_,
            QStringLiteral("Gives all eight channels these values at once: ranges, stops, positions, and "
@@ -74,7 +73,7 @@ ChannelChoices::ChannelChoices(ChannelEditor& editor, const ChannelTable& workin
 QButtonGroup* ChannelChoices::MakeOptions(QLayout& column, const QString& title, const QString& array,
                                           const QStringList& captions, const QStringList& tips,
                                           bool side_by_side) {
-  auto* frame = new QGroupBox(title);
+  auto* frame = new FrameBox(title);
   auto* layout = new QBoxLayout(side_by_side ? QBoxLayout::LeftToRight : QBoxLayout::TopToBottom, frame);
   layout->setContentsMargins(9, 2, 9, 4);
   layout->setSpacing(2);

@@ -20,7 +20,7 @@ constexpr char kSelectedOutput[] =
 }  // namespace
 
 ChannelStrip::ChannelStrip(const ChannelTable& working, QWidget* parent)
-    : QGroupBox(QStringLiteral("Click to Select Channel"), parent), working_(working) {
+    : FrameBox(QStringLiteral("Click to Select Channel"), parent), working_(working) {
   arms_.fill(kCentrePulseWidth);
   QGridLayout* grid = MakeChannelColumns(this);
   for (int channel = 0; channel < kChannelColumns; ++channel) {

@@ -1,7 +1,6 @@
 // ChannelStrip: the eight servos.
 #pragma once
 
-#include <QGroupBox>
 #include <QPushButton>
 #include <QStackedWidget>
 #include <array>
@@ -11,10 +10,11 @@
 
 #include "config/channel_config.h"
 #include "simulator/servo_simulator.h"
+#include "ui/controls.h"
 
 namespace tendril {
 
-class ChannelStrip : public QGroupBox {
+class ChannelStrip : public FrameBox {
  public:
   // `working` are the records that are shown; they must outlive the strip.
   explicit ChannelStrip(const ChannelTable& working, QWidget* parent = nullptr);

@@ -1,6 +1,5 @@
 #include "ui/command_area.h"
 
-#include <QGroupBox>
 #include <QHBoxLayout>
 #include <QPushButton>
 #include <QVBoxLayout>
@@ -54,7 +53,7 @@ CommandArea::CommandArea(UnitCommands& commands, const UnitTarget& target, Comma
       update, QString::fromUtf8(kUpdateTip), [&commands] { commands.ChangeId(); },
       [&target] { return target.UnitId() == 0 ? QString::fromUtf8(kNoUnitZero) : QString(); });
 
-  auto* frame = Named(new QGroupBox(QStringLiteral("Unit")), QStringLiteral("frmUpDownLoad"));
+  auto* frame = Named(new FrameBox(QStringLiteral("Unit")), QStringLiteral("frmUpDownLoad"));
   auto* commands_row = new QHBoxLayout(frame);
   commands_row->setContentsMargins(7, 4, 7, 6);
   commands_row->setSpacing(5);

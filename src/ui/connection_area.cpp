@@ -1,6 +1,5 @@
 #include "ui/connection_area.h"
 
-#include <QGroupBox>
 #include <QHBoxLayout>
 #include <QLabel>
 #include <QSignalBlocker>
@@ -47,7 +46,7 @@ ConnectionArea::ConnectionArea(PortSelection& ports, QWidget* parent)
   cmbNYX_->setAccessibleName(QStringLiteral("Comm Port"));
 
   auto* id_label = new QLabel(QStringLiteral("Select Unit &ID"));
-  auto* group = new QGroupBox(QStringLiteral("Connection"));
+  auto* group = new FrameBox(QStringLiteral("Connection"));
   auto* row = new QHBoxLayout(group);
   row->setContentsMargins(7, 4, 7, 6);
   row->setSpacing(5);

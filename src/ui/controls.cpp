@@ -1,8 +1,10 @@
 #include "ui/controls.h"
 
 #include <QAbstractButton>
+#include <QPainter>
 #include <QPalette>
 #include <QSignalBlocker>
+#include <QStyleOptionGroupBox>
 #include <QWheelEvent>
 #include <algorithm>
 
@@ -52,6 +54,15 @@ void CalmSpinBox::wheelEvent(QWheelEvent* event) {
   } else {
     event->ignore();
   }
+}
+
+void FrameBox::paintEvent(QPaintEvent* /*event*/) {
+  QPainter painter(this);
+  // The picture's corners are made for one pixel to a unit.
+  painter.setRenderHint(QPainter::SmoothPixmapTransform, devicePixelRatioF() != 1);
+  QStyleOptionGroupBox option;
+  initStyleOption(&option);
+  style()->drawComplexControl(QStyle::CC_GroupBox, &option, &painter, this);
 }
 
 QString ArrayName(const QString& array, int index) { return QStringLiteral("%1_%2").arg(array).arg(index); }

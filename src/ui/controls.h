@@ -3,6 +3,7 @@
 
 #include <QButtonGroup>
 #include <QComboBox>
+#include <QGroupBox>
 #include <QLabel>
 #include <QPoint>
 #include <QSpinBox>
@@ -42,6 +43,16 @@ class CalmSpinBox : public QSpinBox {
 
   BoundedValue shown_;
   bool held_ = false;  // an arrow may be: new limits would end its repetition
+};
+
+// A group box that is painted several times as fast. A style may stretch the picture of a frame over the whole box;
+// Qt's own group box has that done smoothly, by threads that must first be started, and it looks the same.
+class FrameBox : public QGroupBox {
+ public:
+  using QGroupBox::QGroupBox;
+
+ protected:
+  void paintEvent(QPaintEvent* event) override;
 };
 
 // Gives `widget` its design name, and returns it.

@@ -1,6 +1,5 @@
 #include "ui/editor_area.h"
 
-#include <QGroupBox>
 #include <QHBoxLayout>
 #include <QVBoxLayout>
 #include <utility>
@@ -30,7 +29,7 @@ EditorArea::EditorArea(ChannelEditor& editor, const ChannelTable& working, Event
 }
 
 QWidget* EditorArea::MakeServo() {
-  auto* frame = new QGroupBox(QStringLiteral("Channel"));
+  auto* frame = new FrameBox(QStringLiteral("Channel"));
   ServoSimulator1_ = Named(new ServoSimulator, QStringLiteral("ServoSimulator1"));
   Disable(ServoSimulator1_, QStringLiteral("The chosen channel's servo."));
   QObject::connect(ServoSimulator1_, &ServoSimulator::Resized, this,

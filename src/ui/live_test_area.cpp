@@ -51,7 +51,7 @@ QString TestName(int button, bool running) {
 
 }  // namespace
 
-LiveTestArea::LiveTestArea(QWidget* parent) : QGroupBox(QStringLiteral("Live Test"), parent) {
+LiveTestArea::LiveTestArea(QWidget* parent) : FrameBox(QStringLiteral("Live Test"), parent) {
   chkSendSlideCommands_ = Named(new QCheckBox(QStringLiteral("Use Slider to Test Intensity Values")),
                                 QStringLiteral("chkSendSlideCommands"));
   Describe(chkSendSlideCommands_, QString::fromUtf8(kSendsTip));
@@ -153,7 +153,7 @@ bool LiveTestArea::SliderSends() const { return chkSendSlideCommands_->isChecked
 void LiveTestArea::ClearSliderSends() { chkSendSlideCommands_->setChecked(false); }
 
 void LiveTestArea::changeEvent(QEvent* event) {
-  QGroupBox::changeEvent(event);
+  FrameBox::changeEvent(event);
   if (event->type() == QEvent::PaletteChange) ColourWarning();
 }
 

@@ -2,13 +2,13 @@
 #pragma once
 
 #include <QCheckBox>
-#include <QGroupBox>
 #include <QLabel>
 #include <QPushButton>
 #include <QSlider>
 #include <QString>
 #include <array>
 
+#include "ui/controls.h"
 #include "unitops/live_test.h"
 #include "unitops/running_command.h"
 
@@ -16,7 +16,7 @@ namespace tendril {
 
 // The slider, its read-outs and its box lie in the area itself. The test buttons stand elsewhere, each beside
 // the parameter that it tests.
-class LiveTestArea : public QGroupBox, public LiveTestView {
+class LiveTestArea : public FrameBox, public LiveTestView {
  public:
   explicit LiveTestArea(QWidget* parent = nullptr);
 

@@ -93,7 +93,7 @@ QString PhysicalValue(Parameter parameter, const ChannelConfig& values) {
 MotionParameters::MotionParameters(ChannelEditor& editor, Events events,
                                    const std::array<QPushButton*, LiveTest::kTestButtons>& test_buttons,
                                    QWidget* parent)
-    : QGroupBox(QStringLiteral("Motion Parameters"), parent),
+    : FrameBox(QStringLiteral("Motion Parameters"), parent),
       editor_(editor),
       events_(std::move(events)),
       lblActPulseLeft_(Named(BoldLabel({}), QStringLiteral("lblActPulseLeft"))) {
@@ -139,7 +139,7 @@ MotionParameters::MotionParameters(ChannelEditor& editor, Events events,
 
 bool MotionParameters::eventFilter(QObject* object, QEvent* event) {
   if (event->type() == QEvent::MouseButtonPress) events_.values_wanted(*static_cast<QWidget*>(object));
-  return QGroupBox::eventFilter(object, event);
+  return FrameBox::eventFilter(object, event);
 }
 
 void MotionParameters::ShowValues() {

@@ -1,7 +1,6 @@
 // MotionParameters: the six parameters that spin buttons set, each with its test beside it.
 #pragma once
 
-#include <QGroupBox>
 #include <QLabel>
 #include <QPushButton>
 #include <array>
@@ -14,7 +13,7 @@
 namespace tendril {
 
 // Shows what ChannelEditor holds, and brings it what the person sets.
-class MotionParameters : public QGroupBox {
+class MotionParameters : public FrameBox {
  public:
   struct Events {
     std::function<void(FollowUp)> edited;                     // the records have changed

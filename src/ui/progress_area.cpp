@@ -29,7 +29,7 @@ QColor Shade(ProgressColour colour, bool dark) {
 
 ProgressArea::ProgressArea(QWidget* parent)
     // The title stands until there is more to say, and keeps room for that.
-    : QGroupBox(QStringLiteral("Progress"), parent),
+    : FrameBox(QStringLiteral("Progress"), parent),
       pctProgress_(Named(new QWidget(this), QStringLiteral("pctProgress"))),
       ShapeProgress_(Named(new QWidget(pctProgress_), QStringLiteral("ShapeProgress"))),
       lblProgress_(Named(new QLabel(this), QStringLiteral("lblProgress"))) {
@@ -82,7 +82,7 @@ void ProgressArea::SetText(const std::string& text) {
 }
 
 void ProgressArea::changeEvent(QEvent* event) {
-  QGroupBox::changeEvent(event);
+  FrameBox::changeEvent(event);
   if (event->type() == QEvent::PaletteChange) ApplyColour();
 }
 

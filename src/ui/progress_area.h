@@ -1,11 +1,11 @@
 // ProgressArea: the bar that shows that a unit command runs, and how it ended.
 #pragma once
 
-#include <QGroupBox>
 #include <QLabel>
 #include <QStackedLayout>
 #include <QWidget>
 
+#include "ui/controls.h"
 #include "unitops/command_progress.h"
 #include "unitops/running_command.h"
 
@@ -13,7 +13,7 @@ namespace tendril {
 
 // The frame `frmProgress`. It shares its place with another widget, the frame of the apply boxes: nothing
 // around them moves when one gives way to the other.
-class ProgressArea : public QGroupBox, public CommandProgressView {
+class ProgressArea : public FrameBox, public CommandProgressView {
  public:
   explicit ProgressArea(QWidget* parent = nullptr);
 
