@@ -15,6 +15,8 @@
 #include <system_error>
 #include <utility>
 
+#include "platform/posix/proc_folders.h"
+
 namespace tendril {
 namespace {
 
@@ -118,7 +120,7 @@ void PseudoTerminal::ForgetClosings() const {
 
 bool PseudoTerminal::ProgramHasGone() const {
   ForgetClosings();
-  if (OpenElsewhere()) return false;
+  if (OpenInAnotherProcess(device_)) return false;
   ::tcflush(near_end_, TCIOFLUSH);
   ::tcflush(far_end_, TCIFLUSH);
   // A program that was killed leaves its exclusive mode behind, which would keep every other one out.
@@ -127,28 +129,10 @@ bool PseudoTerminal::ProgramHasGone() const {
   return true;
 }
 
-// Whether another process has the device open, as far as this user may see.
-bool PseudoTerminal::OpenElsewhere() const {
-  const std::string self = std::to_string(::getpid());
-  std::error_code error;
-  for (const fs::directory_entry& process : fs::directory_iterator("/proc", error)) {
-    const std::string id = process.path().filename().string();
-    if (id == self || id.find_first_not_of("0123456789") != std::string::npos) continue;
-    std::error_code unreadable;
-    for (fs::directory_iterator entry(process.path() / "fd", unreadable), end; !unreadable && entry != end;
-         entry.increment(unreadable)) {
-      std::error_code closed_meanwhile;
-      if (fs::read_symlink(entry->path(), closed_meanwhile) == device_) return true;
-    }
-  }
-  return false;
-}
-
 #else
 
 void PseudoTerminal::ForgetClosings() const {}
 bool PseudoTerminal::ProgramHasGone() const { return false; }
-bool PseudoTerminal::OpenElsewhere() const { return false; }
 
 #endif
 

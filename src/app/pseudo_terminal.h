@@ -48,7 +48,6 @@ class PseudoTerminal {
 
  private:
   void MakeRaw() const;
-  bool OpenElsewhere() const;
 
   std::string device_;
   int far_end_ = -1;

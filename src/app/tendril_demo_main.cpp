@@ -87,17 +87,18 @@ int main(int argc, char** argv) {
   parser.setApplicationDescription(QStringLiteral(
       "The Tendril Configuration Utility on a virtual bench. Comm 1 has working units at 01 and 0A, Comm 2 "
       "one fresh from the factory at FF, Comm 3 is held by a Control Panel that can be asked for it, and on "
-      "Comm 4 "
-      "nobody answers."));
+      "Comm 4 nobody answers."));
   parser.addHelpOption();
   const QCommandLineOption show(
       QStringLiteral("without-display"),
-      QStringLiteral("Send a configuration to unit 01, read it back, print what crosses the line, save "
-                     "pictures of the window in <folder>, and end."),
+      QStringLiteral(
+          "Send a configuration to unit 01, read it back, take Comm 3 from the Control Panel and give "
+          "it back, print what crosses the lines, save pictures of the window in <folder>, and end."),
       QStringLiteral("folder"));
   const QCommandLineOption pictures(
       QStringLiteral("pictures"),
-      QStringLiteral("Save pictures of the editor and of the summary in <folder>, and end."),
+      QStringLiteral(
+          "Save pictures of the editor, of the summary and of the question for a port in <folder>, and end."),
       QStringLiteral("folder"));
   const QCommandLineOption dark(QStringLiteral("dark"), QStringLiteral("Light text on a dark ground."));
   parser.addOptions({show, pictures, dark});

@@ -40,7 +40,7 @@ class LockedUnit final : public VirtualUnit {
   bool Attends(std::uint8_t code, std::uint64_t at_us) override;
 };
 
-// Does not hear every n-th poll.
+// Does not hear every n-th poll; `every` is at least 1.
 class DeafUnit final : public VirtualUnit {
  public:
   explicit DeafUnit(std::uint8_t id, std::size_t every = 2) : VirtualUnit(id), every_(every) {}
@@ -116,7 +116,7 @@ class UnfinishedUnit final : public VirtualUnit {
   Transmission Reply(std::uint8_t kind, const Bytes& data, std::uint64_t poll_end_us) override;
 };
 
-// Leaves out the last data byte of every n-th reply.
+// Leaves out the last data byte of every n-th reply; `every` is at least 1.
 class ShortReplyUnit final : public VirtualUnit {
  public:
   explicit ShortReplyUnit(std::uint8_t id, std::size_t every = 3) : VirtualUnit(id), every_(every) {}

@@ -97,8 +97,7 @@ std::string DescribeReply(const Bytes& packet) {
   return reply + std::to_string(data.size()) + " data bytes";
 }
 
-}  // namespace
-
+// What a packet means, given with or without its zero bytes: "set options of port 3 of unit 01".
 std::string DescribePacket(LineSide from, const Bytes& bytes) {
   const auto is_zero = [](std::uint8_t byte) { return byte == 0; };
   const auto begin = std::find_if_not(bytes.begin(), bytes.end(), is_zero);
@@ -108,6 +107,8 @@ std::string DescribePacket(LineSide from, const Bytes& bytes) {
   const Bytes packet(begin, std::find_if(begin, bytes.end(), is_zero));
   return from == LineSide::kProgram ? DescribeCommand(packet) : DescribeReply(packet);
 }
+
+}  // namespace
 
 LinePrinter::LinePrinter(std::function<void(const std::string&)> print) : print_(std::move(print)) {}
 

@@ -34,7 +34,4 @@ class LinePrinter {
   bool has_content_ = false;  // one of bytes_ is not zero
 };
 
-// What a packet means, given with or without its zero bytes: "set options of port 3 of unit 01".
-std::string DescribePacket(LineSide from, const Bytes& bytes);
-
 }  // namespace tendril

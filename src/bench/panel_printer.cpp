@@ -55,8 +55,7 @@ std::string DescribeRequest(const PanelRequest& request) {
   }
 }
 
-}  // namespace
-
+// What bytes on a connection mean: "request 1: give up Comm 3".
 std::string DescribePanelBytes(PanelSide from, std::span<const std::uint8_t> bytes) {
   const std::optional<PanelRequest> frame = ParsePanelFrame(bytes);
   if (from == PanelSide::kPanel) {
@@ -72,6 +71,8 @@ std::string DescribePanelBytes(PanelSide from, std::span<const std::uint8_t> byt
   return text + "repeats " + static_cast<char>(inner->sequence) +
          " inside, to no effect: " + DescribeRequest(*inner);
 }
+
+}  // namespace
 
 std::string PrintPanelBytes(std::uint64_t at_us, PanelSide from, std::span<const std::uint8_t> bytes) {
   char time_and_side[32];

@@ -16,7 +16,4 @@ namespace tendril {
 //     3.284402  panel    31 31 30 30 30 30 30                            reply to 1: done
 std::string PrintPanelBytes(std::uint64_t at_us, PanelSide from, std::span<const std::uint8_t> bytes);
 
-// What bytes on a connection mean: "request 1: give up Comm 3".
-std::string DescribePanelBytes(PanelSide from, std::span<const std::uint8_t> bytes);
-
 }  // namespace tendril

@@ -132,8 +132,8 @@ class VirtualControlPanel {
   std::vector<PanelSession*> sessions_;
 };
 
-// What carries a session. Both are called from within Receive() and from timers, and must not destroy the
-// session.
+// What carries a session. Both are called from within Receive() and SetListener(), and from timers, and must
+// not destroy the session.
 struct PanelConnection {
   std::function<void(std::span<const std::uint8_t> bytes)> send;
   std::function<void()> hang_up;  // once, and the last call

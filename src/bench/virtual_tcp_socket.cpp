@@ -11,10 +11,6 @@ constexpr char kPanelHost[] = "127.0.0.1";
 constexpr std::uint16_t kChosenPort = 49152;  // what a system gives who does not care
 constexpr std::int32_t kEventDelayMs = 1;     // the least that a timer can wait
 
-// The platform's published socket error numbers.
-constexpr std::int32_t kConnectionReset = 10054;
-constexpr std::int32_t kConnectionRefused = 10061;
-
 }  // namespace
 
 VirtualTcpSocket::VirtualTcpSocket(VirtualControlPanel& panel, std::uint16_t panel_port, TimerFactory& timers)

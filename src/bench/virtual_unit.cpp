@@ -125,11 +125,9 @@ void VirtualUnit::HandleConfiguration(const Bytes& packet, bool unlocked, std::u
 }
 
 void VirtualUnit::Apply(std::uint8_t code, const Bytes& body, std::uint64_t at_us) {
-  if (code == kSetAddress) {
-    TakeAddress(body[0], at_us);
-  } else if (body[0] != kServoOption) {
-    other_options_[body[0]] = body;
-  } else if (body[1] == kLivePosition) {
+  if (code == kSetAddress) return TakeAddress(body[0], at_us);
+  if (body[0] != kServoOption) return;  // accepted; what it does is not seen on the line
+  if (body[1] == kLivePosition) {
     for (int port = 1; port <= kUnitPorts; ++port) {
       if ((body[2] >> (port - 1) & 1) != 0) live_positions_[SlotOf(port)] = body[3];
     }

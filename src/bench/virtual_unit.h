@@ -19,7 +19,6 @@
 #include <array>
 #include <cstddef>
 #include <cstdint>
-#include <map>
 #include <optional>
 #include <vector>
 
@@ -69,8 +68,6 @@ class VirtualUnit : public LineUnit {
   void SetPortOptions(int port, const PortOptionBytes& options);
   // The position that live commands gave to `port`, in units of 10 microseconds; nothing before the first.
   std::optional<std::uint8_t> LivePosition(int port) const;
-  // The body of the last command for an option that is none of the above, by option number.
-  const std::map<std::uint8_t, Bytes>& OtherOptions() const { return other_options_; }
 
   std::size_t accepted_commands() const { return accepted_commands_; }
   const std::vector<Rejection>& rejections() const { return rejections_; }
@@ -99,7 +96,6 @@ class VirtualUnit : public LineUnit {
   ReplyTiming timing_;
   std::array<PortOptionBytes, kUnitPorts> ports_;
   std::array<std::optional<std::uint8_t>, kUnitPorts> live_positions_;
-  std::map<std::uint8_t, Bytes> other_options_;
 
   Bytes packet_;                // since the last zero byte
   bool seen_zero_ = false;      // what comes before the first zero byte is the rest of some packet

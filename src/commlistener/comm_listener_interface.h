@@ -28,7 +28,8 @@ enum CLIErrorCode : std::int32_t {
   kCLICannotConnect = 8
 };
 
-// What the client tells its owner. Each may call the client again, but for SetEvents().
+// What the client tells its owner. Each may call the client again, but for SetEvents(). CommError and CommStateChanged
+// must not raise: no further attempt to connect would follow.
 struct CommListenerEvents {
   // A request was acknowledged. The status is always 0.
   std::function<void(const Bytes& payload, std::int32_t status)> CommReply = {};
@@ -115,7 +116,7 @@ class CommListenerInterface {
   // The socket's local port. What is set is used at the next connect; 0 lets the system choose.
   std::int32_t LocalPort() const;
   void SetLocalPort(std::int32_t port) { local_port_ = port; }
-  // Milliseconds: allowed for a connect, between a failure and the next attempt, and allowed for a reply. 0 is
+  // Milliseconds, 0 or more: allowed for a connect, between a failure and the next attempt, and allowed for a reply. 0 is
   // never: no time-out, no next attempt.
   std::int32_t ConnectTimeout() const { return connect_timeout_; }
   void SetConnectTimeout(std::int32_t ms) { connect_timeout_ = ms; }

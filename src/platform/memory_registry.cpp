@@ -17,7 +17,6 @@ std::u16string TextOf(const std::string& ansi) {
   return AnsiText({reinterpret_cast<const std::uint8_t*>(ansi.data()), ansi.size()});
 }
 
-// No default, so that a new root key is not forgotten.
 std::u16string RootName(RootKey root) {
   switch (root) {
     case RootKey::kClassesRoot:

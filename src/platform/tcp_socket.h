@@ -16,11 +16,15 @@ struct TcpEvents {
   std::function<void()> connected;
   std::function<void()> data_arrived;
   // The attempt or the connection ended by itself: refused, closed by the peer, unreachable. The socket is
-  // closed when this comes, comes once an attempt, and never after Close().
+  // closed when this comes; it comes once an attempt, and never after Close().
   std::function<void(std::int32_t number, const std::string& description)> ended;
 };
 
-// The states of a socket that its owner tells apart, with the numbers of the platform's published list.
+// Why a connection ended, in the numbers of the platform's published list.
+inline constexpr std::int32_t kConnectionReset = 10054;
+inline constexpr std::int32_t kConnectionRefused = 10061;
+
+// The states of a socket that its owner tells apart, with the numbers of that list.
 enum class TcpState : std::int32_t { kClosed = 0, kConnecting = 6, kConnected = 7 };
 
 // One connection at a time; Connect() may be called again after the connection has ended.

@@ -4,7 +4,6 @@
 #include <cstddef>
 #include <cstdint>
 #include <string>
-#include <string_view>
 #include <vector>
 
 #include "prefs/registry.h"
@@ -72,7 +71,6 @@ class NetworkPreferences {
   void CopyFrom(const NetworkPreferences& other);
   bool DiffersFrom(const NetworkPreferences& other) const;
 
-  bool IsInitialised() const { return initialised_; }
   bool ListNetworks() const { return general_.ListNetworks; }
   void SetListNetworks(bool list) { general_.ListNetworks = list; }
   // Serial port number of the Brisk network; 0 = none.

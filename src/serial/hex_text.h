@@ -1,4 +1,4 @@
-// Bytes as text, the way the serial link's log and trace lines show them.
+// Bytes in hexadecimal: in the serial link's log and trace lines, and in what a person is told.
 #pragma once
 
 #include <cstdint>
@@ -7,20 +7,18 @@
 
 namespace tendril {
 
+inline constexpr char kHexDigits[] = "0123456789ABCDEF";
+
 // Two upper-case digits, as unit IDs are written: "0A".
-inline std::string TwoHexDigits(std::uint8_t byte) {
-  constexpr char kDigits[] = "0123456789ABCDEF";
-  return {kDigits[byte / 16], kDigits[byte % 16]};
-}
+inline std::string TwoHexDigits(std::uint8_t byte) { return {kHexDigits[byte / 16], kHexDigits[byte % 16]}; }
 
 // Upper-case hexadecimal without leading zeros, `separator` between the bytes: "0-5-3-80".
 inline std::string HexList(std::span<const std::uint8_t> bytes, char separator) {
-  constexpr char kDigits[] = "0123456789ABCDEF";
   std::string text;
   for (const std::uint8_t byte : bytes) {
     if (!text.empty()) text += separator;
-    if (byte >= 16) text += kDigits[byte / 16];
-    text += kDigits[byte % 16];
+    if (byte >= 16) text += kHexDigits[byte / 16];
+    text += kHexDigits[byte % 16];
   }
   return text;
 }

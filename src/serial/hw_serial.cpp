@@ -76,11 +76,6 @@ void HwSerial::OpenPort() {
 
   const std::string port = std::to_string(comm_port_);
   std::string stage = "Setting Baud Rate";
-  const auto fail = [&](std::int32_t number, const std::string& description) {
-    ClosePort();
-    throw RuntimeError(number, "Open of serial port " + port + " has failed\r\n\r\nError: (" +
-                                   std::to_string(number) + ") " + description + "\r\nWhile: " + stage);
-  };
   try {
     const std::string settings = SpeedText(baud_rate_) + ",N,8,1";
     opened_speed_ = baud_rate_;
@@ -96,10 +91,12 @@ void HwSerial::OpenPort() {
     stage = "Setting RTS on";
     device_.SetRts(true);
     port_open_ = true;
-  } catch (const RuntimeError& error) {
-    fail(error.number(), error.description());
   } catch (...) {
-    fail(kErrInternal, DescribeCurrentFault());
+    const RuntimeError fault = CurrentFault();
+    ClosePort();
+    throw RuntimeError(fault.number(), "Open of serial port " + port + " has failed\r\n\r\nError: (" +
+                                           std::to_string(fault.number()) + ") " + fault.description() +
+                                           "\r\nWhile: " + stage);
   }
 }
 

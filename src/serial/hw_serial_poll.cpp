@@ -73,6 +73,7 @@ bool HwSerial::cmdPollStation(std::uint8_t unit, std::uint8_t kind) {
 
 std::uint32_t HwSerial::PollTimeOutMs(std::uint8_t kind) const {
   const double bytes = static_cast<double>(device_.PendingOutput()) + kPollAndReplyBytes + poll_pad_;
+  // Twice what poll and reply take on the line.
   const double ms = bytes * kBitsPerByte * 1000 / opened_speed_ * 2;
   return static_cast<std::uint32_t>(RoundHalfToEven(ms)) + (IsSlowKind(kind) ? kSlowKindExtraMs : 0);
 }

@@ -153,10 +153,6 @@ class ServoDial {
   double limit_end() const { return limit_.end; }
   double stops_start() const { return stops_.start; }
   double stops_end() const { return stops_.end; }
-  bool neutral_shown() const { return neutral_shown_; }
-  bool default_shown() const { return default_shown_; }
-  bool limit_shown() const { return limit_shown_; }
-  bool stops_shown() const { return stops_shown_; }
   // The pulse width that the arm stands for: the one given, or that of the degrees given.
   std::int64_t arm_pulse() const { return arm_pulse_; }
 

@@ -58,12 +58,11 @@ ApplyBoxes::ApplyBoxes(ChannelEditor& editor, const std::function<void()>& click
 }
 
 void ApplyBoxes::ShowEditing(bool editing) {
+  const QString why_not =
+      editing ? QString() : QStringLiteral("In the summary each change goes to its own channel alone.");
   for (QLabel* label : lblUpdateNum_) label->setEnabled(editing);
   for (std::size_t index = 0; index < chkUpdate_.size(); ++index) {
-    chkUpdate_[index]->setEnabled(editing);
-    Describe(
-        chkUpdate_[index],
-        editing ? Tip(index) : QStringLiteral("In the summary each change goes to its own channel alone."));
+    EnableUnless(why_not, chkUpdate_[index], Tip(index));
   }
 }
 

@@ -8,16 +8,17 @@
 namespace tendril {
 namespace {
 
-constexpr char kNoChannel[] = "Click a servo first, to choose its channel.";
-
-}  // namespace
-
+// In the order of ChannelConfig's values.
 const QStringList kPowerUpCaptions{QStringLiteral("Move to Default Position"),
                                    QStringLiteral("Move to Neutral Position"),
                                    QStringLiteral("Start Pulse on First Command")};
 const QStringList kLostCommCaptions{
     QStringLiteral("Hold at Current Position"), QStringLiteral("Move to Default Position"),
     QStringLiteral("Move to Neutral Position"), QStringLiteral("Stop Pulse / Start on First Command")};
+
+constexpr char kNoChannel[] = "Click a servo first, to choose its channel.";
+
+}  // namespace
 
 ChannelChoices::ChannelChoices(ChannelEditor& editor, const ChannelTable& working, Events events,
                                QWidget* parent)
@@ -102,10 +103,8 @@ void ChannelChoices::ShowChoices() {
   CheckOnly(*optChannelType_, record.PortType + 1);
   CheckOnly(*optPowerUp_, record.PowerUPOpt);
   CheckOnly(*optLostComm_, record.LostCommOption);
-  for (const auto& [button, tip] : options_) {
-    button->setEnabled(channel.has_value());
-    Describe(button, channel ? tip : QString::fromUtf8(kNoChannel));
-  }
+  const QString why_not = channel ? QString() : QString::fromUtf8(kNoChannel);
+  for (const auto& [button, tip] : options_) EnableUnless(why_not, button, tip);
 }
 
 }  // namespace tendril

@@ -16,10 +16,6 @@
 
 namespace tendril {
 
-// "Move to Default Position" and so on, in the order of ChannelConfig's values.
-extern const QStringList kPowerUpCaptions;
-extern const QStringList kLostCommCaptions;
-
 class ChannelChoices : public QWidget {
  public:
   // What only the window can carry out.

@@ -26,11 +26,9 @@ void CommandButtons::Add(QAbstractButton* button, const QString& tip, std::funct
 
 void CommandButtons::ShowRunning(const RunningCommand& running) {
   for (const auto& [button, tip, objection] : entries_) {
-    const QString why_not = running.Active() ? QString::fromStdString(running.What())
-                            : objection      ? objection()
-                                             : QString();
-    button->setEnabled(why_not.isEmpty());
-    Describe(button, why_not.isEmpty() ? tip : why_not);
+    QString why_not = QString::fromStdString(running.What());
+    if (why_not.isEmpty() && objection) why_not = objection();
+    EnableUnless(why_not, button, tip);
   }
 }
 
@@ -75,9 +73,8 @@ CommandArea::CommandArea(UnitCommands& commands, const UnitTarget& target, Comma
 }
 
 void CommandArea::ShowSummaryButton(bool enabled) {
-  cmdShowSummary_->setEnabled(enabled);
-  Describe(cmdShowSummary_, enabled ? QStringLiteral("Shows all eight channels in one table.")
-                                    : QStringLiteral("The summary is shown. \"Simulator\" goes back."));
+  EnableUnless(enabled ? QString() : QStringLiteral("The summary is shown. \"Simulator\" goes back."),
+               cmdShowSummary_, QStringLiteral("Shows all eight channels in one table."));
 }
 
 void CommandArea::DisableExportAndImport() {

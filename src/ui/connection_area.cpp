@@ -111,17 +111,11 @@ void ConnectionArea::RereadCommPorts() {
 }
 
 void ConnectionArea::ShowRunning(const RunningCommand& running) {
-  const QString what = QString::fromStdString(running.What());
-  const auto show = [&](QComboBox* box, const char* tip) {
-    if (running.Active()) {
-      Disable(box, what);
-    } else {
-      box->setEnabled(true);
-      Describe(box, QString::fromUtf8(tip));
-    }
-  };
-  show(cmbNYX_, kPortTip);
-  for (std::size_t digit = 0; digit < CmbUnitID_.size(); ++digit) show(CmbUnitID_[digit], kUnitIdTips[digit]);
+  const QString why_not = QString::fromStdString(running.What());
+  EnableUnless(why_not, cmbNYX_, QString::fromUtf8(kPortTip));
+  for (std::size_t digit = 0; digit < CmbUnitID_.size(); ++digit) {
+    EnableUnless(why_not, CmbUnitID_[digit], QString::fromUtf8(kUnitIdTips[digit]));
+  }
 }
 
 bool ConnectionArea::PortChosen() const { return cmbNYX_->currentIndex() > 0; }

@@ -74,18 +74,23 @@ void Disable(QWidget* widget, const QString& why) {
   Describe(widget, why);
 }
 
-QLabel* DimLabel(const QString& text, QWidget* parent) {
-  auto* label = new QLabel(text, parent);
+QLabel* DimLabel(const QString& text) {
+  auto* label = new QLabel(text);
   label->setForegroundRole(QPalette::PlaceholderText);
   return label;
 }
 
-QLabel* BoldLabel(const QString& text, QWidget* parent) {
-  auto* label = new QLabel(text, parent);
+QLabel* BoldLabel(const QString& text) {
+  auto* label = new QLabel(text);
   QFont font = label->font();
   font.setBold(true);
   label->setFont(font);
   return label;
+}
+
+void EnableUnless(const QString& why_not, QWidget* widget, const QString& what_it_does) {
+  widget->setEnabled(why_not.isEmpty());
+  Describe(widget, why_not.isEmpty() ? what_it_does : why_not);
 }
 
 void CheckOnly(QButtonGroup& group, int id) {

@@ -71,14 +71,17 @@ void Describe(QWidget* widget, const QString& what_it_does);
 // Disables the control; its tool tip says why.
 void Disable(QWidget* widget, const QString& why);
 
+// Enables the control and says what it does; with a reason not to, disables it and gives that.
+void EnableUnless(const QString& why_not, QWidget* widget, const QString& what_it_does);
+
 // Checks the button of an exclusive group that has this id; none when no button has it. Runs no handler of clicks.
 void CheckOnly(QButtonGroup& group, int id);
 
 // A label in the theme's less prominent text colour.
-QLabel* DimLabel(const QString& text, QWidget* parent = nullptr);
+QLabel* DimLabel(const QString& text);
 
 // A label in bold type.
-QLabel* BoldLabel(const QString& text, QWidget* parent = nullptr);
+QLabel* BoldLabel(const QString& text);
 
 // The unit of a form's measures is a fifteenth of a pixel.
 inline constexpr int kFormUnitsPerPixel = 15;

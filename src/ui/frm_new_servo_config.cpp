@@ -127,7 +127,7 @@ void frmNewServoConfig::StartUp(const Version& version) {
   connection_->ListCommPorts();
   control_panel_.ReadPreferences();
   control_panel_.InitializeCommListenerInterface();
-  simulators_.UpdateAll();
+  simulators_.UpdateAll(live_test_.ShownPosition());
   live_test_.ShowSlider();
 }
 
@@ -193,7 +193,7 @@ void frmNewServoConfig::OnPresetChosen(std::size_t preset) {
 void frmNewServoConfig::ShowRecords() {
   channels_->ShowKinds();
   ShowEditor();
-  simulators_.UpdateAll();
+  simulators_.UpdateAll(live_test_.ShownPosition());
   live_test_.ShowSlider();
 }
 

@@ -93,7 +93,7 @@ class frmNewServoConfig : public QWidget {
   LiveTestArea* live_test_area_;
   EditorArea* editor_;
   QStackedWidget* views_;
-  // Made after the first paint.
+  // Made after the first paint, or when the summary is asked for before that.
   SummaryArea* summary_ = nullptr;
   ActualsFrame* actuals_ = nullptr;
 

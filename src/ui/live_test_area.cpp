@@ -115,16 +115,12 @@ void LiveTestArea::ShowRunning(const RunningCommand& running) {
 }
 
 void LiveTestArea::EnableControls() {
-  const auto enable = [](QWidget* widget, const QString& why_not, const char* tip) {
-    widget->setEnabled(why_not.isEmpty());
-    Describe(widget, why_not.isEmpty() ? QString::fromUtf8(tip) : why_not);
-  };
-  enable(HScrollSendServoPosition_, running_command_, kSliderTip);
+  EnableUnless(running_command_, HScrollSendServoPosition_, QString::fromUtf8(kSliderTip));
   const QString why_no_test = !running_command_.isEmpty() ? running_command_
                               : SliderSends()             ? QString::fromUtf8(kSliderTestsTip)
                                                           : QString();
   for (std::size_t button = 0; button < cmdTest_.size(); ++button) {
-    enable(cmdTest_[button], why_no_test, kTests[button].tip);
+    EnableUnless(why_no_test, cmdTest_[button], QString::fromUtf8(kTests[button].tip));
   }
 }
 

@@ -32,7 +32,7 @@ ProgressArea::ProgressArea(QWidget* parent)
     : FrameBox(QStringLiteral("Progress"), parent),
       pctProgress_(Named(new QWidget(this), QStringLiteral("pctProgress"))),
       ShapeProgress_(Named(new QWidget(pctProgress_), QStringLiteral("ShapeProgress"))),
-      lblProgress_(Named(new QLabel(this), QStringLiteral("lblProgress"))) {
+      lblProgress_(Named(BoldLabel({}), QStringLiteral("lblProgress"))) {
   setObjectName(QStringLiteral("frmProgress"));
   pctProgress_->setFixedHeight(kBarHeight);
   pctProgress_->setAutoFillBackground(true);
@@ -41,9 +41,6 @@ ProgressArea::ProgressArea(QWidget* parent)
   ShapeProgress_->setAutoFillBackground(true);
   ShapeProgress_->setBackgroundRole(QPalette::Window);  // not the trough's, which it would inherit
   lblProgress_->setAlignment(Qt::AlignCenter);
-  QFont font = lblProgress_->font();
-  font.setBold(true);
-  lblProgress_->setFont(font);
 
   auto* layout = new QVBoxLayout(this);
   layout->setContentsMargins(9, 0, 9, 3);

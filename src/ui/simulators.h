@@ -15,8 +15,8 @@ class Simulators : public ServoPictures {
   // All must outlive it.
   Simulators(ChannelStrip& channels, EditorArea& editor, const ChannelEditor& ticks);
 
-  // Shows all records anew: at the start, and after anything that replaces them.
-  void UpdateAll();
+  // Shows all records anew, with the arms at `arm`: at the start, and after anything that replaces them.
+  void UpdateAll(Microseconds arm);
   // Shows the records of the ticked channels anew, and the large servo, with the arms at `arm`.
   void UpdateSimulators(Microseconds arm) override;
   void MoveArm(Microseconds position) override;
@@ -25,7 +25,6 @@ class Simulators : public ServoPictures {
   ChannelStrip& channels_;
   EditorArea& editor_;
   const ChannelEditor& ticks_;
-  Microseconds arm_ = kCentrePulseWidth;
 };
 
 }  // namespace tendril

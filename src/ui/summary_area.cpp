@@ -83,6 +83,13 @@ void LeaveWidthToColumn(QWidget* widget) {
   widget->setSizePolicy(QSizePolicy::Ignored, widget->sizePolicy().verticalPolicy());
 }
 
+// Hidden, it leaves its place empty.
+void KeepPlace(QWidget* widget) {
+  QSizePolicy policy = widget->sizePolicy();
+  policy.setRetainSizeWhenHidden(true);
+  widget->setSizePolicy(policy);
+}
+
 QLabel* MakeCaption(const char* text) {
   auto* caption = BoldLabel(QString::fromUtf8(text));
   caption->setAlignment(Qt::AlignHCenter | Qt::AlignBottom);
@@ -146,11 +153,6 @@ void SummaryArea::AddRow(QGridLayout& table, int channel) {
   const QString name = QStringLiteral("CHAN %1").arg(channel + 1);
   table.addWidget(Named(BoldLabel(name), ArrayName(QStringLiteral("lblSumChannel"), channel)), line,
                   kChannelColumn);
-  const auto keep_place = [](QWidget* widget) {
-    QSizePolicy policy = widget->sizePolicy();
-    policy.setRetainSizeWhenHidden(true);
-    widget->setSizePolicy(policy);
-  };
   int column = kValueColumn;
   for (std::size_t value = 0; value < kValues.size(); ++value) {
     const QString caption = OnOneLine(kValues[value].caption);
@@ -165,11 +167,24 @@ void SummaryArea::AddRow(QGridLayout& table, int channel) {
     // Selected, it would look as if it could be typed over.
     QObject::connect(text, &QLineEdit::selectionChanged, text, &QLineEdit::deselect);
     LeaveWidthToColumn(text);
-    keep_place(text);
+    KeepPlace(text);
     table.addWidget(text, line, column++);
     row.texts[value] = text;
   }
 
+  AddOptions(table, channel, name);
+
+  row.lblSumDIOPWM = Named(BoldLabel({}), ArrayName(QStringLiteral("lblSumDIOPWM"), channel));
+  row.lblSumDIOPWM->setAlignment(Qt::AlignCenter);
+  row.lblSumDIOPWM->hide();
+  table.addWidget(row.lblSumDIOPWM, line, kValueColumn, 1, kLastColumn - kValueColumn);
+}
+
+void SummaryArea::AddOptions(QGridLayout& table, int channel, const QString& name) {
+  const auto slot = static_cast<std::size_t>(channel);
+  Row& row = rows_[slot];
+  const int line = kHeaderLines + channel;
+  int column = kPowerUpColumn;
   row.power_up = new QButtonGroup(this);
   row.lost_comm = new QButtonGroup(this);
   for (const Option& option : kOptions) {
@@ -180,11 +195,10 @@ void SummaryArea::AddRow(QGridLayout& table, int channel) {
     button->setAccessibleName(QStringLiteral("%1, %2: %3").arg(name, what, OnOneLine(option.caption)));
     Describe(button, button->accessibleName());
     group.addButton(button, static_cast<int>(group.buttons().size()) + 1);
-    keep_place(button);
+    KeepPlace(button);
     table.addWidget(button, line, column++, Qt::AlignCenter);
     row.options.push_back(button);
   }
-  const auto slot = static_cast<std::size_t>(channel);
   QObject::connect(row.power_up, &QButtonGroup::idClicked, this, [this, slot](int id) {
     entry_->Close();
     working_.At(slot).PowerUPOpt = id;
@@ -193,11 +207,6 @@ void SummaryArea::AddRow(QGridLayout& table, int channel) {
     entry_->Close();
     working_.At(slot).LostCommOption = id;
   });
-
-  row.lblSumDIOPWM = Named(BoldLabel({}), ArrayName(QStringLiteral("lblSumDIOPWM"), channel));
-  row.lblSumDIOPWM->setAlignment(Qt::AlignCenter);
-  row.lblSumDIOPWM->hide();
-  table.addWidget(row.lblSumDIOPWM, line, kValueColumn, 1, kLastColumn - kValueColumn);
 }
 
 void SummaryArea::ShowRecords() {

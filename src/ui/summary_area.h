@@ -57,6 +57,7 @@ class SummaryArea : public QWidget {
 
   void AddHeader(QGridLayout& table);
   void AddRow(QGridLayout& table, int channel);
+  void AddOptions(QGridLayout& table, int channel, const QString& name);
   void AddTrailer(QGridLayout& table);
   QLayout* MakeButtons(UnitCommands& commands, CommandButtons& buttons, std::function<void()> back);
   void ShowRow(std::size_t channel);

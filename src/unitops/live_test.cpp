@@ -170,22 +170,19 @@ std::optional<Microseconds> LiveTest::PlaceSlider() {
   const ChannelConfig values = choice_.Values();
   const auto position_at = [&](int slider) { return SliderPulseWidth(values.VirtualRange, slider); };
   const PulsePair& stops = values.VirtualStops;
-  // What is sent is rounded, and must lie inside too.
-  const auto inside = [&](int slider) {
+  // The way back between the stops; 0 inside them. What is sent is rounded, and must lie inside too.
+  const auto way_back = [&](int slider) {
     const Microseconds position = position_at(slider);
     const Microseconds sent = Tenths(position) * 10;
-    return std::min(position, sent) >= stops[0] && std::max(position, sent) <= stops[1];
+    return std::min(position, sent) < stops[0] ? 1 : std::max(position, sent) > stops[1] ? -1 : 0;
   };
 
   int slider = view_.SliderValue();
-  bool may_send = true;
-  if (!inside(slider)) {
-    const int step = std::min(position_at(slider), Tenths(position_at(slider)) * 10) < stops[0] ? 1 : -1;
-    int pushed = slider + step;
-    while (pushed >= 0 && pushed <= kSliderMaximum && !inside(pushed)) pushed += step;
-    may_send = pushed >= 0 && pushed <= kSliderMaximum;
-    if (may_send) view_.SetSlider(slider = pushed);
-  }
+  const int step = way_back(slider);
+  int pushed = slider;
+  while (pushed >= 0 && pushed <= kSliderMaximum && way_back(pushed) != 0) pushed += step;
+  const bool may_send = pushed >= 0 && pushed <= kSliderMaximum;
+  if (may_send && step != 0) view_.SetSlider(slider = pushed);
 
   shown_position_ = position_at(slider);
   const double fraction = SliderFraction(slider);

@@ -21,7 +21,8 @@ namespace tendril {
 //   Polling --wrong reply, or third poll unanswered--> Idle (failed)
 //   Pausing --300 ms: next port's options and poll out--> Polling
 //   Pausing --300 ms after port 8--> Idle (success)
-//   Idle, Pausing --a field is invalid, or a fault--> Idle
+//   Idle, Pausing --a field is invalid--> Idle
+//   any --a fault--> Idle
 class SendOperation {
  public:
   // The poll kind of an acknowledgement.

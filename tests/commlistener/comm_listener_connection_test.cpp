@@ -43,6 +43,8 @@ TEST(CommListenerControls, MissingOnes_AreNamedInTheirOrder) {
     client.Connect(false, "x", false, true);  // cannot, and says so
     EXPECT_EQ(client.CLIErrorMessage(), "Error connecting");
     client.Disconnect();
+    client.Reconnect(false, "x", false, true);
+    EXPECT_TRUE(client.Closed());
   }
 }
 
@@ -116,12 +118,10 @@ TEST_F(ClientTest, ConnectTimeout_FailsAndTriesAgain) {
 
 TEST_F(ClientTest, SilentListener_GetsTheRequestOnceMoreInsideANewOne) {
   ConnectIdle();
-  client.SendAllOffOnDisconnect();  // "1"
-  socket.Deliver("1100000");
-  client.SendAllOffOnDisconnect();  // "2"
-  socket.Deliver("1200000");
-  client.SendAllOffOnDisconnect();  // "3"
-  socket.Deliver("1300000");
+  for (const char* reply : {"1100000", "1200000", "1300000"}) {
+    client.SendAllOffOnDisconnect();
+    socket.Deliver(reply);
+  }
   Events();
   socket.Take();
   client.RequestCommPortControl(3);
@@ -169,7 +169,6 @@ TEST(CommListenerReplies, BadReplies_EndInTheirCodeAndTheClientReconnects) {
       {"1900000", "error 5 Sequence char mismatch in comm reply|0|"},
       {"0900000", "error 5 Sequence char mismatch in comm reply|0|"},
       {"2100000", "error 5 Unexpected message identifier in comm reply|0|"},
-      {"C100000", "error 5 Unexpected message identifier in comm reply|0|"},
       {"0100000", "error 6 NAKed comm request|0|"},
       {"0100003abc", "error 6 NAKed comm request|0|"},
       {"11A0000", "error 4 Error on comm reply 37: Invalid digit byte: 65|0|"},
@@ -276,6 +275,22 @@ TEST_F(ClientTest, FaultsOfTheOwner_DoNotKeepTheClientFromReconnecting) {
   socket.Deliver("1000000");
   EXPECT_EQ(errors.back(), "Error on comm reply 11: Division by zero");
   Reconnected();
+}
+
+TEST_F(ClientTest, OwnerThatDisconnectsOrFailsInsideAnEvent_IsObeyed) {
+  client.SetEvents(
+      {.CommConnected = [this] { client.Disconnect(); }, .CommStateChanged = [this] { Note("state"); }});
+  client.Connect(false, "x", false, true);
+  socket.Accept();
+  EXPECT_THAT(Events(), IsEmpty()) << "it never counted as connected";
+  EXPECT_THAT(socket.Take(), IsEmpty());
+
+  client.SetEvents({.CommClosed = [] { throw RuntimeError(11, "Division by zero"); }});
+  client.Reconnect(false, "x", false, true);
+  socket.Accept();
+  client.Disconnect();
+  EXPECT_EQ(client.CLIErrorMessage(), "Error disconnecting");
+  EXPECT_TRUE(client.Closed());
 }
 
 TEST_F(ClientTest, Disconnect_ClosesAndAShutdownStopsEverything) {

@@ -28,7 +28,7 @@ class RequestsTest : public ClientTest {
   }
 };
 
-TEST_F(RequestsTest, PendingRequests_GoOutInTheStatedOrder) {
+TEST_F(RequestsTest, PendingRequests_GoOutInTheirOrder) {
   client.SendAllOffCommand();
   client.RequestCommPortControl(3);
   client.RelinquishCommPortControl(3);

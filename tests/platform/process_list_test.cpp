@@ -78,14 +78,14 @@ TEST(ProcessList, RunningProgram_IsFoundByItsNameOrTheFileThatItRuns) {
     const char* what;
     std::string program;
     std::vector<std::string> arguments;
-    bool found;
+    const char* seen_as;
   };
   const Case cases[] = {
-      {"its name", copy, {"x", "60"}, true},
-      {"what it was started as", sleep, {"Z:\\opt\\show\\TESTTRAY.EXE", "60"}, true},
-      {"what it was started as, without folders", sleep, {"testtray.exe", "60"}, true},
-      {"what it interprets", "/bin/sh", {"sh", folder / "testtray.exe"}, true},
-      {"a part of a name", sleep, {"/opt/NotTestTray.exe", "60"}, false},
+      {"its name", copy, {"x", "60"}, "TestTray.exe"},
+      {"what it was started as", sleep, {"Z:\\opt\\show\\TESTTRAY.EXE", "60"}, "TestTray.exe"},
+      {"what it was started as, without folders", sleep, {"testtray.exe", "60"}, "TestTray.exe"},
+      {"what it interprets", "/bin/sh", {"sh", folder / "testtray.exe"}, "TestTray.exe"},
+      {"a part of a name", sleep, {"/opt/NotTestTray.exe", "60"}, "NotTestTray.exe"},
   };
   // An interpreter that reads its program waits for the other end of the pipe.
   ASSERT_EQ(::mkfifo((folder / "testtray.exe").c_str(), 0600), 0);
@@ -93,13 +93,14 @@ TEST(ProcessList, RunningProgram_IsFoundByItsNameOrTheFileThatItRuns) {
   for (const Case& process : cases) {
     const Process running(process.program, process.arguments);
     // A process is there a moment before the system knows its arguments.
-    const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(process.found ? 20 : 0);
-    bool found = processes->IsRunning("TestTray.exe");
-    while (!found && std::chrono::steady_clock::now() < deadline)
-      found = processes->IsRunning("TestTray.exe");
-    EXPECT_EQ(found, process.found) << process.what;
+    const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(20);
+    while (!processes->IsRunning(process.seen_as) && std::chrono::steady_clock::now() < deadline) {
+    }
+    EXPECT_TRUE(processes->IsRunning(process.seen_as)) << process.what;
+    EXPECT_EQ(processes->IsRunning("TestTray.exe"), process.seen_as == std::string("TestTray.exe"))
+        << process.what;
     running.End();
-    EXPECT_FALSE(processes->IsRunning("TestTray.exe")) << "it has ended: " << process.what;
+    EXPECT_FALSE(processes->IsRunning(process.seen_as)) << "it has ended: " << process.what;
   }
   fs::remove_all(folder);
 }

@@ -55,6 +55,10 @@ TEST_P(EveryRegistry, ValuesOfEachType_ComeBack) {
 
   EXPECT_EQ(registry.GetNumber(kUser, "software\\KELVANE\\Shared\\Network", "Flag", 7), 0);
   EXPECT_EQ(RegistryBranch::Company(registry).Below("Shared\\Network").GetNumber("Flag", 7), 0);
+  for (const RootKey other :
+       {RootKey::kClassesRoot, RootKey::kLocalMachine, RootKey::kUsers, RootKey::kCurrentConfig}) {
+    EXPECT_EQ(registry.GetNumber(other, "Software\\Kelvane\\Shared\\Network", "Flag", 7), 7);
+  }
   RegistryBranch::Shared(registry).DeleteKey("Network");
   EXPECT_EQ(key.GetNumber("Flag", 7), 7);
 }
@@ -86,6 +90,8 @@ TEST_P(EveryRegistry, KeyOpenedToBeRead_CannotBeChanged) {
   EXPECT_EQ(store->SetValue(key, "X", kRegSz, {}), kRegAccessDenied);
   registry.CloseKey(key);
   EXPECT_EQ(FailureOf([&] { registry.CloseKey(key); }), "6 RegCloseKey failure");
+  EXPECT_EQ(store->SetValue(key, "X", kRegSz, {}), kRegInvalidHandle);
+  EXPECT_EQ(store->DeleteKey(key, "X"), kRegInvalidHandle);
 }
 
 TEST_P(EveryRegistry, ValuesThatCannotBeUsed_GiveTheDefaultAndAWarning) {
@@ -108,6 +114,7 @@ TEST_P(EveryRegistry, ValuesThatCannotBeUsed_GiveTheDefaultAndAWarning) {
       {"longest text", kRegSz, longest, -7, std::string(longest.size() - 1, 'x')},
       {"too long a text", kRegSz, too_long, -7, "default"},
       {"text with variables", kRegExpandSz, {'%', 'X', '%', 0}, -7, "default"},
+      {"list of texts", kRegMultiSz, {'a', 0, 'b', 0, 0}, -7, "default"},
       {"number", kRegDword, {1, 2, 3, 4}, 0x04030201, "default"},
       {"number of 3 bytes", kRegDword, {1, 2, 3}, -7, "default"},
       {"number of 8 bytes", 11, {1, 2, 3, 4, 5, 6, 7, 8}, -7, "default"},
@@ -200,6 +207,16 @@ TEST(Registry, FailureOfEachCall_IsRaisedWithItsTextOnceTheKeyIsClosed) {
       EXPECT_THAT(warning, HasSubstr(get.texts[i] + code)) << get.name;
       EXPECT_EQ(store.open_keys, 0) << get.name;
     }
+  }
+}
+
+TEST(Registry, WarningThatNobodyHears_ChangesNothing) {
+  MemoryRegistry memory;
+  UnreliableStore store(memory);
+  store.failing_call = -1;
+  for (const WarningSink& warn : {WarningSink(), WarningSink([](const std::string&) { throw 7; })}) {
+    Registry registry(store, warn);
+    EXPECT_EQ(RegistryBranch::Company(registry).GetNumber("X", 5), 5);
   }
 }
 

@@ -11,7 +11,9 @@ namespace {
 TEST(SavedErr, Raise_GivesTheCapturedErrorUnchangedAsOftenAsWanted) {
   std::optional<SavedErr> saved;
   try {
-    throw RuntimeError(kErrReadFault, "Key not found", "Registry");
+    RuntimeError failure(kErrReadFault, "Key not found", "Registry");
+    failure.SetHelp("registry.hlp", 12);
+    throw failure;
   } catch (RuntimeError& error) {
     saved.emplace();
     error.AddLine("changed after the capture");
@@ -23,6 +25,8 @@ TEST(SavedErr, Raise_GivesTheCapturedErrorUnchangedAsOftenAsWanted) {
       EXPECT_EQ(error.number(), kErrReadFault);
       EXPECT_EQ(error.description(), "Key not found");
       EXPECT_EQ(error.source(), "Registry");
+      EXPECT_EQ(error.help_file(), "registry.hlp");
+      EXPECT_EQ(error.help_context(), 12);
       error.AddLine("Trace: a caller");
     }
   }

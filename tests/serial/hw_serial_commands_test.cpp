@@ -97,6 +97,12 @@ TEST_F(HwSerialCommands, Buffering_KeepsTheNewestLightCommandOfACircuit) {
   EXPECT_TRUE(link_.Buffer().Find(5, 100)->two_byte_circuit);
   EXPECT_EQ(link_.Buffer().Find(5, 100)->intensity, 25);
 
+  for (const int without_entry : {-1, 18, 900}) {
+    link_.cmdSetoption(5, static_cast<std::int16_t>(without_entry), 1, 2, 3, 4, 5);
+  }
+  EXPECT_NE(link_.Buffer().Find(5, 17), nullptr);
+  EXPECT_EQ(link_.Buffer().Find(5, -1), nullptr);
+  device_.TakeWrites();
   link_.cmdSetoption(5, 17, 1, 2, 3, 4, 5);  // another code: clears the circuit's entry and goes out
   EXPECT_EQ(link_.Buffer().Find(5, 17), nullptr);
   EXPECT_NE(link_.Buffer().Find(5, 100), nullptr);

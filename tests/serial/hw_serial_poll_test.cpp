@@ -36,6 +36,12 @@ TEST_F(HwSerialPoll, Reply_ReleasesTheLineAfterTheEchoAndReportsOnce) {
   EXPECT_EQ(link_.LastPollPads(), 2u);
   time_.Advance(1000);
   EXPECT_EQ(replies_.size(), 1u);
+  for (const std::uint32_t pads : {200u, 201u}) {
+    PollAndEcho(100);
+    device_.Receive(Bytes(pads, 0));
+    device_.Receive({0xFE, 101, 0});
+    EXPECT_EQ(link_.LastPollPads(), pads == 200 ? 200u : 0u);
+  }
   EXPECT_EQ(time_.RunningTimers(), 0);
 }
 
@@ -97,8 +103,10 @@ TEST_F(HwSerialPoll, NoReply_EndsAtTheComputedTimeOut) {
 }
 
 TEST_F(HwSerialPoll, SilentKinds_KeepTheirTimeOutToThemselves) {
-  for (const std::uint8_t kind : {std::uint8_t{202}, std::uint8_t{203}})
-    ASSERT_TRUE((PollAndEcho(kind), time_.Advance(500), true));
+  for (const std::uint8_t kind : {std::uint8_t{202}, std::uint8_t{203}}) {
+    PollAndEcho(kind);
+    time_.Advance(500);
+  }
   EXPECT_TRUE(link_.Download(5).timed_out);
   EXPECT_TRUE(link_.Bootloader().timed_out);
   EXPECT_THAT(replies_, IsEmpty());

@@ -71,14 +71,5 @@ TEST(Packets, Checksum_BringsTheSumToZeroOrIsMarked) {
             (Bytes{0, 1, 0x0A, 0x56, 0x80, 0x80, 0}));
 }
 
-TEST(Packets, LightCommandsAndPoll_AreLaidOutAsTheUnitsReadThem) {
-  EXPECT_EQ(SetIntensityPacket(5, 1, 100), (Bytes{0, 5, 3, 1, 0x81, 0}));
-  EXPECT_EQ(SetIntensityPacket(5, 64, 50), (Bytes{0, 5, 3, 0x80, 0xC0, 0x81, 0}));
-  EXPECT_EQ(DmxIntensityPacket(5, 1, 200), (Bytes{0, 5, 8, 200, 0x81, 0}));
-  EXPECT_EQ(FadePacket(5, 1, 1, 0, 100), (Bytes{0, 5, 4, 0xF0, 0x01, 0x13, 0xEB, 0x81, 0}));
-  EXPECT_EQ(EffectPacket(5, 63, kCodeTwinkle), (Bytes{0, 5, 6, 0xBF, 0}));
-  EXPECT_EQ(PollPacket(5, 100, 45), (Bytes{0, 5, 0x88, 100, 45, 0}));
-}
-
 }  // namespace
 }  // namespace tendril

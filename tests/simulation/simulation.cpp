@@ -381,6 +381,7 @@ void Simulation::CheckRecovery() {
   CalmDown();
   LetTimePass(10'000);
   Require(panel_.control_panel.Client().IsConnected(), "the client connects again");
+  Require(panel_.control_panel.Client().ReadyToTransmit(), "a request that nobody answers is given up");
   ChoosePort("Comm 1");
   if (!link_.PortOpen()) {  // it was given back to the panel only now
     LetTimePass(5000);

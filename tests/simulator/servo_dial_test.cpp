@@ -3,7 +3,11 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <limits>
 #include <utility>
+#include <vector>
+
+#include "platform/runtime_error.h"
 
 namespace tendril {
 namespace {
@@ -17,6 +21,7 @@ TEST(ServoDial, Degrees_ConvertToDrawingAngles) {
     EXPECT_DOUBLE_EQ(ServoDial::Convert(degrees), expected / 180.0 * kDialPi) << degrees;
   }
   EXPECT_EQ(ServoDial::Convert(-90), 3.141592653238);
+  EXPECT_THROW(ServoDial::Convert(std::numeric_limits<std::int32_t>::min()), RuntimeError);
 }
 
 TEST(ServoDial, PulseWidths_BecomeDegreesWithHalvesToEven) {
@@ -131,6 +136,14 @@ TEST(ServoDial, ServoText_PrintsEachAngleInPlaceOfTheCaption) {
   std::string texts;
   for (const DialElement& element : dial.Draw(300, 300)) texts += element.text + "|";
   EXPECT_THAT(texts, testing::EndsWith("|Stops −45°|Stops +45°|Arm −12°|Neutral 0°|"));
+  dial.SetDefaultPosition(10);
+  texts.clear();
+  for (const DialElement& element : dial.Draw(300, 300)) texts += element.text + "|";
+  EXPECT_THAT(texts, testing::EndsWith("|Neutral 0°|Default +10°|"));
+  dial.DisplaySize(1);  // has room for the numbers only, and shows no markers
+  texts.clear();
+  for (const DialElement& element : dial.Draw(300, 300)) texts += element.text + "|";
+  EXPECT_THAT(texts, testing::EndsWith("|−45°|+45°|−12°|"));
 }
 
 TEST(ServoDial, Resize_DiscardsRangeLimitAndArmOnly) {

@@ -32,7 +32,7 @@ int LargestDifference(const QImage& a, const QImage& b) {
   return largest;
 }
 
-TEST(FrameBox, IsPaintedQuickly_LooksLikeTheStylesGroupBox) {
+TEST(FrameBox, PaintedByItself_LooksLikeTheStylesGroupBox) {
   for (const bool enabled : {true, false}) {
     SCOPED_TRACE(enabled);
     FrameBox frame;

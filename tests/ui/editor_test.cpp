@@ -16,10 +16,14 @@ class Editor : public Window {
  protected:
   const ChannelConfig& Record(std::size_t channel) { return window_->WorkingConfiguration().At(channel); }
   QSpinBox& Spin(const char* name) { return Find<QSpinBox>(name); }
-  void Type(const char* spin, const char* text) {
+  // Types over the value, and leaves it unfinished.
+  void TypeOver(const char* spin, const char* text) {
     Spin(spin).setFocus();
     Spin(spin).selectAll();
     QTest::keyClicks(&Spin(spin), QString::fromLatin1(text));
+  }
+  void Type(const char* spin, const char* text) {
+    TypeOver(spin, text);
     QTest::keyClick(&Spin(spin), Qt::Key_Return);
   }
   bool Checked(const char* button) { return Find<QAbstractButton>(button).isChecked(); }
@@ -58,26 +62,20 @@ TEST_F(Editor, TypedValue_CountsWhenItIsWhole) {
   auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
   ChooseByKeys("cmbNYX", 1);
   Click("ServoSimulator2_0");
-  Spin("spnDefaultPos").setFocus();
-  Spin("spnDefaultPos").selectAll();
-  QTest::keyClicks(&Spin("spnDefaultPos"), QStringLiteral("25"));
+  TypeOver("spnDefaultPos", "25");
   EXPECT_EQ(Record(0).DefaultPosition, 1500);
   QTest::keyClicks(&Spin("spnDefaultPos"), QStringLiteral("5"));
   QTest::keyClick(&Spin("spnDefaultPos"), Qt::Key_Tab);
   EXPECT_EQ(Record(0).DefaultPosition, 1755);
   // A shortcut leaves the focus where it is: what has been typed is sent all the same.
-  Spin("spnActPulseRange").setFocus();
-  Spin("spnActPulseRange").selectAll();
-  QTest::keyClicks(&Spin("spnActPulseRange"), QStringLiteral("880"));
+  TypeOver("spnActPulseRange", "880");
   Find<QAbstractButton>("Command3_0").click();
   RunToTheEnd();
   EXPECT_EQ(unit.PortOptions(1), (PortOptionBytes{1, 62, 238, 100, 200, 100, 200, 175, 150}));
 
   // Closing takes it over too, and opens no port for it.
   Find<QCheckBox>("chkSendSlideCommands").click();
-  Spin("spnRightVirtStop").setFocus();
-  Spin("spnRightVirtStop").selectAll();
-  QTest::keyClicks(&Spin("spnRightVirtStop"), QStringLiteral("123"));
+  TypeOver("spnRightVirtStop", "123");
   EXPECT_TRUE(window_->close());
   world_.time.Advance(5000);
   EXPECT_FALSE(link_.PortOpen());
@@ -87,9 +85,7 @@ TEST_F(Editor, TypedValue_CountsWhenItIsWhole) {
 TEST_F(Editor, WindowThatGoesWhileSomethingIsTyped_GoesQuietly) {
   Click("ServoSimulator2_0");
   Find<QCheckBox>("chkSendSlideCommands").click();
-  Spin("spnRightVirtStop").setFocus();
-  Spin("spnRightVirtStop").selectAll();
-  QTest::keyClicks(&Spin("spnRightVirtStop"), QStringLiteral("123"));
+  TypeOver("spnRightVirtStop", "123");
   window_.reset();
   EXPECT_EQ(world_.time.RunningTimers(), 0);
 }

@@ -60,7 +60,6 @@ TEST_F(Get, Units_EndAsTheyReportTheirPorts) {
                          {"late", 9, true},
                          {"mute", 33, false},
                          {"flooding", 2, false},  // talks all the time
-
                          {"missing-port", 33, false},
                          {"stuck-port", 33, false},
                          {"too-slow", 7, false},  // deaf while it talks

@@ -95,6 +95,12 @@ TEST_F(PortSelectionTest, OpenedList_IsReadAgainAndKeepsTheSelection) {
   EXPECT_THAT(selection_.RereadCommPorts(selected), ElementsAre("Select", "Comm 2", "Comm 4", "Comm 7"));
   EXPECT_EQ(selected, 0u);
   EXPECT_EQ(selection_.DescribePort(0), "");
+  selected = 4;  // beyond the list: as if none were selected
+  EXPECT_EQ(selection_.DescribePort(selected), "");
+  selection_.Choose(selected);
+  EXPECT_EQ(link_.CommPort(), 3);
+  EXPECT_EQ(selection_.RereadCommPorts(selected).size(), 4u);
+  EXPECT_EQ(selected, 0u);
   selection_.Choose(3);
   EXPECT_EQ(link_.CommPort(), 7);
 }

@@ -18,6 +18,7 @@
 #include <string_view>
 #include <system_error>
 
+#include "platform/posix/proc_folders.h"
 #include "platform/runtime_error.h"
 
 namespace tendril {
@@ -79,28 +80,11 @@ int OpenDevice(const fs::path& device) {
 }
 
 #ifdef TIOCGEXCL
-// Whether any descriptor but `own` is open on the device, as far as this user may see.
-bool OpenElsewhere(const fs::path& device, int own) {
-  std::error_code error;
-  const std::string self = std::to_string(::getpid());
-  for (const fs::directory_entry& process : fs::directory_iterator("/proc", error)) {
-    const std::string id = process.path().filename().string();
-    if (id.find_first_not_of("0123456789") != std::string::npos) continue;
-    for (fs::directory_iterator entry(process.path() / "fd", error), end; !error && entry != end;
-         entry.increment(error)) {
-      if (id == self && entry->path().filename() == std::to_string(own)) continue;
-      std::error_code closed_meanwhile;
-      if (fs::read_symlink(entry->path(), closed_meanwhile) == device) return true;
-    }
-  }
-  return false;
-}
-
 // Only the superuser gets this far on a device in exclusive mode. The mode of a pseudo-terminal outlives a
 // program that was killed, so it says "in use" only while somebody has the device open.
 bool HeldExclusively(const fs::path& device, int own) {
   int exclusive = 0;
-  return ::ioctl(own, TIOCGEXCL, &exclusive) == 0 && exclusive != 0 && OpenElsewhere(device, own);
+  return ::ioctl(own, TIOCGEXCL, &exclusive) == 0 && exclusive != 0 && OpenInAnotherProcess(device);
 }
 #else
 bool HeldExclusively(const fs::path& /*device*/, int /*own*/) { return false; }

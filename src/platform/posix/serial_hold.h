@@ -36,8 +36,8 @@ class SerialHold {
  private:
   explicit SerialHold(int descriptor) : descriptor_(descriptor) {}
 
-  std::filesystem::path device_;
-  [[maybe_unused]] int descriptor_ = -1;
+  std::filesystem::path device_;          // what Windows asks about
+  [[maybe_unused]] int descriptor_ = -1;  // what the others ask
 };
 
 #ifndef _WIN32

@@ -12,6 +12,8 @@
 #else
 #include <filesystem>
 #include <fstream>
+
+#include "platform/posix/proc_folders.h"
 #endif
 
 namespace tendril {
@@ -105,13 +107,8 @@ bool HasEnded(const fs::path& process) {
 }
 
 bool AnyIsNamed(std::string_view program) {
-  std::error_code error;
-  for (fs::directory_iterator entry("/proc", error), end; !error && entry != end; entry.increment(error)) {
-    const fs::path& process = entry->path();
-    if (process.filename().string().find_first_not_of("0123456789") != std::string::npos) continue;
-    if (IsNamed(NamesOf(process), program) && !HasEnded(process)) return true;
-  }
-  return false;
+  return AnyProcess(
+      [&](const fs::path& process) { return IsNamed(NamesOf(process), program) && !HasEnded(process); });
 }
 
 #endif

@@ -57,8 +57,8 @@ QMessageBox::StandardButton QtMessageBoxes::Ask(const BoxMessage& message,
   box->setWindowTitle(QString::fromStdString(message.title));
   box->setIcon(QtIcon(message.icon));
   box->setStandardButtons(buttons);
-  box->setDefaultButton(
-      QMessageBox::No);  // where there is one: Yes takes something, and is not to be hit by accident
+  // No, where there is one: Yes takes something, and is not to be hit by accident.
+  box->setDefaultButton(QMessageBox::No);
 
   // The box's own exec() does not tell an answer from a quit, which closes the box like a person and then
   // ends every event loop.

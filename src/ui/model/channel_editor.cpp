@@ -5,8 +5,6 @@
 namespace tendril {
 namespace {
 
-constexpr int kMaxHalfWidth = 1000;
-
 // Sets only the fields that belong to `parameter`.
 void StoreOwnFields(Parameter parameter, const ChannelConfig& from, ChannelConfig& to) {
   switch (parameter) {
@@ -58,13 +56,16 @@ ChannelEditor::ChannelEditor(ChannelTable& working) : working_(working) {
   start(Parameter::kRightStop, 0, 800, 750);
   start(Parameter::kNeutralTrim, -200, 200, 0);
   start(Parameter::kDefaultPosition, -750, 750, 0);
-  StoreMotion({.actual_half_width = 900,
-               .virtual_half_width = 800,
-               .trim = 0,
-               .left_stop = -750,
-               .right_stop = 750,
-               .default_position = 0},
-              values_);
+  StoreMotion(Entered(), values_);
+}
+
+Motion ChannelEditor::Entered() const {
+  return {.actual_half_width = Spin(Parameter::kActualRange).Value(),
+          .virtual_half_width = Spin(Parameter::kVirtualRange).Value(),
+          .trim = Spin(Parameter::kNeutralTrim).Value(),
+          .left_stop = Spin(Parameter::kLeftStop).Value(),
+          .right_stop = Spin(Parameter::kRightStop).Value(),
+          .default_position = Spin(Parameter::kDefaultPosition).Value()};
 }
 
 void ChannelEditor::RecalcParameters() {
@@ -73,12 +74,7 @@ void ChannelEditor::RecalcParameters() {
   BoundedValue& left_stop = SpinOf(Parameter::kLeftStop);
   BoundedValue& right_stop = SpinOf(Parameter::kRightStop);
   BoundedValue& default_position = SpinOf(Parameter::kDefaultPosition);
-  Motion motion{.actual_half_width = Spin(Parameter::kActualRange).Value(),
-                .virtual_half_width = virtual_range.Value(),
-                .trim = trim.Value(),
-                .left_stop = left_stop.Value(),
-                .right_stop = right_stop.Value(),
-                .default_position = default_position.Value()};
+  Motion motion = Entered();
 
   motion.LimitVirtualRange();
   virtual_range.SetValue(motion.virtual_half_width);

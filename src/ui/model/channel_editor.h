@@ -64,6 +64,8 @@ class ChannelEditor {
 
  private:
   BoundedValue& SpinOf(Parameter parameter) { return spins_[static_cast<std::size_t>(parameter)]; }
+  // What the spin buttons say.
+  Motion Entered() const;
   void RecalcParameters();
   void Load(const ChannelConfig& record);
   void StoreInTicked();

@@ -13,6 +13,9 @@
 
 namespace tendril {
 
+// The widest half width that can be entered, in microseconds.
+inline constexpr int kMaxHalfWidth = 1000;
+
 // All in microseconds.
 struct Motion {
   int actual_half_width = 0;
@@ -30,12 +33,8 @@ struct Motion {
   void LimitTrim();
   void LimitStops();
   void LimitDefault();
-
-  friend bool operator==(const Motion&, const Motion&) = default;
 };
 
-// Half of the distance between the ends of `range`, halves rounded to even.
-int HalfWidth(const PulsePair& range);
 // The parameters as `record` gives them, whether they keep the bounds or not. Stops and default are measured
 // from the record's own neutral position, so that loading and storing it leaves it as it was.
 Motion MotionOf(const ChannelConfig& record);

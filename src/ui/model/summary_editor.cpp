@@ -19,7 +19,7 @@ void SummaryEditor::OpenNumberEntry(std::size_t channel, SummaryField field) {
   };
   switch (field) {
     case SummaryField::kActualRange:
-      start(spins_[0], 0, 1000, motion.actual_half_width);
+      start(spins_[0], 0, kMaxHalfWidth, motion.actual_half_width);
       break;
     case SummaryField::kVirtualRange:
       start(spins_[0], 0, actual_width, half);

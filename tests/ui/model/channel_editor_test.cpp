@@ -129,19 +129,6 @@ TEST_F(ChannelEditorTest, Edit_StoresItsOwnFieldsAloneInTheTickedChannels) {
   }
 }
 
-TEST_F(ChannelEditorTest, LeavingAChannel_StoresAllItsWorkingValues) {
-  editor_.SelectChannel(0);
-  editor_.ClickApplyBox(1, true);
-  editor_.Change(Parameter::kActualRange, 400);
-  EXPECT_EQ(working_.At(0).VirtualRange, (PulsePair{1000, 2000})) << "stored later";
-  editor_.SelectChannel(4);
-  EXPECT_EQ(working_.At(0).VirtualRange, (PulsePair{1100, 1900}));
-  EXPECT_EQ(working_.At(0).VirtualStops, (PulsePair{1100, 1900}));
-  EXPECT_EQ(working_.At(1).VirtualRange, (PulsePair{1000, 2000}));
-  for (std::size_t channel = 0; channel < kPortCount; ++channel)
-    EXPECT_EQ(editor_.Ticked(channel), channel == 4);
-}
-
 TEST_F(ChannelEditorTest, ApplyBoxes_CopyThePulsesAndKeepTheEditedChannelTicked) {
   editor_.ClickAllBox(true);  // without a channel: boxes only
   EXPECT_TRUE(editor_.Ticked(7));

@@ -124,8 +124,10 @@ TEST_F(SummaryEditorTest, Changes_GoToTheRowsRecordAndOnlyWhileItsEntryIsOpen) {
   const ChannelTable before = working_;
   summary_.ChangeEntry(0, 300);
   EXPECT_EQ(working_, before);
+  EXPECT_EQ(summary_.Title(), "");
   summary_.OpenNumberEntry(5, SummaryField::kActualRange);
   summary_.CloseNumberEntry();
+  EXPECT_EQ(summary_.Readings(), Readings{});
   summary_.ChangeEntry(0, 300);
   EXPECT_EQ(working_, before);
   summary_.OpenNumberEntry(5, SummaryField::kActualRange);
