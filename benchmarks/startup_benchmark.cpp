@@ -68,6 +68,7 @@ int main(int argc, char** argv) {
     if (run == 0) program = empty = plain = {};  // the first round warms the caches
   }
   // The first is the target; what Qt itself takes for the controls is beyond it already, so the second decides.
-  if (!ReportBoth(program, "empty window", empty)) std::printf("  the target against an empty window is MISSED\n");
+  if (!ReportBoth(program, "empty window", empty))
+    std::printf("  the target against an empty window is MISSED\n");
   return ReportBoth(program, "window of plain controls", plain) ? EXIT_SUCCESS : EXIT_FAILURE;
 }

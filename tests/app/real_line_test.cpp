@@ -1,17 +1,10 @@
 // The window with its real adapters, on a kernel terminal device, with the units in another process.
 #include <gtest/gtest.h>
-#include <sys/resource.h>
 
 #include <QAbstractButton>
-#include <QAbstractItemView>
 #include <QApplication>
 #include <QComboBox>
-#include <QHostAddress>
-#include <QLabel>
-#include <QMessageBox>
-#include <QTcpServer>
 #include <QTest>
-#include <QTimer>
 #include <array>
 #include <cstddef>
 #include <cstdint>
@@ -24,112 +17,56 @@
 #include "config/option_bytes.h"
 #include "platform/posix/paths.h"
 #include "support/bench_process.h"
+#include "support/person.h"
 
 namespace tendril::test {
 namespace {
 
 constexpr int kGenerousMs = 20000;
 
-// The buttons.
-constexpr char kSend[] = "Command3_0";
-constexpr char kGet[] = "Command3_1";
-constexpr char kChangeId[] = "Command3_2";
-constexpr char kSweep[] = "cmdTest_0";
-
 // Options of the bench.
 const QStringList kFactoryFresh{QStringLiteral("--unit"), QStringLiteral("FF")};
 QStringList Fault(const char* name) { return {QStringLiteral("--fault"), QString::fromLatin1(name)}; }
 
-class RealLine : public testing::Test {
+class RealLine : public testing::Test, protected Person {
  protected:
-  RealLine() {
-    // A person who reads each box and presses OK or Yes.
-    reader_.setInterval(20);
-    QObject::connect(&reader_, &QTimer::timeout, &reader_, [this] {
-      if (auto* box = qobject_cast<QMessageBox*>(QApplication::activeModalWidget())) {
-        read_.push_back(box->text().toStdString());
-        box->button(box->button(QMessageBox::Yes) != nullptr ? QMessageBox::Yes : QMessageBox::Ok)->click();
-      }
-    });
-    reader_.start();
-  }
-
-  // Makes the program anew. Call it when Comm 1 is there.
+  // Makes the program anew.
   void StartProgram() {
     program_.reset();
     program_ = std::make_unique<UtilityProgram>();
     program_->window.show();
-  }
-  void ChooseComm1() {
-    auto& ports = *program_->window.findChild<QComboBox*>(QStringLiteral("cmbNYX"));
-    ports.setCurrentIndex(0);
-    QTest::keyClick(&ports, Qt::Key_Down);
-    ASSERT_EQ(ports.currentText().toStdString(), "Comm 1");
-  }
-  // Chooses the line that is chosen already.
-  void ChooseAgain() {
-    auto& ports = *program_->window.findChild<QComboBox*>(QStringLiteral("cmbNYX"));
-    ports.showPopup();
-    QTest::keyClick(ports.view(), Qt::Key_Return);
-  }
-  void Press(const char* button) {
-    outcome().clear();
-    QTest::mouseClick(&Button(button), Qt::LeftButton);
+    SitDownAt(program_->window);
   }
   // What the command that was pressed last ends with.
   std::string Outcome() {
-    return QTest::qWaitFor([this] { return !outcome().text().isEmpty() && Button(kSend).isEnabled(); },
+    return QTest::qWaitFor([this] { return !OutcomeLabel().text().isEmpty() && Button(kSend).isEnabled(); },
                            kGenerousMs)
-               ? outcome().text().toStdString()
+               ? OutcomeLabel().text().toStdString()
                : "none";
   }
   bool WaitForBox() {
-    return QTest::qWaitFor([this] { return !read_.empty() && QApplication::activeModalWidget() == nullptr; },
+    return QTest::qWaitFor([this] { return !read.empty() && QApplication::activeModalWidget() == nullptr; },
                            kGenerousMs);
   }
   bool WaitForClosedPort() {
     return QTest::qWaitFor([this] { return !program_->Serial1.PortOpen(); }, kGenerousMs);
   }
-  QAbstractButton& Button(const char* name) {
-    return *program_->window.findChild<QAbstractButton*>(QString::fromLatin1(name));
-  }
-  QLabel& outcome() { return *program_->window.findChild<QLabel*>(QStringLiteral("lblProgress")); }
 
   BenchProcess bench_;
   std::unique_ptr<UtilityProgram> program_;
-  QTimer reader_;
-  std::vector<std::string> read_;
 };
 
-// The registry as its editor exports it, with the comm listener's TCP port.
-QByteArray ExportedRegistry(std::uint16_t listener_port) {
-  const QString text =
-      QStringLiteral(
-          "\ufeffWindows Registry Editor Version 5.00\r\n\r\n"
-          "[HKEY_CURRENT_USER\\Software\\Kelvane\\Shared\\NetVersion]\r\n\"Ver\"=\"2\"\r\n\r\n"
-          "[HKEY_CURRENT_USER\\Software\\Kelvane\\Shared\\Network2]\r\n\"DMXListenerPort\"=dword:%1\r\n\r\n")
-          .arg(listener_port, 8, 16, QLatin1Char('0'));
-  return {reinterpret_cast<const char*>(text.utf16()), text.size() * 2};
-}
-
 TEST_F(RealLine, PortOfTheControlPanel_ChangesHandsAndBack) {
-  std::uint16_t listener_port = 0;
-  {
-    QTcpServer finder;
-    ASSERT_TRUE(finder.listen(QHostAddress::LocalHost));
-    listener_port = finder.serverPort();
-  }
-  bench_.WriteRegistry(ExportedRegistry(listener_port));
-  bench_.Start({QStringLiteral("--control-panel"), QString::number(listener_port)}, true);
+  bench_.Start({QStringLiteral("--control-panel"), bench_.WriteRegistry()}, true);
   StartProgram();
   ChooseComm1();
-  ASSERT_TRUE(QTest::qWaitFor([this] { return read_.size() == 2; }, kGenerousMs));
-  EXPECT_EQ(read_[0].substr(0, 62), "This serial port (Comm1) is in use by the Control Panel.\n\nThe ");
+  ASSERT_TRUE(QTest::qWaitFor([this] { return read.size() == 2; }, kGenerousMs));
+  EXPECT_EQ(read[0].second.substr(0, 62), "This serial port (Comm1) is in use by the Control Panel.\n\nThe ");
   EXPECT_FALSE(program_->Serial1.PortOpen());
   ASSERT_TRUE(QTest::qWaitFor(
       [this] { return bench_.Printed().find("reply to 1: done") != std::string::npos; }, kGenerousMs));
 
-  ChooseAgain();
+  ChooseComm1();
   ASSERT_TRUE(program_->Serial1.PortOpen());
   Press(kSend);
   EXPECT_EQ(Outcome(), "SUCCESS: Send Complete!");
@@ -152,15 +89,6 @@ TEST_F(RealLine, PortOfTheControlPanel_ChangesHandsAndBack) {
   }
 }
 
-double CpuSeconds() {
-  rusage usage{};
-  getrusage(RUSAGE_SELF, &usage);
-  const auto seconds = [](const timeval& time) {
-    return static_cast<double>(time.tv_sec) + static_cast<double>(time.tv_usec) / 1e6;
-  };
-  return seconds(usage.ru_utime) + seconds(usage.ru_stime);
-}
-
 TEST_F(RealLine, Send_SucceedsWithAndWithoutEcho) {
   for (const QStringList& options : {QStringList{}, QStringList{QStringLiteral("--no-echo")}}) {
     bench_.Start(options);
@@ -168,7 +96,7 @@ TEST_F(RealLine, Send_SucceedsWithAndWithoutEcho) {
     ChooseComm1();
     Press(kSend);
     EXPECT_EQ(Outcome(), "SUCCESS: Send Complete!") << options.join(QLatin1Char(' ')).toStdString();
-    EXPECT_TRUE(read_.empty());
+    EXPECT_TRUE(read.empty());
     bench_.Kill();
     ASSERT_TRUE(WaitForClosedPort());
   }
@@ -190,9 +118,9 @@ TEST_F(RealLine, Get_TakesOverAllPortsOrNone) {
   struct Case {
     QStringList options;
     const char* outcome;
-    std::vector<std::string> boxes;
+    std::vector<Box> boxes;
   };
-  const std::string retry = "Error:1  Uploading Configuration, Please retry";
+  const Box retry{"Send Error", "Error:1  Uploading Configuration, Please retry"};
   const Case cases[] = {{Fault("missing-port"), "COMMAND FAILED!", {retry}},
                         {QStringList{}, "SUCCESS: Upload Complete", {}},
                         {QStringList{QStringLiteral("--no-echo")}, "SUCCESS: Upload Complete", {}},
@@ -200,7 +128,7 @@ TEST_F(RealLine, Get_TakesOverAllPortsOrNone) {
   for (const auto& [options, expected_outcome, boxes] : cases) {
     SCOPED_TRACE(options.join(QLatin1Char(' ')).toStdString());
     bench_.Start(options);
-    read_.clear();
+    read.clear();
     StartProgram();
     const ChannelTable before = program_->window.WorkingConfiguration();
     ChooseComm1();
@@ -214,7 +142,7 @@ TEST_F(RealLine, Get_TakesOverAllPortsOrNone) {
     Press(kGet);
     EXPECT_EQ(Outcome(), expected_outcome);
     ASSERT_TRUE(boxes.empty() || WaitForBox());
-    EXPECT_EQ(read_, boxes);
+    EXPECT_EQ(read, boxes);
     ChannelTable expected = before;
     if (boxes.empty()) {
       expected.At(2) = {kPortPwm, {610, 2390}, {1010, 1990},    {1020, 1980},
@@ -238,7 +166,7 @@ TEST_F(RealLine, ChangedId_IsWhereTheUnitAnswersFromThenOn) {
   EXPECT_EQ(Outcome(), "SUCCESS: UnitID set to '0A'");
   Press(kGet);
   EXPECT_EQ(Outcome(), "SUCCESS: Upload Complete");
-  EXPECT_EQ(read_.size(), 1u);
+  EXPECT_EQ(read.size(), 1u);
 }
 
 TEST_F(RealLine, UnpluggedInTheMiddle_IsToldOnceAndThePortWorksAfterReplugging) {
@@ -254,7 +182,7 @@ TEST_F(RealLine, UnpluggedInTheMiddle_IsToldOnceAndThePortWorksAfterReplugging) 
         Case{kChangeId, kFactoryFresh, Fault("mute"), "SUCCESS: UnitID set to '01'"}}) {
     SCOPED_TRACE(success);
     bench_.Start(units + fault);
-    read_.clear();
+    read.clear();
     if (!program_) StartProgram();
     ChooseComm1();
     Press(button);
@@ -262,9 +190,9 @@ TEST_F(RealLine, UnpluggedInTheMiddle_IsToldOnceAndThePortWorksAfterReplugging) 
     ASSERT_FALSE(Button(button).isEnabled());  // it runs
     bench_.Kill();
     ASSERT_TRUE(WaitForBox());
-    EXPECT_EQ(outcome().text().toStdString(), "COMMAND FAILED!");
-    EXPECT_EQ(read_.size(), 1u);
-    EXPECT_NE(read_[0].find("Open of serial port 1 has failed"), std::string::npos) << read_[0];
+    EXPECT_EQ(OutcomeLabel().text().toStdString(), "COMMAND FAILED!");
+    EXPECT_EQ(read.size(), 1u);
+    EXPECT_NE(read[0].second.find("Open of serial port 1 has failed"), std::string::npos) << read[0].second;
 
     bench_.Start(units);
     ChooseComm1();
@@ -291,25 +219,12 @@ TEST_F(RealLine, UnpluggedInASweep_EndsItSilentlyAndItCanBeStartedAgain) {
     EXPECT_TRUE(WaitForClosedPort());
     EXPECT_EQ(Button(kSweep).text().toStdString(), "Test");
     QTest::qWait(300);  // no step comes any more
-    EXPECT_TRUE(read_.empty());
+    EXPECT_TRUE(read.empty());
     bench_.Start();
   }
   ChooseComm1();
   Press(kGet);
   EXPECT_EQ(Outcome(), "SUCCESS: Upload Complete");
-}
-
-TEST_F(RealLine, UnpluggedWhileIdle_SaysNothingAndCostsNothing) {
-  bench_.Start();
-  StartProgram();
-  ChooseComm1();
-  bench_.Kill();
-  EXPECT_TRUE(WaitForClosedPort());
-  reader_.stop();
-  const double before = CpuSeconds();
-  QTest::qWait(1000);
-  EXPECT_LT(CpuSeconds() - before, 0.05);
-  EXPECT_TRUE(read_.empty());
 }
 
 }  // namespace

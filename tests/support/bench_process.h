@@ -3,13 +3,16 @@
 #pragma once
 
 #include <QByteArray>
+#include <QCoreApplication>
 #include <QDeadlineTimer>
 #include <QDir>
 #include <QFile>
 #include <QFileInfo>
+#include <QHostAddress>
 #include <QProcess>
 #include <QString>
 #include <QStringList>
+#include <QTcpServer>
 #include <QTemporaryDir>
 #include <QThread>
 #include <filesystem>
@@ -25,45 +28,66 @@ class BenchProcess {
   BenchProcess() {
     qputenv("XDG_CONFIG_HOME", folder_.path().toUtf8());
     qputenv("XDG_STATE_HOME", folder_.path().toUtf8());
+    QDir(folder_.path()).mkpath(QStringLiteral("kelvane/ports"));
+    LinkToNowhere();
   }
   ~BenchProcess() { Kill(); }
 
   // Starts the bench and waits until its device is there. `printing`: it says what crosses the line.
   void Start(const QStringList& options = {}, bool printing = false) {
-    // The link of one that was killed; its device's name may belong to somebody else by now.
-    std::filesystem::remove(Link().toStdString());
     process_.setStandardOutputFile(folder_.filePath(QStringLiteral("bench.txt")));
     const QStringList quiet = printing ? QStringList() : QStringList{QStringLiteral("--quiet")};
     process_.start(QStringLiteral(TENDRIL_BENCH_PROGRAM), quiet + options);
     const QDeadlineTimer deadline(10000);
     while (!QFileInfo::exists(Link())) {
       if (deadline.hasExpired()) throw std::runtime_error("tendril-bench does not start");
-      QThread::msleep(5);
+      QCoreApplication::processEvents();  // a program in this process goes on
+      QThread::msleep(2);
     }
   }
-  // Pulls the plug: the device is gone at once. Its link stays and leads nowhere, so that Comm 1 never
-  // becomes a serial port of the machine that the test runs on.
+  // Pulls the plug: the device is gone at once.
   void Kill() {
     process_.kill();
     process_.waitForFinished();
+    LinkToNowhere();  // the name of a device that is gone is given to the next one
   }
   // What it has printed so far.
   std::string Printed() const {
     QFile file(folder_.filePath(QStringLiteral("bench.txt")));
     return file.open(QIODevice::ReadOnly) ? file.readAll().toStdString() : std::string();
   }
-  // Makes `bytes` the registry of this process.
-  void WriteRegistry(const QByteArray& bytes) {
-    QDir(folder_.path()).mkpath(QStringLiteral("kelvane"));
+  // Gives this process a registry, as its editor exports it, with a comm listener's TCP port where nobody
+  // listens yet. Returns the port: "--control-panel" takes it.
+  QString WriteRegistry() {
+    QTcpServer finder;
+    if (!finder.listen(QHostAddress::LocalHost)) throw std::runtime_error("there is no free TCP port");
+    const QString text =
+        QStringLiteral(
+            "\ufeffWindows Registry Editor Version 5.00\r\n\r\n"
+            "[HKEY_CURRENT_USER\\Software\\Kelvane\\Shared\\NetVersion]\r\n\"Ver\"=\"2\"\r\n\r\n"
+            "[HKEY_CURRENT_USER\\Software\\Kelvane\\Shared\\Network2]\r\n"
+            "\"DMXListenerPort\"=dword:%1\r\n\r\n")
+            .arg(finder.serverPort(), 8, 16, QLatin1Char('0'));
+    const QByteArray bytes(reinterpret_cast<const char*>(text.utf16()), text.size() * 2);
     QFile file(folder_.filePath(QStringLiteral("kelvane/registry.reg")));
     if (!file.open(QIODevice::WriteOnly) || file.write(bytes) != bytes.size()) {
       throw std::runtime_error("the registry cannot be written");
     }
+    return QString::number(finder.serverPort());
   }
+  // Its process, while it runs.
+  qint64 ProcessId() const { return process_.processId(); }
   // Where the link to the device stands.
   QString Link() const { return folder_.filePath(QStringLiteral("kelvane/ports/com1")); }
 
  private:
+  // Without a link, Comm 1 would be a serial port of the machine that the test runs on, if only for a moment.
+  void LinkToNowhere() const {
+    const std::filesystem::path link = Link().toStdString(), beside = link.string() + ".new";
+    std::filesystem::create_symlink("/nowhere", beside);
+    std::filesystem::rename(beside, link);
+  }
+
   QTemporaryDir folder_;
   QProcess process_;
 };

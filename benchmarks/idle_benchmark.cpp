@@ -1,0 +1,92 @@
+// What the program costs while its window stands there and nobody uses it: of the processor, and of memory against a
+// program with an empty window.
+#include <QApplication>
+#include <QWidget>
+#include <cstdio>
+#include <memory>
+#include <stdexcept>
+#include <vector>
+
+#include "app/utility_program.h"
+#include "platform/tcp_socket.h"
+#include "platform/wait_for.h"
+#include "run_benchmark.h"
+#include "support/bench_process.h"
+#include "support/person.h"
+#include "support/process_figures.h"
+
+namespace tendril {
+namespace {
+
+using test::BenchProcess;
+using test::CpuPercentWhileIdle;
+using test::Person;
+using test::RunFor;
+using test::WaitFor;
+using test::WhatIsHeld;
+
+constexpr int kForMs = 20000;
+constexpr int kSettleMs = 1500;  // a button's last fading, a command's last reply
+constexpr double kMegabyte = 1e6;
+
+void Require(bool met, const char* otherwise) {
+  if (!met) throw std::runtime_error(otherwise);
+}
+
+bool Measure(const char* what, double max_percent) {
+  RunFor(kSettleMs);
+  const double percent = CpuPercentWhileIdle(kForMs);
+  std::printf("%s: %.2f %% of a core in %d s (below %.1f)\n", what, percent, kForMs / 1000, max_percent);
+  return percent < max_percent;
+}
+
+bool MeasureMemory(double empty, double idle) {
+  constexpr double kMaxRatio = 1.5;
+  std::printf("resident: %.1f MB, with an empty window %.1f MB, ratio %.2f (at most %.1f)\n",
+              idle / kMegabyte, empty / kMegabyte, idle / empty, kMaxRatio);
+  return idle / empty <= kMaxRatio;
+}
+
+bool MeasureAll() {
+  auto empty_window = std::make_unique<QWidget>();
+  empty_window->resize(1280, 800);
+  empty_window->show();
+  RunFor(kSettleMs);
+  const double empty = WhatIsHeld().resident;
+  empty_window.reset();
+
+  BenchProcess bench;
+  const QStringList panel{QStringLiteral("--control-panel"), bench.WriteRegistry()};
+  UtilityProgram program;
+  program.window.resize(1280, 800);
+  program.window.show();
+  Person person;
+  person.SitDownAt(program.window);
+
+  person.Rest(true);
+  bool within_bounds = Measure("trying to connect where nobody listens", 1);
+  bench.Start(panel);
+  const auto connected = [&] { return program.control_panel.Client().TCPState() == TcpState::kConnected; };
+  Require(WaitFor(connected), "It had given up connecting");
+
+  person.Rest(false);
+  person.ChooseComm1();
+  Require(WaitFor([&] { return person.read.size() == 2; }), "The Control Panel is not asked for the port");
+  RunFor(kSettleMs);
+  person.ChooseComm1();
+  Require(program.Serial1.PortOpen(), "The port does not open");
+  person.Rest(true);
+  within_bounds &= Measure("connected, with the port open", 0.5);
+  Require(connected() && program.Serial1.PortOpen(), "It does not stay connected");
+
+  bench.Kill();
+  Require(WaitFor([&] { return !program.Serial1.PortOpen(); }), "The loss of the adapter goes unnoticed");
+  // The bench was both.
+  within_bounds &= Measure("unplugged, and trying to connect where nobody listens any more", 1);
+  return MeasureMemory(empty, WhatIsHeld().resident) && within_bounds;
+}
+
+}  // namespace
+}  // namespace tendril
+
+int main(int argc, char** argv) { return tendril::RunBenchmark(argc, argv, tendril::MeasureAll); }
