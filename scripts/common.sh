@@ -7,6 +7,8 @@ build_packages=(g++ cmake ninja-build qt6-base-dev qt6-serialport-dev libgl-dev 
                 fonts-dejavu-core)
 # What building and testing for Windows needs; GoogleTest is compiled along.
 windows_packages=(cmake ninja-build g++-mingw-w64-x86-64-posix googletest wine64)
+fuzz_packages=(clang-14 libclang-rt-14-dev llvm-14 cmake ninja-build)
+coverage_packages=(gcovr)
 check_packages=(clang-format-14 clang-tidy-14)
 
 say() { printf '%s\n' "== $*" >&2; }
@@ -30,6 +32,12 @@ require_packages() {
   "${as_root[@]}" apt-get update -qq
   "${as_root[@]}" env DEBIAN_FRONTEND=noninteractive apt-get install -y -qq --no-install-recommends "${missing[@]}" \
     >/dev/null
+}
+
+# For programs with a window that run without a display. That platform tells of what it cannot do, which nobody needs.
+without_display() {
+  export QT_QPA_PLATFORM="${QT_QPA_PLATFORM:-offscreen}" XDG_RUNTIME_DIR="${XDG_RUNTIME_DIR:-/tmp}"
+  export QT_LOGGING_RULES="default.warning=false"
 }
 
 # build PRESET [TARGET ...]: configures when needed and brings the build up to date.

@@ -75,6 +75,12 @@ std::u16string_view Trimmed(std::u16string_view text) {
   return text;
 }
 
+std::u16string AsComment(std::u16string lines) {
+  std::replace_if(
+      lines.begin(), lines.end(), [](char16_t unit) { return unit == u'\n' || unit == u'\r'; }, u' ');
+  return std::u16string(u"; ").append(Trimmed(lines));
+}
+
 // Takes `prefix` off the front of `text`, if it is there.
 bool Take(std::u16string_view& text, std::u16string_view prefix) {
   if (!text.starts_with(prefix)) return false;
@@ -197,8 +203,10 @@ std::u16string_view Reader::NextLine() {
   line_has_end_ = end != rest_.npos;
   rest_.remove_prefix(line_has_end_ ? end + 1 : rest_.size());
   ++line_number_;
-  if (line.ends_with(u'\r')) line.remove_suffix(1);
-  return Trimmed(line);
+  line = Trimmed(line);
+  // Not only directly in front of the line feed: there it would be when the line is written again.
+  while (line.ends_with(u'\r')) line = Trimmed(line.substr(0, line.size() - 1));
+  return line;
 }
 
 void Reader::ReadHeader() {
@@ -230,16 +238,22 @@ void Reader::Read(std::u16string_view text) {
         line = NextLine();
         joined += line;
       }
+      // What were stray bytes may be a character now.
+      if (!joined.empty() && form_.encoding != RegistryEncoding::kUtf16) joined = Utf16(Utf8(joined));
       read = ReadValue(joined.empty() ? line : joined);
     } else {
       read = ReadLine(line);
     }
     if (!line.empty()) Count(1);
     if (read) continue;
-    // What was passed over is kept as it stands.
-    const std::u16string_view whole(begin, static_cast<std::size_t>(line.data() + line.size() - begin));
-    (key_ != nullptr ? key_->other_lines : form_.lines_outside).emplace_back(whole);
-    if (!whole.starts_with(u';')) unread_(first_number);
+    // What was passed over is kept as it stands. What was cut off would pass for whole when it is written with an end,
+    // and becomes a comment.
+    std::u16string kept(begin, static_cast<std::size_t>(line.data() + line.size() - begin));
+    if (!kept.starts_with(u';')) {
+      unread_(first_number);
+      if (!line_has_end_) kept = AsComment(std::move(kept));
+    }
+    (key_ != nullptr ? key_->other_lines : form_.lines_outside).push_back(std::move(kept));
   }
 }
 

@@ -43,9 +43,9 @@ struct RegistryForm {
 using UnreadLineSink = std::function<void(std::size_t line)>;
 
 // Adds what a file's bytes say to `tree`, in time that grows with their number. What cannot be read is passed over, and
-// kept as a line of its key; of a file that ends in the middle of a line, the whole lines count. Raises
-// std::runtime_error for another encoding than those above, and std::length_error for more than a million keys and
-// lines, which no installation has.
+// kept as a line of its key; of a file that ends in the middle of a line, the whole lines count, and that line becomes a
+// comment. Raises std::runtime_error for another encoding than those above, and std::length_error for more than a
+// million keys and lines, which no installation has.
 RegistryForm ReadRegistryText(std::span<const std::uint8_t> bytes, RegistryTree& tree,
                               const UnreadLineSink& unread);
 

@@ -2,6 +2,7 @@
 
 #include <gmock/gmock.h>
 
+#include <algorithm>
 #include <string>
 
 #include "platform/registry_store.h"
@@ -31,10 +32,12 @@ constexpr char kExport[] =
     "  19,1a\r\n"
     "\"Comment\"=\"B\xC3\xBChne \xF0\x9F\x92\xA1\"\r\n"
     "\"DMXListenerPort\"=dword:00002285\r\n"
+    "\"Line\\nend\\r\"=\"\"\r\n"
     "\"Lines\"=hex(1):61,00,0d,00,0a,00,62,00,00,00\r\n"
     "\"List\"=hex(7):61,00,00,00,62,00,00,00,00,00\r\n"
     "\"Nothing\"=hex:\r\n"
     "\"Nothing typed\"=hex(80000001):\r\n"
+    "\"Odd\"=hex(1):61\r\n"
     "\r\n"
     "[HKEY_USERS\\.DEFAULT\\Console]\r\n"
     "\"x\"=dword:fffffffe\r\n"
@@ -76,6 +79,9 @@ struct Content {
 TEST(RegistryText, Export_IsReadAndWrittenAsItIsInEveryEncoding) {
   std::string with_line_feeds(kExport);
   std::erase(with_line_feeds, '\r');
+  EXPECT_EQ(Content(AsUtf8("\n[HKEY_USERS]\n[HKEY_USERS\\K]\n")).Written(),
+            "Windows Registry Editor Version 5.00\n\n[HKEY_USERS\\K]\n\n");
+  EXPECT_EQ(Content(AsUtf8("[HKEY_USERS]\n")).Written(), "Windows Registry Editor Version 5.00\n\n");
   for (const Bytes& bytes : {AsUtf16(kExport), AsUtf8(kExport), AsUtf8("\xEF\xBB\xBF" + std::string(kExport)),
                              AsUtf8(with_line_feeds), AsUtf16(with_line_feeds)}) {
     Content content(bytes);
@@ -133,6 +139,7 @@ TEST(RegistryText, Line_IsAValueOrIsPassedOver) {
                                  "\"v\"=hex",
                                  "\"v\"=hex(:00",
                                  "\"v\"=hex():00",
+                                 "\"v\"=hex(g):00",
                                  "\"v\"=hex(123456789):00",
                                  "@",
                                  "=",
@@ -158,13 +165,15 @@ TEST(RegistryText, LaterLines_ReplaceAndDeleteWhatWasThere) {
       AsUtf8("[HKEY_CURRENT_USER\\K]\n\"v\"=\"old\"\n\"gone\"=\"x\"\n"
              "[HKEY_CURRENT_USER\\K\\Sub]\n\"v\"=\"x\"\n"
              "[HKEY_CURRENT_USER\\Kept]\n\"v\"=\"x\"\n"
+             "[HKEY_USERS\\K]\n\"v\"=\"x\"\n[-HKEY_USERS]\n[-HKEY_USERS\\None\\Sub]\n"
              "[-HKEY_CURRENT_USER\\k\\SUB]\n\"lost\"=\"x\"\n"
              "[hkey_current_user\\k]\n\"V\"=dword:00000001\n\"Gone\"=-\n"));
   EXPECT_THAT(content.Value()->data, ElementsAre(1, 0, 0, 0));
   EXPECT_EQ(content.Value(u"HKEY_CURRENT_USER\\K", u"gone"), nullptr);
   EXPECT_EQ(content.tree.Find(u"HKEY_CURRENT_USER\\K\\Sub"), nullptr);
   EXPECT_NE(content.Value(u"HKEY_CURRENT_USER\\Kept", u"v"), nullptr);
-  EXPECT_THAT(content.unread, ElementsAre(9)) << "a value below a key that is deleted";
+  EXPECT_EQ(content.tree.Find(u"HKEY_USERS"), nullptr);
+  EXPECT_THAT(content.unread, ElementsAre(13)) << "a value below a key that is deleted";
   EXPECT_EQ(content.Written(),
             "Windows Registry Editor Version "
             "5.00\n\"lost\"=\"x\"\n\n[HKEY_CURRENT_USER\\K]\n\"v\"=dword:00000001\n\n"
@@ -192,6 +201,22 @@ TEST(RegistryText, FileCutOffAnywhere_KeepsItsWholeLines) {
         }
       }
     }
+  }
+}
+
+// Written with proper line ends, what was not read must not become a value, nor a value another one.
+TEST(RegistryText, FileWrittenAgain_HasTheSameValues) {
+  for (const std::string file :
+       {"\"v\"=hex:00,01", "\"v\"=hex:00,\\\n  01", "\"v\"=hex:00,\\\n  01,\\", "\"v\"=hex:00,\\\n  01,\\\nz",
+        "\"v\"=\"a\"\r\t\n", "\"\xC3\\\n \xA9\"=\"a character on two lines\"\n"}) {
+    Content content(AsUtf8("[HKEY_CURRENT_USER\\K]\n" + file));
+    Content again(AsUtf8(content.Written()));
+    const auto& values = content.tree.Find(u"HKEY_CURRENT_USER\\K")->values;
+    const auto& values_again = again.tree.Find(u"HKEY_CURRENT_USER\\K")->values;
+    EXPECT_TRUE(std::equal(values.begin(), values.end(), values_again.begin(), values_again.end(),
+                           [](const auto& a, const auto& b) { return a.first == b.first; }))
+        << file;
+    EXPECT_EQ(again.Written(), content.Written()) << file;
   }
 }
 
