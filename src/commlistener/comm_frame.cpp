@@ -50,7 +50,7 @@ std::optional<FrameHeader> ParseFrameHeader(std::span<const std::uint8_t> bytes)
 }
 
 std::uint8_t SequenceCharacters::Take() {
-  if (next_ < '0' || next_ > '9') next_ = '0';
+  if (next_ > '9') next_ = '0';
   return next_++;
 }
 

@@ -193,10 +193,6 @@ NyxNetworkPreferences& NetworkPreferences::NyxNetwork(std::size_t index) {
   return ItemAt(networks_, index, 0);
 }
 
-const NyxNetworkPreferences& NetworkPreferences::NyxNetwork(std::size_t index) const {
-  return ItemAt(networks_, index, 0);
-}
-
 DMXUniversePrefs& NetworkPreferences::DMXUniverse(std::size_t number) {
   return ItemAt(universes_, number, 1);
 }

@@ -85,7 +85,6 @@ class NetworkPreferences {
 
   // Networks 0 to 15. Raises kErrOutOfRange for another one.
   NyxNetworkPreferences& NyxNetwork(std::size_t index);
-  const NyxNetworkPreferences& NyxNetwork(std::size_t index) const;
   // Universes 1 to 999. Raises kErrOutOfRange for another one.
   DMXUniversePrefs& DMXUniverse(std::size_t number);
   const DMXUniversePrefs& DMXUniverse(std::size_t number) const;

@@ -13,7 +13,7 @@ FileCommandLog::FileCommandLog(std::filesystem::path path) : path_(std::move(pat
 
 void FileCommandLog::Append(std::string_view line) {
   std::error_code ignored;  // a folder that cannot be made shows when the file is opened
-  if (path_.has_parent_path()) std::filesystem::create_directories(path_.parent_path(), ignored);
+  std::filesystem::create_directories(path_.parent_path(), ignored);
   std::ofstream file(path_, std::ios::app);
   file << line << '\n';
   file.close();

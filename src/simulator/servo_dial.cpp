@@ -41,13 +41,11 @@ std::int32_t Checked(std::int64_t value) {
 
 double Drawable(double angle) { return angle == 0 ? kNearlyZeroAngle : angle; }
 
-// The angle of `angle` from straight up, counterclockwise, more than minus half a turn up to half a turn.
+// The angle of the drawing angle `angle` (0 to a full turn) from straight up, counterclockwise, more than minus half a
+// turn up to half a turn.
 double FromTop(double angle) {
-  const double turn = 2 * kDialPi;
-  double from_top = angle - kDialPi / 2;
-  while (from_top > kDialPi) from_top -= turn;
-  while (from_top <= -kDialPi) from_top += turn;
-  return from_top;
+  const double from_top = angle - kDialPi / 2;
+  return from_top > kDialPi ? from_top - 2 * kDialPi : from_top;
 }
 
 DialColour ColourOf(DialInk ink) { return kDialColours.at(static_cast<std::size_t>(ink)); }

@@ -75,6 +75,16 @@ TEST_F(VirtualControlPanelTest, Requests_AreDoneOrRefused) {
       {"L100019" + two_records.substr(0, 19), "0100000"},
       {"L200016" + two_records.substr(0, 15) + "x", "0200000"},  // padded with something
       {"Z300002??", "0300000"},
+      {"C400009D200002\3\0"s, "0400000"},  // another request inside is none
+      {"C500008C200002\3", "0500000"},     // nor is one that is cut off
+      {"P600002\1\1", "0600000"},
+      {"L700002\1\0"s, "0700000"},
+      {"L800004\5\0\0\0"s, "0800000"},                  // an unknown record
+      {"L900008\1\0\4\0abcd"s, "0900000"},              // one with too much data
+      {"L000004\0\0\x0C\0"s, "0000000"},                // an effect without its data
+      {"L100012\4\0\6\0\0\0\0\0\1\0\0\0"s, "0100000"},  // intensities, one less than their number
+      {"L200008\4\0\4\0\0\0\0\0"s, "0200000"},
+      {"L300044\0\0\x0C\0abcdefghijkl\2\0\x0C\0abcdefghijkl\4\0\6\0\0\0\0\0\0\0\0\0"s, "1300000"},
   };
   for (const auto& each : cases) EXPECT_EQ(Say(each.request), each.reply) << each.request;
 
@@ -82,6 +92,9 @@ TEST_F(VirtualControlPanelTest, Requests_AreDoneOrRefused) {
   EXPECT_EQ(panel_.requests()[0],
             (PanelRequest{.identifier = 'I', .sequence = '0', .payload = Raw("Tendril Utility")}));
   EXPECT_TRUE(panel_.requests()[3].nested);
+  for (int i = 0; i < 1000; ++i) Say("A800000");
+  EXPECT_EQ(panel_.requests().size(), 1000u);
+  EXPECT_EQ(panel_.requests()[0].identifier, 'A') << "the oldest are forgotten";
 }
 
 TEST_F(VirtualControlPanelTest, Requests_ComeInAnyPieces) {
@@ -94,14 +107,17 @@ TEST_F(VirtualControlPanelTest, Requests_ComeInAnyPieces) {
 }
 
 TEST_F(VirtualControlPanelTest, Garbage_EndsTheConnectionAtItsFirstByte) {
-  for (const std::string begin : {"\1", "1", "Cx", "C0-", "C0000x"}) {
+  for (const std::string begin : {"\1", "1", "[", "{", "Cx", "C0-", "C0000x"}) {
     PanelSession session(panel_, Connection());
     shown_.clear();
     session.Receive(Raw("A100000" + begin));
     EXPECT_EQ(std::exchange(said_, {}), "1100000<end>");
     EXPECT_EQ(shown_, ">A100000<1100000>" + begin);
     session.Receive(Raw("A200000"));
-    EXPECT_EQ(said_, "");
+    panel_.SetListener(PanelListener::kOff);  // ends those that have not ended
+    panel_.SetListener(PanelListener::kOpen);
+    EXPECT_EQ(std::exchange(said_, {}), begin == "\1" ? "<end>" : "")
+        << "the one that has said nothing wrong";
   }
 }
 

@@ -93,6 +93,27 @@ TEST_F(VirtualLineTest, Echo_FollowsTheAdapter) {
   }
 }
 
+TEST_F(VirtualLineTest, OtherSpeed_MakesGarbageOfWhatTheOtherEndHears) {
+  ScriptedUnit unit({0xFE, 0x30, 0});
+  UseLine({.driver_follows_rts = false}, {&unit});
+  Write({0x11}, 0);
+  line->AdvanceTo(600);
+  line->SetProgramBaud(9600, 600);
+  Write({0x22}, 600);
+  line->AdvanceTo(2'000);
+  EXPECT_THAT(arrived,
+              ElementsAre(Pair(0x11, 521), Pair(0x22, 1'642)));  // twice as long, and its own echo whole
+  EXPECT_THAT(Values(listener.heard), ElementsAre(0x11, Not(0x22)));
+
+  line->SetProgramBaud(19200, 2'000);
+  Write({0x88}, 2'000);
+  line->AdvanceTo(2'600);
+  line->SetProgramBaud(9600, 2'600);
+  line->AdvanceTo(10'000);
+  EXPECT_THAT(Values(arrived), ElementsAre(0x11, 0x22, 0x88, Not(0xFE), Not(0x30), Not(0)));
+  EXPECT_EQ(line->counters().garbled_bytes, 0u) << "the line itself carried them whole";
+}
+
 TEST_F(VirtualLineTest, Driver_KeepsTheUnitFromBeingHeardWhileRtsIsUp) {
   const Bytes reply = {0, 0, 0xFE, 0x30, 10, 0};
   const struct {

@@ -3,9 +3,11 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <functional>
+#include <stdexcept>
 #include <vector>
 
-#include "bench/virtual_unit.h"
+#include "bench/faulty_units.h"
 #include "platform/runtime_error.h"
 #include "support/simulated_time.h"
 
@@ -26,12 +28,13 @@ class VirtualPortsTest : public testing::Test {
     device = ports.CreateDevice();
     device->SetEventHandler([this](SerialEvent event) { events.push_back(event); });
   }
-  void Open() {
-    device->SetSettings("19200,N,8,1");
-    device->SetPortNumber(1);
-    device->SetLineOptions({.receive_threshold = 1});
-    device->Open();
-    device->SetRts(true);
+  void Open() { Use(*device); }
+  static void Use(SerialDevice& port) {
+    port.SetSettings("19200,N,8,1");
+    port.SetPortNumber(1);
+    port.SetLineOptions({.receive_threshold = 1});
+    port.Open();
+    port.SetRts(true);
   }
 
   test::SimulatedTime time{0xFFFFFFFEu};  // wraps in every test
@@ -87,6 +90,59 @@ TEST_F(VirtualPortsTest, FullInputBuffer_DropsTheSurplusAndSaysSo) {
   time.Advance(15);
   EXPECT_THAT(events, testing::AllOf(testing::Not(IsEmpty()), testing::Each(SerialEvent::kReceiveOverflow)));
   EXPECT_EQ(device->ReadAll(), (Bytes{1, 2, 3, 4, 5, 6, 7, 8, 9, 10}));
+}
+
+TEST_F(VirtualPortsTest, Misuse_FailsAsWithARealPort) {
+  const auto settings = [](const char* text) {
+    return [text](SerialDevice& port) { port.SetSettings(text); };
+  };
+  const auto options = [](const LineOptions& line_options) {
+    return [line_options](SerialDevice& port) { port.SetLineOptions(line_options); };
+  };
+  const struct {
+    std::function<void(SerialDevice&)> call;
+    std::int32_t number;
+  } cases[] = {
+      {settings(",N,8,1"), kErrInvalidPropertyValue},
+      {settings("fast,N,8,1"), kErrSettingsRefused},
+      {settings("19200x,N,8,1"), kErrSettingsRefused},
+      {settings("0,N,8,1"), kErrSettingsRefused},
+      {settings("19200,E,8,1"), kErrSettingsRefused},
+      {options({.handshaking = true}), kErrSettingsRefused},
+      {options({.binary_input = false}), kErrSettingsRefused},
+      {options({.discard_nul = true}), kErrSettingsRefused},
+      {options({.transmit_threshold = 1}), kErrSettingsRefused},
+      {options({.input_buffer_size = 0}), kErrSettingsRefused},
+      {options({.receive_threshold = -1}), kErrSettingsRefused},
+      {[](SerialDevice& port) { port.SetPortNumber(0); }, kErrInvalidPropertyValue},
+      {[](SerialDevice& port) { port.SetReceiveThreshold(-1); }, kErrInvalidPropertyValue},
+      {[](SerialDevice& port) { port.SetTransmitThreshold(1); }, kErrInvalidPropertyValue},
+      {[](SerialDevice& port) { port.Open(); }, kErrPortAlreadyOpen},
+      {[this](SerialDevice&) { Use(*ports.CreateDevice()); }, kErrPortAlreadyOpen},
+      {[this](SerialDevice&) { ports.CreateDevice()->Write(kPoll); }, kErrPortNotOpen},
+  };
+  Open();
+  for (const auto& each : cases) {
+    const auto row = &each - cases;
+    try {
+      each.call(*device);
+      ADD_FAILURE() << row;
+    } catch (const RuntimeError& error) {
+      EXPECT_EQ(error.number(), each.number) << row;
+    }
+  }
+  EXPECT_THROW(ports.AddPort(0), std::invalid_argument);
+  EXPECT_THROW(ports.AddPort(1), std::invalid_argument);
+  EXPECT_EQ(FindFaultKind("polite"), nullptr);
+  device->Write(kPoll);  // nothing of it has changed the port
+  time.Advance(4);
+  EXPECT_EQ(device->ReadAll(), kPoll);
+  device->SetSettings("9600,N,8,1");  // at once, also while it is open
+  device->Write(Bytes{0x11});
+  time.Advance(1);
+  EXPECT_THAT(device->ReadAll(), IsEmpty());
+  time.Advance(1);
+  EXPECT_EQ(device->ReadAll(), Bytes{0x11});
 }
 
 TEST_F(VirtualPortsTest, Unplugged_ClosesItselfAndSaysSoOnce) {

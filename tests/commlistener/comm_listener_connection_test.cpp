@@ -33,6 +33,10 @@ TEST(CommListenerControls, MissingOnes_AreNamedInTheirOrder) {
                {&socket, good, good, nullptr, "Missing TCPRequestTimer"}};
   for (const auto& each : cases) {
     CommListenerInterface client;
+    client.SetLocalPort(7);
+    EXPECT_EQ(client.LocalPort(), 7);
+    client.SendDMXIntensities(0, 0, -1, {});  // a failure before there is anything to close
+    EXPECT_EQ(client.CLIErrorMessage(), "Error in SendDMXIntensities");
     try {
       client.InitializeControls(each.socket, each.connect, each.reconnect, each.request);
       ADD_FAILURE() << each.description;

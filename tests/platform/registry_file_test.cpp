@@ -155,6 +155,7 @@ TEST_F(RegistryFiles, FileThatCannotBeRead_HasNoKeysAndIsNotReplaced) {
       {"is not read", make_pipe},
       {"is not read", make_folder},
       {"neither UTF-16", [&] { Write(path, std::string("\xFE\xFF\0W\0i", 6)); }},
+      {"neither UTF-16", [&] { Write(path, "\xFE\xFF\xC3\xBC\xC3\xBC"); }},
       {"neither UTF-16", [&] { Write(path, std::string("W\0i\0n\0", 6)); }},
       {"neither UTF-16", [&] { Write(path, std::string("\xFF\xFE\0\0W\0\0\0", 8)); }},
       {"neither UTF-16", [&] { Write(path, "REGEDIT4\r\n\"K\xE4te\"=dword:00000001\r\n"); }},

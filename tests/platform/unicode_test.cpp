@@ -16,6 +16,7 @@ TEST(Unicode, Text_ComesBackWhateverItsBytesAre) {
       {"", u""},
       {"a\xC3\xBC\xE2\x82\xAC", u"a\u00FC\u20AC"},
       {"\xF0\x9F\x92\xA1", u"\xD83D\xDCA1"},
+      {"\xED\x95\x9C", u"\xD55C"},  // begins as a surrogate does
       {std::string("a\0b", 3), std::u16string(u"a\0b", 3)},
       // No UTF-8: a byte alone, a character cut off, a surrogate, too long a form, beyond the last character.
       {"\x80z", u"\xDC80z"},
@@ -28,7 +29,9 @@ TEST(Unicode, Text_ComesBackWhateverItsBytesAre) {
     EXPECT_EQ(Utf16(text.utf8), text.utf16) << text.utf8;
     EXPECT_EQ(Utf8(text.utf16), text.utf8) << text.utf8;
   }
+  EXPECT_EQ(Utf8(u"a\xD83D\xDD00z"), "a\xF0\x9F\x94\x80z");
   EXPECT_EQ(Utf8(u"a\xD83D"), "a?");
+  EXPECT_EQ(Utf8(u"\xDD00"), "?");  // stands for no byte
   EXPECT_EQ(Utf8(u"\xDCA1\xD83D\xD83D\xDCA1"), "\xA1?\xF0\x9F\x92\xA1");
 }
 

@@ -92,6 +92,11 @@ TEST_P(EveryRegistry, KeyOpenedToBeRead_CannotBeChanged) {
   EXPECT_EQ(FailureOf([&] { registry.CloseKey(key); }), "6 RegCloseKey failure");
   EXPECT_EQ(store->SetValue(key, "X", kRegSz, {}), kRegInvalidHandle);
   EXPECT_EQ(store->DeleteKey(key, "X"), kRegInvalidHandle);
+  const RegistryHandle write_only = RegistryBranch::Company(registry).OpenKey(kKeyWrite);
+  std::uint32_t type = 0;
+  std::uint32_t size = 0;
+  EXPECT_EQ(store->QueryValue(write_only, "X", type, nullptr, size), kRegAccessDenied);
+  registry.CloseKey(write_only);
 }
 
 TEST_P(EveryRegistry, ValuesThatCannotBeUsed_GiveTheDefaultAndAWarning) {
@@ -199,6 +204,14 @@ TEST(Registry, FailureOfEachCall_IsRaisedWithItsTextOnceTheKeyIsClosed) {
       EXPECT_EQ(store.open_keys, 0) << change.name;
     }
   }
+  store.failing_call = 0;
+  EXPECT_EQ(FailureOf([&] { company.Below("a\\").CreateKey(); }), "161 RegCreateKeyEx failure");
+  EXPECT_EQ(FailureOf([&] { registry.DeleteKey(kUser, "", ""); }), "5 RegDeleteKey failure");
+  company.Below("Gone").CreateKey();
+  const RegistryHandle deleted = company.Below("Gone").OpenKey(kKeyAllAccess);
+  company.DeleteKey("Gone");
+  EXPECT_EQ(store.SetValue(deleted, "X", kRegSz, {}), kRegKeyDeleted);
+  registry.CloseKey(deleted);
   for (const Case& get : gets) {
     for (std::size_t i = 0; i < get.texts.size(); ++i) {
       prepare(i + 1);

@@ -103,6 +103,11 @@ TEST(ServoDial, Arc_IsTheSameInEitherOrderAndKeepsClearOfStraightDown) {
       EXPECT_NEAR(pie.sweep_angle / kDialPi * 180, c.sweep, 0.01) << c.low;
     }
   }
+  ServoDial dial;
+  dial.SetRange(90, 90);  // drawing angles of 0
+  EXPECT_EQ(dial.Draw(300, 200).at(1).sweep_angle, 0);
+  EXPECT_EQ(dial.range_start(), 1e-08);
+  EXPECT_EQ(dial.range_end(), 1e-08);
 }
 
 TEST(ServoDial, AnyPicture_IsNotCut) {
@@ -111,6 +116,7 @@ TEST(ServoDial, AnyPicture_IsNotCut) {
   dial.SetNeutralPosition(-90);
   dial.SetDefaultPosition(90);
   dial.SetMovingArm(-90);
+  dial.DisplayCaption("CHAN 1");
   for (const std::int32_t size : {0, 1, 2}) {
     dial.DisplaySize(size);
     for (const auto& [width, height] :
