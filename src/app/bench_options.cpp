@@ -7,7 +7,7 @@
 #include <string>
 #include <string_view>
 
-#include "platform/posix/paths.h"
+#include "platform/paths.h"
 
 namespace tendril {
 namespace {

@@ -25,7 +25,7 @@
 #include "app/quit_on_signal.h"
 #include "bench/virtual_line.h"
 #include "bench/virtual_unit.h"
-#include "platform/posix/paths.h"
+#include "platform/paths.h"
 #include "platform/qt/qt_timer.h"
 
 namespace tendril {

@@ -14,7 +14,7 @@
 #include "app/qt_platform.h"
 #include "app/version.h"
 #include "bench/virtual_control_panel.h"
-#include "bench/virtual_serial_device.h"
+#include "bench/virtual_ports.h"
 #include "bench/virtual_tcp_socket.h"
 #include "bench/virtual_unit.h"
 #include "platform/memory_registry.h"

@@ -4,9 +4,9 @@
 #include <string>
 
 #include "app/version.h"
-#include "platform/posix/paths.h"
-#include "platform/posix/system_processes.h"
-#include "platform/posix/system_registry.h"
+#include "platform/paths.h"
+#include "platform/system_processes.h"
+#include "platform/system_registry.h"
 
 namespace tendril {
 namespace {

@@ -15,7 +15,7 @@
 
 #include "app/utility_program.h"
 #include "config/option_bytes.h"
-#include "platform/posix/paths.h"
+#include "platform/paths.h"
 #include "support/bench_process.h"
 #include "support/person.h"
 

@@ -6,7 +6,7 @@
 #include <string>
 #include <vector>
 
-#include "platform/posix/system_processes.h"
+#include "platform/system_processes.h"
 
 #ifndef _WIN32
 #include <signal.h>

@@ -11,7 +11,7 @@
 #include <string>
 
 #include "platform/bytes.h"
-#include "platform/posix/paths.h"
+#include "platform/paths.h"
 
 namespace tendril::test {
 

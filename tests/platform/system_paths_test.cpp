@@ -3,8 +3,8 @@
 #include <QTemporaryDir>
 #include <fstream>
 
-#include "platform/posix/paths.h"
-#include "platform/posix/port_names.h"
+#include "platform/paths.h"
+#include "platform/port_names.h"
 
 namespace tendril::test {
 namespace {

@@ -4,9 +4,9 @@
 #include <fstream>
 #include <string>
 
-#include "platform/posix/paths.h"
-#include "platform/posix/port_names.h"
-#include "platform/posix/serial_hold.h"
+#include "platform/paths.h"
+#include "platform/port_names.h"
+#include "platform/serial_hold.h"
 #include "serial/command_log.h"
 
 namespace tendril {

@@ -10,7 +10,7 @@
 #include <vector>
 
 #include "platform/memory_registry.h"
-#include "platform/posix/system_registry.h"
+#include "platform/system_registry.h"
 #include "prefs/registry.h"
 
 #ifdef _WIN32

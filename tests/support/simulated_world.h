@@ -3,7 +3,7 @@
 
 #include <memory>
 
-#include "bench/virtual_serial_device.h"
+#include "bench/virtual_ports.h"
 #include "bench/virtual_unit.h"
 #include "platform/serial_device.h"
 #include "support/memory_log.h"

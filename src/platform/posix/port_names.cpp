@@ -1,4 +1,4 @@
-#include "platform/posix/port_names.h"
+#include "platform/port_names.h"
 
 #include <algorithm>
 #include <array>
@@ -8,7 +8,7 @@
 #include <system_error>
 #include <vector>
 
-#include "platform/posix/paths.h"
+#include "platform/paths.h"
 
 namespace tendril {
 namespace {

@@ -1,4 +1,4 @@
-#include "platform/posix/serial_hold.h"
+#include "platform/serial_hold.h"
 
 #include <fcntl.h>
 #include <grp.h>

@@ -1,6 +1,6 @@
-#include "platform/posix/system_registry.h"
+#include "platform/system_registry.h"
 
-#include "platform/posix/paths.h"
+#include "platform/paths.h"
 #include "platform/posix/registry_file.h"
 
 namespace tendril {

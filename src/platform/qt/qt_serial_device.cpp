@@ -8,7 +8,7 @@
 #include <string_view>
 #include <utility>
 
-#include "platform/posix/port_names.h"
+#include "platform/port_names.h"
 #include "platform/runtime_error.h"
 
 namespace tendril {

@@ -10,9 +10,9 @@
 #include <optional>
 #include <string>
 
-#include "platform/posix/serial_hold.h"
 #include "platform/qt/fault_handler.h"
 #include "platform/serial_device.h"
+#include "platform/serial_hold.h"
 
 namespace tendril {
 

@@ -1,4 +1,4 @@
-#include "platform/posix/port_names.h"
+#include "platform/port_names.h"
 
 #include <windows.h>
 

@@ -1,4 +1,4 @@
-#include "platform/posix/system_processes.h"
+#include "platform/system_processes.h"
 
 #include <windows.h>
 // After windows.h, which it needs.

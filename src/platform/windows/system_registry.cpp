@@ -1,4 +1,4 @@
-#include "platform/posix/system_registry.h"
+#include "platform/system_registry.h"
 
 #include <windows.h>
 

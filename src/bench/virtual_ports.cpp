@@ -1,4 +1,4 @@
-#include "bench/virtual_serial_device.h"
+#include "bench/virtual_ports.h"
 
 #include <algorithm>
 #include <charconv>
