@@ -221,6 +221,7 @@ void frmNewServoConfig::OnSummaryScreen() {
   focus_before_summary_ = focusWidget();
   actuals_->hide();
   summary_->ShowRecords();
+  live_test_.ShowSlider();  // showing the records can have changed them
   views_->setCurrentWidget(summary_);
   command_area_->ShowSummaryButton(false);
   apply_boxes_->ShowEditing(false);

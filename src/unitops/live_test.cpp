@@ -163,6 +163,7 @@ void LiveTest::OnSlider() {
 }
 
 void LiveTest::ShowSlider() {
+  waiting_.reset();  // it was meant for the records as they were
   Guarded([this] { PlaceSlider(); });
 }
 

@@ -70,7 +70,7 @@ class LiveTestView {
 //
 // Slider: spans the virtual range; outside the virtual stops it is pushed back and sends nothing from there.
 // Its positions go out no faster than the line takes them: one that is still waiting gives way to the next,
-// and the last one always goes out.
+// and the last one always goes out, unless the records are replaced first.
 //
 // Nothing is sent while no channel is chosen, while no port is, and while a unit command runs.
 class LiveTest {
@@ -94,7 +94,7 @@ class LiveTest {
   void OnTestButton(int button);
   // The slider was moved, or the range that it spans has changed by an edit.
   void OnSlider();
-  // The records were replaced: the same, but nothing is sent.
+  // The records were replaced: the same, but nothing is sent, not even what waits.
   void ShowSlider();
   // "Use Slider to Test Intensity Values" was ticked or cleared.
   void OnSliderSends();

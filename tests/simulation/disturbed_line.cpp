@@ -110,6 +110,7 @@ void DisturbedDevice::SetReceiveThreshold(std::int32_t bytes) {
 }
 
 void DisturbedDevice::SetRts(bool asserted) {
+  if (asserted) pending_when_taken_back_ = device_->PendingOutput();
   device_->SetRts(asserted);
   rts_ = asserted;
 }

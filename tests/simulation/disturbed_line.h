@@ -108,6 +108,8 @@ class DisturbedDevice final : public SerialDevice {
 
   std::int32_t number() const { return number_; }
   bool rts() const { return rts_; }
+  // What waited to go out when RTS was asserted last.
+  std::size_t pending_when_taken_back() const { return pending_when_taken_back_; }
   // Something has been wrong with the input since ForgetDamage(), or some of it was late then.
   bool damaged() const { return damaged_; }
   void ForgetDamage() { damaged_ = !late_.empty(); }
@@ -130,6 +132,7 @@ class DisturbedDevice final : public SerialDevice {
   bool holding_ = false;
   bool untold_ = false;
   bool rts_ = false;
+  std::size_t pending_when_taken_back_ = 0;
   bool damaged_ = false;
 };
 

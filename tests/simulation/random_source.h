@@ -1,4 +1,4 @@
-// RandomSource: chance that a seed repeats exactly, on every system.
+// RandomSource: chance that a seed repeats exactly.
 #pragma once
 
 #include <cstddef>

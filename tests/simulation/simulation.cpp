@@ -30,10 +30,9 @@ constexpr int kMostPollsOfPort = 3;
 constexpr int kMostPollsOfGet = 33;
 constexpr int kMostPollsOfStage = 15;
 constexpr std::size_t kMostReplyData = 4050;
-// Above what the program holds at the start: the parts of the window that are made later, and all buffers.
-constexpr std::size_t kMostHeapGrowth = 9u << 19;
-
-std::size_t HeapInUse() { return mallinfo2().uordblks; }
+// Above what the program holds at the start. Seen are 4.0 MB at the most: the parts of the window that are made later, and
+// a flood of a megabyte on its way.
+constexpr std::size_t kMostHeapGrowth = 4608u * 1024;
 
 std::vector<Bytes> SplitPackets(std::span<const std::uint8_t> bytes) {
   std::vector<Bytes> packets(1);
@@ -57,6 +56,8 @@ ChannelTable Normalised(ChannelTable records) {
 
 }  // namespace
 
+std::size_t HeapInUse() { return mallinfo2().uordblks; }
+
 Simulation::Simulation(std::uint64_t seed, Tally& tally, bool narrate)
     : random_(seed),
       tally_(tally),
@@ -66,7 +67,7 @@ Simulation::Simulation(std::uint64_t seed, Tally& tally, bool narrate)
       device_(world_.bench.CreateDevice(), world_.time, disturbance_,
               [this](std::span<const std::uint8_t> bytes) { OnWritten(bytes); }),
       link_(device_, world_.time, world_.time, world_.log) {
-  if (world_.time.NowMs() > 0x8000'0000) ++tally_.faults["clocks that wrap"];
+  if (world_.time.NowMs() > 0x8000'0000) ++tally_.faults["clocks near their wrap"];
   SetUpWorld();
   window_ = std::make_unique<frmNewServoConfig>(link_, world_.time, world_.boxes, panel_.control_panel,
                                                 Version{1, 0, 0});
@@ -78,6 +79,11 @@ Simulation::Simulation(std::uint64_t seed, Tally& tally, bool narrate)
         OnPollReply(success, kind, data);
         if (program) program(success, unit, kind, data);
       });
+  panel_.panel.SetPortHandler([this](std::uint8_t port, bool held) {
+    Require(!held || !closing_ || !device_.IsOpen() || device_.number() != port,
+            "a port is closed before it is given back");
+    world_.bench.SetHeldByAnother(port, held);
+  });
   world_.boxes.while_open = [this] { WhileBoxOpen(); };
   world_.time.SetObserver([this] {
     CheckTheLine();
@@ -129,12 +135,12 @@ void Simulation::Require(bool holds, const char* rule) {
 }
 
 void Simulation::Note(const std::string& text) {
-  Digest({reinterpret_cast<const std::uint8_t*>(text.data()), text.size()});
+  Mix({reinterpret_cast<const std::uint8_t*>(text.data()), text.size()});
   if (narrate_)
     std::printf("%10.3f s  %s\n", static_cast<double>(world_.time.ElapsedMs()) / 1000, text.c_str());
 }
 
-void Simulation::Digest(std::span<const std::uint8_t> bytes) {
+void Simulation::Mix(std::span<const std::uint8_t> bytes) {
   const auto add = [this](std::uint64_t value) { digest_ = (digest_ ^ value) * 0x100000001b3; };
   add(world_.time.ElapsedMs());
   for (const std::uint8_t byte : bytes) add(byte);
@@ -158,10 +164,10 @@ bool Simulation::SummaryShown() const {
   return back != nullptr && back->isVisibleTo(window_.get());
 }
 
-bool Simulation::RecordsAreAsLeft() {
-  const ChannelTable& records = window_->WorkingConfiguration();
-  if (!(records == records_) && SummaryShown() && records == Normalised(records_)) records_ = records;
-  return records == records_;
+// The summary changes records by showing them.
+void Simulation::TakeOverNormalised() {
+  if (SummaryShown() && window_->WorkingConfiguration() == Normalised(records_))
+    records_ = Normalised(records_);
 }
 
 bool Simulation::AllRecordsValid() const {
@@ -177,7 +183,7 @@ bool Simulation::AllRecordsValid() const {
 void Simulation::OnWritten(std::span<const std::uint8_t> bytes) {
   Require(device_.rts(), "the program transmits only while RTS is asserted");
   Require(!closed_, "a closed window sends nothing");
-  Digest(bytes);
+  Mix(bytes);
   for (const Bytes& packet : SplitPackets(bytes)) OnPacket(packet);
 }
 
@@ -185,7 +191,11 @@ void Simulation::OnPacket(const Bytes& packet) {
   if (packet.size() < 3) return;
   const std::uint8_t code = packet[1];
   operation_.last_activity_ms = world_.time.ElapsedMs();
+  const bool to_any = code == kSetAddress || (code == kPoll && packet[2] == '*');
+  if (code == kPoll || code == kSetAddress || (code == kSetOption && packet[3] != kLivePosition))
+    Require(packet[0] == (to_any ? 0xFF : operation_.unit), "a command speaks to the unit that was chosen");
   if (code == kPoll) {
+    operation_.last_poll = packet[2];
     Require(polls_ == poll_replies_, "one poll is outstanding at most");
     ++polls_;
     ++operation_.polls;
@@ -227,6 +237,7 @@ void Simulation::OnPositionSent(const Bytes& packet) {
   // What a sweep and the test buttons send goes beyond the stops on purpose.
   if (SweepRuns() || using_test_button_ || operation_.swept) return;
   ++tally_.seen["slider positions sent"];
+  Require(device_.PendingOutput() <= 48, "the slider sends no faster than the line");
   const auto channel = static_cast<std::size_t>(std::countr_zero(packet[4]));
   const Microseconds position = packet[5] * 10;
   const auto inside = [&](const ChannelTable& records) {
@@ -246,6 +257,8 @@ void Simulation::OnAccepted(const DisturbedUnit& unit, const Bytes& packet, bool
     port.accepted = true;
   } else if (damaged) {
     port.damage_passed = true;
+  } else if (packet[3] == kLivePosition) {
+    port.excused = true;  // sent before the command, and heard in it
   }
 }
 
@@ -254,7 +267,7 @@ void Simulation::OnPollReply(bool success, std::uint8_t kind, const Bytes& data)
   operation_.last_activity_ms = world_.time.ElapsedMs();
   operation_.last_poll_answered = success;
   operation_.replies_damaged = operation_.replies_damaged || device_.damaged();
-  answered_too_early_ = success && device_.PendingOutput() > 0;
+  answered_too_early_ = success && device_.pending_when_taken_back() > 0;
   const std::uint64_t took_ms = world_.time.ElapsedMs() - poll_ms_;
   Require(poll_replies_ == polls_, "one poll, one PollReply");
   Require(!link_.PollOutstanding(), "the host may poll again in PollReply");
@@ -262,6 +275,8 @@ void Simulation::OnPollReply(bool success, std::uint8_t kind, const Bytes& data)
           "a poll ends with its time-out");
   Require(data.size() <= kMostReplyData, "a reply's data stay under their cap");
   Note(success ? "replied, " + std::to_string(data.size()) + " bytes" : "not replied");
+  if (success && kind == 'n' && data.size() >= 10 && (data[0] < 1 || data[0] > 8))
+    operation_.no_such_port = true;
   if (success && kind == '0' && data.size() >= 2 && data[1] == kAccepted && operation_.port >= 0 &&
       device_.damaged())
     operation_.ports[static_cast<std::size_t>(operation_.port)].excused = true;
@@ -301,7 +316,9 @@ void Simulation::CheckOperation() {
                                                                     : kMostPollsOfStage),
             "a command does not poll more often than it may");
   }
-  Require(RecordsAreAsLeft(), "only the person and a get that succeeds change the records");
+  if (!(window_->WorkingConfiguration() == records_)) TakeOverNormalised();
+  Require(window_->WorkingConfiguration() == records_,
+          "only the person and a get that succeeds change the records");
   CheckPanel();
 }
 
@@ -313,6 +330,10 @@ void Simulation::EndOperation() {
   Note(operation_.what + " ended: " + outcome);
   if (outcome.starts_with("SUCCESS")) {
     Require(boxes == 0, "a success shows no box");
+    Require(!operation_.no_such_port, "a port that no unit has ends a get");
+    if (operation_.what == "UPDATE")
+      Require(operation_.last_poll == '+' && operation_.last_poll_answered,
+              "SUCCESS of a change of the ID: a unit has answered by the new one");
     if (operation_.what == "SEND") CheckSend();
     if (operation_.what == "GET") CheckGet();
   } else if (title == "Internal Error") {
@@ -323,10 +344,13 @@ void Simulation::EndOperation() {
     Require(boxes == 1, "a failure shows one box");
     if (title == "No Repsonse" && !operation_.last_poll_answered)
       Require(operation_.polls_of_step == kMostPollsOfPort, "a send asks three times before it gives up");
+    if (title == "Send Error" && operation_.what == "GET")
+      Require(operation_.polls == kMostPollsOfGet, "a get asks 33 times before it gives up");
     if (title == "Cannot Find Unit" || title == "Cannot Change Unit ID")
       Require(operation_.polls_of_step == kMostPollsOfStage, "a change of the ID asks fifteen times");
   }
-  Require(outcome.starts_with("SUCCESS: Upload") || RecordsAreAsLeft(),
+  TakeOverNormalised();
+  Require(outcome.starts_with("SUCCESS: Upload") || window_->WorkingConfiguration() == records_,
           "a get that fails leaves the records as they were");
   records_ = window_->WorkingConfiguration();
   ++tally_.seen[operation_.what + ": " +
@@ -366,6 +390,9 @@ void Simulation::CheckGet() {
 
 // A panel that has behaved all the time has every port but the one that the program has asked for last.
 void Simulation::CheckPanel() {
+  const bool connected = panel_.control_panel.Client().IsConnected();
+  if (panel_always_there_) Require(connected || !was_connected_, "a connection that nothing disturbs stays");
+  was_connected_ = connected;
   if (!panel_behaved_ || !panel_.control_panel.Client().ReadyToTransmit()) return;
   for (const std::uint8_t port : panel_ports_) {
     Require(panel_.panel.Holds(port) || panel_.control_panel.RequestedPort() == port,

@@ -36,6 +36,9 @@ struct Tally {
   std::uint64_t virtual_ms = 0;
 };
 
+// Bytes of the heap in use.
+std::size_t HeapInUse();
+
 // One run. The same seed does the same in every run of the same program.
 class Simulation {
  public:
@@ -79,7 +82,10 @@ class Simulation {
     std::size_t garbled_before = 0;  // bytes on the lines
     bool swept = false;              // a sweep ran when it was asked for
     std::array<SentPort, kPortCount> ports{};
-    int port = -1;  // the slot that was sent last
+    int port = -1;               // the slot that was sent last
+    std::uint8_t unit = 0;       // that is chosen
+    std::uint8_t last_poll = 0;  // its kind
+    bool no_such_port = false;   // a reply spoke of one
   };
 
   // What goes wrong.
@@ -131,12 +137,12 @@ class Simulation {
   bool SweepRuns() const;
   std::string Outcome() const;
   bool SummaryShown() const;
-  bool RecordsAreAsLeft();
+  void TakeOverNormalised();
   bool AllRecordsValid() const;
   // Without those that came up while another was open.
   std::size_t BoxesShown() const { return world_.boxes.shown.size() - boxes_on_boxes_; }
   void Note(const std::string& text);
-  void Digest(std::span<const std::uint8_t> bytes);
+  void Mix(std::span<const std::uint8_t> bytes);
 
   RandomSource random_;
   Tally& tally_;
@@ -163,6 +169,9 @@ class Simulation {
   bool using_test_button_ = false;
   bool calm_ = false;  // nothing goes wrong any more
   bool closed_ = false;
+  bool closing_ = false;
+  bool panel_always_there_ = true;  // its listener was never gone, nor misbehaved
+  bool was_connected_ = false;
   // Of the last poll.
   std::uint64_t polls_ = 0;
   std::uint64_t poll_replies_ = 0;

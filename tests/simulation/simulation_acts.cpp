@@ -39,6 +39,7 @@ void Simulation::AttachUnit(std::int32_t port, std::unique_ptr<VirtualUnit> unit
       options[i] = static_cast<std::uint8_t>(random_.Between(50, centre));
       options[i + 1] = static_cast<std::uint8_t>(random_.Between(centre, 250));
     }
+    if (random_.OneIn(40)) options[0] = 0x14;  // of no kind
     unit->SetPortOptions(number, options);
   }
   auto disturbed = std::make_unique<DisturbedUnit>(
@@ -90,7 +91,7 @@ void Simulation::ActAsWorld() {
       Bytes noise(static_cast<std::size_t>(random_.Between(1, 40)));
       for (std::uint8_t& byte : noise)
         byte = random_.Chance(20) ? random_.Pick(std::array<std::uint8_t, 4>{0, 0, 0xFE, 1}) : random_.Byte();
-      device_.AddNoise(noise);
+      if (port == open_port) device_.AddNoise(noise);
       for (const Place& place : units_) {
         if (place.port == port) place.unit->AddNoise(noise);
       }
@@ -107,12 +108,16 @@ void Simulation::ActAsWorld() {
         world_.bench.SetAllowed(each, true);
       }
       return;
-    case 6:
+    case 6: {
       if (port == open_port) return;
-      ++tally_.faults["ports held by another program or not allowed"];
-      if (random_.Chance(30)) return world_.bench.SetAllowed(port, false);
-      return world_.bench.SetHeldByAnother(
-          port, random_.Chance(60) || panel_.panel.Holds(static_cast<std::uint8_t>(port)));
+      if (random_.Chance(30)) {
+        ++tally_.faults["ports not allowed"];
+        return world_.bench.SetAllowed(port, false);
+      }
+      const bool held = random_.Chance(60) || panel_.panel.Holds(static_cast<std::uint8_t>(port));
+      if (held) ++tally_.faults["ports held by another program"];
+      return world_.bench.SetHeldByAnother(port, held);
+    }
     case 7:
       ++tally_.faults["units exchanged"];
       DetachUnits(port);
@@ -125,7 +130,7 @@ void Simulation::ActAsWorld() {
 void Simulation::ActAsPanel() {
   switch (random_.Below(5)) {
     case 0: {
-      panel_behaved_ = panel_proper_ = false;
+      panel_behaved_ = panel_proper_ = panel_always_there_ = false;
       const PanelBehaviourKind& kind = random_.Pick(PanelBehaviourKinds());
       ++tally_.faults["listener: " + std::string(kind.name)];
       Note("the panel behaves: " + std::string(kind.name));
@@ -133,7 +138,9 @@ void Simulation::ActAsPanel() {
           kind.behaviour, random_.Chance(50) ? std::optional<std::size_t>(random_.Below(4)) : std::nullopt);
     }
     case 1:
-      panel_behaved_ = panel_proper_ = false;
+      panel_behaved_ = panel_behaved_ && (panel_.control_panel.Client().ReadyToTransmit() ||
+                                          panel_.control_panel.Client().Closed());
+      panel_proper_ = panel_always_there_ = false;
       ++tally_.faults["listener gone or stuck"];
       return panel_.panel.SetListener(random_.Chance(70) ? PanelListener::kOff : PanelListener::kStuck);
     case 2:
@@ -184,6 +191,7 @@ void Simulation::WhileBoxOpen() {
   if (BoxesShown() == operation_.boxes_before + 1) operation_.first_box = box.title;
   if (boxes_open_ >= kMostBoxesAtOnce || !broken_.empty()) return;
   ++boxes_open_;
+  ++tally_.faults["boxes left open"];
   for (int i = random_.Between(0, 3); i > 0; --i) {
     if (!calm_ && random_.Chance(40)) ActAsWorld();
     LetTimePass(AnyDuration());
@@ -213,6 +221,8 @@ void Simulation::ActAsPerson() {
       Use(Find("HScrollSendServoPosition"));
       LetTimePass(random_.Below(15));
     }
+  } else if (act <= 60 && SummaryShown()) {
+    Use(Find(random_.Pick(std::array{"cmdShowConfig", "spnSumValue_0"})));
   } else {
     UseAnyControl();
   }
@@ -227,6 +237,8 @@ void Simulation::ChoosePort(const std::string& line) {
   const int entry = ports.findText(QString::fromStdString(line));
   ports.setCurrentIndex(entry);
   Q_EMIT ports.activated(entry);
+  if (link_.PortOpen() && device_.number() == 5) ++tally_.faults["lines without an echo"];
+  if (link_.PortOpen() && device_.number() == 6) ++tally_.faults["lines with a torn echo"];
 }
 
 void Simulation::ChooseUnit(std::uint8_t id) {
@@ -240,6 +252,7 @@ void Simulation::UseAnyControl() {
   const auto usable = [this](const QWidget* widget) {
     if (!widget->isEnabledTo(window_.get()) || !widget->isVisibleTo(window_.get())) return false;
     const QString name = widget->objectName();
+    if (name.isEmpty() || name.startsWith(QStringLiteral("qt_"))) return false;
     return qobject_cast<const QAbstractButton*>(widget) != nullptr ||
            qobject_cast<const QComboBox*>(widget) != nullptr ||
            qobject_cast<const QSpinBox*>(widget) != nullptr ||
@@ -253,7 +266,7 @@ void Simulation::UseAnyControl() {
 
 void Simulation::Use(QWidget& control) {
   const std::string name = control.objectName().toStdString();
-  if (!control.isEnabledTo(window_.get()) || name == "cmbNYX") return;
+  if (!control.isEnabledTo(window_.get()) || !control.isVisibleTo(window_.get()) || name == "cmbNYX") return;
   Note("the person uses " + name);
   if (auto* button = qobject_cast<QAbstractButton*>(&control)) {
     if (name.starts_with("Command3_")) return RunCommand(*button);
@@ -298,7 +311,9 @@ void Simulation::RunCommand(QAbstractButton& button) {
                 .boxes_before = BoxesShown(),
                 .last_activity_ms = world_.time.ElapsedMs(),
                 .garbled_before = CountOnLines(&LineCounters::garbled_bytes),
-                .swept = SweepRuns()};
+                .swept = SweepRuns(),
+                .unit = static_cast<std::uint8_t>(Find<QComboBox>("CmbUnitID_0").currentIndex() * 16 +
+                                                  Find<QComboBox>("CmbUnitID_1").currentIndex())};
   Note("the person presses " + operation_.what);
   button.click();
   operation_.running = CommandRuns();
@@ -313,13 +328,21 @@ void Simulation::Close() {
   const std::optional<std::uint8_t> requested = panel_.control_panel.RequestedPort();
   const bool can_give_back = client.ReadyToTransmit() && panel_proper_;
   const std::size_t boxes_before = world_.boxes.shown.size();
-  operation_.running = false;
+  if (std::exchange(operation_.running, false)) ++tally_.seen["windows closed while a command ran"];
   Note("the person closes the window");
+  if (requested) window_->show();
+  closing_ = true;
   bool closed = window_->close();
   Require(closed == !requested, "the window closes at once unless a port has to be given back");
   Require(!link_.PortOpen() || !closed, "a closed window has closed the port");
+  if (!closed && random_.Chance(30)) {
+    world_.time.Advance(random_.Below(90));
+    if (window_->isEnabled()) ChoosePort("Comm " + std::to_string(random_.Between(1, 6)));
+    Require(!link_.PortOpen(), "nothing opens the port while it is given back");
+    if (random_.Chance(50)) closed = window_->close();
+  }
   world_.time.Advance(150);
-  if (!closed) closed = window_->close();
+  closed = closed || !window_->isVisible();
   Require(closed && !link_.PortOpen() && !device_.IsOpen(), "a window that closes leaves no port open");
   closed_ = true;
   world_.time.Advance(5000);
