@@ -340,7 +340,7 @@ TEST_F(Live, Drag_KeepsUpWithTheHandAndEndsWhereItEnds) {
   EXPECT_EQ(world_.time.RunningTimers(), 0);
 }
 
-TEST_F(Live, WaitingPosition_GoesOutWhateverComesNext) {
+TEST_F(Live, WaitingPosition_GoesOutUnlessItsRecordsOrItsPortAreGone) {
   const auto drag = [&] {
     sent_.clear();
     for (const int value : {400, 410, 420}) MoveSliderTo(value);  // 140 goes out, 142 waits
@@ -373,6 +373,12 @@ TEST_F(Live, WaitingPosition_GoesOutWhateverComesNext) {
   RunToTheEnd();
   ExpectSuccess("SUCCESS: Upload Complete");
   EXPECT_THAT(SentPositions(), ElementsAre(140, 142));
+
+  // Other records have other stops.
+  drag();
+  test_.ShowSlider();
+  Settle();
+  EXPECT_THAT(SentPositions(), ElementsAre(140));
 
   // Unless the port has gone: that is not opened for it.
   drag();
