@@ -5,6 +5,7 @@
 #include <utility>
 
 #include "platform/ansi_text.h"
+#include "platform/unicode.h"
 
 namespace tendril {
 namespace {
@@ -45,23 +46,12 @@ bool HoldsText(std::uint32_t type) { return type == kRegSz || type == kRegExpand
 
 // The data as it crosses: text in ANSI.
 Bytes Crossing(const RegistryValue& value) {
-  if (!HoldsText(value.type)) return value.data;
-  std::u16string text(value.data.size() / 2, u'\0');
-  for (std::size_t i = 0; i < text.size(); ++i) {
-    text[i] = static_cast<char16_t>(value.data[2 * i] | value.data[2 * i + 1] << 8);
-  }
-  return AnsiBytes(text);
+  return HoldsText(value.type) ? AnsiBytes(Utf16Text(value.data)) : value.data;
 }
 
 Bytes Kept(std::uint32_t type, std::span<const std::uint8_t> data) {
-  if (!HoldsText(type)) return {data.begin(), data.end()};
-  Bytes kept;
-  kept.reserve(2 * data.size());
-  for (const char16_t unit : AnsiText(data)) {
-    kept.push_back(static_cast<std::uint8_t>(unit & 0xFF));
-    kept.push_back(static_cast<std::uint8_t>(unit >> 8));
-  }
-  return kept;
+  if (HoldsText(type)) return Utf16Bytes(AnsiText(data));
+  return {data.begin(), data.end()};
 }
 
 }  // namespace

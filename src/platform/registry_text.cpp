@@ -37,27 +37,14 @@ std::u16string Decode(std::string_view bytes, RegistryEncoding& encoding) {
   }
   encoding = RegistryEncoding::kUtf16;
   bytes.remove_prefix(kUtf16Mark.size());
-  std::u16string text(bytes.size() / 2, u'\0');
-  for (std::size_t i = 0; i < text.size(); ++i) {
-    text[i] = static_cast<char16_t>(static_cast<std::uint8_t>(bytes[2 * i]) |
-                                    static_cast<std::uint8_t>(bytes[2 * i + 1]) << 8);
-  }
-  return text;
-}
-
-void AppendUtf16(Bytes& bytes, std::u16string_view text) {
-  for (const char16_t unit : text) {
-    bytes.push_back(static_cast<std::uint8_t>(unit & 0xFF));
-    bytes.push_back(static_cast<std::uint8_t>(unit >> 8));
-  }
+  return Utf16Text({reinterpret_cast<const std::uint8_t*>(bytes.data()), bytes.size()});
 }
 
 Bytes Encode(std::u16string_view text, RegistryEncoding encoding) {
   Bytes bytes;
   if (encoding == RegistryEncoding::kUtf16) {
-    bytes.reserve(kUtf16Mark.size() + 2 * text.size());
-    bytes.assign(kUtf16Mark.begin(), kUtf16Mark.end());
-    AppendUtf16(bytes, text);
+    bytes = Utf16Bytes(text);
+    bytes.insert(bytes.begin(), kUtf16Mark.begin(), kUtf16Mark.end());
     return bytes;
   }
   if (encoding == RegistryEncoding::kUtf8WithMark) bytes.assign(kUtf8Mark.begin(), kUtf8Mark.end());
@@ -135,9 +122,7 @@ std::optional<RegistryValue> ReadText(std::u16string_view data) {
   std::optional<std::u16string> text = TakeQuoted(data);
   if (!text || !data.empty()) return std::nullopt;
   text->push_back(u'\0');
-  RegistryValue value{kRegSz, {}};
-  AppendUtf16(value.data, *text);
-  return value;
+  return RegistryValue{kRegSz, Utf16Bytes(*text)};
 }
 
 std::optional<RegistryValue> ReadNumber(std::u16string_view data) {
@@ -311,10 +296,7 @@ bool Reader::ReadValue(std::u16string_view line) {
 std::optional<std::u16string> PlainText(const RegistryValue& value) {
   const Bytes& data = value.data;
   if (value.type != kRegSz || data.size() % 2 != 0 || data.empty()) return std::nullopt;
-  std::u16string text;
-  for (std::size_t i = 0; i < data.size(); i += 2) {
-    text += static_cast<char16_t>(data[i] | data[i + 1] << 8);
-  }
+  std::u16string text = Utf16Text(data);
   if (text.back() != u'\0') return std::nullopt;
   text.pop_back();
   const bool has_controls = std::any_of(text.begin(), text.end(), [](char16_t unit) { return unit < u' '; });

@@ -58,4 +58,22 @@ std::string Utf8(std::u16string_view text) {
   return {bytes.data(), to};
 }
 
+Bytes Utf16Bytes(std::u16string_view text) {
+  Bytes bytes;
+  bytes.reserve(2 * text.size());
+  for (const char16_t unit : text) {
+    bytes.push_back(static_cast<std::uint8_t>(unit & 0xFF));
+    bytes.push_back(static_cast<std::uint8_t>(unit >> 8));
+  }
+  return bytes;
+}
+
+std::u16string Utf16Text(std::span<const std::uint8_t> bytes) {
+  std::u16string text(bytes.size() / 2, u'\0');
+  for (std::size_t i = 0; i < text.size(); ++i) {
+    text[i] = static_cast<char16_t>(bytes[2 * i] | bytes[2 * i + 1] << 8);
+  }
+  return text;
+}
+
 }  // namespace tendril

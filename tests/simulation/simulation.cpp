@@ -30,6 +30,7 @@ constexpr int kMostPollsOfPort = 3;
 constexpr int kMostPollsOfGet = 33;
 constexpr int kMostPollsOfStage = 15;
 constexpr std::size_t kMostReplyData = 4050;
+constexpr std::size_t kMostWaitingBytes = 48;  // three live commands with their unlocks
 // Above what the program holds at the start. Seen are 4.0 MB at the most: the parts of the window that are made later, and
 // a flood of a megabyte on its way.
 constexpr std::size_t kMostHeapGrowth = 4608u * 1024;
@@ -62,7 +63,7 @@ Simulation::Simulation(std::uint64_t seed, Tally& tally, bool narrate)
     : random_(seed),
       tally_(tally),
       narrate_(narrate),
-      // Every third clock wraps during the run.
+      // Every third clock is near its wrap.
       world_(random_.Chance(33) ? 0u - static_cast<std::uint32_t>(random_.Between(0, 60'000)) : 1000),
       device_(world_.bench.CreateDevice(), world_.time, disturbance_,
               [this](std::span<const std::uint8_t> bytes) { OnWritten(bytes); }),
@@ -188,7 +189,7 @@ void Simulation::OnWritten(std::span<const std::uint8_t> bytes) {
 }
 
 void Simulation::OnPacket(const Bytes& packet) {
-  if (packet.size() < 3) return;
+  if (packet.size() < 4) return;  // an unlock
   const std::uint8_t code = packet[1];
   operation_.last_activity_ms = world_.time.ElapsedMs();
   const bool to_any = code == kSetAddress || (code == kPoll && packet[2] == '*');
@@ -224,7 +225,7 @@ void Simulation::OnOptionsSent(const Bytes& packet) {
   const auto encoded = EncodeOptions(window_->WorkingConfiguration().At(static_cast<std::size_t>(slot)));
   Require(std::holds_alternative<OptionBytes>(encoded), "no invalid record is sent");
   if (!broken_.empty()) return;
-  port = {.options = std::get<OptionBytes>(encoded), .sent = true};
+  port = {.options = std::get<OptionBytes>(encoded)};
   for (const Place& place : units_) {
     const bool hears =
         place.port == device_.number() && (place.unit->unit().id() == packet[0] || packet[0] == 0xFF);
@@ -237,7 +238,7 @@ void Simulation::OnPositionSent(const Bytes& packet) {
   // What a sweep and the test buttons send goes beyond the stops on purpose.
   if (SweepRuns() || using_test_button_ || operation_.swept) return;
   ++tally_.seen["slider positions sent"];
-  Require(device_.PendingOutput() <= 48, "the slider sends no faster than the line");
+  Require(device_.PendingOutput() <= kMostWaitingBytes, "the slider sends no faster than the line");
   const auto channel = static_cast<std::size_t>(std::countr_zero(packet[4]));
   const Microseconds position = packet[5] * 10;
   const auto inside = [&](const ChannelTable& records) {

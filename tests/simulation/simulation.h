@@ -63,7 +63,6 @@ class Simulation {
   // One port of the send that runs.
   struct SentPort {
     OptionBytes options{};
-    bool sent = false;
     bool accepted = false;       // by a unit, as it was encoded
     bool damage_passed = false;  // a unit accepted something else in its place
     bool excused = false;        // the acknowledgement spoke of another command, or was damaged
