@@ -33,7 +33,7 @@ constexpr std::size_t kMostReplyData = 4050;
 constexpr std::size_t kMostWaitingBytes = 48;  // three live commands with their unlocks
 // Above what the program holds at the start. Seen are 4.0 MB at the most: the parts of the window that are made later, and
 // a flood of a megabyte on its way.
-constexpr std::size_t kMostHeapGrowth = 4608u * 1024;
+constexpr std::size_t kMostHeapGrowth = 4'718'592;
 
 std::vector<Bytes> SplitPackets(std::span<const std::uint8_t> bytes) {
   std::vector<Bytes> packets(1);
@@ -332,9 +332,10 @@ void Simulation::EndOperation() {
   if (outcome.starts_with("SUCCESS")) {
     Require(boxes == 0, "a success shows no box");
     Require(!operation_.no_such_port, "a port that no unit has ends a get");
-    if (operation_.what == "UPDATE")
+    if (operation_.what == "UPDATE") {
       Require(operation_.last_poll == '+' && operation_.last_poll_answered,
               "SUCCESS of a change of the ID: a unit has answered by the new one");
+    }
     if (operation_.what == "SEND") CheckSend();
     if (operation_.what == "GET") CheckGet();
   } else if (title == "Internal Error") {
