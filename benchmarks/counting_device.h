@@ -24,14 +24,9 @@ class CountingDevice final : public SerialDevice {
   }
   bool Exists(std::int32_t number) const override { return device_.Exists(number); }
   std::string Describe(std::int32_t number) const override { return device_.Describe(number); }
-  void SetSettings(const std::string& settings) override { device_.SetSettings(settings); }
-  void SetPortNumber(std::int32_t number) override { device_.SetPortNumber(number); }
-  void SetLineOptions(const LineOptions& options) override { device_.SetLineOptions(options); }
-  void Open() override { device_.Open(); }
+  void Open(std::int32_t number, std::int32_t baud) override { device_.Open(number, baud); }
   void Close() noexcept override { device_.Close(); }
-  bool IsOpen() const override { return device_.IsOpen(); }
   void SetReceiveThreshold(std::int32_t bytes) override { device_.SetReceiveThreshold(bytes); }
-  void SetTransmitThreshold(std::int32_t bytes) override { device_.SetTransmitThreshold(bytes); }
   void SetRts(bool asserted) override { device_.SetRts(asserted); }
   void Write(std::span<const std::uint8_t> bytes) override {
     sent += bytes.size();

@@ -16,8 +16,8 @@
 #include "counting_device.h"
 #include "measuring.h"
 #include "platform/paths.h"
-#include "platform/qt/qt_serial_device.h"
 #include "platform/qt/qt_tcp_socket.h"
+#include "platform/qt/system_serial_device.h"
 #include "platform/system_processes.h"
 #include "platform/system_registry.h"
 #include "prefs/registry.h"
@@ -87,10 +87,10 @@ class MeasuredWindow {
 
   StartedBench bench_;
   QtPlatform platform_;
-  QtSerialDevice serial_{platform_.on_fault};
+  const std::unique_ptr<SerialDevice> serial_ = CreateSystemSerialDevice(platform_.on_fault);
 
  public:
-  CountingDevice device{serial_};
+  CountingDevice device{*serial_};
 
  private:
   FileCommandLog log_{CommandLogPath()};

@@ -12,7 +12,7 @@
 #include "app/control_panel_server.h"
 #include "app/pseudo_terminal.h"
 #include "bench/virtual_control_panel.h"
-#include "platform/serial_hold.h"
+#include "platform/posix/serial_hold.h"
 #include "platform/timer.h"
 
 namespace tendril {

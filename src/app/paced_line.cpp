@@ -15,9 +15,6 @@ constexpr std::uint64_t kFineWaitUs = 2000;
 // A program that sends faster than the line goes is held up, as by any serial port, when this much waits.
 constexpr std::size_t kQueueLimit = 4096;
 
-// Stands for a speed that has no name. Any that the units do not run at will do.
-constexpr std::uint32_t kUncommonBaud = 300;
-
 }  // namespace
 
 PacedLine::PacedLine(const PseudoTerminal& terminal, VirtualLine& line, Console& console, bool show_bytes)
@@ -93,12 +90,11 @@ void PacedLine::TakeInput() {
 
 void PacedLine::FollowSpeed() {
   const std::uint32_t baud = terminal_.ProgramBaud();
-  if (baud == program_baud_) return;
+  if (baud == program_baud_ || baud == 0) return;
   program_baud_ = baud;
-  line_.SetProgramBaud(baud != 0 ? baud : kUncommonBaud, NowUs());
-  const std::string speed = baud != 0 ? std::to_string(baud) + " baud" : "an uncommon speed";
-  console_.Print("-- The program has set " + speed +
-                 (baud == line_.options().baud ? "." : ": the units do not understand that."));
+  line_.SetProgramBaud(baud, NowUs());
+  console_.Print("-- The program has set " + std::to_string(baud) +
+                 (baud == line_.options().baud ? " baud." : " baud: the units do not understand that."));
 }
 
 // What the program had sent still crosses the line, as it would from any serial port. What comes back has

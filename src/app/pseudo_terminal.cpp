@@ -13,7 +13,6 @@
 #include <cstdlib>
 #include <stdexcept>
 #include <system_error>
-#include <utility>
 
 #include "platform/posix/proc_folders.h"
 
@@ -95,19 +94,6 @@ void PseudoTerminal::WaitForInput(std::chrono::microseconds time) const {
   FD_SET(far_end_, &readable);
   const timespec limit = {.tv_sec = 0, .tv_nsec = static_cast<long>(time.count()) * 1000};
   ::pselect(far_end_ + 1, &readable, nullptr, nullptr, &limit, nullptr);
-}
-
-std::uint32_t PseudoTerminal::ProgramBaud() const {
-  constexpr std::pair<speed_t, std::uint32_t> kSpeeds[] = {
-      {B1200, 1200},   {B2400, 2400},   {B4800, 4800},     {B9600, 9600},     {B19200, 19200},
-      {B38400, 38400}, {B57600, 57600}, {B115200, 115200}, {B230400, 230400},
-  };
-  termios settings = {};
-  ::tcgetattr(near_end_, &settings);
-  for (const auto& [code, baud] : kSpeeds) {
-    if (::cfgetospeed(&settings) == code) return baud;
-  }
-  return 0;
 }
 
 #ifdef __linux__

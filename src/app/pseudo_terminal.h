@@ -9,6 +9,7 @@
 #include <string>
 
 #include "platform/bytes.h"
+#include "platform/posix/serial_terminal.h"
 
 namespace tendril {
 
@@ -36,8 +37,8 @@ class PseudoTerminal {
   bool Write(std::span<const std::uint8_t> bytes) const;
   // Waits until the program has sent something, or for `time` (less than a second) if it does not.
   void WaitForInput(std::chrono::microseconds time) const;
-  // The speed that the program has set; 0 for one that is not common.
-  std::uint32_t ProgramBaud() const;
+  // The speed that the program has set, in bit/s; 0 when the system does not say.
+  std::uint32_t ProgramBaud() const { return LineSpeed(near_end_); }
 
   // To be called when closing_descriptor() is readable. True when no program has the device open any more:
   // what nobody has read yet, at either end, is dropped then, and the device is as at the beginning.

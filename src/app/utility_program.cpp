@@ -21,9 +21,9 @@ void Warn(const std::string& line) { qCWarning(preferences, "%s", line.c_str());
 }  // namespace
 
 UtilityProgram::UtilityProgram()
-    : device(platform.on_fault, Trace),
+    : device(CreateSystemSerialDevice(platform.on_fault, Trace)),
       log(CommandLogPath()),
-      Serial1(device, platform.timers, platform.clock, log),
+      Serial1(*device, platform.timers, platform.clock, log),
       wsCLI(platform.on_fault),
       registry_store(OpenSystemRegistry(Warn)),
       registry(*registry_store, Warn),

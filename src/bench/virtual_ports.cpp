@@ -1,11 +1,9 @@
 #include "bench/virtual_ports.h"
 
 #include <algorithm>
-#include <charconv>
 #include <limits>
 #include <optional>
 #include <stdexcept>
-#include <string_view>
 
 #include "platform/runtime_error.h"
 
@@ -14,22 +12,6 @@ namespace {
 
 RuntimeError Fault(std::int32_t number, std::string description) {
   return RuntimeError(number, std::move(description), "Serial port");
-}
-
-// The only settings that the virtual ports do: a speed, no parity, eight data bits, one stop bit.
-std::uint32_t ParseBaud(const std::string& settings) {
-  const std::string_view text = settings;
-  const std::string_view speed = text.substr(0, text.find(','));
-  if (speed.empty()) {
-    throw Fault(kErrInvalidPropertyValue, "The port settings \"" + settings + "\" lack a speed.");
-  }
-  std::uint32_t baud = 0;
-  const auto [end, error] = std::from_chars(speed.data(), speed.data() + speed.size(), baud);
-  if (error != std::errc() || end != speed.data() + speed.size() || baud == 0 ||
-      text.substr(speed.size()) != ",N,8,1") {
-    throw Fault(kErrSettingsRefused, "The serial port does not do \"" + settings + "\".");
-  }
-  return baud;
 }
 
 }  // namespace
@@ -105,23 +87,16 @@ class VirtualPorts::Device final : public SerialDevice {
   bool Exists(std::int32_t number) const override;
   std::string Describe(std::int32_t number) const override;
 
-  void SetSettings(const std::string& settings) override;
-  void SetPortNumber(std::int32_t number) override;
-  void SetLineOptions(const LineOptions& options) override;
-  void Open() override;
+  void Open(std::int32_t number, std::int32_t baud) override;
   void Close() noexcept override;
-  bool IsOpen() const override { return port_ != nullptr || lost_; }
-
   void SetReceiveThreshold(std::int32_t bytes) override;
-  void SetTransmitThreshold(std::int32_t bytes) override;
   void SetRts(bool asserted) override;
   void Write(std::span<const std::uint8_t> bytes) override;
   Bytes ReadAll() override;
   void ClearInput() override;
   std::size_t PendingOutput() const override;
 
-  // The adapter was pulled out. Until the owner is told, the device counts as open: writing goes nowhere, and
-  // what had arrived can be read.
+  // The adapter was pulled out.
   void Lose();
   bool HasEvent() const { return DataIsDue() || overflowed_ || lost_; }
   // Tells the owner of one event. The owner may do anything in it, also destroy this device.
@@ -131,21 +106,17 @@ class VirtualPorts::Device final : public SerialDevice {
   // The line of the open port; null when the adapter was pulled out.
   VirtualLine* OpenLine() const;
   bool DataIsDue() const {
-    return untold_ && options_.receive_threshold > 0 &&
-           input_.size() >= static_cast<std::size_t>(options_.receive_threshold);
+    return untold_ && receive_threshold_ > 0 && input_.size() >= static_cast<std::size_t>(receive_threshold_);
   }
-  void AskAgainAboutInput();
   void Arrive(std::uint8_t byte);
   void ForgetInput();
   void LetGoOfLine();
 
   VirtualPorts& ports_;
   std::function<void(SerialEvent)> handler_;
-  std::int32_t number_ = 1;
-  std::uint32_t baud_ = 9600;
-  LineOptions options_;
+  std::int32_t receive_threshold_ = 0;
   Port* port_ = nullptr;     // while open and plugged in
-  Bytes input_;              // at most options_.input_buffer_size
+  Bytes input_;              // at most kSerialInputBufferBytes
   bool untold_ = false;      // kDataReceived is due as soon as enough bytes wait
   bool overflowed_ = false;  // kReceiveOverflow is due
   bool lost_ = false;        // kDeviceLost is due; port_ is null then
@@ -160,32 +131,12 @@ bool VirtualPorts::Device::Exists(std::int32_t number) const {
   return port != ports_.ports_.end() && port->second->plugged_in;
 }
 
-void VirtualPorts::Device::SetSettings(const std::string& settings) {
-  baud_ = ParseBaud(settings);
-  if (port_ != nullptr) port_->line.SetProgramBaud(baud_, ports_.NowUs());
-}
-
-void VirtualPorts::Device::SetPortNumber(std::int32_t number) {
-  if (number < 1) throw Fault(kErrInvalidPropertyValue, "A port number must be 1 or more.");
-  number_ = number;
-}
-
-void VirtualPorts::Device::SetLineOptions(const LineOptions& options) {
-  if (options.handshaking || !options.binary_input || options.discard_nul ||
-      options.transmit_threshold != 0 || options.input_buffer_size < 1 || options.receive_threshold < 0) {
-    throw Fault(kErrSettingsRefused, "The serial port does not do these line options.");
-  }
-  options_ = options;
-  AskAgainAboutInput();
-}
-
-void VirtualPorts::Device::Open() {
-  const std::string name = "Comm " + std::to_string(number_);
-  if (IsOpen()) throw Fault(kErrPortAlreadyOpen, name + " is open already.");
-  if (!Exists(number_)) {
-    throw Fault(kErrInvalidPort, name + " does not exist. Is its adapter plugged in?");
-  }
-  Port& port = ports_.At(number_);
+void VirtualPorts::Device::Open(std::int32_t number, std::int32_t baud) {
+  const std::string name = "Comm " + std::to_string(number);
+  if (port_ != nullptr || lost_) throw Fault(kErrPortAlreadyOpen, "A port is open already.");
+  if (!Exists(number)) throw Fault(kErrInvalidPort, name + " does not exist. Is its adapter plugged in?");
+  if (baud <= 0) throw Fault(kErrSettingsRefused, name + " does not do " + std::to_string(baud) + " bit/s.");
+  Port& port = ports_.At(number);
   if (!port.allowed) {
     throw Fault(kErrNotAllowed,
                 "You are not allowed to use " + name +
@@ -197,7 +148,7 @@ void VirtualPorts::Device::Open() {
   }
   port_ = &port;
   port.opener = this;
-  port.line.SetProgramBaud(baud_, ports_.NowUs());
+  port.line.SetProgramBaud(static_cast<std::uint32_t>(baud), ports_.NowUs());
   port.line.SetProgramHandler([this](std::uint8_t byte, std::uint64_t /*at_us*/) { Arrive(byte); });
 }
 
@@ -225,23 +176,14 @@ void VirtualPorts::Device::Lose() {
 }
 
 VirtualLine* VirtualPorts::Device::OpenLine() const {
-  if (!IsOpen()) throw Fault(kErrPortNotOpen, "Comm " + std::to_string(number_) + " is not open.");
+  if (port_ == nullptr && !lost_) throw Fault(kErrPortNotOpen, "No port is open.");
   return port_ != nullptr ? &port_->line : nullptr;
 }
 
 void VirtualPorts::Device::SetReceiveThreshold(std::int32_t bytes) {
   if (bytes < 0) throw Fault(kErrInvalidPropertyValue, "A receive threshold must be 0 or more.");
-  options_.receive_threshold = bytes;
-  AskAgainAboutInput();
-}
-
-void VirtualPorts::Device::SetTransmitThreshold(std::int32_t bytes) {
-  if (bytes != 0) throw Fault(kErrInvalidPropertyValue, "The serial port has no event on transmit.");
-}
-
-// What waits may be enough for the new threshold.
-void VirtualPorts::Device::AskAgainAboutInput() {
-  untold_ = !input_.empty();
+  receive_threshold_ = bytes;
+  untold_ = !input_.empty();  // what waits may be enough for the new threshold
   if (port_ != nullptr) ports_.Schedule();
 }
 
@@ -271,7 +213,7 @@ std::size_t VirtualPorts::Device::PendingOutput() const {
 }
 
 void VirtualPorts::Device::Arrive(std::uint8_t byte) {
-  if (input_.size() >= static_cast<std::size_t>(options_.input_buffer_size)) {
+  if (input_.size() >= kSerialInputBufferBytes) {
     overflowed_ = true;
     return;
   }

@@ -10,6 +10,7 @@
 #include <cstdint>
 #include <filesystem>
 #include <optional>
+#include <string>
 
 namespace tendril {
 
@@ -26,6 +27,11 @@ std::filesystem::path DefaultSerialDevice(std::int32_t number);
 // that a machine could have. `tty_class` is the folder in which the drivers describe their devices.
 bool DriverFoundHardware(const std::filesystem::path& device,
                          const std::filesystem::path& tty_class = "/sys/class/tty");
+
+// What the maker of an adapter calls it, who the maker is, and the device's path, as far as they are known: "FT232R USB
+// UART, FTDI, /dev/ttyUSB0". `tty_class` as above.
+std::string DescribeSerialDevice(const std::filesystem::path& device,
+                                 const std::filesystem::path& tty_class = "/sys/class/tty");
 #endif
 
 }  // namespace tendril

@@ -14,6 +14,7 @@ inline constexpr std::int32_t kErrOverflow = 6;
 inline constexpr std::int32_t kErrOutOfRange = 9;  // an index outside its table
 inline constexpr std::int32_t kErrDivisionByZero = 11;
 inline constexpr std::int32_t kErrInternal = 37;
+inline constexpr std::int32_t kErrDeviceIo = 57;  // the device failed, or does not obey
 inline constexpr std::int32_t kErrNotAllowed = 70;
 inline constexpr std::int32_t kErrPathAccess = 75;
 inline constexpr std::int32_t kErrInvalidPropertyValue = 380;

@@ -80,14 +80,14 @@ void HwSerial::OpenPort() {
     const std::string settings = SpeedText(baud_rate_) + ",N,8,1";
     opened_speed_ = baud_rate_;
     stage = "Setting(" + settings + ")";
-    device_.SetSettings(settings);
+    if (settings.starts_with(',')) throw RuntimeError(kErrInvalidPropertyValue, "Invalid property value");
     stage = "Setting Port = " + port;
-    device_.SetPortNumber(comm_port_);
+    if (comm_port_ < 0) throw RuntimeError(kErrInvalidPropertyValue, "Invalid property value");
     opened_port_ = comm_port_;
     stage = "Setting misc Comm Settings";
-    device_.SetLineOptions(LineOptions());
+    device_.SetReceiveThreshold(kIdleReceiveThreshold);
     stage = "Executing Port Open Property";
-    device_.Open();
+    device_.Open(opened_port_, opened_speed_);
     stage = "Setting RTS on";
     device_.SetRts(true);
     port_open_ = true;

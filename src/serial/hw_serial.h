@@ -120,8 +120,9 @@ class HwSerial {
   // Pad count that polls carry, 2 to 200; what is set is clamped to that. 45 at the start.
   std::uint8_t PollPad() const { return poll_pad_; }
   void SetPollPad(std::uint8_t pads);
-  // Zero bytes between the echo and the reply of the last poll. A count above 200 reads as 0.
-  std::uint32_t LastPollPads() const;
+  // Zero bytes between the echo and the reply of the last poll. A count above 200 reads as 0, and starts again
+  // from 0.
+  std::uint32_t LastPollPads();
   // Granularity of the clock and period of the system's timer, in milliseconds, as found at the start.
   std::uint32_t TickGranularity() const { return tick_granularity_ms_; }
   std::uint32_t TimerPeriod() const { return timer_period_ms_; }
@@ -184,6 +185,10 @@ class HwSerial {
   const BootloaderReply& Bootloader() const { return bootloader_; }
 
  private:
+  // Bytes that must wait before the device reports them: while no poll is outstanding, and while one is.
+  static constexpr std::int32_t kIdleReceiveThreshold = 4000;
+  static constexpr std::int32_t kPollReceiveThreshold = 1;
+
   struct Poll {
     std::uint8_t unit;
     std::uint8_t kind;
@@ -218,7 +223,6 @@ class HwSerial {
   void CompletePoll();
   void TimeOutPoll();
   Poll EndPoll();
-  void RestoreThresholds();
   void WriteHeldBack();
   void RaisePollReply(bool success, std::uint8_t unit, std::uint8_t code, Bytes data);
 

@@ -21,8 +21,6 @@ constexpr std::uint8_t kKindReplyCode = 111;
 constexpr std::uint8_t kFirstStatusCode = 101;
 constexpr std::uint8_t kLastStatusCode = 104;
 
-constexpr std::int32_t kIdleReceiveThreshold = LineOptions().receive_threshold;
-
 // Room for the poll and its reply in the time-out, in bytes, beside the pads.
 constexpr double kPollAndReplyBytes = 38;
 constexpr double kBitsPerByte = 10;
@@ -55,15 +53,14 @@ bool HwSerial::cmdPollStation(std::uint8_t unit, std::uint8_t kind) {
   parser_.Start(unit);
   try {
     device_.ClearInput();
-    device_.SetTransmitThreshold(0);
-    device_.SetReceiveThreshold(1);
+    device_.SetReceiveThreshold(kPollReceiveThreshold);
     const Bytes packet = PollPacket(unit, kind, poll_pad_);
     device_.Write(packet);
     Trace([&] { return "POLL[" + std::to_string(poll_->start_ms) + "](" + HexList(packet, ',') + ")"; });
     poll_->time_out_ms = PollTimeOutMs(kind);
   } catch (...) {
     poll_.reset();
-    RestoreThresholds();
+    device_.SetReceiveThreshold(kIdleReceiveThreshold);
     throw;
   }
   poll_timer_->SetInterval(static_cast<std::int32_t>(poll_->time_out_ms));
@@ -92,8 +89,6 @@ void HwSerial::OnDeviceEvent(SerialEvent event) {
       break;
     case SerialEvent::kDeviceLost:
       ClosePort();
-      break;
-    case SerialEvent::kLineError:
       break;
   }
 }
@@ -192,15 +187,8 @@ void HwSerial::TimeOutPoll() {
 HwSerial::Poll HwSerial::EndPoll() {
   poll_timer_->SetEnabled(false);
   const Poll poll = *std::exchange(poll_, std::nullopt);
-  RestoreThresholds();
+  device_.SetReceiveThreshold(kIdleReceiveThreshold);
   return poll;
-}
-
-void HwSerial::RestoreThresholds() {
-  IgnoreFailure([&] {
-    device_.SetReceiveThreshold(kIdleReceiveThreshold);
-    device_.SetTransmitThreshold(0);
-  });
 }
 
 void HwSerial::WriteHeldBack() {
@@ -214,8 +202,9 @@ void HwSerial::RaisePollReply(bool success, std::uint8_t unit, std::uint8_t code
   if (poll_reply_) poll_reply_(success, unit, code, data);
 }
 
-std::uint32_t HwSerial::LastPollPads() const {
-  return parser_.pads() <= kMaxPlausiblePads ? parser_.pads() : 0;
+std::uint32_t HwSerial::LastPollPads() {
+  if (parser_.pads() > kMaxPlausiblePads) parser_.ResetPads();
+  return parser_.pads();
 }
 
 void HwSerial::OnHeartbeatTimer() {

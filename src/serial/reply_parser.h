@@ -37,6 +37,8 @@ class ReplyParser {
   const Bytes& data() const { return data_; }
   // Zero bytes since the echo ended, or since Start() while it has not.
   std::uint32_t pads() const { return pads_; }
+  // Counts the pads from 0 again.
+  void ResetPads() { pads_ = 0; }
 
  private:
   enum class State { kAwaitZero, kAwaitAddress, kAwaitCode, kInData };

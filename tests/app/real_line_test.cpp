@@ -6,17 +6,20 @@
 #include <QComboBox>
 #include <QTest>
 #include <array>
+#include <cerrno>
 #include <cstddef>
 #include <cstdint>
 #include <filesystem>
 #include <memory>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "app/utility_program.h"
 #include "config/option_bytes.h"
 #include "platform/paths.h"
 #include "support/bench_process.h"
+#include "support/emulated_adapter.h"
 #include "support/person.h"
 
 namespace tendril::test {
@@ -30,6 +33,21 @@ QStringList Fault(const char* name) { return {QStringLiteral("--fault"), QString
 
 class RealLine : public testing::Test, protected Person {
  protected:
+  RealLine() {
+    Adapter() = {};
+    Adapter().empty_read_every = 5;
+  }
+  // All the ways that a test can take use the adapter in the one right way.
+  void TearDown() override {
+    EXPECT_GT(Adapter().empty_reads, 0u);
+    EXPECT_FALSE(Adapter().settings.empty());
+    for (const auto& settings : Adapter().settings) {
+      EXPECT_EQ(settings, (EmulatedAdapter::LineSettings{19200, 8, false, 1, false}));
+    }
+    ASSERT_FALSE(Adapter().rts.empty());
+    EXPECT_TRUE(Adapter().rts.front()) << "the program drives the line from the opening on";
+  }
+
   // Makes the program anew.
   void StartProgram() {
     program_.reset();
@@ -94,13 +112,52 @@ TEST_F(RealLine, Send_SucceedsWithAndWithoutEcho) {
     bench_.Start(options);
     if (!program_) StartProgram();
     ChooseComm1();
+    Adapter().rts.clear();
     Press(kSend);
     EXPECT_EQ(Outcome(), "SUCCESS: Send Complete!") << options.join(QLatin1Char(' ')).toStdString();
     EXPECT_TRUE(read.empty());
+    // Each of the eight polls releases the line for the reply, once its echo is there, and takes it back.
+    std::vector<bool> turns;
+    for (int port = 0; port < 8; ++port) {
+      if (options.isEmpty()) turns.push_back(false);
+      turns.push_back(true);
+    }
+    EXPECT_EQ(Adapter().rts, turns);
     bench_.Kill();
     ASSERT_TRUE(WaitForClosedPort());
   }
   EXPECT_TRUE(std::filesystem::exists(CommandLogPath()));
+}
+
+TEST_F(RealLine, RtsThatFails_FailsTheOpeningAndOtherwiseOnlyThePoll) {
+  bench_.Start();
+  StartProgram();
+  for (const auto& [error, reason] :
+       {std::pair(EPROTO, "Protocol error"), std::pair(ETIMEDOUT, "Connection timed out"),
+        std::pair(EPIPE, "Broken pipe")}) {
+    SCOPED_TRACE(reason);
+    read.clear();
+    Adapter().rts_error = [error = error](bool) { return error; };
+    ChooseComm1();
+    ASSERT_TRUE(WaitForBox());
+    EXPECT_NE(read[0].second.find(std::string("cannot be asserted: ") + reason + ".\nWhile: Setting RTS on"),
+              std::string::npos)
+        << read[0].second;
+    EXPECT_FALSE(program_->Serial1.PortOpen());
+
+    // An adapter that stalls when a poll releases the line.
+    read.clear();
+    int turns_that_fail = 2;
+    Adapter().rts_error = [error = error, &turns_that_fail](bool asserted) {
+      return !asserted && turns_that_fail-- > 0 ? error : 0;
+    };
+    ChooseComm1();
+    Press(kGet);
+    EXPECT_EQ(Outcome(), "SUCCESS: Upload Complete");  // by its repeats
+    EXPECT_LT(turns_that_fail, 0);
+    EXPECT_TRUE(read.empty());
+    program_->Serial1.SetPortOpen(false);
+  }
 }
 
 TEST_F(RealLine, NoisyUnits_AreHeardThroughTheNoise) {

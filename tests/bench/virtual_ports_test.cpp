@@ -30,10 +30,8 @@ class VirtualPortsTest : public testing::Test {
   }
   void Open() { Use(*device); }
   static void Use(SerialDevice& port) {
-    port.SetSettings("19200,N,8,1");
-    port.SetPortNumber(1);
-    port.SetLineOptions({.receive_threshold = 1});
-    port.Open();
+    port.SetReceiveThreshold(1);
+    port.Open(1, 19200);
     port.SetRts(true);
   }
 
@@ -85,39 +83,23 @@ TEST_F(VirtualPortsTest, ReceiveThreshold_DecidesWhenTheOwnerIsTold) {
 
 TEST_F(VirtualPortsTest, FullInputBuffer_DropsTheSurplusAndSaysSo) {
   Open();
-  device->SetLineOptions({.input_buffer_size = 10, .receive_threshold = 0});
-  device->Write(Bytes{1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12});
-  time.Advance(15);
+  device->SetReceiveThreshold(0);
+  device->Write(Bytes(kSerialInputBufferBytes, 1));
+  device->Write(Bytes{2, 2});
+  time.Advance(3000);
   EXPECT_THAT(events, testing::AllOf(testing::Not(IsEmpty()), testing::Each(SerialEvent::kReceiveOverflow)));
-  EXPECT_EQ(device->ReadAll(), (Bytes{1, 2, 3, 4, 5, 6, 7, 8, 9, 10}));
+  EXPECT_EQ(device->ReadAll(), Bytes(kSerialInputBufferBytes, 1));
 }
 
 TEST_F(VirtualPortsTest, Misuse_FailsAsWithARealPort) {
-  const auto settings = [](const char* text) {
-    return [text](SerialDevice& port) { port.SetSettings(text); };
-  };
-  const auto options = [](const LineOptions& line_options) {
-    return [line_options](SerialDevice& port) { port.SetLineOptions(line_options); };
-  };
   const struct {
     std::function<void(SerialDevice&)> call;
     std::int32_t number;
   } cases[] = {
-      {settings(",N,8,1"), kErrInvalidPropertyValue},
-      {settings("fast,N,8,1"), kErrSettingsRefused},
-      {settings("19200x,N,8,1"), kErrSettingsRefused},
-      {settings("0,N,8,1"), kErrSettingsRefused},
-      {settings("19200,E,8,1"), kErrSettingsRefused},
-      {options({.handshaking = true}), kErrSettingsRefused},
-      {options({.binary_input = false}), kErrSettingsRefused},
-      {options({.discard_nul = true}), kErrSettingsRefused},
-      {options({.transmit_threshold = 1}), kErrSettingsRefused},
-      {options({.input_buffer_size = 0}), kErrSettingsRefused},
-      {options({.receive_threshold = -1}), kErrSettingsRefused},
-      {[](SerialDevice& port) { port.SetPortNumber(0); }, kErrInvalidPropertyValue},
+      {[this](SerialDevice&) { ports.CreateDevice()->Open(0, 19200); }, kErrInvalidPort},
+      {[this](SerialDevice&) { ports.CreateDevice()->Open(1, 0); }, kErrSettingsRefused},
       {[](SerialDevice& port) { port.SetReceiveThreshold(-1); }, kErrInvalidPropertyValue},
-      {[](SerialDevice& port) { port.SetTransmitThreshold(1); }, kErrInvalidPropertyValue},
-      {[](SerialDevice& port) { port.Open(); }, kErrPortAlreadyOpen},
+      {[](SerialDevice& port) { port.Open(1, 19200); }, kErrPortAlreadyOpen},
       {[this](SerialDevice&) { Use(*ports.CreateDevice()); }, kErrPortAlreadyOpen},
       {[this](SerialDevice&) { ports.CreateDevice()->Write(kPoll); }, kErrPortNotOpen},
   };
@@ -137,7 +119,9 @@ TEST_F(VirtualPortsTest, Misuse_FailsAsWithARealPort) {
   device->Write(kPoll);  // nothing of it has changed the port
   time.Advance(4);
   EXPECT_EQ(device->ReadAll(), kPoll);
-  device->SetSettings("9600,N,8,1");  // at once, also while it is open
+  device->Close();
+  device->Open(1, 9600);
+  device->SetRts(true);
   device->Write(Bytes{0x11});
   time.Advance(1);
   EXPECT_THAT(device->ReadAll(), IsEmpty());
@@ -158,8 +142,8 @@ TEST_F(VirtualPortsTest, Unplugged_ClosesItselfAndSaysSoOnce) {
   EXPECT_EQ(device->ReadAll(), (Bytes{0x00, 0x05, 0x88}));
   time.Advance(100);
   EXPECT_THAT(events, ElementsAre(SerialEvent::kDeviceLost));
-  EXPECT_FALSE(device->IsOpen());
-  EXPECT_THROW(device->Open(), RuntimeError);
+  EXPECT_THROW(device->Write(kPoll), RuntimeError) << "it has closed itself";
+  EXPECT_THROW(device->Open(1, 19200), RuntimeError);
 
   ports.Replug(1);
   Open();

@@ -1,4 +1,4 @@
-#include "platform/serial_hold.h"
+#include "platform/posix/serial_hold.h"
 
 #include <gmock/gmock.h>
 #include <grp.h>

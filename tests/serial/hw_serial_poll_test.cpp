@@ -39,8 +39,10 @@ TEST_F(HwSerialPoll, Reply_ReleasesTheLineAfterTheEchoAndReportsOnce) {
   for (const std::uint32_t pads : {200u, 201u}) {
     PollAndEcho(100);
     device_.Receive(Bytes(pads, 0));
-    device_.Receive({0xFE, 101, 0});
     EXPECT_EQ(link_.LastPollPads(), pads == 200 ? 200u : 0u);
+    device_.Receive({0, 0, 0});
+    EXPECT_EQ(link_.LastPollPads(), pads == 200 ? 0u : 3u);
+    device_.Receive({0xFE, 101, 0});
   }
   EXPECT_EQ(time_.RunningTimers(), 0);
 }
@@ -77,17 +79,20 @@ TEST_F(HwSerialPoll, NoReply_EndsAtTheComputedTimeOut) {
     std::size_t pending;
     int pads;
     std::uint64_t time_out_ms;
+    std::int32_t baud = 19200;
   };
-  // (pending + 38 + pads) bytes of 10 bits at 19200 bit/s, twice; the slow kinds get 250 ms more.
+  // (pending + 38 + pads) bytes of 10 bits, twice; the slow kinds get 250 ms more.
   for (const Case& c : std::vector<Case>{{'0', 6, 45, 93},
                                          {'n', 33, 45, 121},
                                          {'0', 0, 200, 248},
                                          {'2', 6, 45, 343},
                                          {'1', 6, 45, 343},
                                          {'A', 6, 45, 343},
-                                         {'o', 6, 45, 343}}) {
+                                         {'o', 6, 45, 343},
+                                         {'0', 6, 45, 15, 115200}}) {
     replies_.clear();
     device_.pending_output = c.pending;
+    link_.SetBaudRate(c.baud);
     link_.SetPollPad(static_cast<std::uint8_t>(c.pads));
     ASSERT_TRUE(link_.cmdPollStation(5, static_cast<std::uint8_t>(c.kind)));
     device_.Receive({0, 5, 0x88, static_cast<std::uint8_t>(c.kind), static_cast<std::uint8_t>(c.pads), 0});
@@ -184,13 +189,24 @@ TEST_F(HwSerialPoll, WhatCameBeforeThePoll_IsNoReply) {
   EXPECT_THAT(replies_, ElementsAre(ReportedReply{false, 5, '0', {}}));
 }
 
-TEST_F(HwSerialPoll, RtsThatFails_KeepsNothingElseFromHappening) {
-  PollAndEcho('0');
-  link_.SendUnlockCmd(5);
-  device_.rts_failure = RuntimeError(kErrReadFault, "broken");
-  time_.Advance(500);
-  EXPECT_EQ(replies_.size(), 1u);
-  EXPECT_THAT(device_.TakeWrites(), ElementsAre(Bytes{0, 5, 0x8A, 0x56, 0}, Bytes{0}, Bytes{0}));
+TEST_F(HwSerialPoll, RtsOrWriteThatFails_KeepsNothingElseFromHappening) {
+  for (const bool answered : {false, true}) {
+    PollAndEcho('0');
+    link_.SendUnlockCmd(5);
+    device_.rts_failure = RuntimeError(kErrDeviceIo, "broken");
+    if (answered) {
+      device_.write_failure = RuntimeError(kErrDeviceIo, "broken");
+      device_.Receive({0xFE, '0', 6, 10, 0});
+    } else {
+      time_.Advance(500);
+      EXPECT_THAT(device_.TakeWrites(), ElementsAre(Bytes{0, 5, 0x8A, 0x56, 0}, Bytes{0}, Bytes{0}));
+    }
+    EXPECT_EQ(std::exchange(replies_, {}).size(), 1u);
+    device_.rts_failure.reset();
+    device_.write_failure.reset();
+    link_.SendUnlockCmd(5);
+    EXPECT_THAT(device_.TakeWrites(), ElementsAre(Bytes{0, 5, 0x8A, 0x56, 0})) << "held back before";
+  }
 }
 
 TEST_F(HwSerialPoll, HandlerMayPollAgain) {
@@ -215,7 +231,6 @@ TEST_F(HwSerialPoll, WithoutAPoll_InputIsDiscarded) {
   PollAndEcho('0');
   device_.Receive(Bytes(4050, 0x55), /*tell=*/false);
   device_.Raise(SerialEvent::kReceiveOverflow);
-  device_.Raise(SerialEvent::kLineError);
   EXPECT_THAT(device_.input, IsEmpty());
   device_.Receive({0, 0xFE, '0', 6, 10, 0});
   EXPECT_EQ(replies_.size(), 1u);

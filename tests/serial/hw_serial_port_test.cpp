@@ -10,12 +10,11 @@ class HwSerialPort : public LinkFixture {};
 TEST_F(HwSerialPort, Opening_HappensOnceAndAgainOnlyForOtherSettings) {
   link_.SetPortOpen(true);
   link_.SetPortOpen(true);
-  EXPECT_THAT(device_.TakeActions(), ElementsAre("settings 19200,N,8,1", "port 3", "open", "rts on"));
+  EXPECT_THAT(device_.TakeActions(), ElementsAre("open 3 at 19200", "rts on"));
   EXPECT_EQ(device_.receive_threshold, 4000);
 
   link_.SetBaudRate(115200);
-  EXPECT_THAT(device_.TakeActions(),
-              ElementsAre("close", "settings 115200,N,8,1", "port 3", "open", "rts on"));
+  EXPECT_THAT(device_.TakeActions(), ElementsAre("close", "open 3 at 115200", "rts on"));
 
   link_.SetCommPort(0);
   EXPECT_THAT(device_.TakeActions(), ElementsAre("close"));
@@ -39,6 +38,13 @@ TEST_F(HwSerialPort, FailedOpening_TellsPortErrorAndStep) {
   const RuntimeError speed = FailureOf([&] { link_.SetPortOpen(true); });
   EXPECT_EQ(speed.number(), kErrInvalidPropertyValue);
   EXPECT_THAT(speed.description(), testing::EndsWith("\r\nWhile: Setting(,N,8,1)"));
+
+  link_.SetCommPort(-1);
+  link_.SetBaudRate(1000000);
+  EXPECT_THAT(FailureOf([&] { link_.SetPortOpen(true); }).description(),
+              testing::EndsWith("\r\nWhile: Setting Port = -1"));
+  link_.SetCommPort(3);
+  link_.SetBaudRate(9600);
 
   // Through two levels: the open failure, then a line for each operation on the way.
   const RuntimeError command = FailureOf([&] { link_.SendUnlockCmd(5); });

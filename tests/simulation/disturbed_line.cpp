@@ -79,18 +79,13 @@ DisturbedDevice::DisturbedDevice(std::unique_ptr<SerialDevice> device, TimerFact
         Tell();
       })) {
   device_->SetEventHandler([this](SerialEvent event) { OnEvent(event); });
+  device_->SetReceiveThreshold(1);
 }
 
-void DisturbedDevice::SetPortNumber(std::int32_t number) {
-  device_->SetPortNumber(number);
+void DisturbedDevice::Open(std::int32_t number, std::int32_t baud) {
+  device_->Open(number, baud);
   number_ = number;
-}
-
-void DisturbedDevice::SetLineOptions(const LineOptions& options) {
-  LineOptions every_byte = options;
-  every_byte.receive_threshold = 1;
-  device_->SetLineOptions(every_byte);
-  options_ = options;
+  open_ = true;
 }
 
 void DisturbedDevice::Close() noexcept {
@@ -98,11 +93,11 @@ void DisturbedDevice::Close() noexcept {
   timer_->SetEnabled(false);
   input_.clear();
   late_.clear();
-  holding_ = untold_ = rts_ = false;
+  open_ = holding_ = untold_ = rts_ = false;
 }
 
 void DisturbedDevice::SetReceiveThreshold(std::int32_t bytes) {
-  options_.receive_threshold = bytes;
+  receive_threshold_ = bytes;
   untold_ = !input_.empty();
   if (!untold_ || holding_) return;
   timer_->SetInterval(1);  // from the event loop, not from here
@@ -133,10 +128,10 @@ void DisturbedDevice::ClearInput() {
 }
 
 void DisturbedDevice::AddNoise(const Bytes& noise) {
-  if (!IsOpen()) return;
+  if (!open_) return;
   damaged_ = true;
   Arrive(noise);
-  SetReceiveThreshold(options_.receive_threshold);
+  SetReceiveThreshold(receive_threshold_);
 }
 
 void DisturbedDevice::OnEvent(SerialEvent event) {
@@ -150,7 +145,6 @@ void DisturbedDevice::OnEvent(SerialEvent event) {
       if (handler_) handler_(event);
       break;
     case SerialEvent::kReceiveOverflow:
-    case SerialEvent::kLineError:
       if (handler_) handler_(event);
       break;
   }
@@ -176,14 +170,13 @@ void DisturbedDevice::TakeIn() {
 
 void DisturbedDevice::Arrive(const Bytes& bytes) {
   for (const std::uint8_t byte : bytes) {
-    if (input_.size() < static_cast<std::size_t>(options_.input_buffer_size)) input_.push_back(byte);
+    if (input_.size() < kSerialInputBufferBytes) input_.push_back(byte);
     untold_ = true;
   }
 }
 
 void DisturbedDevice::Tell() {
-  if (!untold_ || options_.receive_threshold == 0 ||
-      input_.size() < static_cast<std::size_t>(options_.receive_threshold)) {
+  if (!untold_ || receive_threshold_ == 0 || input_.size() < static_cast<std::size_t>(receive_threshold_)) {
     return;
   }
   untold_ = false;

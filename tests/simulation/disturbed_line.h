@@ -89,14 +89,9 @@ class DisturbedDevice final : public SerialDevice {
   void SetEventHandler(std::function<void(SerialEvent)> handler) override { handler_ = std::move(handler); }
   bool Exists(std::int32_t number) const override { return device_->Exists(number); }
   std::string Describe(std::int32_t number) const override { return device_->Describe(number); }
-  void SetSettings(const std::string& settings) override { device_->SetSettings(settings); }
-  void SetPortNumber(std::int32_t number) override;
-  void SetLineOptions(const LineOptions& options) override;
-  void Open() override { device_->Open(); }
+  void Open(std::int32_t number, std::int32_t baud) override;
   void Close() noexcept override;
-  bool IsOpen() const override { return device_->IsOpen(); }
   void SetReceiveThreshold(std::int32_t bytes) override;
-  void SetTransmitThreshold(std::int32_t bytes) override { device_->SetTransmitThreshold(bytes); }
   void SetRts(bool asserted) override;
   void Write(std::span<const std::uint8_t> bytes) override;
   Bytes ReadAll() override;
@@ -106,6 +101,7 @@ class DisturbedDevice final : public SerialDevice {
   // Arrives at the program without ever having been on the line.
   void AddNoise(const Bytes& noise);
 
+  bool IsOpen() const { return open_; }
   std::int32_t number() const { return number_; }
   bool rts() const { return rts_; }
   // What waited to go out when RTS was asserted last.
@@ -125,8 +121,9 @@ class DisturbedDevice final : public SerialDevice {
   std::function<void(std::span<const std::uint8_t>)> written_;
   std::function<void(SerialEvent)> handler_;
   std::unique_ptr<Timer> timer_;
-  LineOptions options_;
-  std::int32_t number_ = 0;
+  std::int32_t receive_threshold_ = 0;
+  std::int32_t number_ = 0;  // of the port that was opened last
+  bool open_ = false;
   Bytes input_;
   Bytes late_;  // what the adapter has and does not give yet
   bool holding_ = false;

@@ -18,15 +18,9 @@ class RecordingDevice final : public SerialDevice {
   void SetEventHandler(std::function<void(SerialEvent)> handler) override { handler_ = std::move(handler); }
   bool Exists(std::int32_t number) const override { return number == 1 || number == 3; }
   std::string Describe(std::int32_t /*number*/) const override { return {}; }
-  void SetSettings(const std::string& settings) override {
-    actions.push_back("settings " + settings);
-    if (settings.front() == ',') throw RuntimeError(kErrInvalidPropertyValue, "Invalid property value");
-  }
-  void SetPortNumber(std::int32_t number) override { actions.push_back("port " + std::to_string(number)); }
-  void SetLineOptions(const LineOptions& options) override { receive_threshold = options.receive_threshold; }
-  void Open() override {
+  void Open(std::int32_t number, std::int32_t baud) override {
     if (open_failure) throw RuntimeError(*open_failure);
-    actions.push_back("open");
+    actions.push_back("open " + std::to_string(number) + " at " + std::to_string(baud));
     open = true;
   }
   void Close() noexcept override {
@@ -34,9 +28,7 @@ class RecordingDevice final : public SerialDevice {
     open = false;
     input.clear();
   }
-  bool IsOpen() const override { return open; }
   void SetReceiveThreshold(std::int32_t bytes) override { receive_threshold = bytes; }
-  void SetTransmitThreshold(std::int32_t /*bytes*/) override {}
   void SetRts(bool asserted) override {
     RequireOpen();
     if (rts_failure) throw RuntimeError(*rts_failure);

@@ -18,6 +18,13 @@ namespace fs = std::filesystem;
 // What the serial drivers of Linux report as a UART's type when they found none.
 constexpr int kNoUart = 0;
 
+std::string FirstLine(const fs::path& file) {
+  std::ifstream stream(file);
+  std::string line;
+  std::getline(stream, line);
+  return line;
+}
+
 #ifdef __APPLE__
 
 fs::path DeviceAt(std::int32_t number) {
@@ -65,6 +72,25 @@ bool DriverFoundHardware(const fs::path& device, const fs::path& tty_class) {
   std::ifstream file(tty_class / device.filename() / "type");
   int type = kNoUart;
   return !(file >> type) || type != kNoUart;  // only UART drivers have a type to tell
+}
+
+std::string DescribeSerialDevice(const fs::path& device, const fs::path& tty_class) {
+  std::string description;
+  const auto add = [&description](const std::string& part) {
+    if (!part.empty()) description += (description.empty() ? "" : ", ") + part;
+  };
+  // A USB adapter is described some folders above its terminal device, in the first that has a vendor's number: the
+  // ones above that describe the hubs on the way.
+  std::error_code error;
+  for (fs::path folder = fs::canonical(tty_class / device.filename(), error);
+       !error && folder.has_relative_path(); folder = folder.parent_path()) {
+    if (!fs::exists(folder / "idVendor", error)) continue;
+    add(FirstLine(folder / "product"));
+    add(FirstLine(folder / "manufacturer"));
+    break;
+  }
+  add(device.string());
+  return description;
 }
 
 std::optional<fs::path> FindSerialDevice(std::int32_t number) {

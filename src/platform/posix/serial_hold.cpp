@@ -1,21 +1,14 @@
-#include "platform/serial_hold.h"
+#include "platform/posix/serial_hold.h"
 
 #include <fcntl.h>
 #include <grp.h>
-#include <poll.h>
 #include <pwd.h>
 #include <sys/file.h>
 #include <sys/ioctl.h>
 #include <sys/stat.h>
-#include <termios.h>
 #include <unistd.h>
-#ifdef __linux__
-#include <linux/serial.h>
-#endif
 
-#include <algorithm>
 #include <cerrno>
-#include <string_view>
 #include <system_error>
 
 #include "platform/posix/proc_folders.h"
@@ -81,7 +74,7 @@ int OpenDevice(const fs::path& device) {
 
 #ifdef TIOCGEXCL
 // Only the superuser gets this far on a device in exclusive mode. The mode of a pseudo-terminal outlives a
-// program that was killed, so it says "in use" only while somebody has the device open.
+// program that was killed, so it says "in use" only while another program has the device open.
 bool HeldExclusively(const fs::path& device, int own) {
   int exclusive = 0;
   return ::ioctl(own, TIOCGEXCL, &exclusive) == 0 && exclusive != 0 && OpenInAnotherProcess(device);
@@ -93,33 +86,12 @@ bool HeldExclusively(const fs::path& /*device*/, int /*own*/) { return false; }
 }  // namespace
 
 SerialHold::SerialHold(const fs::path& device) : SerialHold(OpenDevice(device)) {
-  device_ = device;
   if (::isatty(descriptor_) == 0) throw NoSuchDevice(device);
   if (::flock(descriptor_, LOCK_EX | LOCK_NB) != 0 && errno == EWOULDBLOCK) throw Busy(device);
   if (HeldExclusively(device, descriptor_)) throw Busy(device);
 }
 
 SerialHold::~SerialHold() { ::close(descriptor_); }
-
-bool SerialHold::DeviceGone() const {
-  pollfd state = {descriptor_, 0, 0};
-  return ::poll(&state, 1, 0) > 0 && (state.revents & (POLLHUP | POLLERR | POLLNVAL)) != 0;
-}
-
-std::size_t SerialHold::QueuedOutput() const {
-  int bytes = 0;
-  if (::ioctl(descriptor_, TIOCOUTQ, &bytes) != 0) return 0;
-  return static_cast<std::size_t>(std::max(bytes, 0));
-}
-
-void SerialHold::AskForLowLatency() const {
-#ifdef __linux__
-  serial_struct settings = {};
-  if (::ioctl(descriptor_, TIOCGSERIAL, &settings) != 0) return;
-  settings.flags |= ASYNC_LOW_LATENCY;
-  (void)::ioctl(descriptor_, TIOCSSERIAL, &settings);
-#endif
-}
 
 std::string ExplainNotAllowed(const DeviceAccess& access) {
   std::string text = "You are not allowed to use " + access.device + ". ";

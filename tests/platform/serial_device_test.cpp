@@ -1,0 +1,302 @@
+// The serial port of this system, on a pseudo-terminal that behaves like an adapter.
+#include <gmock/gmock.h>
+#include <sys/file.h>
+#include <sys/ioctl.h>
+#include <termios.h>
+
+#include <cerrno>
+#include <cstring>
+#include <ctime>
+#include <numeric>
+
+#include "platform/posix/serial_terminal.h"
+#include "platform/pseudo_terminal.h"
+#include "platform/qt/serial_inbox.h"
+#include "platform/qt/system_serial_device.h"
+#include "platform/runtime_error.h"
+#include "platform/wait_for.h"
+#include "support/emulated_adapter.h"
+
+namespace tendril::test {
+namespace {
+
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::IsEmpty;
+
+constexpr int kComm = 3;
+
+Bytes EveryByteValue() {
+  Bytes bytes(256);
+  std::iota(bytes.begin(), bytes.end(), std::uint8_t{0});
+  return bytes;
+}
+
+class SerialDeviceTest : public testing::Test {
+ protected:
+  SerialDeviceTest() {
+    LinkPort(kComm, line_.path());
+    device_->SetEventHandler([this](SerialEvent event) {
+      EXPECT_FALSE(inside_call_) << "the owner was called from inside its own call";
+      events_.push_back(event);
+    });
+    Adapter() = {};
+    Adapter().empty_read_every = 3;
+  }
+
+  void Open(std::int32_t receive_threshold = 1) {
+    device_->SetReceiveThreshold(receive_threshold);
+    device_->Open(kComm, 19200);
+  }
+  // The number of the failure that opening ends in; 0 when it does not fail.
+  std::int32_t FailureOfOpening(std::int32_t number = kComm) {
+    return FailureOf([&] { device_->Open(number, 19200); }).number();
+  }
+  template <typename Call>
+  static RuntimeError FailureOf(const Call& call) {
+    try {
+      call();
+      return {0, "none"};
+    } catch (const RuntimeError& error) {
+      return error;
+    }
+  }
+  bool InExclusiveMode() const {
+    const int observer = line_.OpenAsAnother();  // the superuser may
+    int exclusive = 0;
+    ::ioctl(observer, TIOCGEXCL, &exclusive);
+    ::close(observer);
+    return exclusive != 0;
+  }
+
+  PseudoTerminal line_;
+  std::vector<std::string> faults_;
+  std::vector<std::string> trace_;
+  std::unique_ptr<SerialDevice> device_ =
+      CreateSystemSerialDevice([this](const std::string& fault) { faults_.push_back(fault); },
+                               [this](const std::string& line) { trace_.push_back(line); });
+  std::vector<SerialEvent> events_;
+  bool inside_call_ = false;
+};
+
+TEST_F(SerialDeviceTest, Opening_SetsTheLineUpAndClosingPutsItBack) {
+  const int other = line_.OpenAsAnother();
+  termios before = {};
+  ::tcgetattr(other, &before);
+  for (const std::int32_t baud : {19200, 56000, 115200, 500000, 750000, 1000000}) {
+    Adapter().flushes.clear();
+    device_->Open(kComm, baud);
+    EXPECT_EQ(LineSpeed(other), static_cast<std::uint32_t>(baud));
+    EXPECT_THAT(Adapter().settings, ElementsAre(EmulatedAdapter::LineSettings{
+                                        static_cast<std::uint32_t>(baud), 8, false, 1, false}));
+    EXPECT_TRUE(Adapter().low_latency);
+    EXPECT_TRUE(::geteuid() != 0 || InExclusiveMode());
+    device_->Close();
+    EXPECT_THAT(Adapter().flushes, ElementsAre(TCIOFLUSH, TCIOFLUSH)) << "what waits is dropped at both ends";
+    termios after = {};
+    ::tcgetattr(other, &after);
+    EXPECT_EQ(after.c_lflag, before.c_lflag);
+    EXPECT_EQ(after.c_cflag, before.c_cflag);
+    EXPECT_TRUE(::geteuid() != 0 || !InExclusiveMode());
+    EXPECT_EQ(::flock(other, LOCK_EX | LOCK_NB), 0) << "the claim ends with the closing";
+    ::flock(other, LOCK_UN);
+    Adapter().settings.clear();
+  }
+  ::close(other);
+  Adapter().fixed_baud = 115200;
+  const RuntimeError refused = FailureOf([&] { device_->Open(kComm, 1000000); });
+  EXPECT_EQ(refused.number(), kErrSettingsRefused);
+  EXPECT_THAT(refused.description(), HasSubstr("1000000 bit/s: the nearest that it does is 115200"));
+}
+
+TEST_F(SerialDeviceTest, EveryByteValue_PassesUnchangedBothWays) {
+  Open();
+  device_->SetRts(true);
+  device_->Write(EveryByteValue());
+  device_->SetRts(false);
+  EXPECT_THAT(Adapter().rts, ElementsAre(true, false));
+  Bytes sent;
+  EXPECT_TRUE(WaitFor([&] {
+    const Bytes more = line_.Take();
+    sent.insert(sent.end(), more.begin(), more.end());
+    return sent.size() >= 256;
+  }));
+  EXPECT_EQ(sent, EveryByteValue());
+
+  EXPECT_TRUE(line_.SendAndSettle(EveryByteValue()));
+  EXPECT_EQ(device_->ReadAll(), EveryByteValue());
+  EXPECT_THAT(trace_, IsEmpty());
+}
+
+TEST_F(SerialDeviceTest, RtsThatFails_IsRaisedAndAMissingLineIsNot) {
+  for (const int error : {ENOTTY, EINVAL, EPROTO, ETIMEDOUT, EPIPE, EAGAIN, EIO}) {
+    trace_.clear();
+    Open();
+    Adapter().rts_error = [error](bool) { return error; };
+    const bool missing = error == ENOTTY || error == EINVAL;
+    for (const bool asserted : {true, false, true}) {
+      const RuntimeError fault = FailureOf([&] { device_->SetRts(asserted); });
+      EXPECT_EQ(fault.number(), missing ? 0 : kErrDeviceIo) << error;
+      EXPECT_THAT(fault.description(), HasSubstr(missing ? "none" : std::strerror(error)));
+    }
+    EXPECT_EQ(trace_.size(), 1u) << "noted once: " << error;
+    Adapter().rts_error = nullptr;
+    device_->SetRts(true);
+    EXPECT_TRUE(line_.SendAndSettle({7}));
+    RunFor(20);
+    EXPECT_THAT(device_->ReadAll(), ElementsAre(7)) << "the port goes on working";
+    device_->Close();
+  }
+  EXPECT_THAT(events_, testing::Each(SerialEvent::kDataReceived)) << "no fault of RTS is a loss";
+}
+
+TEST_F(SerialDeviceTest, ReceiveThreshold_SaysHowManyBytesBringAnEvent) {
+  Open(3);
+  line_.Send({0, 0});
+  RunFor(30);
+  EXPECT_THAT(events_, IsEmpty());
+  line_.Send({0});
+  EXPECT_TRUE(WaitFor([&] { return events_.size() == 1; }));
+  device_->SetReceiveThreshold(0);
+  line_.Send({1, 2, 3, 4});
+  RunFor(50);
+  device_->SetReceiveThreshold(4);  // enough waits already
+  EXPECT_TRUE(WaitFor([&] { return events_.size() > 1; }));
+  EXPECT_THAT(events_, ElementsAre(SerialEvent::kDataReceived, SerialEvent::kDataReceived));
+  EXPECT_EQ(FailureOf([&] { device_->SetReceiveThreshold(-1); }).number(), kErrInvalidPropertyValue);
+}
+
+TEST_F(SerialDeviceTest, ReadAllAndClearInput_ReachWhatTheEventLoopHasNotSeen) {
+  Adapter().empty_read_every = 0;
+  Open();
+  ASSERT_TRUE(line_.SendAndSettle({0xFE, 0x0A, 0x00}));
+  EXPECT_THAT(device_->ReadAll(), ElementsAre(0xFE, 0x0A, 0x00));
+  ASSERT_TRUE(line_.SendAndSettle({1, 2, 3}));
+  device_->ClearInput();
+  EXPECT_THAT(device_->ReadAll(), IsEmpty());
+  RunFor(20);
+  EXPECT_THAT(events_, IsEmpty()) << "an event came for bytes that were gone";
+}
+
+TEST_F(SerialDeviceTest, Flood_FillsTheBufferAndNoMore) {
+  Open(0);
+  std::size_t taken = 0;
+  EXPECT_TRUE(WaitFor([&] { return (taken += line_.Send(EveryByteValue())) > 100'000; }));
+  EXPECT_TRUE(WaitFor([&] { return !events_.empty(); }));
+  EXPECT_THAT(events_, testing::Each(SerialEvent::kReceiveOverflow));
+  const Bytes input = device_->ReadAll();
+  EXPECT_EQ(input.size(), kSerialInputBufferBytes);
+  EXPECT_TRUE(std::equal(input.begin(), input.begin() + 256, EveryByteValue().begin()));
+}
+
+TEST_F(SerialDeviceTest, FarEndThatTakesNothing_BlocksNothingAndGetsAllInOrderLater) {
+  Open();
+  Bytes written;
+  RuntimeError full(0, "");
+  const std::clock_t cpu_before = std::clock();
+  while (full.number() == 0) {
+    full = FailureOf([&] { device_->Write(EveryByteValue()); });
+    if (full.number() == 0) written.insert(written.end(), 256, 0);
+    ASSERT_LT(written.size(), 1'000'000u) << "no bound";
+  }
+  EXPECT_EQ(full.number(), kErrDeviceIo);
+  EXPECT_GE(device_->PendingOutput(), 65'000u);
+  RunFor(100);
+  EXPECT_LT(std::clock() - cpu_before, CLOCKS_PER_SEC / 20) << "waiting takes no CPU";
+  Bytes arrived;
+  EXPECT_TRUE(WaitFor([&] {
+    const Bytes more = line_.Take();
+    arrived.insert(arrived.end(), more.begin(), more.end());
+    return arrived.size() >= written.size();
+  }));
+  for (std::size_t at = 0; at < arrived.size(); ++at) ASSERT_EQ(arrived[at], at % 256);
+  EXPECT_EQ(device_->PendingOutput(), 0u);
+}
+
+TEST_F(SerialDeviceTest, Unplugged_IsReportedOnceQuietlyAndThePortOpensAgain) {
+  for (const bool sending : {false, true}) {
+    SCOPED_TRACE(sending);
+    PseudoTerminal line;
+    LinkPort(kComm, line.path());
+    events_.clear();
+    Open(2);
+    EXPECT_TRUE(line.SendAndSettle({7}));
+    RunFor(20);
+    EXPECT_THAT(device_->ReadAll(), ElementsAre(7)) << "the port does not work";
+
+    if (sending) device_->Write(Bytes(50'000, 0x55));
+    line.Unplug();
+    inside_call_ = true;
+    for (int i = 0; sending && i < 3; ++i) {
+      device_->Write(EveryByteValue());
+      device_->SetRts(i == 0);
+      device_->ReadAll();
+      device_->ClearInput();
+      device_->PendingOutput();
+    }
+    inside_call_ = false;
+    EXPECT_TRUE(WaitFor([&] { return !events_.empty(); }));
+    const std::clock_t cpu_before = std::clock();
+    RunFor(1200);  // the check for dead devices has been by
+    EXPECT_LT(std::clock() - cpu_before, CLOCKS_PER_SEC / 5);
+    EXPECT_THAT(events_, ElementsAre(SerialEvent::kDeviceLost));
+    EXPECT_EQ(FailureOf([&] { device_->Write(Bytes{1}); }).number(), kErrPortNotOpen);
+  }
+}
+
+TEST_F(SerialDeviceTest, DeviceThatGoesWithoutAWord_IsNoticedWithinASecond) {
+  Open();
+  Adapter().gone_without_a_word = true;
+  EXPECT_TRUE(WaitFor([&] { return !events_.empty(); }, 3000));
+  EXPECT_THAT(events_, ElementsAre(SerialEvent::kDeviceLost));
+}
+
+TEST(SerialInbox, EventsNotedTogether_AreAllDeliveredDataFirst) {
+  std::string seen;
+  SerialInbox inbox({}, [&] { seen += "close "; });
+  inbox.SetEventHandler([&](SerialEvent event) {
+    seen += event == SerialEvent::kDataReceived ? "data "
+            : event == SerialEvent::kDeviceLost ? "lost "
+                                                : "overflow ";
+    if (event == SerialEvent::kDeviceLost) inbox.Reset();
+  });
+  inbox.SetReceiveThreshold(1);
+  inbox.NoteLoss();
+  inbox.Add(Bytes(kSerialInputBufferBytes + 1, 0));
+  EXPECT_EQ(seen, "") << "never from inside a call";
+  RunFor(20);
+  EXPECT_EQ(seen, "data overflow close lost ");
+}
+
+TEST_F(SerialDeviceTest, PortInUse_IsBusy) {
+  const int other = line_.OpenAsAnother();
+  ::flock(other, LOCK_EX);
+  EXPECT_EQ(FailureOfOpening(), kErrPortAlreadyOpen);
+  ::close(other);
+  EXPECT_EQ(FailureOfOpening(), 0);
+  EXPECT_EQ(FailureOfOpening(), kErrPortAlreadyOpen) << "by itself";
+}
+
+TEST_F(SerialDeviceTest, NothingBehindThePort_IsNoSuchDevice) {
+  LinkPort(1, "/dev/pts/none");
+  LinkPort(33, "/dev/null");
+  EXPECT_TRUE(device_->Exists(kComm));
+  EXPECT_EQ(device_->Describe(kComm), line_.path());
+  EXPECT_FALSE(device_->Exists(1)) << "a link whose device is gone hides the built-in port";
+  EXPECT_FALSE(device_->Exists(30));
+  for (const int number : {1, 30, 33}) EXPECT_EQ(FailureOfOpening(number), kErrInvalidPort) << number;
+}
+
+TEST_F(SerialDeviceTest, EventHandler_MayEndTheDeviceAndFail) {
+  device_->SetEventHandler([&](SerialEvent) {
+    device_.reset();
+    throw RuntimeError(kErrInternal, "parser broke");
+  });
+  Open();
+  line_.Send({1});
+  EXPECT_TRUE(WaitFor([&] { return !faults_.empty(); }));
+  EXPECT_THAT(faults_, ElementsAre("parser broke"));
+}
+
+}  // namespace
+}  // namespace tendril::test

@@ -1,0 +1,43 @@
+// EmulatedAdapter: lets a pseudo-terminal behave towards this process as a serial adapter with its driver does.
+#pragma once
+
+#include <cstdint>
+#include <functional>
+#include <optional>
+#include <vector>
+
+namespace tendril::test {
+
+// A pseudo-terminal has no RTS line and no driver settings, keeps no parity and no character size, and reports its end
+// in every way at once. emulated_adapter.cpp, compiled into a test program, takes the calls ioctl, read and poll of the
+// whole process and adds what is missing, for the pseudo-terminals that were set up as a serial port; all other
+// calls pass unchanged. Linux only.
+struct EmulatedAdapter {
+  struct LineSettings {
+    std::uint32_t baud = 0;
+    int data_bits = 0;
+    bool parity = false;
+    int stop_bits = 0;
+    bool handshaking = false;
+    friend bool operator==(const LineSettings&, const LineSettings&) = default;
+  };
+
+  // What the driver does.
+  std::function<int(bool asserted)> rts_error;  // the error number of a turn of RTS; 0 or none: it obeys
+  std::uint32_t empty_read_every =
+      0;  // every so many reads find nothing; with the error number of an earlier call
+  bool gone_without_a_word = false;  // only who asks learns that the device has gone
+  std::uint32_t fixed_baud = 0;      // the only speed that it can do; 0: all
+
+  // What was asked of it.
+  std::vector<LineSettings> settings;  // each time
+  std::vector<bool> rts;               // each turn that it obeyed
+  std::vector<int> flushes;            // TCIFLUSH, TCOFLUSH or TCIOFLUSH
+  bool low_latency = false;
+  std::uint64_t empty_reads = 0;  // reads that found nothing
+};
+
+// The adapters of this process share it.
+EmulatedAdapter& Adapter();
+
+}  // namespace tendril::test
