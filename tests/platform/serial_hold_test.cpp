@@ -16,12 +16,13 @@ using testing::AllOf;
 using testing::HasSubstr;
 using testing::Not;
 
-// The number of the failure, of 256, that a claim on `device` by an ordinary user ends in; 0 when it succeeds.
-int FailureOfOrdinaryUser(const std::string& device) {
+// The number of the failure, of 256, that a claim on `device` in another process ends in; 0 when it succeeds.
+int FailureOfAnother(const std::string& device, bool ordinary_user) {
   const pid_t child = ::fork();
   if (child == 0) {
     constexpr uid_t kNobody = 65534;
-    if (::geteuid() == 0 && (::setgroups(0, nullptr) != 0 || ::setuid(kNobody) != 0)) ::_exit(255);
+    const bool may_switch = ordinary_user && ::geteuid() == 0;
+    if (may_switch && (::setgroups(0, nullptr) != 0 || ::setuid(kNobody) != 0)) ::_exit(255);
     try {
       const SerialHold hold(device);
       ::_exit(0);
@@ -34,16 +35,18 @@ int FailureOfOrdinaryUser(const std::string& device) {
   return WEXITSTATUS(status);
 }
 
-TEST(SerialHold, OrdinaryUserWithoutPermission_IsNotAllowedRatherThanBusy) {
+TEST(SerialHold, DeviceInExclusiveMode_IsBusyAlsoForTheSuperuserUnlessNotAllowed) {
   const PseudoTerminal line;
   const int other = line.OpenAsAnother();
   ::ioctl(other, TIOCEXCL);
   ::chmod(line.path().c_str(), 0);
-  EXPECT_EQ(FailureOfOrdinaryUser(line.path()), kErrNotAllowed);
+  EXPECT_EQ(FailureOfAnother(line.path(), true), kErrNotAllowed);
   ::chmod(line.path().c_str(), 0666);
-  EXPECT_EQ(FailureOfOrdinaryUser(line.path()), kErrPortAlreadyOpen % 256);
+  for (const bool ordinary_user : {true, false}) {
+    EXPECT_EQ(FailureOfAnother(line.path(), ordinary_user), kErrPortAlreadyOpen % 256);
+  }
   ::ioctl(other, TIOCNXCL);
-  EXPECT_EQ(FailureOfOrdinaryUser(line.path()), 0);
+  EXPECT_EQ(FailureOfAnother(line.path(), true), 0);
   ::close(other);
 }
 
