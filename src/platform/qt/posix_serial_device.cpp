@@ -159,14 +159,9 @@ void PosixSerialDevice::SendWaiting() {
   port_->writable.setEnabled(!output.empty());
 }
 
+// A dead device stays readable, but not for long: the delivery of the loss closes it.
 void PosixSerialDevice::CheckForLoss() {
-  if (inbox_.LossNoted() || !port_->terminal.HungUp()) return;
-  // A dead device stays readable and writable, and would keep the event loop busy.
-  port_->readable.setEnabled(false);
-  port_->writable.setEnabled(false);
-  port_->output.clear();
-  dead_device_check_.stop();
-  inbox_.NoteLoss();
+  if (port_->terminal.HungUp()) inbox_.NoteLoss();
 }
 
 void PosixSerialDevice::TraceRts(const std::string& line) {
