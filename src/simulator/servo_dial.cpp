@@ -94,12 +94,12 @@ std::int32_t ServoDial::ToDegrees(std::int32_t microseconds) const {
 }
 
 ServoDial::Arc ServoDial::ArcOf(std::int32_t first, std::int32_t second) {
-  return {Convert(first), Convert(second)};
+  return {Convert(first), Convert(second), static_cast<std::int64_t>(second) - first};
 }
 
 ServoDial::Arc ServoDial::ArcOfUS(std::int32_t first, std::int32_t second) const {
   // Deliberately the other way round than in degrees: callers pass the lower pulse width first.
-  return {Convert(ToDegrees(second)), Convert(ToDegrees(first))};
+  return ArcOf(ToDegrees(second), ToDegrees(first));
 }
 
 void ServoDial::SetRange(std::int32_t first, std::int32_t second) { range_ = ArcOf(first, second); }
@@ -227,16 +227,13 @@ void ServoDial::AddBox(DialPart part, const Frame& frame, double inset, DialColo
 
 void ServoDial::AddPie(DialPart part, const Frame& frame, const Arc& arc, double radius, DialInk ink) {
   if (radius <= 0) return;
-  // A servo never travels through straight down, so the arc is the one that keeps clear of it. That makes it
-  // the same whichever of its two angles is stored first.
-  const double start = Drawable(arc.start);
-  const double end = Drawable(arc.end);
-  const bool ordered = FromTop(start) <= FromTop(end);
+  // The drawing angles do not say on which side of the circle the servo travels; the degrees do. That makes the arc
+  // the same whichever of its two ends is stored first.
   DialElement& pie = Add(part, DialShape::kPie, ColourOf(ink));
   pie.from = frame.Centre();
   pie.radius = radius;
-  pie.start_angle = ordered ? start : end;
-  pie.sweep_angle = std::abs(FromTop(end) - FromTop(start));
+  pie.start_angle = Drawable(arc.RightEnd());
+  pie.sweep_angle = static_cast<double>(std::min<std::int64_t>(std::abs(arc.clockwise), 360)) / 180 * kDialPi;
   pie.outline = kBodyOutline;
   pie.line_width = kBaseLineWidth;
 }
@@ -273,9 +270,8 @@ void ServoDial::AddAngleTexts(const Frame& frame) {
     AddText(DialPart::kAngleText, {frame.X(middle), frame.Y(kTextTop + row * kTextRow)}, column, plate, text);
   };
   const auto add_arc = [&](int row, const char* name, const Arc& arc, DialInk ink) {
-    const bool ordered = FromTop(arc.start) <= FromTop(arc.end);
-    add(1.0 / 6, row, name, ordered ? arc.end : arc.start, ColourOf(ink));
-    add(5.0 / 6, row, name, ordered ? arc.start : arc.end, ColourOf(ink));
+    add(1.0 / 6, row, name, arc.LeftEnd(), ColourOf(ink));
+    add(5.0 / 6, row, name, arc.RightEnd(), ColourOf(ink));
   };
   add_arc(0, "Range", range_, DialInk::kRange);
   if (limit_shown_) add_arc(1, "Limit", limit_, DialInk::kLimit);

@@ -162,8 +162,13 @@ class ServoDial {
 
  private:
   struct Arc {
-    double start = 0;
+    double start = 0;  // drawing angles
     double end = 0;
+    std::int64_t clockwise = 0;  // servo degrees from start to end; negative counterclockwise
+
+    // The ends as an observer at the centre sees them.
+    double LeftEnd() const { return clockwise > 0 ? start : end; }
+    double RightEnd() const { return clockwise > 0 ? end : start; }
   };
   struct Frame;  // the measures of one picture
 

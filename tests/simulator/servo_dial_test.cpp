@@ -87,13 +87,14 @@ TEST(ServoDial, Picture_IsDrawnInItsOrderAndColours) {
   }
 }
 
-TEST(ServoDial, Arc_IsTheSameInEitherOrderAndKeepsClearOfStraightDown) {
+TEST(ServoDial, Arc_SpansItsDegreesInEitherOrder) {
   struct Case {
     std::int32_t low, high;
     double start, sweep;  // degrees
   };
   for (const Case& c : {Case{600, 2400, 0, 180}, Case{1000, 2000, 40, 100}, Case{1700, 2400, 110, 70},
-                        Case{10, 2550, 301, 254}}) {
+                        Case{10, 2550, 301, 254}, Case{3100, 3500, 250, 40},  // through straight down
+                        Case{-3000, 1500, 0, 360}}) {
     for (const bool reversed : {false, true}) {
       ServoDial dial;
       dial.SetStopsUS(reversed ? c.high : c.low, reversed ? c.low : c.high);
@@ -108,6 +109,35 @@ TEST(ServoDial, Arc_IsTheSameInEitherOrderAndKeepsClearOfStraightDown) {
   EXPECT_EQ(dial.Draw(300, 200).at(1).sweep_angle, 0);
   EXPECT_EQ(dial.range_start(), 1e-08);
   EXPECT_EQ(dial.range_end(), 1e-08);
+}
+
+TEST(ServoDial, SizesAndProportions_FollowTheDisplaySize) {
+  struct Case {
+    std::int32_t size;
+    DialSizes sizes;
+  };
+  for (const auto& [size, sizes] :
+       {Case{1, {3, 0, 6, 2, 2}}, Case{2, {5, 1, 10, 3, 4}}, Case{0, {8, 2, 20, 6, 4}}}) {
+    ServoDial dial;
+    dial.DisplaySize(size);
+    EXPECT_EQ(dial.sizes(), sizes) << size;
+    dial.SetNeutralPosition(0);
+    dial.DisplayCaption("CHAN 1");
+    const std::vector<DialElement> drawn = dial.Draw(300, 200);
+    const auto expect_line = [](const DialElement& e, double left, double top, double right, double bottom,
+                                double pen) {
+      EXPECT_THAT((std::vector{e.from.x, e.from.y, e.to.x, e.to.y, e.line_width}),
+                  testing::Pointwise(testing::DoubleNear(0.01), {left, top, right, bottom, pen}));
+    };
+    expect_line(drawn.front(), 100, 60, 200.1, 190, sizes.outline);
+    expect_line(drawn.end()[-2], 150, 100, 150, sizes.arm, sizes.arm + 1);
+    if (sizes.marker > 0) expect_line(drawn.end()[-3], 150, 100, 150, sizes.arm, sizes.marker);
+    EXPECT_EQ(drawn.back().from.x, 150);
+    EXPECT_EQ(drawn.back().from.y, 130);
+    EXPECT_EQ(drawn[1].radius, 100 - (sizes.margin - sizes.arm));
+    EXPECT_EQ(drawn[2].radius, drawn[1].radius - sizes.arm);
+    EXPECT_EQ(drawn.front().outline, 0x707070u);
+  }
 }
 
 TEST(ServoDial, AnyPicture_IsNotCut) {
@@ -137,19 +167,13 @@ TEST(ServoDial, AnyPicture_IsNotCut) {
 TEST(ServoDial, ServoText_PrintsEachAngleInPlaceOfTheCaption) {
   ServoDial dial;
   dial.SetDisplayServoText(true);
+  dial.DisplayCaption("CHAN 1");
   dial.SetMovingArmPositionUS(1620);
   dial.SetNeutralPosition(0);
+  dial.SetDefaultPosition(10);
   std::string texts;
   for (const DialElement& element : dial.Draw(300, 300)) texts += element.text + "|";
-  EXPECT_THAT(texts, testing::EndsWith("|Stops −45°|Stops +45°|Arm −12°|Neutral 0°|"));
-  dial.SetDefaultPosition(10);
-  texts.clear();
-  for (const DialElement& element : dial.Draw(300, 300)) texts += element.text + "|";
-  EXPECT_THAT(texts, testing::EndsWith("|Neutral 0°|Default +10°|"));
-  dial.DisplaySize(1);  // has room for the numbers only, and shows no markers
-  texts.clear();
-  for (const DialElement& element : dial.Draw(300, 300)) texts += element.text + "|";
-  EXPECT_THAT(texts, testing::EndsWith("|−45°|+45°|−12°|"));
+  EXPECT_THAT(texts, testing::EndsWith("|Stops −45°|Stops +45°|Arm −12°|Neutral 0°|Default +10°|"));
 }
 
 TEST(ServoDial, Resize_DiscardsRangeLimitAndArmOnly) {
