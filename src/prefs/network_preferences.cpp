@@ -9,7 +9,7 @@ namespace {
 // The serial port of the regular network, unless it is said otherwise.
 constexpr std::uint8_t kRegularPort = 1;
 
-// "NetworkKelvane" holds the port: the network has had the maker's name all along.
+// "NetworkKelvane" is the number of the network's serial port.
 constexpr PreferenceTable<NyxNetworkPreferences, 9> kNyxTable = {{
     {"NetworkKelvane", &NyxNetworkPreferences::Port},
     {"NyxSpeed", &NyxNetworkPreferences::Speed},

@@ -95,7 +95,7 @@ class NetworkPreferences {
     bool ListNetworks = false;
     std::uint8_t BriskPort = 0;
     std::uint8_t X10Port = 0;
-    // The registry still has it under the name of the listener that there was before.
+    // Its name in the registry is "DMXListenerPort".
     std::int32_t CommListenerPort = 8837;
   };
   static const auto& GeneralTable();

@@ -37,11 +37,10 @@ void CommandProgress::OnTick() {
     view_.SetBarWidth(kStep);
     return;
   }
+  // A full bar waits for the command's end, or for a wider frame.
   if (value_ < view_.FrameWidth()) {
     value_ += kStep;
     view_.SetBarWidth(value_);
-  } else {
-    timer_->SetEnabled(false);  // full: nothing moves until the command ends
   }
 }
 

@@ -35,7 +35,7 @@ class ScriptedUnit final : public VirtualUnit {
   Bytes data_;
 };
 
-// Comm 1 and unit 01 are chosen, and nobody is on the line. The records are those of the start.
+// Comm 1 and unit 01 are chosen, and no unit is on the line. The records are those of the start.
 class CommandTest : public testing::Test {
  protected:
   CommandTest() {
@@ -43,6 +43,10 @@ class CommandTest : public testing::Test {
     link_.SetBaudRate(19200);
     for (std::size_t slot = 0; slot < kPortCount; ++slot)
       SetFromPreset(kPresets[kStartPreset], working_.At(slot));
+    // A box runs the event loop: the command has ended and shows it before one opens.
+    world_.boxes.while_open = [this] {
+      settled_at_the_box_ = !commands_.Running().Active() && progress_.colour == ProgressColour::kRed;
+    };
   }
 
   // Puts the unit called `fault` on the line of Comm 1; an empty name is a well-behaved one.
@@ -57,14 +61,23 @@ class CommandTest : public testing::Test {
     constexpr std::uint64_t kLongestMs = 12000;
     ASSERT_TRUE(world_.time.AdvanceUntil([&] { return !commands_.Running().Active(); }, kLongestMs));
   }
-  void ExpectFailure(const BoxMessage& box) {
+  void ExpectFailure(const testing::Matcher<const BoxMessage&>& box) {
     EXPECT_THAT(world_.boxes.Take(), testing::ElementsAre(box));
+    EXPECT_TRUE(progress_.shown);
     EXPECT_EQ(progress_.text, "COMMAND FAILED!");
-    EXPECT_EQ(progress_.colour, ProgressColour::kRed);
-    EXPECT_FALSE(commands_.Running().Active());
+    EXPECT_TRUE(std::exchange(settled_at_the_box_, false));
+  }
+  void ExpectFailure(const BoxMessage& box) {
+    ExpectFailure(testing::Matcher<const BoxMessage&>(testing::Eq(box)));
+  }
+  // A box of this title whose text begins like this: it goes on with where the fault happened.
+  static testing::Matcher<const BoxMessage&> Fault(const std::string& title, const std::string& text) {
+    return testing::AllOf(testing::Field(&BoxMessage::title, title),
+                          testing::Field(&BoxMessage::text, testing::StartsWith(text)));
   }
   void ExpectSuccess(const std::string& text) {
     EXPECT_THAT(world_.boxes.Take(), testing::IsEmpty());
+    EXPECT_TRUE(progress_.shown);
     EXPECT_EQ(progress_.text, text);
     EXPECT_EQ(progress_.colour, ProgressColour::kGreen);
   }
@@ -72,6 +85,7 @@ class CommandTest : public testing::Test {
   SimulatedWorld world_;
   HwSerial link_{*world_.device, world_.time, world_.time, world_.log};
   RecordedProgress progress_;
+  bool settled_at_the_box_ = false;
   ChosenTarget target_;
   ChannelTable working_;
   std::function<bool()> on_starting_;

@@ -22,7 +22,9 @@ TEST(CommandProgress, Bar_GrowsTenEvery15msUntilTheFrameIsFull) {
   EXPECT_EQ(view.bar_width, 20);
   time.Advance(60000);
   EXPECT_EQ(view.bar_width, 400);
-  EXPECT_EQ(time.RunningTimers(), 0);
+  view.frame_width = 421;
+  time.Advance(60000);
+  EXPECT_EQ(view.bar_width, 430) << "a frame made wider is filled as well";
   progress.EndCommandProgress(Outcome::kSuccess, "done");
   time.Advance(3000);
   EXPECT_FALSE(view.shown);
