@@ -18,14 +18,39 @@ constexpr std::string_view kUtf8Mark = "\xEF\xBB\xBF";
 // Keys, values and lines that a file may have. A path of two bytes makes a key of two hundred.
 constexpr std::size_t kMostItems = 1'000'000;
 
+// Where the first byte stands that is no UTF-8; npos where there is none.
+std::size_t FindStrayByte(std::u16string_view text) {
+  for (std::size_t i = 0; i < text.size(); ++i) {
+    if (text[i] >= 0xD800 && text[i] < 0xDC00) {
+      ++i;  // the first half of a character
+    } else if (text[i] >= 0xDC00 && text[i] < 0xE000) {
+      return i;
+    }
+  }
+  return text.npos;
+}
+
+[[noreturn]] void Refuse() {
+  throw std::runtime_error("it is neither UTF-16 with a byte order mark, low byte first, nor UTF-8.");
+}
+
 // Read as something else and written again, a file in another encoding would be lost.
 void RefuseOtherForms(std::string_view bytes) {
   const std::string_view begin = bytes.substr(0, 4);
   const bool mark_of_utf16 = bytes.starts_with(kUtf16Mark) && begin != std::string_view("\xFF\xFE\0\0", 4);
   const bool zeros = begin.find('\0') != begin.npos && !mark_of_utf16;
-  if (zeros || bytes.starts_with("\xFE\xFF") || bytes.starts_with("REGEDIT4")) {
-    throw std::runtime_error("it is neither UTF-16 with a byte order mark, low byte first, nor UTF-8.");
-  }
+  if (zeros || bytes.starts_with("\xFE\xFF") || bytes.starts_with("REGEDIT4")) Refuse();
+}
+
+std::u16string DecodeUtf8(std::string_view bytes) {
+  std::u16string text = Utf16(bytes);
+  const std::size_t stray = FindStrayByte(text);
+  if (stray == text.npos) return text;
+  // A file that was cut off may end within a character, of which up to three bytes are there.
+  constexpr std::size_t kLongestPart = 3;
+  if (text.size() - stray > kLongestPart) Refuse();
+  text.resize(stray);
+  return text;
 }
 
 std::u16string Decode(std::string_view bytes, RegistryEncoding& encoding) {
@@ -33,7 +58,7 @@ std::u16string Decode(std::string_view bytes, RegistryEncoding& encoding) {
   if (!bytes.starts_with(kUtf16Mark)) {
     encoding = bytes.starts_with(kUtf8Mark) ? RegistryEncoding::kUtf8WithMark : RegistryEncoding::kUtf8;
     if (encoding == RegistryEncoding::kUtf8WithMark) bytes.remove_prefix(kUtf8Mark.size());
-    return Utf16(bytes);
+    return DecodeUtf8(bytes);
   }
   encoding = RegistryEncoding::kUtf16;
   bytes.remove_prefix(kUtf16Mark.size());
@@ -125,8 +150,11 @@ std::optional<RegistryValue> ReadText(std::u16string_view data) {
   return RegistryValue{kRegSz, Utf16Bytes(*text)};
 }
 
-std::optional<RegistryValue> ReadNumber(std::u16string_view data) {
-  const std::optional<std::uint32_t> number = TakeHex(data, 8);
+// Of a line that was cut off, fewer than all digits would be another number.
+std::optional<RegistryValue> ReadNumber(std::u16string_view data, bool line_is_whole) {
+  constexpr std::size_t kDigits = 8;
+  const std::size_t digits = line_is_whole ? std::clamp<std::size_t>(data.size(), 1, kDigits) : kDigits;
+  const std::optional<std::uint32_t> number = TakeHex(data, digits);
   if (!number || !data.empty()) return std::nullopt;
   RegistryValue value{kRegDword, {}};
   for (const int shift : {0, 8, 16, 24})
@@ -223,8 +251,6 @@ void Reader::Read(std::u16string_view text) {
         line = NextLine();
         joined += line;
       }
-      // What were stray bytes may be a character now.
-      if (!joined.empty() && form_.encoding != RegistryEncoding::kUtf16) joined = Utf16(Utf8(joined));
       read = ReadValue(joined.empty() ? line : joined);
     } else {
       read = ReadLine(line);
@@ -262,9 +288,10 @@ bool Reader::ReadKey(std::u16string_view line) {
     tree_.Remove(line);
     return true;
   }
-  key_ = tree_.Create(line);
+  std::size_t made = 0;
+  key_ = tree_.Create(line, &made);
   if (key_ == nullptr) return false;
-  Count(static_cast<std::size_t>(std::count(line.begin(), line.end(), u'\\')));
+  if (made > 1) Count(made - 1);  // the key itself counts as a line
   return true;
 }
 
@@ -282,7 +309,7 @@ bool Reader::ReadValue(std::u16string_view line) {
   if (line.starts_with(u'"')) {
     value = ReadText(line);
   } else if (Take(line, u"dword:")) {
-    value = ReadNumber(line);
+    value = ReadNumber(line, line_has_end_);
   } else if (Take(line, u"hex") && line_has_end_) {
     // Of a file that was cut off, nobody can tell whether its last bytes are all there.
     value = ReadHex(line);
@@ -300,7 +327,7 @@ std::optional<std::u16string> PlainText(const RegistryValue& value) {
   if (text.back() != u'\0') return std::nullopt;
   text.pop_back();
   const bool has_controls = std::any_of(text.begin(), text.end(), [](char16_t unit) { return unit < u' '; });
-  if (has_controls || Utf16(Utf8(text)) != text) return std::nullopt;
+  if (has_controls || FindStrayByte(text) != text.npos || Utf16(Utf8(text)) != text) return std::nullopt;
   return text;
 }
 

@@ -3,7 +3,7 @@
 //   Windows Registry Editor Version 5.00
 //
 //   [HKEY_CURRENT_USER\Software\Kelvane\Shared\Network]
-//   "DMXListenerPort"=dword:00002285
+//   "DMXListenerPort"=dword:00002285         one to eight hexadecimal digits
 //   "Comment"="text, with \\ and \""
 //   @="the value without a name"
 //   "Data"=hex:00,01,02,\                  hex(t): data of the type t; a line that ends with "\" goes on in the

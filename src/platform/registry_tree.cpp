@@ -47,17 +47,20 @@ RegistryKey* RegistryTree::Find(std::u16string_view path) {
   return key;
 }
 
-RegistryKey* RegistryTree::Create(std::u16string_view path) {
+RegistryKey* RegistryTree::Create(std::u16string_view path, std::size_t* made) {
   if (!CanBeKey(path)) return nullptr;
+  std::size_t missing = 0;
   RegistryKey* key = &top_;
   while (!path.empty()) {
     const std::u16string_view part = NextPart(path);
     auto found = key->subkeys.find(part);
     if (found == key->subkeys.end()) {
       found = key->subkeys.emplace(part, std::make_unique<RegistryKey>()).first;
+      ++missing;
     }
     key = found->second.get();
   }
+  if (made != nullptr) *made = missing;
   return key;
 }
 

@@ -41,8 +41,9 @@ class RegistryTree {
   // The key at `path`; null when there is none.
   RegistryKey* Find(std::u16string_view path);
   // The key at `path`, made with the keys above it where they are missing. Null, with nothing made, for a path that no
-  // key can have: an empty part, one that is too long or has control characters, or too many of them.
-  RegistryKey* Create(std::u16string_view path);
+  // key can have: an empty part, one that is too long or has control characters, or too many of them. `made`, unless
+  // null, becomes the number of keys that were missing.
+  RegistryKey* Create(std::u16string_view path, std::size_t* made = nullptr);
   // Removes the key at `path` with all that is in it and below it.
   void Remove(std::u16string_view path);
 

@@ -21,6 +21,7 @@ struct ClientWorld {
   ClientWorld() {
     client.SetEvents({.CommReply =
                           [this](const Bytes& payload, std::int32_t status) {
+                            EXPECT_LE(payload.capacity(), 2 * kLargestFrame) << "no flood is kept";
                             Note("reply " + std::to_string(status) + " " +
                                  std::string(payload.begin(), payload.end()));
                           },

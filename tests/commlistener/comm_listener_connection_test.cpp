@@ -120,28 +120,6 @@ TEST_F(ClientTest, ConnectTimeout_FailsAndTriesAgain) {
   EXPECT_TRUE(client.IsConnected());
 }
 
-TEST_F(ClientTest, SilentListener_GetsTheRequestOnceMoreInsideANewOne) {
-  ConnectIdle();
-  for (const char* reply : {"1100000", "1200000", "1300000"}) {
-    client.SendAllOffOnDisconnect();
-    socket.Deliver(reply);
-  }
-  Events();
-  socket.Take();
-  client.RequestCommPortControl(3);
-  EXPECT_THAT(socket.Take(), ElementsAre(Frame("C400002", {3, 0})));
-  time.Advance(999);
-  EXPECT_THAT(Events(), IsEmpty());
-  time.Advance(1);
-  EXPECT_THAT(Events(), ElementsAre("error 2 Request timed out|0|", "state"));
-  Reconnected();
-  // No second identification, and not a third time when this is not answered either.
-  EXPECT_THAT(socket.Take(), ElementsAre(Frame("C500009C400002", {3, 0})));
-  time.Advance(1000);
-  Reconnected();
-  EXPECT_THAT(socket.Take(), IsEmpty());
-}
-
 TEST_F(ClientTest, RequestThatIsTooLongToRepeat_IsDropped) {
   ConnectIdle();
   const std::string longest(99999, 'n');
@@ -214,6 +192,13 @@ TEST_F(ClientTest, Replies_AreAssembledAndWhatIsBeyondThemIsDropped) {
   socket.Deliver("1200002");
   socket.Deliver("xy");
   EXPECT_THAT(Events(), ElementsAre("reply 0 xy"));
+  // Half a reply is forgotten with its connection.
+  socket.Deliver("120000");
+  socket.End(10054, "closed");
+  Reconnected();
+  Events();
+  socket.Deliver("1200000");
+  EXPECT_THAT(Events(), ElementsAre("reply 0 "));
   socket.Deliver("1300000");
   EXPECT_THAT(Events(), ElementsAre("error 5 Sequence char mismatch in comm reply|0|", "state"));
 }
@@ -230,19 +215,6 @@ TEST_F(ClientTest, LargestReply_IsTakenAndAFloodEndsWithIt) {
   EXPECT_TRUE(client.ReadyToTransmit());
 }
 
-TEST_F(ClientTest, PeersClose_IsASocketErrorAndNothingOfTheOldReplyStays) {
-  ConnectIdle();
-  client.SendAllOffOnDisconnect();
-  socket.Deliver("1100009half");
-  socket.End(10054, "The remote host closed the connection");
-  EXPECT_THAT(Events(),
-              ElementsAre("error 3 Comm Winsock Error|10054|The remote host closed the connection", "state"));
-  EXPECT_EQ(client.TCPErrorMessage(), "The remote host closed the connection");
-  Reconnected();
-  socket.Deliver("1200000");
-  EXPECT_THAT(Events(), ElementsAre("connected", "state", "reply 0 "));
-}
-
 TEST_F(ClientTest, Faults_AreReportedWithWhereTheyHappened) {
   const RuntimeError fault(10040, "Too big");
   socket.fault = fault;
@@ -254,6 +226,7 @@ TEST_F(ClientTest, Faults_AreReportedWithWhereTheyHappened) {
   socket.Accept();
   EXPECT_EQ(Events()[2], "error 4 Error in SendMessage 10040: Too big|0|");
   Reconnected();
+  EXPECT_THAT(socket.Take(), IsEmpty()) << "what was not sent is not repeated";
   Events();
   socket.fault = fault;  // of receiving
   socket.Deliver("1");
@@ -380,6 +353,7 @@ TEST_F(ClientTest, ShutdownInsideAnEvent_EndsTheFailureThere) {
   }});
   socket.End(10054, "closed");
   EXPECT_EQ(time.RunningTimers(), 0);
+  EXPECT_FALSE(client.Active());
 }
 
 }  // namespace

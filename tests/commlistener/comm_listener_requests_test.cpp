@@ -35,11 +35,16 @@ TEST_F(RequestsTest, PendingRequests_GoOutInTheirOrder) {
   client.RequestCommPortControl(255);
   client.Connect(true, "Käte €", true, false);
   EXPECT_THAT(socket.Take(), IsEmpty());
+  std::vector<std::size_t> sent_before_the_event;
+  client.SetEvents({.CommReply = [&](const Bytes&, std::int32_t) {
+    sent_before_the_event.push_back(socket.sent.size());
+  }});
   socket.Accept();
   EXPECT_THAT(AcknowledgeAll(),
               ElementsAre(Frame("P000001", {0}), BytesOf("I100006K\xE4te \x80"), BytesOf("A200000"),
                           Frame("C300002", {3, 0}), Frame("C400002", {3, 1}), Frame("C500002", {255, 0}),
                           Frame("L600004", {1, 0, 0, 0})));
+  EXPECT_THAT(sent_before_the_event, ElementsAre(1, 1, 1, 1, 1, 1, 0));
   EXPECT_FALSE(client.PhysicalLightsControl());
 }
 
@@ -60,17 +65,6 @@ TEST_F(RequestsTest, PhysicalLights_AreToldWhenSetAndNotWhenOnlyKept) {
   socket.Accept();
   EXPECT_THAT(AcknowledgeAll(), ElementsAre(BytesOf("I300001y")));
   EXPECT_FALSE(client.PhysicalLightsControl());
-}
-
-TEST_F(RequestsTest, OutOfTurn_NothingIsSentAndNothingForgotten) {
-  client.Connect(true, "x", false, true);
-  socket.Accept();
-  socket.Take();
-  client.SendClientIdentification();
-  client.SendAllOffOnDisconnect();  // still to come, since it is not lost by being asked for too early
-  EXPECT_THAT(socket.Take(), IsEmpty());
-  socket.Deliver("1000000");
-  EXPECT_THAT(AcknowledgeAll(), ElementsAre(BytesOf("A100000")));
 }
 
 TEST_F(RequestsTest, LightingData_IsLaidOutByRecordType) {
@@ -106,8 +100,10 @@ TEST_F(RequestsTest, LightingData_BeyondOneMessageGoesOutBatchByBatch) {
 }
 
 TEST(CommListenerRequests, FaultyArguments_FailWithTheNameOfTheRequest) {
-  const Bytes values(32767);
-  for (const std::int16_t count : {std::int16_t{-1}, std::int16_t{32762}}) {
+  // Negative, beyond the values, and beyond a record's length.
+  for (const auto& [count, values] : {std::pair(std::int16_t{-1}, Bytes(9)),
+                                      {std::int16_t{10}, Bytes(9)},
+                                      {std::int16_t{32762}, Bytes(32762)}}) {
     for (const bool dmx : {true, false}) {
       ClientWorld world;
       world.ConnectIdle();

@@ -3,8 +3,6 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "platform/runtime_error.h"
-
 namespace tendril::test {
 namespace {
 
@@ -48,13 +46,6 @@ TEST(LightingQueue, FullBuffer_BecomesABatchAndTheOldestAreDropped) {
   EXPECT_FALSE(queue.TakeBatch());
   EXPECT_EQ(queue.fill(), 3u * 32760u);
   EXPECT_EQ(queue.buffer()[4], 200);
-}
-
-TEST(LightingQueue, DataBeyondItsLengthField_IsRefused) {
-  LightingQueue queue;
-  EXPECT_NO_THROW(queue.Append(LightingRecordType::kDMXIntensities, Bytes(32767)));
-  EXPECT_THROW(queue.Append(LightingRecordType::kDMXIntensities, Bytes(32768)), RuntimeError);
-  EXPECT_EQ(queue.fill(), 32772u);
 }
 
 }  // namespace

@@ -132,13 +132,14 @@ TEST_F(RegistryFiles, LinkAndPermissions_Stay) {
   EXPECT_EQ(Program(real, note).company.GetNumber("Port", 7), 4);
 }
 
-// Two thousand keys, each at the end of a path of 510 others.
-std::string DeepKeys() {
+// Two thousand keys, each at the end of a path of 510 others: of its own, or the same for all.
+std::string DeepKeys(bool same_path) {
+  std::string path;
+  for (int part = 0; part < 510; ++part) path += "\\a";
   std::string text = "Windows Registry Editor Version 5.00\n";
   for (int i = 0; i < 2000; ++i) {
-    text += "[HKEY_CURRENT_USER\\" + std::to_string(i);
-    for (int part = 0; part < 510; ++part) text += "\\a";
-    text += "]\n";
+    const std::string number = "\\" + std::to_string(i);
+    text += "[HKEY_CURRENT_USER" + (same_path ? path + number : number + path) + "]\n";
   }
   return text;
 }
@@ -159,7 +160,8 @@ TEST_F(RegistryFiles, FileThatCannotBeRead_HasNoKeysAndIsNotReplaced) {
       {"neither UTF-16", [&] { Write(path, std::string("W\0i\0n\0", 6)); }},
       {"neither UTF-16", [&] { Write(path, std::string("\xFF\xFE\0\0W\0\0\0", 8)); }},
       {"neither UTF-16", [&] { Write(path, "REGEDIT4\r\n\"K\xE4te\"=dword:00000001\r\n"); }},
-      {"more than a million", [&] { Write(path, DeepKeys()); }}};
+      {"neither UTF-16", [&] { Write(path, std::string(kText) + "\"Comment\"=\"B\xFChne\"\n"); }},
+      {"more than a million", [&] { Write(path, DeepKeys(false)); }}};
   for (const auto& [text, make] : cases) {
     fs::remove_all(path);
     fs::create_directories(path.parent_path());
@@ -176,6 +178,10 @@ TEST_F(RegistryFiles, FileThatCannotBeRead_HasNoKeysAndIsNotReplaced) {
     }
     EXPECT_TRUE(fs::exists(path));
   }
+  warnings.clear();
+  Write(path, DeepKeys(true));
+  EXPECT_EQ(Program(path, note).company.GetNumber("Port", 7), 7);
+  EXPECT_THAT(warnings, SizeIs(0));
 }
 
 TEST_F(RegistryFiles, LinesThatCannotBeRead_AreToldUpToANumber) {
@@ -183,7 +189,7 @@ TEST_F(RegistryFiles, LinesThatCannotBeRead_AreToldUpToANumber) {
   EXPECT_EQ(Program(path, note).company.GetNumber("Port", 7), 1);
   EXPECT_THAT(warnings, ElementsAre(AllOf(HasSubstr("registry.reg"), HasSubstr("line 6"))));
   std::string garbage;
-  for (int i = 0; i < 10000; ++i) garbage += "\x01\xFF[\"\\\n";
+  for (int i = 0; i < 10000; ++i) garbage += "\x01[\"\\\n";
   Write(path, garbage);
   warnings.clear();
   EXPECT_EQ(Program(path, note).company.GetNumber("Port", 7), 7);

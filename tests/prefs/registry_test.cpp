@@ -223,15 +223,5 @@ TEST(Registry, FailureOfEachCall_IsRaisedWithItsTextOnceTheKeyIsClosed) {
   }
 }
 
-TEST(Registry, WarningThatNobodyHears_ChangesNothing) {
-  MemoryRegistry memory;
-  UnreliableStore store(memory);
-  store.failing_call = -1;
-  for (const WarningSink& warn : {WarningSink(), WarningSink([](const std::string&) { throw 7; })}) {
-    Registry registry(store, warn);
-    EXPECT_EQ(RegistryBranch::Company(registry).GetNumber("X", 5), 5);
-  }
-}
-
 }  // namespace
 }  // namespace tendril::test

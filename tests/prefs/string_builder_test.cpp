@@ -2,10 +2,6 @@
 
 #include <gtest/gtest.h>
 
-#include <memory>
-
-#include "platform/runtime_error.h"
-
 namespace tendril {
 namespace {
 
@@ -27,15 +23,6 @@ TEST(StringBuilder, Capacity_DoublesWhenItDoesNotSufficeAndShrinksToTheText) {
   builder.Reset();
   EXPECT_EQ(builder.ToString(), u"");
   EXPECT_EQ(builder.capacity(), 0);
-}
-
-TEST(StringBuilder, TextOfAGigabyte_IsAnOverflow) {
-  constexpr std::size_t kUnits = std::size_t{1} << 29;
-  const std::unique_ptr<char16_t[]> text(
-      new char16_t[kUnits]);  // nobody looks at it, so that it takes no memory
-  StringBuilder builder;
-  EXPECT_THROW(builder.Append({text.get(), kUnits}), RuntimeError);
-  EXPECT_TRUE(builder.IsEmpty());
 }
 
 }  // namespace

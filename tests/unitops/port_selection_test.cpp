@@ -152,7 +152,7 @@ TEST_F(PortSelectionTest, PortThatIsNotGivenUp_IsAskedForAgainWithoutGivingItBac
   EXPECT_THAT(panel_.PortRequests(), testing::Not(testing::Contains("3:1")));
 }
 
-TEST_F(PortSelectionTest, ListenerPortBelowOne_MeansThatNobodyCanBeAsked) {
+TEST_F(PortSelectionTest, ListenerPort_IsThatOfThePreferencesAndMayBeNone) {
   const RegistryBranch network = RegistryBranch::Shared(panel_.registry).Below("Network");
   network.CreateKey();
   panel_.Take(3);
@@ -165,6 +165,13 @@ TEST_F(PortSelectionTest, ListenerPortBelowOne_MeansThatNobodyCanBeAsked) {
     selection.Choose(3);
     EXPECT_THAT(world_.boxes.Take(), ElementsAre(InUse(3)));
   }
+  network.SetNumber("DMXListenerPort", 4321);  // any other one is where the client connects
+  VirtualTcpSocket socket(panel_.panel, 4321, world_.time);
+  ControlPanel elsewhere(world_.time, world_.boxes, socket, panel_.registry, panel_.processes);
+  elsewhere.ReadPreferences();
+  elsewhere.InitializeCommListenerInterface();
+  world_.time.Advance(100);
+  EXPECT_EQ(socket.State(), TcpState::kConnected);
 }
 
 TEST(ControlPanelStart, Fault_IsShownAndTheProgramGoesOn) {
