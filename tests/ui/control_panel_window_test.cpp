@@ -43,6 +43,9 @@ TEST_F(WindowAndControlPanel, PortThatItHolds_IsTakenAndGivenBackOnClosing) {
   Click("Command3_0");
   world_.time.Advance(150);
 
+  panel_.panel.SetPortHandler([this](std::uint8_t, bool held) {
+    EXPECT_FALSE(held && link_.PortOpen()) << "given back before it is closed";
+  });
   EXPECT_FALSE(window_->close());
   QTest::keyClick(&Find("cmbNYX"), Qt::Key_Up);
   EXPECT_FALSE(link_.PortOpen());
