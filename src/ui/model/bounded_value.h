@@ -25,11 +25,8 @@ class BoundedValue {
     maximum_ = maximum;
     SetValue(value_);
   }
-  // Takes the widest limits, and `value`.
-  void Reset(int value = 0) {
-    SetLimits(-kWidest, kWidest);
-    SetValue(value);
-  }
+  // Takes the widest limits, and 0.
+  void Reset() { *this = BoundedValue(); }
 
  private:
   int value_ = 0;

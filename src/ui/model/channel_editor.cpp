@@ -1,6 +1,7 @@
 #include "ui/model/channel_editor.h"
 
 #include <algorithm>
+#include <cstdlib>
 
 namespace tendril {
 namespace {
@@ -77,13 +78,19 @@ void ChannelEditor::RecalcParameters() {
   Motion motion = Entered();
 
   motion.LimitVirtualRange();
+  motion.virtual_half_width = std::max(motion.virtual_half_width, -motion.actual_half_width);
   virtual_range.SetValue(motion.virtual_half_width);
   virtual_range.SetMaximum(motion.actual_half_width);
 
-  motion.LimitTrim();
+  // A reversed virtual range has a negative half width, and needs as much room.
+  const int reach = std::abs(motion.virtual_half_width);
+  const int trim_room = motion.actual_half_width - reach;
+  motion.trim = std::clamp(motion.trim, -trim_room, trim_room);
   trim.SetValue(motion.trim);
-  trim.SetLimits(-motion.TrimRoom(), motion.TrimRoom());
+  trim.SetLimits(-trim_room, trim_room);
 
+  motion.left_stop = std::min(motion.left_stop, reach);
+  motion.right_stop = std::max(motion.right_stop, -reach);
   motion.LimitStops();
   left_stop.SetValue(motion.left_stop);
   left_stop.SetMinimum(-motion.virtual_half_width);
@@ -145,26 +152,23 @@ void ChannelEditor::ReloadChannel() {
 
 void ChannelEditor::Load(const ChannelConfig& record) {
   const Motion motion = MotionOf(record);
-  SpinOf(Parameter::kActualRange).Reset(motion.actual_half_width);
-  SpinOf(Parameter::kVirtualRange).Reset(motion.virtual_half_width);
-  SpinOf(Parameter::kNeutralTrim).Reset(motion.trim);
-  SpinOf(Parameter::kLeftStop).Reset(motion.left_stop);
-  SpinOf(Parameter::kRightStop).Reset(motion.right_stop);
-  SpinOf(Parameter::kDefaultPosition).Reset(motion.default_position);
+  for (BoundedValue& spin : spins_) spin.Reset();
+  // Never wider: together with the bounds that follow from it, this keeps what is stored within what a unit holds.
+  SpinOf(Parameter::kActualRange).SetLimits(0, kMaxHalfWidth);
+  SpinOf(Parameter::kActualRange).SetValue(motion.actual_half_width);
+  SpinOf(Parameter::kVirtualRange).SetValue(motion.virtual_half_width);
+  SpinOf(Parameter::kNeutralTrim).SetValue(motion.trim);
+  SpinOf(Parameter::kLeftStop).SetValue(motion.left_stop);
+  SpinOf(Parameter::kRightStop).SetValue(motion.right_stop);
+  SpinOf(Parameter::kDefaultPosition).SetValue(motion.default_position);
   RecalcParameters();
 
-  // The limits that follow no other parameter, wide enough for a record from elsewhere that lies beyond them.
-  const auto at_least = [this](Parameter parameter, int minimum) {
-    SpinOf(parameter).SetMinimum(std::min(minimum, Spin(parameter).Value()));
-  };
-  const auto at_most = [this](Parameter parameter, int maximum) {
-    SpinOf(parameter).SetMaximum(std::max(maximum, Spin(parameter).Value()));
-  };
-  at_least(Parameter::kActualRange, 0);
-  at_most(Parameter::kActualRange, kMaxHalfWidth);
-  at_least(Parameter::kVirtualRange, 0);
-  at_most(Parameter::kLeftStop, 0);
-  at_least(Parameter::kRightStop, 0);
+  // The other limits that follow no parameter give way to a record from elsewhere that is reversed or one-sided.
+  const auto at_least_0 = [](BoundedValue& spin) { spin.SetMinimum(std::min(0, spin.Value())); };
+  at_least_0(SpinOf(Parameter::kVirtualRange));
+  at_least_0(SpinOf(Parameter::kRightStop));
+  BoundedValue& left_stop = SpinOf(Parameter::kLeftStop);
+  left_stop.SetMaximum(std::max(0, left_stop.Value()));
 }
 
 void ChannelEditor::SetPortType(std::int16_t kind) {
