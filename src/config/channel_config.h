@@ -4,6 +4,7 @@
 #include <array>
 #include <cstddef>
 #include <cstdint>
+#include <string>
 #include <string_view>
 
 namespace tendril {
@@ -51,6 +52,17 @@ struct ChannelConfig {
 
 // Output ports of a unit. Slot s of a table is port s + 1.
 inline constexpr std::size_t kPortCount = 8;
+
+// A pulse field in words: "virtual range " and "1000 to 2000", "default position " and "1500". The actual range needs
+// no name.
+struct PulseFieldText {
+  std::string InWords() const { return std::string(name) + value; }
+
+  std::string_view name;
+  std::string value;
+};
+// The pulse fields of `record`: actual range, virtual range, virtual stops, default position, neutral position.
+std::array<PulseFieldText, 5> PulseFieldTexts(const ChannelConfig& record);
 
 // A table of records with one slot more than there are ports; the last is never sent, received or shown.
 class ChannelTable {

@@ -2,6 +2,7 @@
 
 #include <cstddef>
 #include <string_view>
+#include <utility>
 
 namespace tendril {
 namespace {
@@ -39,14 +40,15 @@ std::int32_t LostCommOption(int flags) {
   }
 }
 
-InvalidRecord Invalid(std::string_view field, std::int32_t value) {
-  return {"Internal Error - Invalid " + std::string(field) + "=" + std::to_string(value)};
+InvalidRecord Invalid(std::string_view name, std::int32_t value, std::string field) {
+  return {"Internal Error - Invalid " + std::string(name) + "=" + std::to_string(value), std::move(field)};
 }
 
 }  // namespace
 
 std::variant<OptionBytes, InvalidRecord> EncodeOptions(const ChannelConfig& record) {
-  if (record.PortType < kPortServo || record.PortType > kPortPwm) return Invalid("PortType", record.PortType);
+  if (record.PortType < kPortServo || record.PortType > kPortPwm)
+    return Invalid("PortType", record.PortType, "output kind " + std::to_string(record.PortType));
   int flags = record.PortType + 1;
 
   switch (record.PowerUPOpt) {
@@ -59,7 +61,7 @@ std::variant<OptionBytes, InvalidRecord> EncodeOptions(const ChannelConfig& reco
     case kPowerUpFirstCommand:
       break;
     default:
-      return Invalid("PowerUPOpt", record.PowerUPOpt);
+      return Invalid("PowerUPOpt", record.PowerUPOpt, "power-up option " + std::to_string(record.PowerUPOpt));
   }
 
   switch (record.LostCommOption) {
@@ -75,29 +77,32 @@ std::variant<OptionBytes, InvalidRecord> EncodeOptions(const ChannelConfig& reco
     case kLostCommStopPulse:
       break;
     default:
-      return Invalid("LostCommOption", record.LostCommOption);
+      return Invalid("LostCommOption", record.LostCommOption,
+                     "lost communications option " + std::to_string(record.LostCommOption));
   }
 
   struct Width {
-    std::string_view field;
+    std::string_view name;
     Microseconds value;
+    std::size_t field;  // in PulseFieldTexts()
   };
   // In the order on the wire, which is also the order of the checks.
   const std::array<Width, kOptionByteCount - 1> widths{{
-      {"ActualRange(0)", record.ActualRange[0]},
-      {"ActualRange(1)", record.ActualRange[1]},
-      {"VirtualRange(0)", record.VirtualRange[0]},
-      {"VirtualRange(1)", record.VirtualRange[1]},
-      {"VirtualStops(0)", record.VirtualStops[0]},
-      {"VirtualStops(1)", record.VirtualStops[1]},
-      {"DefaultPosition", record.DefaultPosition},
-      {"NeutralPosition", record.NeutralPosition},
+      {"ActualRange(0)", record.ActualRange[0], 0},
+      {"ActualRange(1)", record.ActualRange[1], 0},
+      {"VirtualRange(0)", record.VirtualRange[0], 1},
+      {"VirtualRange(1)", record.VirtualRange[1], 1},
+      {"VirtualStops(0)", record.VirtualStops[0], 2},
+      {"VirtualStops(1)", record.VirtualStops[1], 2},
+      {"DefaultPosition", record.DefaultPosition, 3},
+      {"NeutralPosition", record.NeutralPosition, 4},
   }};
 
   OptionBytes bytes{static_cast<std::uint8_t>(flags)};
   for (std::size_t i = 0; i < widths.size(); ++i) {
-    const auto& [field, value] = widths[i];
-    if (value < kMinPulseWidth || value > kMaxPulseWidth) return Invalid(field, value);
+    const auto& [name, value, field] = widths[i];
+    if (value < kMinPulseWidth || value > kMaxPulseWidth)
+      return Invalid(name, value, PulseFieldTexts(record)[field].InWords());
     bytes[i + 1] = static_cast<std::uint8_t>(value / kByteStep);
   }
   return bytes;

@@ -39,9 +39,10 @@ inline constexpr std::uint8_t kOptionServoPort = 17;
 // In the place of a port's number: a mask of ports and a position to move them to follow.
 inline constexpr std::uint8_t kLivePosition = 137;
 
-// Why a record cannot be sent, in the words that the person is shown.
+// Why a record cannot be sent.
 struct InvalidRecord {
-  std::string text;
+  std::string text;   // for a message box
+  std::string field;  // for a sentence: "305 to 2695", "default position 5", "output kind -1"
 };
 
 // Checks `record` field by field and packs it. The first field that is out of its range ends it. How the

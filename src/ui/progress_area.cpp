@@ -51,7 +51,8 @@ ProgressArea::ProgressArea(QWidget* parent)
 }
 
 void ProgressArea::ShowRunning(const RunningCommand& running) {
-  if (running.Active()) setTitle(QString::fromStdString(running.What()));
+  const std::string& title = running.Active() ? running.What() : running.Stopped();
+  if (!title.empty()) setTitle(QString::fromStdString(title));
 }
 
 void ProgressArea::SharePlace(QStackedLayout& place, QWidget* other) {

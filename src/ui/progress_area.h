@@ -19,7 +19,7 @@ class ProgressArea : public FrameBox, public CommandProgressView {
 
   // Puts `other` and this area into `place`. `other` is shown while this is not, and first.
   void SharePlace(QStackedLayout& place, QWidget* other);
-  // Names what runs in the frame's title, until the next command.
+  // Names what runs in the frame's title, until the next command; or where it stopped without showing an outcome.
   void ShowRunning(const RunningCommand& running);
 
   void ShowProgress(bool shown) override;

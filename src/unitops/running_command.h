@@ -24,10 +24,15 @@ class RunningCommand {
 
   // `which` runs from now on; `what` as above.
   void Begin(UnitCommand which, std::string what) { Change(which, std::move(what)); }
-  // Does nothing when nothing runs.
-  void End() {
-    if (Active()) Change(UnitCommand::kNone, {});
+  // Does nothing when nothing runs. `stopped`: where it stopped, and why, when no outcome is shown ("Stopped: channel
+  // 3: 305 to 2695 cannot be sent").
+  void End(std::string stopped = {}) {
+    if (!Active()) return;
+    stopped_ = std::move(stopped);
+    Change(UnitCommand::kNone, {});
   }
+  // Where the command that ended last stopped; empty for one that showed its outcome.
+  const std::string& Stopped() const { return stopped_; }
 
  private:
   void Change(UnitCommand which, std::string what) {
@@ -38,6 +43,7 @@ class RunningCommand {
 
   UnitCommand which_ = UnitCommand::kNone;
   std::string what_;
+  std::string stopped_;  // meaningful while no command is under way
   std::function<void()> observer_;
 };
 

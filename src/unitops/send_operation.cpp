@@ -78,7 +78,8 @@ void SendOperation::OnNextPort() {
 bool SendOperation::EncodeAndSendPort(std::uint8_t port_index) {
   const auto encoded = EncodeOptions(working_.At(port_index));
   if (const auto* invalid = std::get_if<InvalidRecord>(&encoded)) {
-    context_.running.End();
+    context_.running.End("Stopped: channel " + std::to_string(port_index + 1) + ": " + invalid->field +
+                         " cannot be sent");
     context_.boxes.Show({invalid->text, "Internal Error", BoxIcon::kNone});
     return false;
   }
