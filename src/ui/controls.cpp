@@ -1,18 +1,55 @@
 #include "ui/controls.h"
 
 #include <QAbstractButton>
+#include <QGuiApplication>
+#include <QKeyEvent>
 #include <QPainter>
 #include <QPalette>
 #include <QSignalBlocker>
 #include <QStyleOptionGroupBox>
 #include <QWheelEvent>
 #include <algorithm>
+#include <utility>
 
 #include "config/channel_config.h"
 
 namespace tendril {
 
 void CalmComboBox::wheelEvent(QWheelEvent* event) { event->ignore(); }
+
+void CalmComboBox::Choose(int line) {
+  if (!isEnabled()) return;
+  hidePopup();
+  setCurrentIndex(line);
+  Q_EMIT activated(line);
+}
+
+PressableText::PressableText(std::function<void()> pressed) : pressed_(std::move(pressed)) {
+  setReadOnly(true);
+  // Selected, it would look as if it could be typed over.
+  connect(this, &QLineEdit::selectionChanged, this, &QLineEdit::deselect);
+}
+
+void PressableText::Press() {
+  if (isEnabled()) pressed_();
+}
+
+void PressableText::mousePressEvent(QMouseEvent* event) {
+  if (event->button() == Qt::LeftButton) {
+    Press();
+  } else {
+    QLineEdit::mousePressEvent(event);
+  }
+}
+
+void PressableText::keyPressEvent(QKeyEvent* event) {
+  const int key = event->key();
+  if (key == Qt::Key_Return || key == Qt::Key_Enter || key == Qt::Key_Space) {
+    Press();
+  } else {
+    QLineEdit::keyPressEvent(event);
+  }
+}
 
 CalmSpinBox::CalmSpinBox(QWidget* parent) : QSpinBox(parent) {
   setKeyboardTracking(false);
@@ -26,8 +63,14 @@ CalmSpinBox::CalmSpinBox(QWidget* parent) : QSpinBox(parent) {
 void CalmSpinBox::Show(const BoundedValue& value) {
   const QSignalBlocker silent(this);
   shown_ = value;
-  if (!held_) ApplyLimits();
+  if (!ArrowHeld()) ApplyLimits();
   setValue(value.Value());
+}
+
+// New limits would end the arrow's repetition. The release is not seen here when a box has opened meanwhile: only the
+// mouse button itself says that it is over.
+bool CalmSpinBox::ArrowHeld() const {
+  return pressed_ && QGuiApplication::mouseButtons().testFlag(Qt::LeftButton);
 }
 
 void CalmSpinBox::ApplyLimits() {
@@ -37,13 +80,13 @@ void CalmSpinBox::ApplyLimits() {
 }
 
 void CalmSpinBox::mousePressEvent(QMouseEvent* event) {
-  held_ = true;
+  pressed_ = true;
   QSpinBox::mousePressEvent(event);
 }
 
 void CalmSpinBox::mouseReleaseEvent(QMouseEvent* event) {
   QSpinBox::mouseReleaseEvent(event);
-  held_ = false;
+  pressed_ = false;
   const QSignalBlocker silent(this);
   ApplyLimits();
 }

@@ -5,11 +5,13 @@
 #include <QComboBox>
 #include <QGroupBox>
 #include <QLabel>
+#include <QLineEdit>
 #include <QPoint>
 #include <QSpinBox>
 #include <QString>
 #include <QWidget>
 #include <cstdint>
+#include <functional>
 
 #include "ui/model/bounded_value.h"
 
@@ -19,6 +21,9 @@ namespace tendril {
 class CalmComboBox : public QComboBox {
  public:
   using QComboBox::QComboBox;
+
+  // Does what the user's choice of `line` does, of the line that is chosen already too. Nothing while it is disabled.
+  void Choose(int line);
 
  protected:
   void wheelEvent(QWheelEvent* event) override;
@@ -40,9 +45,28 @@ class CalmSpinBox : public QSpinBox {
 
  private:
   void ApplyLimits();
+  bool ArrowHeld() const;
 
   BoundedValue shown_;
-  bool held_ = false;  // an arrow may be: new limits would end its repetition
+  bool pressed_ = false;  // the mouse button went down on it; it may have come up on something else
+};
+
+// A text that cannot be edited, but pressed: with the left mouse button, Enter or the space bar.
+class PressableText : public QLineEdit {
+ public:
+  // `pressed` is what a press does.
+  explicit PressableText(std::function<void()> pressed);
+
+  // Does what a press does. Nothing while it is disabled.
+  void Press();
+
+ protected:
+  void mousePressEvent(QMouseEvent* event) override;
+  void mouseDoubleClickEvent(QMouseEvent* event) override { mousePressEvent(event); }
+  void keyPressEvent(QKeyEvent* event) override;
+
+ private:
+  std::function<void()> pressed_;
 };
 
 // A group box that is painted several times as fast. A style may stretch the picture of a frame over the whole box;

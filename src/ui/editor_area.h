@@ -10,6 +10,8 @@
 #include <cstdint>
 #include <functional>
 #include <optional>
+#include <string>
+#include <vector>
 
 #include "config/channel_config.h"
 #include "simulator/servo_simulator.h"
@@ -41,6 +43,8 @@ class EditorArea : public QWidget, public ChannelChoice {
   void ShowEditor();
   // Shows Values() on the large simulator, with the arm at `arm`.
   void UpdateSimulator(Microseconds arm);
+  // Shows what is to be said about the records.
+  void ShowRemarks(const std::vector<std::string>& sentences) { parameters_->ShowRemarks(sentences); }
   // Moves the arm alone.
   void MoveArm(Microseconds arm);
 

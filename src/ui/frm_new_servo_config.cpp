@@ -37,7 +37,11 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
                        CommitTyping();
                        return live_test_.MakeWay();
                      },
-                 .replaced = [this] { OnReplaced(); }}),
+                 .replaced =
+                     [this] {
+                       remarks_.AcceptRecords();
+                       OnReplaced();
+                     }}),
       command_area_(new CommandArea(commands_, *connection_, command_buttons_, [this] { ShowSummary(); })),
       apply_boxes_(new ApplyBoxes(channel_editor_, [this] { OnApplied(); })),
       channels_(new ChannelStrip(working_)),
@@ -124,6 +128,7 @@ void frmNewServoConfig::StartUp(const Version& version) {
   editor_->ListPresets();
   for (std::size_t slot = 0; slot < kPortCount; ++slot)
     SetFromPreset(kPresets[kStartPreset], working_.At(slot));
+  remarks_.AcceptRecords();
   connection_->ListCommPorts();
   control_panel_.ReadPreferences();
   control_panel_.InitializeCommListenerInterface();
@@ -146,6 +151,16 @@ void frmNewServoConfig::ShowEditor() {
   freeze.SetForm(this);
   editor_->ShowEditor();
   if (actuals_ != nullptr) actuals_->SetValues(channel_editor_.WorkingValues());
+  ShowRemarks();
+}
+
+void frmNewServoConfig::ShowRemarks() {
+  const auto sentences = remarks_.Sentences(!SummaryShown());
+  if (SummaryShown()) {
+    summary_->ShowRemarks(sentences);
+  } else {
+    editor_->ShowRemarks(sentences);
+  }
 }
 
 void frmNewServoConfig::ShowActuals(const QWidget& label) {
@@ -154,6 +169,7 @@ void frmNewServoConfig::ShowActuals(const QWidget& label) {
 
 // The person has edited a parameter.
 void frmNewServoConfig::OnEdited(FollowUp follow_up) {
+  remarks_.AcceptEdit();
   ShowEditor();
   switch (follow_up) {
     case FollowUp::kUpdateSimulators:
@@ -167,6 +183,8 @@ void frmNewServoConfig::OnEdited(FollowUp follow_up) {
 
 // The person has clicked an apply box.
 void frmNewServoConfig::OnApplied() {
+  remarks_.AcceptEdit();
+  ShowRemarks();
   if (channel_editor_.Channel()) simulators_.UpdateSimulators(live_test_.ShownPosition());
 }
 
@@ -185,6 +203,7 @@ void frmNewServoConfig::OnKindChosen(std::int16_t kind) {
 void frmNewServoConfig::OnPresetChosen(std::size_t preset) {
   QGuiApplication::setOverrideCursor(Qt::WaitCursor);
   channel_editor_.ApplyPreset(kPresets.at(preset));
+  remarks_.AcceptRecords();
   ShowRecords();
   QGuiApplication::restoreOverrideCursor();
 }
@@ -200,7 +219,9 @@ void frmNewServoConfig::ShowRecords() {
 void frmNewServoConfig::OnReplaced() {
   channel_editor_.ReloadChannel();
   ShowRecords();
-  if (SummaryShown()) summary_->ShowRecords();
+  if (!SummaryShown()) return;
+  summary_->ShowRecords();
+  ShowRemarks();
 }
 
 // What is being typed counts from now on: a key can set off what uses it without taking the focus away.
@@ -226,6 +247,7 @@ void frmNewServoConfig::OnSummaryScreen() {
   command_area_->ShowSummaryButton(false);
   apply_boxes_->ShowEditing(false);
   summary_->TakeFocus();
+  ShowRemarks();
 }
 
 void frmNewServoConfig::ShowConfig() {
@@ -275,8 +297,14 @@ bool frmNewServoConfig::eventFilter(QObject* object, QEvent* event) {
 
 void frmNewServoConfig::MakeUnseenParts() {
   if (summary_ != nullptr) return;
-  summary_ = new SummaryArea(
-      commands_, command_buttons_, timers_, working_, [this] { ShowConfig(); }, views_);
+  summary_ = new SummaryArea(commands_, command_buttons_, timers_, working_,
+                             {.back = [this] { ShowConfig(); },
+                              .edited =
+                                  [this](std::size_t channel) {
+                                    remarks_.AcceptRecord(channel);
+                                    ShowRemarks();
+                                  }},
+                             views_);
   summary_->SetRangeCaptions(QStringLiteral("1000--2000"));
   views_->addWidget(summary_);
   actuals_ = new ActualsFrame(timers_, *this);

@@ -21,6 +21,7 @@
 #include "ui/editor_area.h"
 #include "ui/live_test_area.h"
 #include "ui/model/channel_editor.h"
+#include "ui/model/record_remarks.h"
 #include "ui/progress_area.h"
 #include "ui/simulators.h"
 #include "ui/summary_area.h"
@@ -66,6 +67,7 @@ class frmNewServoConfig : public QWidget {
   void OnKindChosen(std::int16_t kind);
   void OnPresetChosen(std::size_t preset);
   void ShowRecords();
+  void ShowRemarks();
   void OnReplaced();
   void CommitTyping();
   void ShowSummary();
@@ -80,6 +82,7 @@ class frmNewServoConfig : public QWidget {
   ControlPanel& control_panel_;
   ChannelTable working_;
   ChannelEditor channel_editor_{working_};
+  RecordRemarks remarks_{working_, channel_editor_};
   PortSelection ports_;
   CommandButtons command_buttons_;
 

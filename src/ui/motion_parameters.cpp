@@ -96,7 +96,8 @@ MotionParameters::MotionParameters(ChannelEditor& editor, Events events,
     : FrameBox(QStringLiteral("Motion Parameters"), parent),
       editor_(editor),
       events_(std::move(events)),
-      lblActPulseLeft_(Named(BoldLabel({}), QStringLiteral("lblActPulseLeft"))) {
+      lblActPulseLeft_(Named(BoldLabel({}), QStringLiteral("lblActPulseLeft"))),
+      remarks_(Named(new RemarksLabel, ArrayName(QStringLiteral("lblRemarks"), 0))) {
   auto* grid = new QGridLayout(this);
   grid->setContentsMargins(12, 8, 12, 8);
   grid->setHorizontalSpacing(10);
@@ -125,6 +126,7 @@ MotionParameters::MotionParameters(ChannelEditor& editor, Events events,
   }
   grid->setColumnStretch(kName, 2);
   grid->setColumnStretch(kRightValue, 1);
+  grid->addWidget(remarks_, kLastRow, kName, 1, kTest - kName + 1, Qt::AlignBottom);
   grid->setRowStretch(kLastRow, 1);
 
   for (QLabel* label : {bracket, captions_[static_cast<std::size_t>(Parameter::kVirtualRange)],

@@ -5,9 +5,12 @@
 #include <QPushButton>
 #include <array>
 #include <functional>
+#include <string>
+#include <vector>
 
 #include "ui/controls.h"
 #include "ui/model/channel_editor.h"
+#include "ui/remarks_label.h"
 #include "unitops/live_test.h"
 
 namespace tendril {
@@ -27,6 +30,8 @@ class MotionParameters : public FrameBox {
 
   // Shows values, limits and captions. Runs no handler.
   void ShowValues();
+  // Shows what is to be said about the records.
+  void ShowRemarks(const std::vector<std::string>& sentences) { remarks_->ShowRemarks(sentences); }
 
  protected:
   bool eventFilter(QObject* object, QEvent* event) override;
@@ -37,6 +42,7 @@ class MotionParameters : public FrameBox {
   std::array<CalmSpinBox*, kParameterCount> spins_{};
   std::array<QLabel*, kParameterCount> captions_{};
   QLabel* lblActPulseLeft_;
+  RemarksLabel* remarks_;
 };
 
 }  // namespace tendril

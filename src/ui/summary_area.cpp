@@ -3,7 +3,6 @@
 #include <QFrame>
 #include <QHBoxLayout>
 #include <QKeyEvent>
-#include <QMouseEvent>
 #include <QPushButton>
 #include <QRadioButton>
 #include <QVBoxLayout>
@@ -100,8 +99,8 @@ QLabel* MakeCaption(const char* text) {
 }  // namespace
 
 SummaryArea::SummaryArea(UnitCommands& commands, CommandButtons& buttons, TimerFactory& timers,
-                         ChannelTable& working, std::function<void()> back, QWidget* parent)
-    : QWidget(parent), working_(working), editor_(working) {
+                         ChannelTable& working, Events events, QWidget* parent)
+    : QWidget(parent), working_(working), editor_(working), events_(std::move(events)) {
   auto* column = new QVBoxLayout(this);
   column->setContentsMargins(0, 0, 0, 0);
   auto* table_area = new QWidget;
@@ -112,14 +111,18 @@ SummaryArea::SummaryArea(UnitCommands& commands, CommandButtons& buttons, TimerF
   AddHeader(table);
   for (int channel = 0; channel < static_cast<int>(kPortCount); ++channel) AddRow(table, channel);
   AddTrailer(table);
-  column->addLayout(MakeButtons(commands, buttons, std::move(back)));
+  column->addLayout(MakeButtons(commands, buttons));
   column->addStretch();
   entry_ = new NumberEntry(
-      editor_, timers, [this](std::size_t channel) { ShowTexts(channel); }, *window());
+      editor_, timers,
+      [this](std::size_t channel) {
+        ShowTexts(channel);
+        events_.edited(channel);
+      },
+      *window());
 }
 
-QLayout* SummaryArea::MakeButtons(UnitCommands& commands, CommandButtons& buttons,
-                                  std::function<void()> back) {
+QLayout* SummaryArea::MakeButtons(UnitCommands& commands, CommandButtons& buttons) {
   // The same actions as those of the unit commands above.
   auto* send = Named(new QPushButton(QStringLiteral("Send to Tendril")), QStringLiteral("Command3_3"));
   buttons.Add(send, kSendTip, [&commands] { commands.Send(); });
@@ -127,7 +130,7 @@ QLayout* SummaryArea::MakeButtons(UnitCommands& commands, CommandButtons& button
   buttons.Add(get, kGetTip, [&commands] { commands.Get(); });
   auto* simulator = Named(new QPushButton(QStringLiteral("Si&mulator")), QStringLiteral("cmdShowConfig"));
   Describe(simulator, QStringLiteral("Shows the servos and the editor again."));
-  QObject::connect(simulator, &QAbstractButton::clicked, this, std::move(back));
+  QObject::connect(simulator, &QAbstractButton::clicked, this, events_.back);
   auto* row = new QHBoxLayout;
   row->addStretch();
   for (QPushButton* button : {send, get, simulator}) row->addWidget(button);
@@ -156,16 +159,15 @@ void SummaryArea::AddRow(QGridLayout& table, int channel) {
   int column = kValueColumn;
   for (std::size_t value = 0; value < kValues.size(); ++value) {
     const QString caption = OnOneLine(kValues[value].caption);
-    auto* text = Named(new QLineEdit, ArrayName(QString::fromUtf8(kValues[value].text), channel));
-    text->setReadOnly(true);
+    auto* text = Named(new PressableText([this, value, slot = static_cast<std::size_t>(channel)] {
+                         entry_->OpenNumberEntry(slot, kValues[value].field, *rows_[slot].texts[value]);
+                       }),
+                       ArrayName(QString::fromUtf8(kValues[value].text), channel));
     text->setAlignment(Qt::AlignCenter);
     text->setAccessibleName(name + QStringLiteral(", ") + caption);
     Describe(text, QStringLiteral("%1 of channel %2, in µs. Press on it, or Enter, to change it.")
                        .arg(caption)
                        .arg(channel + 1));
-    text->installEventFilter(this);
-    // Selected, it would look as if it could be typed over.
-    QObject::connect(text, &QLineEdit::selectionChanged, text, &QLineEdit::deselect);
     LeaveWidthToColumn(text);
     KeepPlace(text);
     table.addWidget(text, line, column++);
@@ -242,20 +244,6 @@ void SummaryArea::ShowTexts(std::size_t channel) {
     rows_[channel].texts[value]->setText(texts[value]);
 }
 
-bool SummaryArea::eventFilter(QObject* object, QEvent* event) {
-  bool opens = false;
-  if (event->type() == QEvent::MouseButtonPress || event->type() == QEvent::MouseButtonDblClick) {
-    opens = static_cast<QMouseEvent*>(event)->button() == Qt::LeftButton;
-  }
-  if (event->type() == QEvent::KeyPress) {
-    const int key = static_cast<QKeyEvent*>(event)->key();
-    opens = key == Qt::Key_Return || key == Qt::Key_Enter || key == Qt::Key_Space;
-  }
-  if (!opens) return QWidget::eventFilter(object, event);
-  OpenEntryOf(*object);
-  return true;
-}
-
 void SummaryArea::keyPressEvent(QKeyEvent* event) {
   if (event->key() == Qt::Key_Escape) {
     entry_->Close();
@@ -272,17 +260,10 @@ void SummaryArea::TakeFocus() {
   }
 }
 
-void SummaryArea::OpenEntryOf(QObject& text) {
-  for (std::size_t channel = 0; channel < kPortCount; ++channel) {
-    for (std::size_t value = 0; value < kValues.size(); ++value) {
-      QLineEdit* candidate = rows_[channel].texts[value];
-      if (candidate == &text) entry_->OpenNumberEntry(channel, kValues[value].field, *candidate);
-    }
-  }
-}
-
 void SummaryArea::AddTrailer(QGridLayout& table) {
   AddFrame(table, QStringLiteral("frmSumTrailer"), kTrailerLine, 1);
+  remarks_ = Named(new RemarksLabel, ArrayName(QStringLiteral("lblRemarks"), 1));
+  table.addWidget(remarks_, kTrailerLine, kChannelColumn, 1, kPowerUpColumn - kChannelColumn, Qt::AlignTop);
   for (int option = 0; option < static_cast<int>(kOptions.size()); ++option) {
     auto* caption = Named(new QLabel(QString::fromUtf8(kOptions[static_cast<std::size_t>(option)].caption)),
                           ArrayName(QStringLiteral("lblParameters"), option));

@@ -1,6 +1,7 @@
 // The summary as a person meets it.
 #include <QAbstractButton>
 #include <QAccessible>
+#include <QGroupBox>
 #include <QLineEdit>
 #include <QRadioButton>
 #include <QSpinBox>
@@ -216,6 +217,7 @@ TEST_F(Summary, BackToTheSimulator_TheChannelIsTheEditorsAgain) {
 TEST_F(Summary, Get_FillsTheTableAndAnUnknownKindShowsNothing) {
   auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
   unit.SetPortOptions(2, {1, 70, 230, 90, 190, 95, 180, 130, 140});
+  unit.SetPortOptions(4, {1, 10, 249, 100, 200, 100, 200, 150, 150});
   unit.SetPortOptions(3, {0, 60, 240, 100, 200, 100, 200, 150, 150});
   ChooseByKeys("cmbNYX", 1);
   ShowSummary();
@@ -226,6 +228,12 @@ TEST_F(Summary, Get_FillsTheTableAndAnUnknownKindShowsNothing) {
   RunToTheEnd();
   EXPECT_EQ(Text("lblProgress"), "SUCCESS: Upload Complete");
   EXPECT_EQ(Cell("txtSumActualRange_1") + " " + Cell("txtSumNeutralPosition_1"), "700-2300 1400");
+  EXPECT_EQ(Cell("txtSumActualRange_3"), "305-2695");
+  EXPECT_EQ(
+      Text("lblRemarks_1"),
+      "⚠ Channel 3: output kind -1 cannot be sent\n⚠ Channel 4: 305 to 2695 cannot be sent\nand 1 more");
+  EXPECT_THAT(Find("lblRemarks_1").toolTip().toStdString(),
+              testing::HasSubstr("Channel 4: 100 to 2490 is shown as 305 to 2695"));
   EXPECT_FALSE(EntryShown());
   EXPECT_EQ(Record(2).PortType, -1);
   EXPECT_FALSE(Find("txtSumActualRange_2").isVisible());
@@ -235,6 +243,32 @@ TEST_F(Summary, Get_FillsTheTableAndAnUnknownKindShowsNothing) {
   for (const char* kind : {"optChannelType_0", "optChannelType_1", "optChannelType_2"}) {
     EXPECT_FALSE(Find<QRadioButton>(kind).isChecked());
   }
+  // A send stops at a record that cannot be sent, and says where.
+  Find<QRadioButton>("optChannelType_0").click();
+  EXPECT_EQ(Text("lblRemarks_0"),
+            "⚠ Channel 4: 305 to 2695 cannot be sent\n⚠ Channel 4: 100 to 2490 is shown as 305 to 2695");
+  const QPoint servo = Find("ServoSimulator2_0").mapTo(window_.get(), QPoint());
+  Click("Command3_0");
+  ASSERT_TRUE(world_.time.AdvanceUntil([&] { return !world_.boxes.shown.empty(); }, 20000));
+  EXPECT_EQ(world_.boxes.Take()[0].text, "Internal Error - Invalid ActualRange(1)=2695");
+  EXPECT_EQ(Find<QGroupBox>("frmProgress").title().toStdString(),
+            "Stopped: channel 4: 305 to 2695 cannot be sent");
+  ChooseByKeys("cmbPresets", 2);
+  EXPECT_EQ(Text("lblRemarks_0"), "");
+  EXPECT_EQ(Find("ServoSimulator2_0").mapTo(window_.get(), QPoint()), servo) << "the window jumps";
+}
+
+TEST_F(Summary, HeldArrow_GoesOnSteppingAndIsLetGoOfBehindABox) {
+  ShowSummary();
+  Click("txtSumNeutralPosition_3");
+  auto& spin = Find<QSpinBox>("spnSumValue_0");
+  const QPoint down(spin.width() - 5, spin.height() - 5);
+  QTest::mousePress(&spin, Qt::LeftButton, {}, down);
+  EXPECT_TRUE(QTest::qWaitFor([&] { return spin.value() <= -30; }, 5000));
+  spin.clearFocus();  // a box opens, and gets the release
+  QTest::mouseRelease(window_.get(), Qt::LeftButton);
+  QTest::keyClick(&spin, Qt::Key_Up);
+  EXPECT_EQ(spin.minimum(), -400);
 }
 
 }  // namespace

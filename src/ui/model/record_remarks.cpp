@@ -1,0 +1,37 @@
+#include "ui/model/record_remarks.h"
+
+#include <variant>
+
+#include "config/option_bytes.h"
+
+namespace tendril {
+
+void RecordRemarks::AcceptEdit() {
+  if (!editor_.Channel()) return;  // nothing was stored
+  for (std::size_t channel = 0; channel < kPortCount; ++channel) {
+    if (editor_.Ticked(channel)) given_.At(channel) = Shown(channel, true);
+  }
+}
+
+const ChannelConfig& RecordRemarks::Shown(std::size_t channel, bool editor_shown) const {
+  return editor_shown && editor_.Channel() == channel ? editor_.WorkingValues() : working_.At(channel);
+}
+
+std::vector<std::string> RecordRemarks::Sentences(bool editor_shown) const {
+  std::vector<std::string> sentences;
+  for (std::size_t channel = 0; channel < kPortCount; ++channel) {
+    const std::string start = "Channel " + std::to_string(channel + 1) + ": ";
+    const auto encoded = EncodeOptions(working_.At(channel));
+    if (const auto* invalid = std::get_if<InvalidRecord>(&encoded))
+      sentences.push_back(start + invalid->field + " cannot be sent");
+    const auto given = PulseFieldTexts(given_.At(channel));
+    const auto shown = PulseFieldTexts(Shown(channel, editor_shown));
+    for (std::size_t field = 0; field < given.size(); ++field) {
+      if (given[field].value == shown[field].value) continue;
+      sentences.push_back(start + given[field].InWords() + " is shown as " + shown[field].value);
+    }
+  }
+  return sentences;
+}
+
+}  // namespace tendril

@@ -1,0 +1,48 @@
+#include "ui/remarks_label.h"
+
+#include <QAccessible>
+
+namespace tendril {
+namespace {
+
+constexpr qsizetype kShownRemarks = 2;
+constexpr int kLines = 3;  // and how many more
+constexpr char kWhy[] =
+    "A unit holds pulse widths of 10 to 2550 µs. Editor and summary show the actual range about 1500 µs and "
+    "all else "
+    "inside it. Leaving a channel, and the summary, store what is shown.";
+
+}  // namespace
+
+void RemarksLabel::ShowRemarks(const std::vector<std::string>& sentences) {
+  QStringList all;
+  for (const std::string& sentence : sentences) all += QString::fromStdString(sentence);
+  QStringList lines;
+  for (const QString& sentence : all.first(std::min(all.size(), kShownRemarks)))
+    lines += QStringLiteral("⚠ ") + sentence;
+  if (all.size() > kShownRemarks) lines += QStringLiteral("and %1 more").arg(all.size() - kShownRemarks);
+  if (lines == lines_ && accessibleDescription() == all.join(QLatin1Char('\n'))) return;
+  lines_ = lines;
+  setAccessibleDescription(all.join(QLatin1Char('\n')));
+  setToolTip(all.isEmpty() ? QString()
+                           : accessibleDescription() + QStringLiteral("\n\n") + QString::fromUtf8(kWhy));
+  ShowLines();
+  if (all.isEmpty()) return;
+  QAccessibleEvent alert(this, QAccessible::Alert);  // read out by itself
+  QAccessible::updateAccessibility(&alert);
+}
+
+QSize RemarksLabel::sizeHint() const { return {0, kLines * fontMetrics().lineSpacing()}; }
+
+void RemarksLabel::resizeEvent(QResizeEvent* event) {
+  QLabel::resizeEvent(event);
+  ShowLines();
+}
+
+void RemarksLabel::ShowLines() {
+  QStringList fitting;
+  for (const QString& line : lines_) fitting += fontMetrics().elidedText(line, Qt::ElideRight, width());
+  setText(fitting.join(QLatin1Char('\n')));
+}
+
+}  // namespace tendril

@@ -1,0 +1,52 @@
+#include "ui/model/record_remarks.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+namespace tendril {
+namespace {
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+TEST(RecordRemarks, NameWhatCannotBeSentAndWhatLookingChanges) {
+  ChannelTable working;
+  for (std::size_t slot = 0; slot < kPortCount; ++slot)
+    SetFromPreset(kPresets[kStartPreset], working.At(slot));
+  ChannelEditor editor(working);
+  RecordRemarks remarks(working, editor);
+  remarks.AcceptRecords();
+  EXPECT_THAT(remarks.Sentences(true), IsEmpty());
+  editor.Change(Parameter::kActualRange, 300);  // of no channel
+  remarks.AcceptEdit();
+  EXPECT_THAT(remarks.Sentences(true), IsEmpty());
+
+  working.At(2).ActualRange = {600, 2410};
+  working.At(2).DefaultPosition = 2100;
+  working.At(4).DefaultPosition = 5;
+  remarks.AcceptRecords();
+  EXPECT_THAT(remarks.Sentences(true), ElementsAre("Channel 5: default position 5 cannot be sent"));
+  working.At(4).DefaultPosition = 1500;
+  remarks.AcceptRecord(4);
+  const auto changed = ElementsAre("Channel 3: 600 to 2410 is shown as 595 to 2405",
+                                   "Channel 3: default position 2100 is shown as 2000");
+  editor.SelectChannel(2);
+  EXPECT_THAT(remarks.Sentences(true), changed) << "while it is looked at";
+  EXPECT_THAT(remarks.Sentences(false), IsEmpty()) << "the record is still as it was";
+  editor.SelectChannel(0);
+  EXPECT_THAT(remarks.Sentences(true), changed) << "when it was left";
+
+  // Edits are meant: of the channel and of the ticked ones, as they are shown.
+  editor.SelectChannel(1);
+  editor.ClickApplyBox(2, true);
+  editor.Change(Parameter::kNeutralTrim, 100);
+  EXPECT_FALSE(remarks.Sentences(true).empty());
+  remarks.AcceptEdit();
+  EXPECT_THAT(remarks.Sentences(true), IsEmpty());
+  editor.SelectChannel(2);
+  EXPECT_THAT(remarks.Sentences(true),
+              ElementsAre("Channel 3: virtual range 1000 to 2000 is shown as 1100 to 2100"));
+}
+
+}  // namespace
+}  // namespace tendril
