@@ -10,6 +10,7 @@
 #include <QVBoxLayout>
 #include <optional>
 
+#include "ui/accessible_controls.h"
 #include "ui/freeze.h"
 
 namespace tendril {
@@ -25,7 +26,8 @@ constexpr std::int32_t kSummaryScreenMs = 20;
 
 frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes,
                                      ControlPanel& control_panel, const Version& version)
-    : link_(link),
+    : QWidget((InstallAccessibleControls(), nullptr)),
+      link_(link),
       timers_(timers),
       control_panel_(control_panel),
       ports_(link, boxes, control_panel),
