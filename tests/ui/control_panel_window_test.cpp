@@ -49,6 +49,7 @@ TEST_F(WindowAndControlPanel, PortThatItHolds_IsTakenAndGivenBackOnClosing) {
   EXPECT_FALSE(window_->close());
   QTest::keyClick(&Find("cmbNYX"), Qt::Key_Up);
   EXPECT_FALSE(link_.PortOpen());
+  EXPECT_EQ(panel_.control_panel.RequestedPort(), std::nullopt);
   EXPECT_THAT(panel_.PortRequests(), ElementsAre("3:0", "3:1"));
   EXPECT_TRUE(panel_.panel.Holds(3));
   world_.time.Advance(99);
@@ -65,26 +66,6 @@ TEST_F(WindowAndControlPanel, SecondCloseRequest_IsNotKeptWaiting) {
   EXPECT_FALSE(window_->close());
   EXPECT_TRUE(window_->close());
   EXPECT_EQ(panel_.PortRequests().back(), "3:1");
-}
-
-TEST_F(WindowAndControlPanel, RetryingClient_DoesNotDisturbACommand) {
-  panel_.panel.SetListener(PanelListener::kOff);
-  world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
-  ChooseByKeys("cmbNYX", 1);
-  world_.time.Advance(50);
-  const auto begin_ms = world_.time.ElapsedMs();
-  Click("Command3_0");
-  RunToTheEnd();
-  EXPECT_EQ(Text("lblProgress"), "SUCCESS: Send Complete!");
-  EXPECT_EQ(panel_.control_panel.Client().CLIError(), kCLISocketError);
-  const auto retrying_ms = world_.time.ElapsedMs() - begin_ms;
-  panel_.panel.SetListener(PanelListener::kOpen);
-  world_.time.Advance(1000);
-  EXPECT_TRUE(panel_.control_panel.Client().ReadyToTransmit());
-  const auto second_begin_ms = world_.time.ElapsedMs();
-  Click("Command3_0");
-  RunToTheEnd();
-  EXPECT_EQ(world_.time.ElapsedMs() - second_begin_ms, retrying_ms);
 }
 
 TEST_F(WindowAndControlPanel, OpenedList_FindsNewPortsAndSaysWhichDeviceEachIs) {

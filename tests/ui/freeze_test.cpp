@@ -4,7 +4,6 @@
 
 #include <QCoreApplication>
 #include <QTest>
-#include <memory>
 
 namespace tendril {
 namespace {
@@ -60,33 +59,6 @@ TEST_F(FreezeTest, WhileItLives_NothingIsPaintedAndThenWhatChangedOnce) {
   child_.update();
   Settle();
   EXPECT_EQ(child_.paints, 2) << "the window is back to normal";
-}
-
-TEST_F(FreezeTest, SeveralOnOneWindow_TheLastToEndLetsItPaint) {
-  for (const bool reverse_order : {true, false}) {
-    child_.paints = 0;
-    auto first = std::make_unique<Freeze>();
-    auto second = std::make_unique<Freeze>();
-    first->SetForm(&window_);
-    second->SetForm(&window_);
-    ChangeChild();
-    (reverse_order ? second : first).reset();
-    ChangeChild();
-    EXPECT_EQ(child_.paints, 0) << reverse_order;
-    (reverse_order ? first : second).reset();
-    Settle();
-    EXPECT_EQ(child_.paints, 1) << reverse_order;
-  }
-}
-
-TEST_F(FreezeTest, FormDestroyedMeanwhile_EndsWithoutTouchingIt) {
-  Freeze freeze;
-  auto form = std::make_unique<QWidget>();
-  freeze.SetForm(form.get());
-  form.reset();
-  freeze.SetForm(&window_);
-  ChangeChild();
-  EXPECT_EQ(child_.paints, 0);
 }
 
 }  // namespace

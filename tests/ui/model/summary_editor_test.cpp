@@ -108,35 +108,5 @@ TEST_F(SummaryEditorTest, Entries_OpenWithTheFirstLimitsAndNarrowAtTheFirstChang
   EXPECT_EQ(record.DefaultPosition, 1650) << "pushed in by the stop";
 }
 
-TEST_F(SummaryEditorTest, Trim_LeavesThePositionsWhereTheyAre) {
-  ChannelConfig& record = working_.At(0);
-  record.VirtualStops = {1200, 1800};
-  record.DefaultPosition = 1650;
-  summary_.OpenNumberEntry(0, SummaryField::kNeutralTrim);
-  summary_.ChangeEntry(0, 100);
-  EXPECT_EQ(record.NeutralPosition, 1600);
-  EXPECT_EQ(record.VirtualRange, (PulsePair{1100, 2100}));
-  EXPECT_EQ(record.VirtualStops, (PulsePair{1200, 1800}));
-  EXPECT_EQ(record.DefaultPosition, 1650);
-}
-
-TEST_F(SummaryEditorTest, Changes_GoToTheRowsRecordAndOnlyWhileItsEntryIsOpen) {
-  const ChannelTable before = working_;
-  summary_.ChangeEntry(0, 300);
-  EXPECT_EQ(working_, before);
-  EXPECT_EQ(summary_.Title(), "");
-  summary_.OpenNumberEntry(5, SummaryField::kActualRange);
-  summary_.CloseNumberEntry();
-  EXPECT_EQ(summary_.Readings(), Readings{});
-  summary_.ChangeEntry(0, 300);
-  EXPECT_EQ(working_, before);
-  summary_.OpenNumberEntry(5, SummaryField::kActualRange);
-  summary_.ChangeEntry(0, 300);
-  for (std::size_t channel = 0; channel < kPortCount; ++channel) {
-    EXPECT_EQ(working_.At(channel) == before.At(channel), channel != 5);
-  }
-  EXPECT_EQ(working_.At(5).VirtualRange, (PulsePair{1200, 1800}));
-}
-
 }  // namespace
 }  // namespace tendril
