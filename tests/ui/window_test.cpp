@@ -64,7 +64,9 @@ TEST_F(Window, FreshStart_ShowsTheDefaultConfiguration) {
 }
 
 TEST_F(Window, Simulators_ShowTheRecordsAndKeepThemOverAResize) {
+  const double large_range = Find<ServoSimulator>("ServoSimulator1").dial().range_start();
   const auto expect_shown = [&] {
+    EXPECT_EQ(Find<ServoSimulator>("ServoSimulator1").dial().range_start(), large_range);
     for (int channel = 0; channel < 8; ++channel) {
       const auto& simulator = Find<ServoSimulator>(("ServoSimulator2_" + std::to_string(channel)).c_str());
       ServoDial wanted;
