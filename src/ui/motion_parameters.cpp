@@ -126,7 +126,7 @@ MotionParameters::MotionParameters(ChannelEditor& editor, Events events,
   }
   grid->setColumnStretch(kName, 2);
   grid->setColumnStretch(kRightValue, 1);
-  grid->addWidget(remarks_, kLastRow, kName, 1, kTest - kName + 1, Qt::AlignBottom);
+  grid->addWidget(remarks_, kLastRow, kName, 1, kTest - kName + 1, Qt::AlignTop);
   grid->setRowStretch(kLastRow, 1);
 
   for (QLabel* label : {bracket, captions_[static_cast<std::size_t>(Parameter::kVirtualRange)],

@@ -3,6 +3,7 @@
 #include <QFrame>
 #include <QHBoxLayout>
 #include <QKeyEvent>
+#include <QPainter>
 #include <QPushButton>
 #include <QRadioButton>
 #include <QVBoxLayout>
@@ -71,9 +72,19 @@ void SetUpColumns(QGridLayout& table) {
   }
 }
 
+// A thin outline. It keeps clear of the edge, which is cut where a pixel is no whole number of device pixels.
+class Outline : public QFrame {
+ protected:
+  void paintEvent(QPaintEvent* /*event*/) override {
+    QPainter painter(this);
+    painter.setPen(QPen(palette().color(QPalette::Mid), 0));
+    painter.drawRect(rect().adjusted(1, 1, -2, -2));
+  }
+};
+
 // The frame of one or more lines, behind what stands in them.
-QFrame* AddFrame(QGridLayout& table, const QString& name, int line, int lines) {
-  auto* frame = Named(new QFrame, name);
+QFrame* AddFrame(QGridLayout& table, QFrame* frame, const QString& name, int line, int lines) {
+  frame->setObjectName(name);
   table.addWidget(frame, line, 0, lines, kLastColumn + 1);
   return frame;
 }
@@ -138,7 +149,7 @@ QLayout* SummaryArea::MakeButtons(UnitCommands& commands, CommandButtons& button
 }
 
 void SummaryArea::AddHeader(QGridLayout& table) {
-  AddFrame(table, QStringLiteral("frmSumHeader"), 0, kHeaderLines);
+  AddFrame(table, new QFrame, QStringLiteral("frmSumHeader"), 0, kHeaderLines);
   table.addWidget(MakeCaption("Actual Motion Parameters in µs"), 0, kValueColumn, 1,
                   kPowerUpColumn - kValueColumn);
   table.addWidget(MakeCaption("Power Up Params"), 0, kPowerUpColumn, 2, kLostCommColumn - kPowerUpColumn);
@@ -150,8 +161,7 @@ void SummaryArea::AddHeader(QGridLayout& table) {
 void SummaryArea::AddRow(QGridLayout& table, int channel) {
   Row& row = rows_[static_cast<std::size_t>(channel)];
   const int line = kHeaderLines + channel;
-  QFrame* frame = AddFrame(table, ArrayName(QStringLiteral("frmSumTable"), channel), line, 1);
-  frame->setFrameShape(QFrame::StyledPanel);
+  QFrame* frame = AddFrame(table, new Outline, ArrayName(QStringLiteral("frmSumTable"), channel), line, 1);
   frame->setSizePolicy(QSizePolicy::Preferred, QSizePolicy::Expanding);
   const QString name = QStringLiteral("CHAN %1").arg(channel + 1);
   table.addWidget(Named(BoldLabel(name), ArrayName(QStringLiteral("lblSumChannel"), channel)), line,
@@ -261,7 +271,7 @@ void SummaryArea::TakeFocus() {
 }
 
 void SummaryArea::AddTrailer(QGridLayout& table) {
-  AddFrame(table, QStringLiteral("frmSumTrailer"), kTrailerLine, 1);
+  AddFrame(table, new QFrame, QStringLiteral("frmSumTrailer"), kTrailerLine, 1);
   remarks_ = Named(new RemarksLabel, ArrayName(QStringLiteral("lblRemarks"), 1));
   table.addWidget(remarks_, kTrailerLine, kChannelColumn, 1, kPowerUpColumn - kChannelColumn, Qt::AlignTop);
   for (int option = 0; option < static_cast<int>(kOptions.size()); ++option) {

@@ -26,11 +26,12 @@ class RecordRemarks {
   // The user has edited in the editor: all that it shows of its channel is meant, and the ticked channels' records.
   void AcceptEdit();
 
-  // One sentence each, in the order of the channels. `editor_shown`: the editor's working values are what is shown of
-  // its channel; otherwise its record is.
+  // One sentence each: first what cannot be sent, then what differs, of the edited channel first. `editor_shown`: the
+  // editor's working values are what is shown of its channel; otherwise its record is.
   std::vector<std::string> Sentences(bool editor_shown) const;
 
  private:
+  void AddDifferences(std::size_t channel, bool editor_shown, std::vector<std::string>& sentences) const;
   // What is shown of `channel`, 0 to 7; only the pulse fields mean something.
   const ChannelConfig& Shown(std::size_t channel, bool editor_shown) const;
 
