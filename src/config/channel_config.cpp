@@ -19,7 +19,7 @@ std::array<PulseFieldText, 5> PulseFieldTexts(const ChannelConfig& record) {
   };
   return {{{"", range(record.ActualRange)},
            {"virtual range ", range(record.VirtualRange)},
-           {"virtual stops ", range(record.VirtualStops)},
+           {"stop range ", range(record.VirtualStops)},
            {"default position ", std::to_string(record.DefaultPosition)},
            {"neutral position ", std::to_string(record.NeutralPosition)}}};
 }

@@ -61,7 +61,7 @@ struct PulseFieldText {
   std::string_view name;
   std::string value;
 };
-// The pulse fields of `record`: actual range, virtual range, virtual stops, default position, neutral position.
+// The pulse fields of `record`: actual range, virtual range, stops, default position, neutral position.
 std::array<PulseFieldText, 5> PulseFieldTexts(const ChannelConfig& record);
 
 // A table of records with one slot more than there are ports; the last is never sent, received or shown.

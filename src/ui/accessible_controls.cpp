@@ -206,8 +206,9 @@ QAccessibleInterface* Create(const QString&, QObject* object) {
   if (auto* text = dynamic_cast<PressableText*>(object)) return new PressableTextAccessible(text);
   auto* view = qobject_cast<QAbstractItemView*>(object);
   if (view == nullptr || view->parent() == nullptr) return nullptr;
+  // The list stands in a frame of the box's. The box itself is not asked: it may be making the list just now.
   auto* box = dynamic_cast<CalmComboBox*>(view->parent()->parent());
-  return box != nullptr && box->view() == view ? new ListAccessible(view, *box) : nullptr;
+  return box != nullptr ? new ListAccessible(view, *box) : nullptr;
 }
 
 }  // namespace

@@ -1,9 +1,6 @@
 // What assistive technology's actions do, compared with what the mouse does.
-#include "ui/accessible_controls.h"
-
 #include <QAbstractItemView>
 #include <QAccessible>
-#include <QRadioButton>
 #include <QSignalSpy>
 
 #include "simulator/servo_simulator.h"

@@ -1,4 +1,4 @@
-// How the motion parameters of a channel lie to each other, and how a record holds them.
+// Constraints between the motion parameters of a channel, and how a record holds them.
 //
 //   actual half width a     ActualRange = 1500 -/+ a: always about the centre
 //   virtual half width v    at most a
@@ -35,8 +35,10 @@ struct Motion {
   void LimitDefault();
 };
 
-// The parameters as `record` gives them, whether they keep the bounds or not. Stops and default are measured
-// from the record's own neutral position, so that loading and storing it leaves it as it was.
+// The parameters as `record` gives them, whether they keep the bounds or not. Stored again, they put the actual range
+// about 1500 and the virtual range about the neutral position, each as wide as it was, with half the width rounded to
+// even: 600 to 2410 becomes 595 to 2405 (which a unit holds as 590 to 2400). Stops and default are measured from the
+// record's own neutral position, and stay where they are.
 Motion MotionOf(const ChannelConfig& record);
 // Sets the eight pulse fields of `record`, and no other.
 void StoreMotion(const Motion& motion, ChannelConfig& record);

@@ -44,8 +44,12 @@ TEST(RecordRemarks, NameWhatCannotBeSentAndWhatLookingChanges) {
   remarks.AcceptEdit();
   EXPECT_THAT(remarks.Sentences(true), IsEmpty());
   editor.SelectChannel(2);
+  working.At(0).NeutralPosition = 5;
   EXPECT_THAT(remarks.Sentences(true),
-              ElementsAre("Channel 3: virtual range 1000 to 2000 is shown as 1100 to 2100"));
+              ElementsAre("Channel 1: neutral position 5 cannot be sent",
+                          "Channel 3: virtual range 1000 to 2000 is shown as 1100 to 2100",
+                          "Channel 3: stop range 1000 to 2000 is shown as 1100 to 2000",
+                          "Channel 1: neutral position 1500 is shown as 5"));
 }
 
 }  // namespace
