@@ -8,9 +8,8 @@ namespace {
 constexpr qsizetype kShownRemarks = 2;
 constexpr int kLines = 3;  // and how many more
 constexpr char kWhy[] =
-    "A unit holds pulse widths of 10 to 2550 µs. Editor and summary show the actual range about 1500 µs and "
-    "all else "
-    "inside it. Leaving a channel, and the summary, store what is shown.";
+    "A unit holds pulse widths of 10 to 2550 µs. Editor and summary show the actual range about 1500 µs, "
+    "and all else inside it.\nLeaving a channel, and the summary, store what is shown.";
 
 }  // namespace
 

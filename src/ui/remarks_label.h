@@ -12,7 +12,7 @@ namespace tendril {
 // Keeps the room of its lines while there is nothing to say, so that nothing around it moves.
 class RemarksLabel : public QLabel {
  public:
-  using QLabel::QLabel;
+  RemarksLabel() { setAlignment(Qt::AlignLeft | Qt::AlignTop); }
 
   // Shows the first two of `sentences`, a line each, and how many more there are. The tool tip and the accessible
   // description have all of them.
