@@ -180,7 +180,8 @@ TEST_F(HwSerialPoll, PortChangedInThePoll_NothingOfItReachesTheNewLine) {
   EXPECT_TRUE(link_.cmdPollStation(6, '0'));
   device_.TakeWrites();
   time_.Advance(500);
-  EXPECT_THAT(device_.TakeWrites(), ElementsAre(Bytes{0})) << "and nothing that was held back for the old one";
+  EXPECT_THAT(device_.TakeWrites(), ElementsAre(Bytes{0}))
+      << "and nothing that was held back for the old one";
 }
 
 TEST_F(HwSerialPoll, WhatCameBeforeThePoll_IsNoReply) {

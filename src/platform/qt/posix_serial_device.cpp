@@ -17,7 +17,7 @@ constexpr char kSource[] = "SerialDevice";
 constexpr int kDeadDeviceCheckMs = 1000;
 
 // What a device may leave waiting, in bytes, before it counts as stuck: half a minute of the slowest line.
-constexpr std::size_t kMaxWaitingOutput = 64 * 1024;
+constexpr std::size_t kMaxWaitingOutput = std::size_t{64} * 1024;
 
 // Bytes that are taken out of the system at once.
 constexpr std::size_t kPieceBytes = 4096;
