@@ -82,20 +82,19 @@ void ChannelEditor::RecalcParameters() {
   virtual_range.SetValue(motion.virtual_half_width);
   virtual_range.SetMaximum(motion.actual_half_width);
 
-  // A reversed virtual range has a negative half width, and needs as much room.
+  // A reversed virtual range has a negative half width, and reaches as far to each side.
   const int reach = std::abs(motion.virtual_half_width);
   const int trim_room = motion.actual_half_width - reach;
   motion.trim = std::clamp(motion.trim, -trim_room, trim_room);
   trim.SetValue(motion.trim);
   trim.SetLimits(-trim_room, trim_room);
 
-  motion.left_stop = std::min(motion.left_stop, reach);
-  motion.right_stop = std::max(motion.right_stop, -reach);
-  motion.LimitStops();
+  motion.left_stop = std::clamp(motion.left_stop, -reach, reach);
+  motion.right_stop = std::clamp(motion.right_stop, -reach, reach);
   left_stop.SetValue(motion.left_stop);
-  left_stop.SetMinimum(-motion.virtual_half_width);
+  left_stop.SetMinimum(-reach);
   right_stop.SetValue(motion.right_stop);
-  right_stop.SetMaximum(motion.virtual_half_width);
+  right_stop.SetMaximum(reach);
 
   motion.LimitDefault();
   default_position.SetMinimum(motion.left_stop);
