@@ -108,6 +108,9 @@ SerialTerminal::~SerialTerminal() {
 
 void SerialTerminal::Configure(std::int32_t baud) {
   const auto refuse = [&](const std::string& reason) {
+    if (HungUp()) {  // it went just now
+      throw RuntimeError(kErrInvalidPort, "There is no serial device at " + device_.string() + ".", kSource);
+    }
     throw RuntimeError(
         kErrSettingsRefused,
         device_.string() + " cannot be set to " + std::to_string(baud) + " bit/s: " + reason + ".", kSource);
