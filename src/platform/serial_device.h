@@ -23,7 +23,8 @@ inline constexpr std::size_t kSerialInputBufferBytes = 4050;
 
 // One serial port, with 8 data bits, no parity, one stop bit and no handshaking; bytes of all values pass unchanged,
 // zero too. Operations that need an open port raise kErrPortNotOpen (8012) on a closed one. Events are delivered
-// from the event loop, never from inside one of these calls, and none after Close() or destruction. No call blocks.
+// from the event loop, never from inside one of these calls, and none after Close() or destruction. No call waits for
+// the far end; a driver whose adapter has stalled may hold one for seconds all the same.
 //
 // A device that was lost counts as open until kDeviceLost has been delivered: what is written until then goes
 // nowhere, without a failure, and what had arrived can be read.
@@ -57,7 +58,8 @@ class SerialDevice {
   virtual void SetRts(bool asserted) = 0;
 
   // Queues all of `bytes` to be sent and starts sending at once; does not wait. Raises kErrDeviceIo, and queues
-  // none of them, when the system refuses them or the device has not taken what it was given for too long.
+  // none of them, when the system refuses them (what waited is dropped too) or the device has not taken what it was
+  // given for too long.
   virtual void Write(std::span<const std::uint8_t> bytes) = 0;
   // Takes all that has arrived up to this moment, also what the event loop has not seen yet; at most as much as
   // the input buffer holds, the rest stays for the next call.

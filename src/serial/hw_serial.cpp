@@ -90,6 +90,7 @@ void HwSerial::OpenPort() {
     device_.Open(opened_port_, opened_speed_);
     stage = "Setting RTS on";
     device_.SetRts(true);
+    line_released_ = false;
     port_open_ = true;
   } catch (...) {
     const RuntimeError fault = CurrentFault();
@@ -112,6 +113,7 @@ void HwSerial::SetRTS(bool asserted) {
   Traced("Trace: Let RTS", [&] {
     OpenPort();
     device_.SetRts(asserted);
+    line_released_ = false;  // the line is as the host wants it
   });
 }
 

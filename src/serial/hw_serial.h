@@ -217,6 +217,8 @@ class HwSerial {
   void OnPollTimer();
   void OnHeartbeatTimer();
   std::uint32_t PollTimeOutMs(std::uint8_t kind) const;
+  // Asserts RTS again after a reply, or before the next packet when the adapter refused it then.
+  void TakeLineBack() noexcept;
   // Whether the poll is out on the line that is open now: packets wait for it, and its reply is listened for.
   bool PollOnLine() const { return poll_ && !poll_->line_closed; }
   bool TakeReply();
@@ -240,6 +242,7 @@ class HwSerial {
   std::int16_t opened_port_ = 0;  // with which the port was last opened
   std::int32_t opened_speed_ = 0;
   bool port_open_ = false;
+  bool line_released_ = false;  // RTS was cleared for a reply, and has not been asserted since
 
   bool trace_output_ = false;
   bool in_test_mode_ = false;

@@ -165,6 +165,7 @@ void HwSerial::XmitData(std::span<const std::uint8_t> packet) {
     if (packet.back() != kFrameByte) held_back_.push_back(kFrameByte);
     return;
   }
+  if (line_released_) TakeLineBack();
   device_.Write(packet);
   Trace([&] { return "Write[" + std::to_string(clock_.NowMs()) + "](" + HexList(packet, ',') + ")"; });
 }

@@ -31,8 +31,8 @@ constexpr std::uint32_t kMaxPlausiblePads = 200;
 
 bool IsSlowKind(std::uint8_t kind) { return kind == '2' || kind == '1' || kind == 'A' || kind == 'o'; }
 
-// Runs what may fail because the device is going away. The loss shows by itself: the poll ends without a
-// reply, or the next operation fails to open the port.
+// Runs what may fail in the receive handling, where failures are ignored. They show by themselves: the poll ends
+// without a reply, or the next packet cannot be sent.
 template <typename Action>
 void IgnoreFailure(Action&& action) noexcept {
   try {
@@ -55,6 +55,7 @@ bool HwSerial::cmdPollStation(std::uint8_t unit, std::uint8_t kind) {
     device_.ClearInput();
     device_.SetReceiveThreshold(kPollReceiveThreshold);
     const Bytes packet = PollPacket(unit, kind, poll_pad_);
+    if (line_released_) TakeLineBack();
     device_.Write(packet);
     Trace([&] { return "POLL[" + std::to_string(poll_->start_ms) + "](" + HexList(packet, ',') + ")"; });
     poll_->time_out_ms = PollTimeOutMs(kind);
@@ -106,6 +107,7 @@ bool HwSerial::TakeReply() {
       case ReplyParser::Verdict::kNeedMore:
         break;
       case ReplyParser::Verdict::kEchoSeen:
+        line_released_ = true;
         IgnoreFailure([&] { device_.SetRts(false); });
         break;
       case ReplyParser::Verdict::kReplyComplete:
@@ -120,7 +122,7 @@ void HwSerial::CompletePoll() {
     return "Poll Took - " + std::to_string(clock_.NowMs() - poll_->start_ms) + "ms, received " +
            std::to_string(parser_.pads()) + " nulls";
   });
-  IgnoreFailure([&] { device_.SetRts(true); });
+  TakeLineBack();
   IgnoreFailure([&] { device_.Write(std::array{kFrameByte, kFrameByte}); });
   WriteHeldBack();
   const Poll poll = EndPoll();
@@ -163,7 +165,7 @@ void HwSerial::OnPollTimer() {
 
 void HwSerial::TimeOutPoll() {
   if (PollOnLine()) {
-    IgnoreFailure([&] { device_.SetRts(true); });
+    TakeLineBack();
     WriteHeldBack();
     // Before the host hears of it: the host may poll again, and must not find this byte in the middle.
     IgnoreFailure([&] { device_.Write(std::array{kFrameByte}); });
@@ -189,6 +191,13 @@ HwSerial::Poll HwSerial::EndPoll() {
   const Poll poll = *std::exchange(poll_, std::nullopt);
   device_.SetReceiveThreshold(kIdleReceiveThreshold);
   return poll;
+}
+
+void HwSerial::TakeLineBack() noexcept {
+  IgnoreFailure([&] {
+    device_.SetRts(true);
+    line_released_ = false;
+  });
 }
 
 void HwSerial::WriteHeldBack() {

@@ -210,6 +210,7 @@ TEST_F(HwSerialPoll, RtsOrWriteThatFails_KeepsNothingElseFromHappening) {
     device_.write_failure.reset();
     link_.SendUnlockCmd(5);
     EXPECT_THAT(device_.TakeWrites(), ElementsAre(Bytes{0, 5, 0x8A, 0x56, 0})) << "held back before";
+    EXPECT_TRUE(device_.rts) << "the line is taken back with the next packet";
   }
 }
 

@@ -32,7 +32,9 @@ EmulatedAdapter::LineSettings Decode(const termios2& settings) {
           .data_bits = 5 + static_cast<int>((settings.c_cflag & CSIZE) / CS6),
           .parity = (settings.c_cflag & PARENB) != 0,
           .stop_bits = (settings.c_cflag & CSTOPB) != 0 ? 2 : 1,
-          .handshaking = (settings.c_cflag & CRTSCTS) != 0 || (settings.c_iflag & (IXON | IXOFF)) != 0};
+          .handshaking = (settings.c_cflag & CRTSCTS) != 0 || (settings.c_iflag & (IXON | IXOFF)) != 0,
+          .receives_without_carrier = (settings.c_cflag & (CREAD | CLOCAL)) == (CREAD | CLOCAL),
+          .reads_at_once = settings.c_cc[VMIN] == 0 && settings.c_cc[VTIME] == 0};
 }
 
 int TurnRts(int descriptor, bool asserted) {
@@ -85,6 +87,9 @@ int AdapterIoctl(int descriptor, unsigned long request, void* argument) {
     case TCFLSH:
       adapter.flushes.push_back(static_cast<int>(reinterpret_cast<std::intptr_t>(argument)));
       break;
+    case TIOCOUTQ:
+      *static_cast<int*>(argument) = adapter.queued_output;
+      return 0;
     case TCGETS2: {
       const int result = RealIoctl(descriptor, request, argument);
       if (adapter.fixed_baud != 0) static_cast<termios2*>(argument)->c_ospeed = adapter.fixed_baud;
@@ -125,6 +130,14 @@ extern "C" ssize_t read(int descriptor, void* buffer, std::size_t size) {
     errno = EAGAIN;  // an old one: the read itself did not fail
   }
   return got;
+}
+
+extern "C" ssize_t write(int descriptor, const void* bytes, std::size_t size) {
+  using namespace tendril::test;
+  static auto* const real = Real<ssize_t(int, const void*, std::size_t)>("write");
+  if (!IsAdapter(descriptor) || Adapter().write_error == 0) return real(descriptor, bytes, size);
+  errno = Adapter().write_error;
+  return -1;
 }
 
 extern "C" int poll(pollfd* states, nfds_t count, int timeout_ms) {

@@ -100,7 +100,8 @@ SerialTerminal::SerialTerminal(const std::filesystem::path& device, std::int32_t
 }
 
 SerialTerminal::~SerialTerminal() {
-  // Otherwise the system goes on sending what is queued, and keeps the closing waiting for it.
+  // Otherwise the system goes on sending what is queued, and keeps the closing waiting for it. (Drivers of USB adapters
+  // have a queue of their own besides, which nothing empties.)
   Flush(descriptor(), TCIOFLUSH);
   if (before_) (void)Store(descriptor(), before_->values);
   (void)::ioctl(descriptor(), TIOCNXCL);
@@ -129,7 +130,8 @@ void SerialTerminal::Configure(std::int32_t baud) {
   if (!StoreWithSpeed(descriptor(), raw, baud)) refuse(Reason(errno));
 
   // A driver takes the nearest speed that it can do, and reports that one.
-  const std::int64_t speed = LineSpeed(descriptor());
+  if (!Load(descriptor(), raw)) refuse(Reason(errno));
+  const std::int64_t speed = Speed(raw);
   if (std::abs(speed - baud) * 100 > baud * kMaxSpeedErrorPercent) {
     refuse("the nearest that it does is " + std::to_string(speed));
   }

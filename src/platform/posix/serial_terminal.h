@@ -12,13 +12,14 @@
 namespace tendril {
 
 // A terminal device for this program alone, set to raw bytes with 8 data bits, no parity, one stop bit and no
-// handshaking. No call blocks, also when the device takes nothing.
+// handshaking. No call waits for the device, also when it takes nothing. A driver may: that of a USB adapter which has
+// stalled holds a turn of RTS, and the closing while output is queued, for seconds.
 class SerialTerminal {
  public:
   // Opens `device` at `baud` bit/s; what had arrived before is dropped. Raises what SerialHold raises, and
   // kErrSettingsRefused when the device cannot do the speed.
   SerialTerminal(const std::filesystem::path& device, std::int32_t baud);
-  // Drops what waits in either direction, and puts back the settings that the device had.
+  // Drops what waits in either direction, and puts back the line settings that the device had.
   ~SerialTerminal();
   SerialTerminal(const SerialTerminal&) = delete;
   SerialTerminal& operator=(const SerialTerminal&) = delete;

@@ -17,6 +17,9 @@ constexpr char kSource[] = "SerialDevice";
 // A driver that lets a device go without a word is noticed within this time.
 constexpr int kDeadDeviceCheckMs = 1000;
 
+// As on the other systems.
+constexpr std::size_t kMaxWaitingOutput = std::size_t{64} * 1024;
+
 std::string CommName(std::int32_t number) { return "Comm " + std::to_string(number); }
 
 // Raises why `port` could not be opened, in the words of a user.
@@ -98,6 +101,8 @@ void WindowsSerialDevice::SetReceiveThreshold(std::int32_t bytes) { inbox_.SetRe
 void WindowsSerialDevice::SetRts(bool asserted) {
   QSerialPort& port = OpenPort();
   if (inbox_.LossNoted() || port.setRequestToSend(asserted)) return;
+  CheckForLoss();
+  if (inbox_.LossNoted()) return;
   if (port.error() == QSerialPort::UnsupportedOperationError) {
     TraceRts(CommName(number_) + " has no RTS line; its adapter has to turn the line around by itself.");
     return;
@@ -114,6 +119,9 @@ void WindowsSerialDevice::SetRts(bool asserted) {
 void WindowsSerialDevice::Write(std::span<const std::uint8_t> bytes) {
   QSerialPort& port = OpenPort();
   if (inbox_.LossNoted() || bytes.empty()) return;
+  if (static_cast<std::size_t>(port.bytesToWrite()) + bytes.size() > kMaxWaitingOutput) {
+    throw RuntimeError(kErrDeviceIo, CommName(number_) + " takes nothing.", kSource);
+  }
   port.write(reinterpret_cast<const char*>(bytes.data()), static_cast<qint64>(bytes.size()));
   port.flush();  // otherwise sending starts when the event loop is idle
 }
