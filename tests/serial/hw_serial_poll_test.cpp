@@ -153,16 +153,6 @@ TEST_F(HwSerialPoll, WhileOutstanding_PacketsWaitAndASecondPollIsRefused) {
   EXPECT_EQ(device_.TakeWrites().size(), 1u);
 }
 
-TEST_F(HwSerialPoll, HeldBackPackets_GoOutOnceAfterATimeOutToo) {
-  PollAndEcho('0');
-  link_.SendUnlockCmd(5);
-  time_.Advance(500);
-  EXPECT_THAT(device_.TakeWrites(), ElementsAre(Bytes{0, 5, 0x8A, 0x56, 0}, Bytes{0}, Bytes{0}));
-  PollAndEcho('0');
-  time_.Advance(500);
-  EXPECT_THAT(device_.TakeWrites(), ElementsAre(Bytes{0}));
-}
-
 TEST_F(HwSerialPoll, PortChangedInThePoll_NothingOfItReachesTheNewLine) {
   PollAndEcho('0');
   link_.SendUnlockCmd(5);
@@ -214,20 +204,6 @@ TEST_F(HwSerialPoll, RtsOrWriteThatFails_KeepsNothingElseFromHappening) {
   }
 }
 
-TEST_F(HwSerialPoll, HandlerMayPollAgain) {
-  on_reply_ = [&] {
-    on_reply_ = nullptr;
-    EXPECT_TRUE(link_.cmdPollStation(6, 'n'));
-  };
-  PollAndEcho('0');
-  time_.Advance(90);  // times out; the handler's own poll is only just under way
-  EXPECT_EQ(replies_.size(), 1u);
-  EXPECT_THAT(device_.TakeWrites(), ElementsAre(Bytes{0}, Bytes{0, 6, 0x88, 'n', 45, 0}));
-  EXPECT_TRUE(link_.PollOutstanding());
-  device_.Receive({0, 6, 0x88, 'n', 45, 0, 0xFE, 'n', 1, 0});
-  EXPECT_EQ(replies_.back(), (ReportedReply{true, 6, 'n', {1}}));
-}
-
 TEST_F(HwSerialPoll, WithoutAPoll_InputIsDiscarded) {
   link_.SetPortOpen(true);
   device_.Receive({0xFE, '0', 6, 10, 0});
@@ -257,18 +233,6 @@ TEST_F(HwSerialPoll, PollThatCannotBeWritten_IsUndone) {
   EXPECT_EQ(device_.receive_threshold, 4000);
   device_.write_failure.reset();
   EXPECT_TRUE(link_.cmdPollStation(5, '0'));
-}
-
-TEST_F(HwSerialPoll, DeviceLostInThePoll_EndsByTimeOutWithoutReopening) {
-  PollAndEcho('0');
-  link_.SendUnlockCmd(5);
-  device_.Close();
-  device_.Raise(SerialEvent::kDeviceLost);
-  device_.TakeActions();
-  time_.Advance(500);
-  EXPECT_THAT(replies_, ElementsAre(ReportedReply{false, 5, '0', {}}));
-  EXPECT_THAT(device_.TakeActions(), IsEmpty());
-  EXPECT_THAT(device_.TakeWrites(), IsEmpty());
 }
 
 TEST_F(HwSerialPoll, Trace_TellsTheTrafficWhileItIsOn) {

@@ -23,17 +23,6 @@ Verdict Feed(ReplyParser& parser, const Bytes& bytes) {
   return verdict;
 }
 
-TEST(ReplyParser, EchoPadsReply_AreToldApart) {
-  ReplyParser parser;
-  parser.Start(kUnit);
-  EXPECT_EQ(Feed(parser, kEcho), Verdict::kEchoSeen);
-  EXPECT_EQ(Feed(parser, {0, 0, 0, 0xFE, 0x65, 1, 2}), Verdict::kNeedMore);
-  EXPECT_EQ(parser.Push(0), Verdict::kReplyComplete);
-  EXPECT_EQ(parser.code(), 0x65);
-  EXPECT_EQ(parser.data(), (Bytes{1, 2}));
-  EXPECT_EQ(parser.pads(), 3u);
-}
-
 TEST(ReplyParser, WhatIsNoReply_IsPassedOver) {
   struct Case {
     std::string what;
@@ -67,14 +56,6 @@ TEST(ReplyParser, WhatIsNoReply_IsPassedOver) {
     EXPECT_EQ(Feed(parser, c.line), c.verdict) << c.what;
     EXPECT_EQ(parser.data(), c.data) << c.what;
   }
-}
-
-TEST(ReplyParser, UnitFE_TakesItsOwnEchoForTheReply) {
-  ReplyParser parser;
-  parser.Start(0xFE);
-  EXPECT_EQ(Feed(parser, {0, 0xFE, 0x88, 0x30, 0x2D, 0}), Verdict::kReplyComplete);
-  EXPECT_EQ(parser.code(), 0x88);
-  EXPECT_EQ(parser.data(), (Bytes{0x30, 0x2D}));
 }
 
 TEST(ReplyParser, OversizedReply_IsCutAndTheNextReplyStillDecodes) {
