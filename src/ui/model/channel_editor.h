@@ -22,9 +22,10 @@ enum class FollowUp { kUpdateSimulators, kRefreshLivePosition };
 // Holds the working values of the channel that is edited. They keep the bounds of Motion at all times, and each
 // spin button's limits follow the others'. Whatever record is loaded, a unit can hold the working values: the actual
 // half width is 0 to kMaxHalfWidth, and all else lies within the actual range. A reversed virtual range (high end
-// first), and stops that lie on one side of the neutral position, are kept within it. The record gets of an edit only the edited parameter's own fields; all
-// eight when the channel is left, or when an apply box is clicked. Until the first SelectChannel() no channel is
-// edited, and nothing is stored.
+// first), and stops that lie on one side of the neutral position, are kept within it.
+//
+// The record gets of an edit only the edited parameter's own fields; all eight when the channel is left, or when an
+// apply box is clicked. Until the first SelectChannel() no channel is edited, and nothing is stored.
 class ChannelEditor {
  public:
   // `working` are the records, which must outlive the editor. The spin buttons have the values of the start.
