@@ -8,17 +8,17 @@
 #include <string_view>
 
 #include "platform/paths.h"
+#include "platform/process_list.h"
 
 namespace tendril {
 namespace {
 
 // How a program that looks for a running Control Panel finds this one.
 #ifdef __linux__
-constexpr char kOnTheName[] =
-    "\n\nWith a Control Panel, the list of processes shows the bench as NyxTray.exe.";
+constexpr char kOnTheName[] = "\n\nWith a Control Panel, the list of processes shows the bench as %1.";
 #else
 constexpr char kOnTheName[] =
-    "\n\nA program that looks for a running Control Panel looks for NyxTray.exe, and this system has no call "
+    "\n\nA program that looks for a running Control Panel looks for %1, and this system has no call "
     "that\nchanges a process's name: copy the bench to a file of that name and run the copy.";
 #endif
 
@@ -145,7 +145,7 @@ BenchOptions ParseBenchOptions(const QCoreApplication& application) {
            "line is\n"
            "a pseudo-terminal; its link makes it a comm port of the utility.\n\nFaults:") +
       ListOfFaults() + text("\n\nBehaviours of the Control Panel:") + ListOfPanelBehaviours() +
-      text(kOnTheName) +
+      text(kOnTheName).arg(text(kControlPanelProgram)) +
       text("\n\nEnds with 0 when it is stopped, with 1 for options that make no sense, and with 2 when the "
            "device,\n"
            "its link or the TCP port cannot be had."));

@@ -5,6 +5,7 @@
 
 #include "bench/panel_printer.h"
 #include "platform/runtime_error.h"
+#include "platform/serial_device.h"
 
 namespace tendril {
 namespace {
@@ -16,7 +17,7 @@ constexpr int kRetryMs = 500;
 BenchPanel::BenchPanel(const BenchPanelOptions& options, const PseudoTerminal& terminal, TimerFactory& timers,
                        std::function<void(const std::string&)> print)
     : terminal_(terminal),
-      comm_port_("Comm " + std::to_string(options.comm_port)),
+      comm_port_(CommName(options.comm_port)),
       print_(std::move(print)),
       panel_(timers),
       server_(panel_, options.tcp_port,

@@ -21,6 +21,7 @@
 #include "bench/line_printer.h"
 #include "bench/panel_printer.h"
 #include "config/option_bytes.h"
+#include "platform/hex_text.h"
 
 namespace tendril {
 namespace {
@@ -114,15 +115,13 @@ class Actor {
 
 // Compares port by port, and prints what the unit holds.
 bool AreEqual(const VirtualUnit& unit, const ChannelTable& shown) {
-  char id[3];
-  std::snprintf(id, sizeof id, "%02X", unit.id());
   bool all_equal = true;
   for (int port = 1; port <= kUnitPorts; ++port) {
     const PortOptionBytes& held = unit.PortOptions(port);
     const auto encoded = EncodeOptions(shown.At(static_cast<std::size_t>(port - 1)));
     const auto* bytes = std::get_if<OptionBytes>(&encoded);
     const bool equal = bytes != nullptr && *bytes == held;
-    std::string line = "Port " + std::to_string(port) + " of unit " + id + " holds";
+    std::string line = "Port " + std::to_string(port) + " of unit " + HexByte(unit.id()) + " holds";
     for (const std::uint8_t byte : held) line += " " + std::to_string(byte);
     Print(line + (equal ? "" : "   NOT what the window shows"));
     all_equal = all_equal && equal;

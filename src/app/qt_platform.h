@@ -4,14 +4,14 @@
 #include <string>
 
 #include "platform/qt/fault_handler.h"
-#include "platform/qt/qt_clock.h"
 #include "platform/qt/qt_message_boxes.h"
 #include "platform/qt/qt_timer.h"
+#include "platform/steady_clock.h"
 
 namespace tendril {
 
 struct QtPlatform {
-  QtClock clock;
+  SteadyClock clock;
   QtMessageBoxes boxes;
   // A failure that no part of the program could handle is shown, and the program goes on.
   FaultHandler on_fault = [this](const std::string& description) {

@@ -25,7 +25,9 @@
 #include "app/quit_on_signal.h"
 #include "bench/virtual_line.h"
 #include "bench/virtual_unit.h"
+#include "platform/hex_text.h"
 #include "platform/paths.h"
+#include "platform/process_list.h"
 #include "platform/qt/qt_timer.h"
 
 namespace tendril {
@@ -34,10 +36,6 @@ namespace {
 constexpr int kExitUsage = 1;
 constexpr int kExitSetup = 2;
 
-// The process's name in the list of processes, by which programs see that a Control Panel runs. (macOS has no
-// call for that; --help says what to do there.)
-constexpr char kPanelProcessName[] = "NyxTray.exe";
-
 void IntroducePanel(Console& console, const BenchPanelOptions& options, std::uint16_t tcp_port) {
   char registry_value[9];
   std::snprintf(registry_value, sizeof registry_value, "%08x", static_cast<unsigned>(tcp_port));
@@ -45,7 +43,7 @@ void IntroducePanel(Console& console, const BenchPanelOptions& options, std::uin
                 std::to_string(options.comm_port) + " until it is asked for it");
   console.Print("          in the registry: \"DMXListenerPort\"=dword:" + std::string(registry_value));
 #ifdef __linux__
-  console.Print("          in the list of processes: " + std::string(kPanelProcessName));
+  console.Print("          in the list of processes: " + std::string(kControlPanelProgram));
 #endif
   if (options.behaviour == nullptr) return;
   const std::string limit = options.misbehaving_replies
@@ -65,9 +63,7 @@ void Introduce(Console& console, const BenchOptions& options, const PseudoTermin
   if (!link.replaced().empty())
     console.Print("          which pointed to " + link.replaced().string() + " before");
   for (const BenchUnit& unit : options.units) {
-    char id[3];
-    std::snprintf(id, sizeof id, "%02X", unit.id);
-    console.Print("  unit    " + std::string(id) +
+    console.Print("  unit    " + HexByte(unit.id) +
                   (unit.fault == nullptr ? "" : "  " + std::string(unit.fault->description)));
   }
   if (panel != nullptr) IntroducePanel(console, *options.panel, panel->tcp_port());
@@ -101,8 +97,8 @@ int Run(QCoreApplication& application, const BenchOptions& options) {
       console.Flush();
     });
     if (!options.quiet) panel->ShowConnections([&] { return paced.NowUs(); });
-#ifdef __linux__
-    ::prctl(PR_SET_NAME, kPanelProcessName);
+#ifdef __linux__  // macOS has no call for this; --help says what to do there
+    ::prctl(PR_SET_NAME, kControlPanelProgram);
 #endif
   }
   // Last of all: who finds the link finds everything there.

@@ -39,7 +39,7 @@ constexpr std::uint8_t kPanelPort = 3;
 // The Control Panel runs, and nothing else does.
 class DemoProcesses final : public ProcessList {
  public:
-  bool IsRunning(std::string_view program) const override { return program == "NyxTray.exe"; }
+  bool IsRunning(std::string_view program) const override { return program == kControlPanelProgram; }
 };
 
 // Comm 1: two working units. Comm 2: one fresh from the factory. Comm 3: a working unit, held by the Control Panel

@@ -2,8 +2,11 @@
 
 #include <algorithm>
 #include <cstdio>
+#include <span>
 #include <string_view>
 #include <utility>
+
+#include "platform/hex_text.h"
 
 namespace tendril {
 namespace {
@@ -13,27 +16,18 @@ constexpr std::size_t kShownZeros = 4;       // in a row at the beginning
 constexpr std::uint64_t kSilenceUs = 2'000;  // zero bytes this far apart do not belong together
 constexpr std::size_t kHexWidth = 47;        // of a packet of 16 bytes, as those with a port's options are
 
-std::string Hex(std::uint8_t byte) {
-  char text[3];
-  std::snprintf(text, sizeof text, "%02X", byte);
-  return text;
-}
-
 // Many zero bytes at the beginning, the pads of a patient unit, are given as a count.
 std::string HexList(const Bytes& bytes) {
   const auto begin = std::find_if(bytes.begin(), bytes.end(), [](std::uint8_t byte) { return byte != 0; });
   const auto zeros = static_cast<std::size_t>(begin - bytes.begin());
-  std::size_t i = 0;
+  std::span<const std::uint8_t> rest = bytes;
   std::string text;
   if (zeros > kShownZeros) {
-    text = std::to_string(zeros) + " x 00";
-    i = zeros;
+    rest = rest.subspan(zeros);
+    text = std::to_string(zeros) + " x 00" + (rest.empty() ? "" : " ");
   }
-  for (const std::size_t shown = i + kShownBytes; i < std::min(bytes.size(), shown); ++i) {
-    if (!text.empty()) text += ' ';
-    text += Hex(bytes[i]);
-  }
-  if (i < bytes.size()) text += " ... (" + std::to_string(bytes.size()) + " bytes)";
+  text += HexBytes(rest.first(std::min(rest.size(), kShownBytes)));
+  if (rest.size() > kShownBytes) text += " ... (" + std::to_string(bytes.size()) + " bytes)";
   return text;
 }
 
@@ -42,14 +36,14 @@ std::string Kind(std::uint8_t kind) {
   return std::to_string(kind);
 }
 
-std::string Unit(std::uint8_t id) { return id == 0xFF ? "all units" : "unit " + Hex(id); }
+std::string Unit(std::uint8_t id) { return id == 0xFF ? "all units" : "unit " + HexByte(id); }
 
 std::string DescribeOption(const Bytes& packet, const std::string& unit) {
   if (packet.size() < 6) return "set option of " + unit + ", too short";
   const std::uint8_t option = packet[2];
   const std::uint8_t selector = packet[3];
   if (option == 17 && selector == 137) {
-    return "live position of " + unit + ": ports mask " + Hex(packet[4]) + ", " +
+    return "live position of " + unit + ": ports mask " + HexByte(packet[4]) + ", " +
            std::to_string(packet[5] * 10) + " us";
   }
   if (option == 17) return "set options of port " + std::to_string(selector) + " of " + unit;
@@ -72,7 +66,7 @@ std::string DescribeCommand(const Bytes& packet) {
     case 0x0A:
       return DescribeOption(packet, unit);
     case 0x0F:
-      return packet.size() > 2 ? "set ID of " + unit + " to " + Hex(packet[2])
+      return packet.size() > 2 ? "set ID of " + unit + " to " + HexByte(packet[2])
                                : "set ID of " + unit + ", too short";
     case 0x81:
       return "heartbeat to " + unit;
@@ -82,7 +76,7 @@ std::string DescribeCommand(const Bytes& packet) {
     case 0x8A:
       return "unlock " + unit;
     default:
-      return "command " + Hex(packet[1]) + " to " + unit;
+      return "command " + HexByte(packet[1]) + " to " + unit;
   }
 }
 
@@ -93,7 +87,7 @@ std::string DescribeReply(const Bytes& packet) {
   const std::string reply = "reply to " + Kind(kind) + ": ";
   if (kind == '0' && data.size() >= 2) return reply + (data[1] == 10 ? "acknowledged" : "nothing accepted");
   if (kind == 'n' && data.size() >= 10) return reply + "options of port " + std::to_string(data[0]);
-  if ((kind == '*' || kind == '+') && !data.empty()) return reply + "here is unit " + Hex(data[0]);
+  if ((kind == '*' || kind == '+') && !data.empty()) return reply + "here is unit " + HexByte(data[0]);
   return reply + std::to_string(data.size()) + " data bytes";
 }
 

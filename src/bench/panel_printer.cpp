@@ -4,6 +4,8 @@
 #include <cstdio>
 #include <optional>
 
+#include "platform/hex_text.h"
+
 namespace tendril {
 namespace {
 
@@ -11,12 +13,7 @@ constexpr std::size_t kShownBytes = 24;  // more than any frame but those with a
 constexpr std::size_t kHexWidth = 47;    // as on a serial line
 
 std::string HexList(std::span<const std::uint8_t> bytes) {
-  std::string text;
-  for (const std::uint8_t byte : bytes.first(std::min(bytes.size(), kShownBytes))) {
-    char hex[4];
-    std::snprintf(hex, sizeof hex, text.empty() ? "%02X" : " %02X", byte);
-    text += hex;
-  }
+  std::string text = HexBytes(bytes.first(std::min(bytes.size(), kShownBytes)));
   if (bytes.size() > kShownBytes) text += " ... (" + std::to_string(bytes.size()) + " bytes)";
   return text;
 }

@@ -132,7 +132,7 @@ bool VirtualPorts::Device::Exists(std::int32_t number) const {
 }
 
 void VirtualPorts::Device::Open(std::int32_t number, std::int32_t baud) {
-  const std::string name = "Comm " + std::to_string(number);
+  const std::string name = CommName(number);
   if (port_ != nullptr || lost_) throw Fault(kErrPortAlreadyOpen, "A port is open already.");
   if (!Exists(number)) throw Fault(kErrInvalidPort, name + " does not exist. Is its adapter plugged in?");
   if (baud <= 0) throw Fault(kErrSettingsRefused, name + " does not do " + std::to_string(baud) + " bit/s.");

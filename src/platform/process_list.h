@@ -5,12 +5,14 @@
 
 namespace tendril {
 
+// The Control Panel's program.
+inline constexpr char kControlPanelProgram[] = "NyxTray.exe";
+
 class ProcessList {
  public:
   virtual ~ProcessList() = default;
 
-  // Whether a program of this name, such as "NyxTray.exe", runs. Names are not case-sensitive. A system that
-  // does not answer counts as one on which it does not run.
+  // Whether a program of this name runs. Names are not case-sensitive. False when the system does not answer.
   virtual bool IsRunning(std::string_view program) const = 0;
 };
 

@@ -3,12 +3,10 @@
 #include <algorithm>
 #include <utility>
 
+#include "platform/ascii.h"
+
 namespace tendril {
 namespace {
-
-constexpr char16_t Folded(char16_t unit) {
-  return unit >= u'a' && unit <= u'z' ? static_cast<char16_t>(unit - u'a' + u'A') : unit;
-}
 
 // Cuts the first part off `path`.
 std::u16string_view NextPart(std::u16string_view& path) {
@@ -34,7 +32,7 @@ bool CanBeKey(std::u16string_view path) {
 
 bool RegistryNameLess::operator()(std::u16string_view a, std::u16string_view b) const {
   return std::lexicographical_compare(a.begin(), a.end(), b.begin(), b.end(),
-                                      [](char16_t x, char16_t y) { return Folded(x) < Folded(y); });
+                                      [](char16_t x, char16_t y) { return AsciiUpper(x) < AsciiUpper(y); });
 }
 
 RegistryKey* RegistryTree::Find(std::u16string_view path) {

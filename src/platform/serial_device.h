@@ -18,6 +18,9 @@ enum class SerialEvent {
   kDeviceLost        // the device went away (unplugged): it has closed itself; reported once
 };
 
+// What users call port `number`.
+inline std::string CommName(std::int32_t number) { return "Comm " + std::to_string(number); }
+
 // Received bytes that a device keeps for its owner at most.
 inline constexpr std::size_t kSerialInputBufferBytes = 4050;
 

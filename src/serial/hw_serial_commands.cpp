@@ -1,8 +1,8 @@
 // HwSerial's commands: packets.h builds them, SendCommand and XmitData bring them out.
 #include <utility>
 
+#include "platform/hex_text.h"
 #include "platform/runtime_error.h"
-#include "serial/hex_text.h"
 #include "serial/hw_serial.h"
 #include "serial/packets.h"
 

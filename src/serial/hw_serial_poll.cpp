@@ -2,9 +2,9 @@
 #include <array>
 #include <utility>
 
+#include "platform/hex_text.h"
 #include "platform/rounding.h"
 #include "platform/runtime_error.h"
-#include "serial/hex_text.h"
 #include "serial/hw_serial.h"
 #include "serial/packets.h"
 

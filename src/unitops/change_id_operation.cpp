@@ -1,7 +1,7 @@
 #include "unitops/change_id_operation.h"
 
+#include "platform/hex_text.h"
 #include "platform/runtime_error.h"
-#include "serial/hex_text.h"
 
 namespace tendril {
 namespace {
@@ -21,7 +21,7 @@ void ChangeIdOperation::Start() {
   try {
     const std::uint8_t new_id = context_.target.UnitId();
     StartChangeAddress(kAnyUnit, new_id);
-    context_.running.Begin(UnitCommand::kChangeId, "Giving the unit the ID " + TwoHexDigits(new_id));
+    context_.running.Begin(UnitCommand::kChangeId, "Giving the unit the ID " + HexByte(new_id));
     context_.progress.StartCommandProgress();
   } catch (...) {
     ShowCommError(context_.boxes, {}, DescribeCurrentFault());
@@ -66,7 +66,7 @@ void ChangeIdOperation::Step() {
       if (reply_seen_) {
         Stop();
         context_.progress.EndCommandProgress(Outcome::kSuccess,
-                                             "SUCCESS: UnitID set to '" + TwoHexDigits(new_id_) + "'");
+                                             "SUCCESS: UnitID set to '" + HexByte(new_id_) + "'");
       } else if (MayPollAgain()) {
         context_.link.cmdPollStation(new_id_, kConfirmPoll);
       } else {

@@ -8,7 +8,6 @@
 namespace tendril {
 namespace {
 
-constexpr char kProcessName[] = "NyxTray.exe";
 constexpr char kListenerAddress[] = "127.0.0.1";
 constexpr char kClientName[] = "Tendril Utility";
 
@@ -45,7 +44,7 @@ void ControlPanel::InitializeCommListenerInterface() {
 }
 
 bool ControlPanel::ControlPanelRunning() const {
-  return preferences_.CommListenerPort() > 0 && processes_.IsRunning(kProcessName);
+  return preferences_.CommListenerPort() > 0 && processes_.IsRunning(kControlPanelProgram);
 }
 
 void ControlPanel::AskControlPanelForPort(std::uint8_t port) {

@@ -5,8 +5,8 @@
 #include <utility>
 
 #include "config/option_bytes.h"
+#include "platform/hex_text.h"
 #include "platform/runtime_error.h"
-#include "serial/hex_text.h"
 
 namespace tendril {
 namespace {
@@ -30,7 +30,7 @@ void GetOperation::Start() {
       context_.boxes.Show({"Error Uploading Configuration, Please retry", kSendError, BoxIcon::kCritical});
       return;
     }
-    context_.running.Begin(UnitCommand::kGet, "Reading the configuration of unit " + TwoHexDigits(unit));
+    context_.running.Begin(UnitCommand::kGet, "Reading the configuration of unit " + HexByte(unit));
     context_.progress.StartCommandProgress();
   } catch (...) {
     ShowCommError(context_.boxes, "Upload Failed", DescribeCurrentFault());

@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "platform/runtime_error.h"
+#include "platform/serial_device.h"
 
 namespace tendril {
 namespace {
@@ -36,7 +37,7 @@ std::vector<std::string> PortSelection::ReadCommPorts(std::int16_t always) {
   for (std::int16_t number = 1; number <= kLastListedPort; ++number) {
     if (number != always && !link_.ComPortExists(number)) continue;
     port_table_.push_back(number);
-    lines.push_back("Comm " + std::to_string(number));
+    lines.push_back(CommName(number));
   }
   return lines;
 }

@@ -3,8 +3,8 @@
 #include <span>
 
 #include "config/option_bytes.h"
+#include "platform/hex_text.h"
 #include "platform/runtime_error.h"
-#include "serial/hex_text.h"
 
 namespace tendril {
 namespace {
@@ -34,7 +34,7 @@ void SendOperation::Start() {
       context_.boxes.Show({"Error sending configuration, Please retry", kSendError, BoxIcon::kCritical});
       return;
     }
-    context_.running.Begin(UnitCommand::kSend, "Sending the configuration to unit " + TwoHexDigits(unit));
+    context_.running.Begin(UnitCommand::kSend, "Sending the configuration to unit " + HexByte(unit));
     context_.progress.StartCommandProgress();
   } catch (...) {
     ShowFault(DescribeCurrentFault());

@@ -2,8 +2,8 @@
 
 #include <gmock/gmock.h>
 
-#include "platform/qt/qt_clock.h"
 #include "platform/runtime_error.h"
+#include "platform/steady_clock.h"
 #include "platform/wait_for.h"
 
 namespace tendril::test {
@@ -25,7 +25,7 @@ class QtTimerTest : public testing::Test {
 };
 
 TEST_F(QtTimerTest, Tick_ComesEachPeriodAndNeverEarly) {
-  const QtClock clock;
+  const SteadyClock clock;
   std::vector<std::uint32_t> ticks;
   const std::uint32_t start = clock.NowMs();
   const auto timer = Start(300, [&] { ticks.push_back(clock.NowMs() - start); });

@@ -5,6 +5,8 @@
 #include <system_error>
 #include <vector>
 
+#include "platform/ascii.h"
+
 #ifdef __APPLE__
 #include <sys/sysctl.h>
 
@@ -27,9 +29,7 @@ struct ProcessNames {
 };
 
 bool SameName(std::string_view a, std::string_view b) {
-  const auto folded = [](char c) { return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c; };
-  return std::equal(a.begin(), a.end(), b.begin(), b.end(),
-                    [&](char x, char y) { return folded(x) == folded(y); });
+  return std::ranges::equal(a, b, {}, AsciiUpper<char>, AsciiUpper<char>);
 }
 
 // The name of a file without its folders, in the notation of any system.

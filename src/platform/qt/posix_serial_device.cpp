@@ -22,8 +22,6 @@ constexpr std::size_t kMaxWaitingOutput = std::size_t{64} * 1024;
 // Bytes that are taken out of the system at once.
 constexpr std::size_t kPieceBytes = 4096;
 
-std::string CommName(std::int32_t number) { return "Comm " + std::to_string(number); }
-
 }  // namespace
 
 PosixSerialDevice::Port::Port(const std::filesystem::path& device, std::int32_t baud)

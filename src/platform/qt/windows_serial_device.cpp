@@ -20,8 +20,6 @@ constexpr int kDeadDeviceCheckMs = 1000;
 // As on the other systems.
 constexpr std::size_t kMaxWaitingOutput = std::size_t{64} * 1024;
 
-std::string CommName(std::int32_t number) { return "Comm " + std::to_string(number); }
-
 // Raises why `port` could not be opened, in the words of a user.
 [[noreturn]] void Explain(const QSerialPort& port, std::int32_t number) {
   const QSerialPort::SerialPortError error = port.error();

@@ -1,11 +1,11 @@
-// QtClock: the system's steady clock, in milliseconds.
+// SteadyClock: the Clock of this computer.
 #pragma once
 
 #include "platform/clock.h"
 
 namespace tendril {
 
-class QtClock final : public Clock {
+class SteadyClock final : public Clock {
  public:
   std::uint32_t NowMs() const override;
   std::uint32_t GranularityMs() const override;

@@ -1,4 +1,4 @@
-#include "platform/qt/qt_clock.h"
+#include "platform/steady_clock.h"
 
 #include <chrono>
 #ifdef _WIN32
@@ -9,18 +9,18 @@
 
 namespace tendril {
 
-std::uint32_t QtClock::NowMs() const {
+std::uint32_t SteadyClock::NowMs() const {
   const auto since_start = std::chrono::steady_clock::now().time_since_epoch();
   return static_cast<std::uint32_t>(
       std::chrono::duration_cast<std::chrono::milliseconds>(since_start).count());
 }
 
 // The steady clock is finer than a millisecond on every system, so the count grows by ones.
-std::uint32_t QtClock::GranularityMs() const { return 1; }
+std::uint32_t SteadyClock::GranularityMs() const { return 1; }
 
 #ifdef _WIN32
 
-std::uint32_t QtClock::RequestFinestTimerPeriod() {
+std::uint32_t SteadyClock::RequestFinestTimerPeriod() {
   TIMECAPS capabilities = {};
   const bool known = timeGetDevCaps(&capabilities, sizeof capabilities) == TIMERR_NOERROR;
   const UINT period = known && capabilities.wPeriodMin > 0 ? capabilities.wPeriodMin : 1;
@@ -28,14 +28,14 @@ std::uint32_t QtClock::RequestFinestTimerPeriod() {
   return period;
 }
 
-void QtClock::ReleaseTimerPeriod(std::uint32_t period_ms) { timeEndPeriod(period_ms); }
+void SteadyClock::ReleaseTimerPeriod(std::uint32_t period_ms) { timeEndPeriod(period_ms); }
 
 #else
 
 // Timers are as fine as the clock here, without asking.
-std::uint32_t QtClock::RequestFinestTimerPeriod() { return 1; }
+std::uint32_t SteadyClock::RequestFinestTimerPeriod() { return 1; }
 
-void QtClock::ReleaseTimerPeriod(std::uint32_t /*period_ms*/) {}
+void SteadyClock::ReleaseTimerPeriod(std::uint32_t /*period_ms*/) {}
 
 #endif
 
