@@ -12,16 +12,16 @@
 #include "platform/wait_for.h"
 #include "run_benchmark.h"
 #include "support/bench_process.h"
-#include "support/person.h"
 #include "support/process_figures.h"
+#include "support/user.h"
 
 namespace tendril {
 namespace {
 
 using test::BenchProcess;
 using test::CpuPercentWhileIdle;
-using test::Person;
 using test::RunFor;
+using test::User;
 using test::WaitFor;
 using test::WhatIsHeld;
 
@@ -60,22 +60,22 @@ bool MeasureAll() {
   UtilityProgram program;
   program.window.resize(1280, 800);
   program.window.show();
-  Person person;
-  person.SitDownAt(program.window);
+  User user;
+  user.SetWindow(program.window);
 
-  person.Rest(true);
+  user.Rest(true);
   bool within_bounds = Measure("trying to connect where nobody listens", 1);
   bench.Start(panel);
   const auto connected = [&] { return program.control_panel.Client().TCPState() == TcpState::kConnected; };
   Require(WaitFor(connected), "It had given up connecting");
 
-  person.Rest(false);
-  person.ChooseComm1();
-  Require(WaitFor([&] { return person.read.size() == 2; }), "The Control Panel is not asked for the port");
+  user.Rest(false);
+  user.ChoosePort(1);
+  Require(WaitFor([&] { return user.read.size() == 2; }), "The Control Panel is not asked for the port");
   RunFor(kSettleMs);
-  person.ChooseComm1();
+  user.ChoosePort(1);
   Require(program.Serial1.PortOpen(), "The port does not open");
-  person.Rest(true);
+  user.Rest(true);
   within_bounds &= Measure("connected, with the port open", 0.5);
   Require(connected() && program.Serial1.PortOpen(), "It does not stay connected");
 

@@ -24,6 +24,7 @@
 #include "serial/command_log.h"
 #include "serial/hw_serial.h"
 #include "support/bench_process.h"
+#include "support/find_control.h"
 #include "ui/frm_new_servo_config.h"
 #include "unitops/control_panel.h"
 
@@ -43,9 +44,7 @@ class MeasuredWindow {
   // Raises std::runtime_error when the window has no such control.
   template <typename Control>
   Control& Child(const char* name) {
-    auto* child = window_.findChild<Control*>(QString::fromLatin1(name));
-    if (child == nullptr) throw std::runtime_error(std::string("The window has no ") + name);
-    return *child;
+    return test::FindControl<Control>(window_, name);
   }
 
   // Presses the button of a unit command and waits for its outcome. Returns how long that took in

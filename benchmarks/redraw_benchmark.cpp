@@ -20,6 +20,7 @@
 #include "run_benchmark.h"
 #include "serial/hw_serial.h"
 #include "simulator/servo_simulator.h"
+#include "support/find_control.h"
 #include "support/simulated_control_panel.h"
 #include "ui/frm_new_servo_config.h"
 
@@ -52,9 +53,7 @@ class EditedWindow : public QObject {
   // Raises std::runtime_error when the window has no such control.
   template <typename Control = QWidget>
   Control& Child(const char* name) {
-    auto* child = window_.findChild<Control*>(QString::fromLatin1(name));
-    if (child == nullptr) throw std::runtime_error(std::string("The window has no ") + name);
-    return *child;
+    return test::FindControl<Control>(window_, name);
   }
 
   // Steps `spin` once and returns how long it took until all of the window was painted, in milliseconds. Raises

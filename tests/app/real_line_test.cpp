@@ -20,7 +20,7 @@
 #include "platform/paths.h"
 #include "support/bench_process.h"
 #include "support/emulated_adapter.h"
-#include "support/person.h"
+#include "support/user.h"
 
 namespace tendril::test {
 namespace {
@@ -31,7 +31,7 @@ constexpr int kGenerousMs = 20000;
 const QStringList kFactoryFresh{QStringLiteral("--unit"), QStringLiteral("FF")};
 QStringList Fault(const char* name) { return {QStringLiteral("--fault"), QString::fromLatin1(name)}; }
 
-class RealLine : public testing::Test, protected Person {
+class RealLine : public testing::Test, protected User {
  protected:
   RealLine() {
     Adapter() = {};
@@ -51,12 +51,11 @@ class RealLine : public testing::Test, protected Person {
     program_.reset();
     program_ = std::make_unique<UtilityProgram>();
     program_->window.show();
-    SitDownAt(program_->window);
+    SetWindow(program_->window);
   }
   // What the command that was pressed last ends with.
   std::string Outcome() {
-    return QTest::qWaitFor([this] { return !OutcomeLabel().text().isEmpty() && Button(kSend).isEnabled(); },
-                           kGenerousMs)
+    return QTest::qWaitFor([this] { return CommandOver(); }, kGenerousMs)
                ? OutcomeLabel().text().toStdString()
                : "none";
   }
@@ -75,14 +74,14 @@ class RealLine : public testing::Test, protected Person {
 TEST_F(RealLine, PortOfTheControlPanel_ChangesHandsAndBack) {
   bench_.Start({QStringLiteral("--control-panel"), bench_.WriteRegistry()}, true);
   StartProgram();
-  ChooseComm1();
+  ChoosePort(1);
   ASSERT_TRUE(QTest::qWaitFor([this] { return read.size() == 2; }, kGenerousMs));
   EXPECT_EQ(read[0].second.substr(0, 62), "This serial port (Comm1) is in use by the Control Panel.\n\nThe ");
   EXPECT_FALSE(program_->Serial1.PortOpen());
   ASSERT_TRUE(QTest::qWaitFor(
       [this] { return bench_.Printed().find("reply to 1: done") != std::string::npos; }, kGenerousMs));
 
-  ChooseComm1();
+  ChoosePort(1);
   ASSERT_TRUE(program_->Serial1.PortOpen());
   Press(kSend);
   EXPECT_EQ(Outcome(), "SUCCESS: Send Complete!");
@@ -109,7 +108,7 @@ TEST_F(RealLine, Send_SucceedsWithAndWithoutEcho) {
   for (const QStringList& options : {QStringList{}, QStringList{QStringLiteral("--no-echo")}}) {
     bench_.Start(options);
     if (!program_) StartProgram();
-    ChooseComm1();
+    ChoosePort(1);
     Adapter().rts.clear();
     Press(kSend);
     EXPECT_EQ(Outcome(), "SUCCESS: Send Complete!") << options.join(QLatin1Char(' ')).toStdString();
@@ -136,7 +135,7 @@ TEST_F(RealLine, RtsThatFails_FailsTheOpeningAndOtherwiseOnlyThePoll) {
     SCOPED_TRACE(reason);
     read.clear();
     Adapter().rts_error = [error = error](bool) { return error; };
-    ChooseComm1();
+    ChoosePort(1);
     ASSERT_TRUE(WaitForBox());
     EXPECT_NE(read[0].second.find(std::string("cannot be asserted: ") + reason + ".\nWhile: Setting RTS on"),
               std::string::npos)
@@ -149,7 +148,7 @@ TEST_F(RealLine, RtsThatFails_FailsTheOpeningAndOtherwiseOnlyThePoll) {
     Adapter().rts_error = [error = error, &turns_that_fail](bool asserted) {
       return !asserted && turns_that_fail-- > 0 ? error : 0;
     };
-    ChooseComm1();
+    ChoosePort(1);
     Press(kGet);
     EXPECT_EQ(Outcome(), "SUCCESS: Upload Complete");  // by its repeats
     EXPECT_LT(turns_that_fail, 0);
@@ -161,7 +160,7 @@ TEST_F(RealLine, RtsThatFails_FailsTheOpeningAndOtherwiseOnlyThePoll) {
 TEST_F(RealLine, NoisyUnits_AreHeardThroughTheNoise) {
   bench_.Start(Fault("rambling"));
   StartProgram();
-  ChooseComm1();
+  ChoosePort(1);
   Press(kSend);
   EXPECT_EQ(Outcome(), "SUCCESS: Send Complete!");
   Press(kGet);
@@ -186,7 +185,7 @@ TEST_F(RealLine, Get_TakesOverAllPortsOrNone) {
     read.clear();
     StartProgram();
     const ChannelTable before = program_->window.WorkingConfiguration();
-    ChooseComm1();
+    ChoosePort(1);
     const auto set_port = [this](std::uint8_t port, std::uint8_t flags, std::uint8_t low, std::uint8_t high,
                                  const std::array<std::uint8_t, 6>& others) {
       program_->Serial1.cmdSetManyOptions(0x01, 0, kOptionServoPort, port, flags, low, high, others);
@@ -213,8 +212,8 @@ TEST_F(RealLine, Get_TakesOverAllPortsOrNone) {
 TEST_F(RealLine, ChangedId_IsWhereTheUnitAnswersFromThenOn) {
   bench_.Start(kFactoryFresh);
   StartProgram();
-  ChooseComm1();
-  QTest::keyClick(program_->window.findChild<QComboBox*>(QStringLiteral("CmbUnitID_1")), Qt::Key_A);
+  ChoosePort(1);
+  QTest::keyClick(&Find<QComboBox>("CmbUnitID_1"), Qt::Key_A);
   Press(kGet);
   ASSERT_TRUE(WaitForBox());  // nobody is at 0A yet
   Press(kChangeId);
@@ -239,7 +238,7 @@ TEST_F(RealLine, UnpluggedInTheMiddle_IsToldOnceAndThePortWorksAfterReplugging) 
     bench_.Start(units + fault);
     read.clear();
     if (!program_) StartProgram();
-    ChooseComm1();
+    ChoosePort(1);
     Press(button);
     QTest::qWait(400);
     ASSERT_FALSE(Button(button).isEnabled());  // it runs
@@ -250,7 +249,7 @@ TEST_F(RealLine, UnpluggedInTheMiddle_IsToldOnceAndThePortWorksAfterReplugging) 
     EXPECT_NE(read[0].second.find("Open of serial port 1 has failed"), std::string::npos) << read[0].second;
 
     bench_.Start(units);
-    ChooseComm1();
+    ChoosePort(1);
     Press(button);
     EXPECT_EQ(Outcome(), success);
     bench_.Kill();
@@ -261,9 +260,8 @@ TEST_F(RealLine, UnpluggedInTheMiddle_IsToldOnceAndThePortWorksAfterReplugging) 
 TEST_F(RealLine, UnpluggedInASweep_EndsItSilentlyAndItCanBeStartedAgain) {
   bench_.Start();
   StartProgram();
-  ChooseComm1();
-  QTest::mouseClick(program_->window.findChild<QWidget*>(QStringLiteral("ServoSimulator2_0")),
-                    Qt::LeftButton);
+  ChoosePort(1);
+  QTest::mouseClick(&Find("ServoSimulator2_0"), Qt::LeftButton);
   for (int run = 0; run < 2; ++run) {
     Press(kSweep);
     program_->Serial1.SentByteCount(true);
@@ -277,7 +275,7 @@ TEST_F(RealLine, UnpluggedInASweep_EndsItSilentlyAndItCanBeStartedAgain) {
     EXPECT_TRUE(read.empty());
     bench_.Start();
   }
-  ChooseComm1();
+  ChoosePort(1);
   Press(kGet);
   EXPECT_EQ(Outcome(), "SUCCESS: Upload Complete");
 }

@@ -10,7 +10,6 @@
 #include <optional>
 #include <set>
 #include <span>
-#include <stdexcept>
 #include <string>
 #include <vector>
 
@@ -19,6 +18,7 @@
 #include "serial/hw_serial.h"
 #include "simulation/disturbed_line.h"
 #include "simulation/random_source.h"
+#include "support/find_control.h"
 #include "support/simulated_control_panel.h"
 #include "support/simulated_world.h"
 #include "ui/frm_new_servo_config.h"
@@ -128,9 +128,7 @@ class Simulation {
 
   template <typename Widget = QWidget>
   Widget& Find(const char* name) const {
-    auto* widget = window_->findChild<Widget*>(QString::fromUtf8(name));
-    if (widget == nullptr) throw std::logic_error(std::string("no control named ") + name);
-    return *widget;
+    return FindControl<Widget>(*window_, name);
   }
   bool CommandRuns() const;
   bool SweepRuns() const;

@@ -19,7 +19,7 @@ struct Desk {
   }
   template <typename Widget = QWidget>
   Widget& Find(const QString& name) {
-    return *window.findChild<Widget*>(name);
+    return FindControl<Widget>(window, name);
   }
   void Click(const char* button) { QTest::mouseClick(&Find(QString::fromUtf8(button)), Qt::LeftButton); }
 

@@ -144,9 +144,9 @@ TEST_F(Summary, DoubleClickAndEscape_LeaveNoPanelBehind) {
 TEST_F(Summary, PressedAtOnce_IsThere) {
   SimulatedControlPanel panel(world_);
   frmNewServoConfig window(link_, world_.time, world_.boxes, panel.control_panel, Version{1, 0, 0});
-  window.findChild<QAbstractButton*>(QStringLiteral("cmdShowSummary"))->click();
+  FindControl<QAbstractButton>(window, "cmdShowSummary").click();
   world_.time.Advance(20);
-  EXPECT_FALSE(window.findChild<QWidget*>(QStringLiteral("frmSumHeader"))->isHidden());
+  EXPECT_FALSE(FindControl(window, "frmSumHeader").isHidden());
 }
 
 TEST_F(Summary, NumberEntry_ByKeyboardAlone) {

@@ -8,9 +8,9 @@
 #include <QLabel>
 #include <QTest>
 #include <memory>
-#include <stdexcept>
 #include <string>
 
+#include "support/find_control.h"
 #include "support/simulated_control_panel.h"
 #include "ui/frm_new_servo_config.h"
 
@@ -28,9 +28,7 @@ class Window : public testing::Test {
 
   template <typename Widget = QWidget>
   Widget& Find(const char* name) {
-    auto* widget = window_->findChild<Widget*>(QString::fromUtf8(name));
-    if (widget == nullptr) throw std::logic_error(std::string("no control named ") + name);
-    return *widget;
+    return FindControl<Widget>(*window_, name);
   }
   std::string Text(const char* label) { return Find<QLabel>(label).text().toStdString(); }
   void Click(const char* button) { QTest::mouseClick(&Find(button), Qt::LeftButton); }

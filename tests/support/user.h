@@ -1,4 +1,4 @@
-// Person: works the program's window by mouse and keyboard, and reads its message boxes.
+// User: works the program's window by mouse and keyboard, and answers its message boxes.
 #pragma once
 
 #include <QAbstractButton>
@@ -14,20 +14,22 @@
 #include <utility>
 #include <vector>
 
+#include "support/find_control.h"
+
 namespace tendril::test {
 
-// The buttons.
+// Object names of buttons.
 inline constexpr char kSend[] = "Command3_0";
 inline constexpr char kGet[] = "Command3_1";
 inline constexpr char kChangeId[] = "Command3_2";
 inline constexpr char kSweep[] = "cmdTest_0";
 
-// Reads each box and presses Yes or OK, for as long as it is not at rest.
-class Person {
+// Answers each message box with Yes or OK until told to rest.
+class User {
  public:
-  using Box = std::pair<std::string, std::string>;  // its title and its text
+  using Box = std::pair<std::string, std::string>;  // title and text
 
-  Person() {
+  User() {
     reading_.setInterval(20);
     QObject::connect(&reading_, &QTimer::timeout, &reading_, [this] {
       if (auto* box = qobject_cast<QMessageBox*>(QApplication::activeModalWidget())) {
@@ -38,33 +40,33 @@ class Person {
     reading_.start();
   }
 
-  // Where the controls are from now on; it must last as long as they are used.
-  void SitDownAt(QWidget& window) { window_ = &window; }
+  // `window` has the controls from now on and must outlive their use.
+  void SetWindow(QWidget& window) { window_ = &window; }
   void Rest(bool resting) { resting ? reading_.stop() : reading_.start(); }
 
-  // Raises std::runtime_error when the window has no such control.
-  template <typename Control>
+  template <typename Control = QWidget>
   Control& Find(const char* name) const {
-    auto* control = window_->findChild<Control*>(QString::fromLatin1(name));
-    if (control == nullptr) throw std::runtime_error(std::string("The window has no ") + name);
-    return *control;
+    return FindControl<Control>(*window_, name);
   }
-  // Opens the list of ports and takes Comm 1, be it chosen already or not. Raises when it is not there.
-  void ChooseComm1() const {
+  // Opens the list of ports and takes Comm `number`, even if it is chosen already. Raises std::runtime_error when it is
+  // not in the list.
+  void ChoosePort(int number) const {
     auto& ports = Find<QComboBox>("cmbNYX");
     ports.showPopup();
-    const int entry = ports.findText(QStringLiteral("Comm 1"));
-    if (entry < 0) throw std::runtime_error("Comm 1 is not there");
+    const int entry = ports.findText(QStringLiteral("Comm %1").arg(number));
+    if (entry < 0) throw std::runtime_error("The list has no Comm " + std::to_string(number));
     ports.view()->setCurrentIndex(ports.model()->index(entry, 0));
     QTest::keyClick(ports.view(), Qt::Key_Return);
   }
   QAbstractButton& Button(const char* name) const { return Find<QAbstractButton>(name); }
-  // Where the outcome of a command is told.
+  // Shows the outcome of a command.
   QLabel& OutcomeLabel() const { return Find<QLabel>("lblProgress"); }
   void Press(const char* button) const {
     OutcomeLabel().clear();
     QTest::mouseClick(&Button(button), Qt::LeftButton);
   }
+  // A command has ended and the next one can start.
+  bool CommandOver() const { return !OutcomeLabel().text().isEmpty() && Button(kSend).isEnabled(); }
 
   std::vector<Box> read;
 

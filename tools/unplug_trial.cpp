@@ -31,8 +31,8 @@
 #include "app/utility_program.h"
 #include "platform/wait_for.h"
 #include "support/bench_process.h"
-#include "support/person.h"
 #include "support/process_figures.h"
+#include "support/user.h"
 
 namespace tendril::test {
 namespace {
@@ -91,13 +91,13 @@ class Trial {
     bench_.Start(kUnits);
     program_.emplace();
     program_->window.show();
-    person_.SitDownAt(program_->window);
-    person_.ChooseComm1();
-    QTest::mouseClick(&person_.Find<QWidget>("ServoSimulator2_0"), Qt::LeftButton);
+    user_.SetWindow(program_->window);
+    user_.ChoosePort(1);
+    QTest::mouseClick(&user_.Find<QWidget>("ServoSimulator2_0"), Qt::LeftButton);
     // Notes each outcome and takes it away, so that the next one shows even if it is the same.
     QObject::connect(&watch_, &QTimer::timeout, &watch_, [this] {
       longest_stall_ms_ = std::max(longest_stall_ms_, since_look_.restart());
-      QLabel& label = person_.OutcomeLabel();
+      QLabel& label = user_.OutcomeLabel();
       if (label.text().isEmpty()) return;
       outcomes_.push_back(label.text().toStdString());
       outcome_at_ = Clock::now();
@@ -122,7 +122,7 @@ class Trial {
     const Ms moment = lasts_[index] * std::uniform_real_distribution(0.0, 1.0)(random);
     const int back_ms = std::uniform_int_distribution(0, kMaxBackMs)(random);
     wrong_.clear();
-    person_.read.clear();
+    user_.read.clear();
     outcomes_.clear();
     longest_stall_ms_ = 0;
     const std::filesystem::path device = std::filesystem::read_symlink(bench_.Link().toStdString());
@@ -200,12 +200,10 @@ class Trial {
   void Watch(bool on) {
     since_look_.start();
     on ? watch_.start(2) : watch_.stop();
-    person_.Rest(!on);
+    user_.Rest(!on);
   }
-  static QString Words(const Person::Box& box) {
-    return QString::fromStdString(box.first + ": " + box.second);
-  }
-  bool CommandOver() const { return !outcomes_.empty() && person_.Button(kSend).isEnabled(); }
+  static QString Words(const User::Box& box) { return QString::fromStdString(box.first + ": " + box.second); }
+  bool CommandOver() const { return !outcomes_.empty() && user_.Button(kSend).isEnabled(); }
   static bool Holds(const std::filesystem::path& device) {
     std::error_code closed_meanwhile;
     for (const auto& entry : std::filesystem::directory_iterator("/proc/self/fd")) {
@@ -225,16 +223,16 @@ class Trial {
       ::kill(bench, SIGKILL);
       killed = true;
     });
-    if (kind.button != nullptr) person_.Press(kind.button);
+    if (kind.button != nullptr) user_.Press(kind.button);
     QTimer mover;
     int step = 0;
     QObject::connect(&mover, &QTimer::timeout, &mover, [&] {
       if (QApplication::activeModalWidget() != nullptr) return;  // the box is in the way
-      QTest::keyClick(&person_.Find<QSlider>("HScrollSendServoPosition"),
+      QTest::keyClick(&user_.Find<QSlider>("HScrollSendServoPosition"),
                       ++step / 20 % 2 == 0 ? Qt::Key_Right : Qt::Key_Left);
     });
     if (kind.moves_slider) {
-      person_.Find<QCheckBox>("chkSendSlideCommands").setChecked(true);
+      user_.Find<QCheckBox>("chkSendSlideCommands").setChecked(true);
       mover.start(8);
     }
     WaitFor([&] { return killed.load(); });
@@ -244,9 +242,9 @@ class Trial {
       bench_.Start(kUnits);
     }
     WaitFor([&] {
-      if (kind.moves_slider) return !person_.read.empty();
+      if (kind.moves_slider) return !user_.read.empty();
       return kind.success == nullptr ||
-             (CommandOver() && (outcomes_[0] == kind.success || !person_.read.empty()));
+             (CommandOver() && (outcomes_[0] == kind.success || !user_.read.empty()));
     });
     told_at_ = Clock::now();
     if (!kind.back_soon) WaitFor([this] { return !program_->Serial1.PortOpen(); });
@@ -260,9 +258,9 @@ class Trial {
     ++(success ? row.success : failure ? row.failed : row.silent);
     Expect(success || command_failed || (kind.success == nullptr && outcomes_.empty()),
            "not the one outcome");
-    Expect(person_.read.size() == (failure ? 1 : 0), std::to_string(person_.read.size()) + " boxes");
+    Expect(user_.read.size() == (failure ? 1 : 0), std::to_string(user_.read.size()) + " boxes");
     for (const std::string& outcome : outcomes_) ++texts_[outcome];
-    for (const Person::Box& read : person_.read) {
+    for (const User::Box& read : user_.read) {
       const QString box = Words(read);
       const bool due = std::any_of(kind.boxes.begin(), kind.boxes.end(), [&](const char* pattern) {
         const QString whole = QString::fromLatin1(pattern).replace(QLatin1Char('@'), QLatin1String(kGone));
@@ -281,35 +279,35 @@ class Trial {
       row.slowest_ms = std::max(row.slowest_ms, told_ms);
       Expect(told_ms <= kMaxToldMs + (kind.back_soon ? kMaxBackMs : 0), "told late");
     }
-    Expect(person_.Button(kSweep).text() == QStringLiteral("Test"), "the sweep goes on");
-    Expect(!person_.Find<QCheckBox>("chkSendSlideCommands").isChecked(), "the slider goes on");
+    Expect(user_.Button(kSweep).text() == QStringLiteral("Test"), "the sweep goes on");
+    Expect(!user_.Find<QCheckBox>("chkSendSlideCommands").isChecked(), "the slider goes on");
   }
 
   // Plugs it in again, and does what a person does then.
   void Recover(const Kind& kind) {
-    auto& box = person_.Find<QCheckBox>("chkSendSlideCommands");
+    auto& box = user_.Find<QCheckBox>("chkSendSlideCommands");
     for (const bool checked : {true, false}) {
       QTest::mouseClick(&box, Qt::LeftButton, {}, {8, box.height() / 2});
       Expect(box.isChecked() == checked, "the window does not respond");
     }
     if (!kind.back_soon) bench_.Start(kUnits);
-    person_.read.clear();
-    person_.ChooseComm1();
+    user_.read.clear();
+    user_.ChoosePort(1);
     Command(kind.success != nullptr ? kind : kKinds[1]);
     Expect(program_->Serial1.PortOpen(), "the port is closed");
   }
 
   void Command(const Kind& kind) {
     outcomes_.clear();
-    person_.Press(kind.button);
+    user_.Press(kind.button);
     WaitFor([this] { return CommandOver(); });
     Expect(outcomes_ == std::vector<std::string>{kind.success}, "not " + std::string(kind.success));
-    for (const Person::Box& read : person_.read) Expect(false, Words(read).toStdString());
+    for (const User::Box& read : user_.read) Expect(false, Words(read).toStdString());
   }
 
   BenchProcess bench_;
   std::optional<UtilityProgram> program_;
-  Person person_;
+  User user_;
   QTimer watch_;
   QElapsedTimer since_look_;
   std::array<Ms, kKinds.size()> lasts_;  // when nobody pulls

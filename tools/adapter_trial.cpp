@@ -18,7 +18,7 @@
 #include "app/utility_program.h"
 #include "support/bench_process.h"
 #include "support/emulated_adapter.h"
-#include "support/person.h"
+#include "support/user.h"
 
 namespace tendril::test {
 namespace {
@@ -56,15 +56,15 @@ int Run(int times) {
   BenchProcess bench;
   bench.Start({QStringLiteral("--control-panel"), bench.WriteRegistry()}, true);
   UtilityProgram program;
-  Person person;
+  User user;
   program.window.show();
-  person.SitDownAt(program.window);
-  person.ChooseComm1();  // held by the Control Panel, which is asked for it
+  user.SetWindow(program.window);
+  user.ChoosePort(1);  // held by the Control Panel, which is asked for it
   if (!QTest::qWaitFor([&] { return bench.Printed().find("reply to 1: done") != std::string::npos; },
                        kLongestMs)) {
     throw std::runtime_error("the Control Panel does not give the port up");
   }
-  person.ChooseComm1();
+  user.ChoosePort(1);
   if (!program.Serial1.PortOpen()) throw std::runtime_error("the port does not open");
 
   const EmptySocket socket;
@@ -72,17 +72,15 @@ int Run(int times) {
   program.Serial1.SetPortClosedHandler([&losses] { ++losses; });
   for (int command = 0; command < times; ++command) {
     const bool send = command % 2 == 0;
-    person.read.clear();
-    person.Press(send ? kSend : kGet);
-    const bool over = QTest::qWaitFor(
-        [&] { return !person.OutcomeLabel().text().isEmpty() && person.Button(kSend).isEnabled(); },
-        kLongestMs);
-    const std::string outcome = person.OutcomeLabel().text().toStdString();
+    user.read.clear();
+    user.Press(send ? kSend : kGet);
+    const bool over = QTest::qWaitFor([&] { return user.CommandOver(); }, kLongestMs);
+    const std::string outcome = user.OutcomeLabel().text().toStdString();
     if (over && outcome == (send ? "SUCCESS: Send Complete!" : "SUCCESS: Upload Complete")) continue;
     ++failures;
     std::printf("command %d ended \"%s\"\n", command + 1, over ? outcome.c_str() : "never");
-    for (const auto& [title, text] : person.read) std::printf("  %s: %s\n", title.c_str(), text.c_str());
-    if (!program.Serial1.PortOpen()) person.ChooseComm1();
+    for (const auto& [title, text] : user.read) std::printf("  %s: %s\n", title.c_str(), text.c_str());
+    if (!program.Serial1.PortOpen()) user.ChoosePort(1);
   }
   program.Serial1.SetPortClosedHandler(nullptr);
   const auto empty_reads = static_cast<unsigned long long>(Adapter().empty_reads);

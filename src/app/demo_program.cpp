@@ -1,0 +1,74 @@
+#include "app/demo_program.h"
+
+#include <QApplication>
+#include <QPalette>
+#include <QStyleFactory>
+#include <cstdint>
+#include <filesystem>
+
+#include "app/version.h"
+
+namespace tendril {
+namespace {
+
+// Pads enough for the program to release the line in time even when its window has just been painting.
+constexpr ReplyTiming kPatient{.turn_round_us = 2000, .pads = 45};
+
+// The default of the network preferences.
+constexpr std::uint16_t kListenerPort = 8837;
+
+VirtualUnit& AttachUnit(VirtualPorts& ports, std::int32_t port, std::uint8_t id) {
+  return ports.Attach<VirtualUnit>(port, id, kPatient);
+}
+
+VirtualPorts& AddPorts(VirtualPorts& ports) {
+  for (const std::int32_t port : {1, 2, 3, 4}) ports.AddPort(port);
+  return ports;
+}
+
+}  // namespace
+
+DemoBench::DemoBench(QtPlatform& platform)
+    : ports(platform.clock, platform.timers),
+      panel(platform.timers),
+      unit_01(AttachUnit(AddPorts(ports), 1, 0x01)),
+      unit_0a(AttachUnit(ports, 1, 0x0A)) {
+  AttachUnit(ports, 2, 0xFF);
+  AttachUnit(ports, kDemoPanelPort, 0x01);
+  panel.AddPort(kDemoPanelPort);
+  ports.SetHeldByAnother(kDemoPanelPort, true);
+  panel.SetPortHandler([this](std::uint8_t port, bool held) { ports.SetHeldByAnother(port, held); });
+  // The units on Comm 1 are set up differently from what the window starts with.
+  for (int port = 1; port <= kUnitPorts; ++port) {
+    unit_01.SetPortOptions(port, {1, 80, 220, 125, 175, 125, 175, 150, 150});
+    const auto by = [port](int width) { return static_cast<std::uint8_t>(width + 2 * port); };
+    unit_0a.SetPortOptions(port, {1, 60, 240, by(80), by(170), by(90), by(160), by(120), by(130)});
+  }
+}
+
+DemoProgram::DemoProgram()
+    : log(std::filesystem::path(scratch.filePath(QStringLiteral("HUtest.txt")).toStdString())),
+      wsCLI(bench.panel, kListenerPort, platform.timers),
+      window(Serial1, platform.timers, platform.boxes, control_panel, kVersion) {
+  platform.boxes.SetParent(&window);
+}
+
+void UseDarkPalette() {
+  const QColor text(0xE6, 0xE6, 0xE6);
+  QPalette dark(QColor(0x50, 0x53, 0x57), QColor(0x3C, 0x3F, 0x43));
+  dark.setColor(QPalette::Base, QColor(0x1F, 0x21, 0x24));
+  dark.setColor(QPalette::AlternateBase, QColor(0x2B, 0x2D, 0x30));
+  for (const auto role :
+       {QPalette::WindowText, QPalette::Text, QPalette::ButtonText, QPalette::ToolTipText}) {
+    dark.setColor(role, text);
+    dark.setColor(QPalette::Disabled, role, QColor(0x8A, 0x8D, 0x91));
+  }
+  dark.setColor(QPalette::PlaceholderText, QColor(0xA0, 0xA4, 0xA8));
+  dark.setColor(QPalette::ToolTipBase, QColor(0x3C, 0x3F, 0x43));
+  dark.setColor(QPalette::Highlight, QColor(0x2A, 0x82, 0xDA));
+  dark.setColor(QPalette::HighlightedText, Qt::white);
+  QApplication::setStyle(QStyleFactory::create(QStringLiteral("Fusion")));
+  QApplication::setPalette(dark);
+}
+
+}  // namespace tendril

@@ -1,0 +1,239 @@
+// tendril-demo-show: works the demonstration's window by itself, on a machine without a display.
+#include <QApplication>
+#include <QCommandLineParser>
+#include <QDir>
+#include <QElapsedTimer>
+#include <QPixmap>
+#include <QSpinBox>
+#include <QTest>
+#include <QTimer>
+#include <cstdint>
+#include <cstdio>
+#include <cstdlib>
+#include <functional>
+#include <span>
+#include <stdexcept>
+#include <string>
+#include <utility>
+#include <variant>
+
+#include "app/demo_program.h"
+#include "bench/line_printer.h"
+#include "bench/panel_printer.h"
+#include "config/option_bytes.h"
+#include "platform/hex_text.h"
+#include "platform/wait_for.h"
+#include "support/user.h"
+
+namespace tendril::test {
+namespace {
+
+constexpr int kMaxStepMs = 30'000;
+constexpr QSize kPictureSize(1280, 800);
+
+void Print(const std::string& line) {
+  std::puts(line.c_str());
+  std::fflush(stdout);
+}
+
+void Require(bool met, const std::string& otherwise) {
+  if (!met) throw std::runtime_error(otherwise);
+}
+
+// Each step raises std::runtime_error when it does not succeed.
+class Show {
+ public:
+  // Saves pictures in `folder`, which is created.
+  explicit Show(const QString& folder) : folder_(folder) {
+    QDir().mkpath(folder);
+    program_.window.resize(kPictureSize);
+    program_.window.show();
+    user_.SetWindow(program_.window);
+    QApplication::processEvents();
+  }
+
+  // Sends the configuration to unit 01, reads that of unit 0A, which is another, and reads unit 01 back. Then takes Comm
+  // 3 from the Control Panel and gives it back. Prints what crosses the line and the connection to the panel.
+  void Demonstrate() {
+    SavePicture("window-start.png");
+    line_.SetTap([this](const LineByte& byte) { printer_.Note(byte); });
+    user_.ChoosePort(1);
+    Print("Chosen: Comm 1, unit 01. Sending the configuration of eight ports ...");
+    Send();
+    const ChannelTable sent = program_.window.WorkingConfiguration();
+    Read(10, program_.bench.unit_0a);
+    SavePicture("window-read.png");
+    Read(1, program_.bench.unit_01);
+    line_.SetTap(nullptr);
+    Require(program_.window.WorkingConfiguration() == sent, "What was read back is not what was sent.");
+    Print("What was sent is what was read back.");
+    PassPortBackAndForth();
+  }
+
+  // Pictures of the editor with a servo, a digital and a PWM channel, of the summary, of a number entry open in it, and
+  // of the question for a port.
+  void TakePictures() {
+    Press("ServoSimulator2_2");
+    Press("chkUpdate_6");
+    Step("spnNeutralTrim", 10);
+    Step("spnLeftVirtStop", 15);
+    Step("spnDefaultPos", -20);
+    SavePicture("window-servo.png");
+    Press("ServoSimulator2_4");
+    Press("optChannelType_1");
+    SavePicture("window-digital.png");
+    Press("ServoSimulator2_5");
+    Press("optChannelType_2");
+    SavePicture("window-pwm.png");
+
+    Press("cmdShowSummary");
+    auto& text = user_.Find("txtSumStopRange_3");
+    Await([&text] { return text.isVisible(); }, "the summary");
+    SavePicture("window-summary.png");
+    QTest::mouseClick(&text, Qt::LeftButton);
+    SavePicture("window-number-entry.png");
+    SavePictureOfQuestion();
+  }
+
+ private:
+  static void Await(const std::function<bool()>& done, const std::string& what) {
+    Require(WaitFor(done, kMaxStepMs),
+            "Waited " + std::to_string(kMaxStepMs / 1000) + " s in vain for " + what + ".");
+  }
+
+  void Press(const char* button) const {
+    user_.Button(button).setFocus(Qt::MouseFocusReason);
+    user_.Button(button).click();
+  }
+  void Step(const char* spin, int steps) const {
+    auto& stepped = user_.Find<QSpinBox>(spin);
+    stepped.setFocus(Qt::MouseFocusReason);
+    stepped.stepBy(steps);
+  }
+
+  void SavePicture(const char* name) { SavePicture(program_.window, name); }
+  void SavePicture(QWidget& shown, const char* name) const {
+    const QString path = QDir(folder_).filePath(QString::fromUtf8(name));
+    Require(shown.grab().save(path), "Cannot save the picture " + path.toStdString());
+    Print("Picture: " + path.toStdString());
+  }
+  void SavePictureOfQuestion() {
+    user_.Rest(true);
+    bool saved = false;
+    QTimer::singleShot(0, qApp, [&] {
+      QWidget* const box = QApplication::activeModalWidget();
+      if (box == nullptr) return;
+      SavePicture(*box, "window-port-in-use.png");
+      saved = true;
+      box->close();
+    });
+    user_.ChoosePort(kDemoPanelPort);
+    Require(saved, "No question for Comm 3");
+  }
+
+  void AwaitOutcome(const char* success) {
+    Await([this] { return user_.CommandOver(); }, "the end of a command");
+    printer_.Flush();
+    PrintBoxes();
+    const std::string outcome = user_.OutcomeLabel().text().toStdString();
+    Print("The window says: " + outcome);
+    Require(outcome == success, "The command failed.");
+  }
+  void PrintBoxes() {
+    for (const auto& [title, text] : std::exchange(user_.read, {})) Print("Box \"" + title + "\": " + text);
+  }
+
+  void Send() {
+    const VirtualUnit& unit = program_.bench.unit_01;
+    user_.Press(kSend);
+    // In the pause between two ports: a picture takes longer than a unit waits for the line.
+    Await([&] { return user_.CommandOver() || (unit.accepted_commands() >= 4 && !line_.NextEventUs()); },
+          "the fourth port of a send");
+    SavePicture("window-sending.png");
+    AwaitOutcome("SUCCESS: Send Complete!");
+    Compare(unit);
+    SavePicture("window-sent.png");
+  }
+
+  // Reads the configuration of unit 0`digit`.
+  void Read(int digit, const VirtualUnit& unit) {
+    user_.Find<QComboBox>("CmbUnitID_1").setCurrentIndex(digit);
+    Print("Chosen: unit " + HexByte(unit.id()) + ". Reading its configuration ...");
+    user_.Press(kGet);
+    AwaitOutcome("SUCCESS: Upload Complete");
+    Compare(unit);
+  }
+
+  // Prints what the unit holds, port by port.
+  void Compare(const VirtualUnit& unit) const {
+    const ChannelTable shown = program_.window.WorkingConfiguration();
+    for (int port = 1; port <= kUnitPorts; ++port) {
+      const PortOptionBytes& held = unit.PortOptions(port);
+      std::string line = "Port " + std::to_string(port) + " of unit " + HexByte(unit.id()) + " holds";
+      for (const std::uint8_t byte : held) line += " " + std::to_string(byte);
+      Print(line);
+      const auto encoded = EncodeOptions(shown.At(static_cast<std::size_t>(port - 1)));
+      const auto* bytes = std::get_if<OptionBytes>(&encoded);
+      Require(bytes != nullptr && *bytes == held, "That is not what the window shows.");
+    }
+  }
+
+  // Takes Comm 3 from the Control Panel and gives it back, which closes the window.
+  void PassPortBackAndForth() {
+    VirtualControlPanel& panel = program_.bench.panel;
+    QElapsedTimer since;
+    since.start();
+    panel.SetTap([&since](PanelSide from, std::span<const std::uint8_t> bytes) {
+      Print(PrintPanelBytes(static_cast<std::uint64_t>(since.nsecsElapsed() / 1000), from, bytes));
+    });
+    Print("Choosing Comm 3, which the Control Panel holds, and answering Yes ...");
+    user_.ChoosePort(kDemoPanelPort);
+    Await([&] { return !panel.Holds(kDemoPanelPort); }, "Comm 3");
+    Await([this] { return user_.read.size() == 2; }, "the question and its answer");
+    PrintBoxes();
+    Print("Choosing Comm 3 again, and closing the window ...");
+    user_.ChoosePort(kDemoPanelPort);
+    Require(!program_.window.close(), "The window closed at once.");
+    Await([&] { return panel.Holds(kDemoPanelPort) && !program_.window.isVisible(); }, "the window to close");
+    panel.SetTap(nullptr);
+    Print("The Control Panel has given up Comm 3, and has it back.");
+  }
+
+  const QString folder_;
+  DemoProgram program_;
+  VirtualLine& line_ = program_.bench.ports.Line(1);
+  LinePrinter printer_{Print};
+  User user_;
+};
+
+}  // namespace
+}  // namespace tendril::test
+
+int main(int argc, char** argv) {
+  if (!qEnvironmentVariableIsSet("QT_QPA_PLATFORM")) qputenv("QT_QPA_PLATFORM", "offscreen");
+  QApplication application(argc, argv);
+  QCommandLineParser parser;
+  parser.setApplicationDescription(
+      QStringLiteral("Works the window of tendril-demo by itself: sends a configuration to unit 01, reads it "
+                     "back, takes Comm 3 from "
+                     "the Control Panel and gives it back. Prints what crosses the lines and saves pictures "
+                     "of the window."));
+  parser.addHelpOption();
+  const QCommandLineOption pictures(
+      QStringLiteral("pictures"),
+      QStringLiteral("Only save pictures of the editor, of the summary and of the question for a port."));
+  const QCommandLineOption dark(QStringLiteral("dark"), QStringLiteral("Light text on a dark background."));
+  parser.addOptions({pictures, dark});
+  parser.addPositionalArgument(QStringLiteral("folder"), QStringLiteral("Where to save the pictures."));
+  parser.process(application);
+  if (parser.positionalArguments().size() != 1) parser.showHelp(EXIT_FAILURE);
+  if (parser.isSet(dark)) tendril::UseDarkPalette();
+  try {
+    tendril::test::Show show(parser.positionalArguments().constFirst());
+    parser.isSet(pictures) ? show.TakePictures() : show.Demonstrate();
+    return EXIT_SUCCESS;
+  } catch (const std::exception& fault) {
+    tendril::test::Print(fault.what());
+    return EXIT_FAILURE;
+  }
+}
