@@ -45,10 +45,10 @@ CommandArea::CommandArea(UnitCommands& commands, const UnitTarget& target, Comma
   auto* get =
       Named(new QPushButton(QStringLiteral("&GET(read) Configuration")), QStringLiteral("Command3_1"));
   auto* update = Named(new QPushButton(QStringLiteral("&UPDATE Unit_ID")), QStringLiteral("Command3_2"));
-  buttons.Add(send, kSendTip, [&commands] { commands.Send(); });
-  buttons.Add(get, kGetTip, [&commands] { commands.Get(); });
+  buttons.Add(send, kSendTip, [&commands] { commands.send.Start(); });
+  buttons.Add(get, kGetTip, [&commands] { commands.get.Start(); });
   buttons.Add(
-      update, QString::fromUtf8(kUpdateTip), [&commands] { commands.ChangeId(); },
+      update, QString::fromUtf8(kUpdateTip), [&commands] { commands.change_id.Start(); },
       [&target] { return target.UnitId() == 0 ? QString::fromUtf8(kNoUnitZero) : QString(); });
 
   auto* frame = Named(new FrameBox(QStringLiteral("Unit")), QStringLiteral("frmUpDownLoad"));

@@ -57,23 +57,25 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
           live_test_area_->TestButtons())),
       views_(new QStackedWidget),
       simulators_(*channels_, *editor_, channel_editor_),
-      live_test_(link, timers, boxes, commands_.Running(), *connection_, *editor_, *live_test_area_,
+      live_test_(link, timers, boxes, commands_.running, *connection_, *editor_, *live_test_area_,
                  simulators_),
       tmrSummaryScreen_(timers.CreateTimer([this] { OnSummaryScreen(); })),
       shutdown_(link, timers, control_panel, [this] { close(); }) {
   setObjectName(QStringLiteral("frmNewServoConfig"));
   LayOut();
-  commands_.Running().SetObserver([this] { ShowRunning(); });
-  connection_->SetUnitIdHandler([this] { command_buttons_.ShowRunning(commands_.Running()); });
+  commands_.running.SetObserver([this] { ShowRunning(); });
+  connection_->SetUnitIdHandler([this] { command_buttons_.ShowRunning(commands_.running); });
   channels_->SetSelectHandler([this](std::size_t channel) { SelectChannel(channel); });
   live_test_area_->Connect(live_test_);
   ports_.SetOpeningHandler([this] { live_test_.OnTestButton(LiveTest::kNoButton); });
+  link_.SetPortClosedHandler([this] { live_test_.OnPortClosed(); });
   StartUp(version);
 }
 
 frmNewServoConfig::~frmNewServoConfig() {
   hide();  // what is being typed is taken over now, and not when half of the window is gone
-  commands_.Running().SetObserver(nullptr);
+  commands_.running.SetObserver(nullptr);
+  link_.SetPortClosedHandler(nullptr);
 }
 
 // Stacks and scroll areas show a widget as soon as they get it, and with that lay it out. So they get theirs
@@ -135,7 +137,7 @@ void frmNewServoConfig::StartUp(const Version& version) {
   control_panel_.ReadPreferences();
   control_panel_.InitializeCommListenerInterface();
   simulators_.UpdateAll(live_test_.ShownPosition());
-  live_test_.ShowSlider();
+  live_test_.OnRecordsReplaced();
 }
 
 void frmNewServoConfig::SelectChannel(std::size_t channel) {
@@ -215,7 +217,7 @@ void frmNewServoConfig::ShowRecords() {
   channels_->ShowKinds();
   ShowEditor();
   simulators_.UpdateAll(live_test_.ShownPosition());
-  live_test_.ShowSlider();
+  live_test_.OnRecordsReplaced();
 }
 
 void frmNewServoConfig::OnReplaced() {
@@ -244,7 +246,7 @@ void frmNewServoConfig::OnSummaryScreen() {
   focus_before_summary_ = focusWidget();
   actuals_->hide();
   summary_->ShowRecords();
-  live_test_.ShowSlider();  // showing the records can have changed them
+  live_test_.OnRecordsReplaced();  // showing the records can have changed them
   views_->setCurrentWidget(summary_);
   command_area_->ShowSummaryButton(false);
   apply_boxes_->ShowEditing(false);
@@ -267,7 +269,7 @@ bool frmNewServoConfig::SummaryShown() const {
 }
 
 void frmNewServoConfig::ShowRunning() {
-  const RunningCommand& running = commands_.Running();
+  const RunningCommand& running = commands_.running;
   // Disabling takes the focus off what was used last, and it would fall on some servo or button, and scroll there. It
   // rests on the window meanwhile and then goes back, unless the person has moved it since.
   if (running.Active()) {

@@ -6,7 +6,6 @@
 #include <QWidget>
 
 #include "ui/controls.h"
-#include "unitops/command_progress.h"
 #include "unitops/running_command.h"
 
 namespace tendril {

@@ -136,9 +136,9 @@ SummaryArea::SummaryArea(UnitCommands& commands, CommandButtons& buttons, TimerF
 QLayout* SummaryArea::MakeButtons(UnitCommands& commands, CommandButtons& buttons) {
   // The same actions as those of the unit commands above.
   auto* send = Named(new QPushButton(QStringLiteral("Send to Tendril")), QStringLiteral("Command3_3"));
-  buttons.Add(send, kSendTip, [&commands] { commands.Send(); });
+  buttons.Add(send, kSendTip, [&commands] { commands.send.Start(); });
   auto* get = Named(new QPushButton(QStringLiteral("Get from Tendril")), QStringLiteral("Command3_4"));
-  buttons.Add(get, kGetTip, [&commands] { commands.Get(); });
+  buttons.Add(get, kGetTip, [&commands] { commands.get.Start(); });
   auto* simulator = Named(new QPushButton(QStringLiteral("Si&mulator")), QStringLiteral("cmdShowConfig"));
   Describe(simulator, QStringLiteral("Shows the servos and the editor again."));
   QObject::connect(simulator, &QAbstractButton::clicked, this, events_.back);

@@ -1,97 +1,72 @@
 #include "unitops/change_id_operation.h"
 
+#include <string>
+
 #include "platform/hex_text.h"
-#include "platform/runtime_error.h"
+#include "serial/packets.h"
 
 namespace tendril {
 namespace {
 
+constexpr std::uint8_t kFindPoll = '*';
+constexpr std::uint8_t kConfirmPoll = '+';
 constexpr std::int32_t kStepMs = 200;
 constexpr std::int32_t kMaxPolls = 15;
 
 }  // namespace
 
-ChangeIdOperation::ChangeIdOperation(CommandContext& context, TimerFactory& timers)
-    : context_(context), tmrChangeAddr_(timers.CreateTimer([this] { OnTick(); })) {
-  tmrChangeAddr_->SetInterval(kStepMs);
-}
+ChangeIdOperation::ChangeIdOperation(CommandContext& context)
+    : UnitOperation(context, "*+", {}), tmrChangeAddr_(MakeTimer(kStepMs, [this] { OnTick(); })) {}
 
-void ChangeIdOperation::Start() {
-  if (!MayStartCommand(context_)) return;
-  try {
-    const std::uint8_t new_id = context_.target.UnitId();
-    StartChangeAddress(kAnyUnit, new_id);
-    context_.running.Begin(UnitCommand::kChangeId, "Giving the unit the ID " + HexByte(new_id));
-    context_.progress.StartCommandProgress();
-  } catch (...) {
-    ShowCommError(context_.boxes, {}, DescribeCurrentFault());
-  }
+void ChangeIdOperation::Begin() {
+  const std::uint8_t new_id = UnitId();
+  StartChangeAddress(kAllUnits, new_id);
+  Run("Giving the unit the ID " + TwoHexDigits(new_id));
 }
 
 void ChangeIdOperation::StartChangeAddress(std::uint8_t old_id, std::uint8_t new_id) {
-  if (!context_.link.PortOpen()) context_.link.SetPortOpen(true);
+  if (!Link().PortOpen()) Link().SetPortOpen(true);
   old_id_ = old_id;
   new_id_ = new_id;
   stage_ = Stage::kFinding;
   attempts_ = 0;
   reply_seen_ = false;
-  tmrChangeAddr_->SetEnabled(true);
+  tmrChangeAddr_.SetEnabled(true);
+}
+
+void ChangeIdOperation::OnReply(bool replied, std::uint8_t /*unit*/, const Bytes& /*data*/) {
+  reply_seen_ = replied;
 }
 
 void ChangeIdOperation::OnTick() {
-  try {
-    Step();
-  } catch (...) {
-    const std::string fault = DescribeCurrentFault();
-    Abort();
-    ShowCommError(context_.boxes, {}, fault);
-  }
-}
-
-void ChangeIdOperation::Step() {
   switch (stage_) {
     case Stage::kFinding:
       if (reply_seen_) {
         stage_ = Stage::kConfirming;
         attempts_ = 0;
         reply_seen_ = false;
-        context_.link.cmdSetAddress(old_id_, new_id_, false);
+        Link().cmdSetAddress(old_id_, new_id_, false);
       } else if (MayPollAgain()) {
-        context_.link.cmdPollStation(old_id_, kFindPoll);
+        Link().cmdPollStation(old_id_, kFindPoll);
       } else {
-        Fail("Unable to locate unit to change address. Check connections and power.", "Cannot Find Unit");
+        Fail({"Unable to locate unit to change address. Check connections and power.", "Cannot Find Unit",
+              BoxIcon::kExclamation});
       }
       return;
     case Stage::kConfirming:
       if (reply_seen_) {
-        Stop();
-        context_.progress.EndCommandProgress(Outcome::kSuccess,
-                                             "SUCCESS: UnitID set to '" + HexByte(new_id_) + "'");
+        Succeed("SUCCESS: UnitID set to '" + TwoHexDigits(new_id_) + "'");
       } else if (MayPollAgain()) {
-        context_.link.cmdPollStation(new_id_, kConfirmPoll);
+        Link().cmdPollStation(new_id_, kConfirmPoll);
       } else {
-        Fail("Unable to change Unit ID. Please retry.", "Cannot Change Unit ID");
+        Fail({"Unable to change Unit ID. Please retry.", "Cannot Change Unit ID", BoxIcon::kExclamation});
       }
       return;
   }
-  Fail("Unknown error has cause failure of Unit ID change.", "Unit ID Change Error");  // a stage that is none
+  // A stage that does not exist.
+  Fail({"Unknown error has cause failure of Unit ID change.", "Unit ID Change Error", BoxIcon::kExclamation});
 }
 
 bool ChangeIdOperation::MayPollAgain() { return ++attempts_ <= kMaxPolls; }
-
-void ChangeIdOperation::Abort() {
-  tmrChangeAddr_->SetEnabled(false);
-  EndAsFailed(context_);
-}
-
-void ChangeIdOperation::Stop() {
-  tmrChangeAddr_->SetEnabled(false);
-  context_.running.End();
-}
-
-void ChangeIdOperation::Fail(const std::string& text, const std::string& title) {
-  Abort();
-  context_.boxes.Show({text, title, BoxIcon::kExclamation});
-}
 
 }  // namespace tendril

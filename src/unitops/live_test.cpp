@@ -7,7 +7,7 @@
 #include "config/option_bytes.h"
 #include "platform/rounding.h"
 #include "platform/runtime_error.h"
-#include "unitops/command_context.h"
+#include "unitops/unit_operation.h"
 
 namespace tendril {
 namespace {
@@ -64,10 +64,7 @@ LiveTest::LiveTest(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes, co
         Guarded([this] { SendWaiting(); });
       })) {
   pace_timer_->SetInterval(kCommandOnLineMs);
-  link_.SetPortClosedHandler([this] { StopAll(); });
 }
-
-LiveTest::~LiveTest() { link_.SetPortClosedHandler(nullptr); }
 
 bool LiveTest::Guarded(const std::function<void()>& action) {
   try {
@@ -162,7 +159,7 @@ void LiveTest::OnSlider() {
   });
 }
 
-void LiveTest::ShowSlider() {
+void LiveTest::OnRecordsReplaced() {
   waiting_.reset();  // it was meant for the records as they were
   Guarded([this] { PlaceSlider(); });
 }

@@ -80,13 +80,10 @@ class LiveTest {
   // In the place of a button: none is pressed, all are reset.
   static constexpr int kNoButton = -1;
 
-  // Everything handed in must outlive it. Takes the link's port-closed event.
+  // Everything handed in must outlive it.
   LiveTest(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes, const RunningCommand& running,
            const UnitTarget& target, const ChannelChoice& choice, LiveTestView& view,
            ServoPictures& pictures);
-  ~LiveTest();
-  LiveTest(const LiveTest&) = delete;
-  LiveTest& operator=(const LiveTest&) = delete;
 
   // Button 0 to 4 was pressed: sweep the virtual range, sweep the stops, move to the default position, sweep
   // the actual range, move to the centre. kNoButton resets the captions and stops a sweep where it is. Shows
@@ -94,10 +91,12 @@ class LiveTest {
   void OnTestButton(int button);
   // The slider was moved, or the range that it spans has changed by an edit.
   void OnSlider();
-  // The records were replaced: the same, but nothing is sent, not even what waits.
-  void ShowSlider();
+  // The records were replaced: shows the slider anew and sends nothing; a position that still waits is dropped.
+  void OnRecordsReplaced();
   // "Use Slider to Test Intensity Values" was ticked or cleared.
   void OnSliderSends();
+  // The link has closed its port: everything stops where it is, and nothing is left unsent.
+  void OnPortClosed() { StopAll(); }
   // A unit command is about to start: a sweep ends as by its button, and nothing is left unsent. False: that failed,
   // and the person has been told.
   bool MakeWay();

@@ -1,50 +1,78 @@
-// RunningCommand: which unit command is under way. At most one is.
+// RunningCommand: which unit command runs, and the progress display that shows it.
 #pragma once
 
+#include <cstdint>
 #include <functional>
+#include <memory>
 #include <string>
 #include <utility>
 
+#include "platform/timer.h"
+
 namespace tendril {
 
-enum class UnitCommand { kNone, kSend, kGet, kChangeId };
+class UnitOperation;
 
-// The commands begin and end it; the window disables what must not be used meanwhile.
+// Blue while a command runs, green for a success, red for a failure.
+enum class ProgressColour { kBlue, kGreen, kRed };
+// How a command ended.
+enum class Outcome { kSuccess, kFailure };
+
+// What the display is drawn on. Widths are device-independent pixels.
+class CommandProgressView {
+ public:
+  virtual ~CommandProgressView() = default;
+  // True: the progress frame replaces "Channels to Apply Changes". False: the reverse.
+  virtual void ShowProgress(bool shown) = 0;
+  // The inner width of the progress frame, at which the bar is full.
+  virtual int FrameWidth() const = 0;
+  // Draws the bar `width` wide, which may be a little more than the frame.
+  virtual void SetBarWidth(int width) = 0;
+  // Colours bar and label.
+  virtual void SetColour(ProgressColour colour) = 0;
+  // Sets the label; empty for none.
+  virtual void SetText(const std::string& text) = 0;
+};
+
+// At most one command runs. The display shows it, then for three seconds how it ended. The bar is an animation only:
+// it counts nothing and sets no time limit.
 class RunningCommand {
  public:
-  // Who is told of each change; called after it.
+  // `view` must outlive it.
+  RunningCommand(TimerFactory& timers, CommandProgressView& view);
+
+  // `observer` is called after each start and each end.
   void SetObserver(std::function<void()> observer) { observer_ = std::move(observer); }
 
-  // Which command is under way.
-  UnitCommand Which() const { return which_; }
-  // What runs, in the words of a tool tip ("Sending the configuration to unit 01"); empty when nothing does.
+  // The command that runs; nullptr when none does.
+  UnitOperation* Operation() const { return operation_; }
+  // Whether a command runs.
+  bool Active() const { return operation_ != nullptr; }
+  // What runs, for a tool tip ("Sending the configuration to unit 01"); empty when nothing does.
   const std::string& What() const { return what_; }
-  // Whether a command is under way.
-  bool Active() const { return which_ != UnitCommand::kNone; }
-
-  // `which` runs from now on; `what` as above.
-  void Begin(UnitCommand which, std::string what) { Change(which, std::move(what)); }
-  // Does nothing when nothing runs. `stopped`: where it stopped, and why, when no outcome is shown ("Stopped: channel
-  // 3: 305 to 2695 cannot be sent").
-  void End(std::string stopped = {}) {
-    if (!Active()) return;
-    stopped_ = std::move(stopped);
-    Change(UnitCommand::kNone, {});
-  }
-  // Where the command that ended last stopped; empty for one that showed its outcome.
+  // Where the last command stopped, when it ended without an outcome ("Stopped: channel 3: ActualRange(0) cannot be
+  // sent"); otherwise empty. Meaningful while no command runs.
   const std::string& Stopped() const { return stopped_; }
 
- private:
-  void Change(UnitCommand which, std::string what) {
-    which_ = which;
-    what_ = std::move(what);
-    if (observer_) observer_();
-  }
+  // `operation` runs from now on: shows the empty bar and lets it grow. `what` as above.
+  void StartCommandProgress(UnitOperation& operation, std::string what);
+  // Ends the command and shows `text` in green or red for three seconds.
+  void EndCommandProgress(Outcome outcome, const std::string& text);
+  // Ends the command, if one runs, and leaves the display as it is. `where`: see Stopped().
+  void Stop(std::string where = {});
 
-  UnitCommand which_ = UnitCommand::kNone;
-  std::string what_;
-  std::string stopped_;  // meaningful while no command is under way
+ private:
+  void OnTick();
+
+  CommandProgressView& view_;
+  std::unique_ptr<Timer> tmrProgress_;
   std::function<void()> observer_;
+  UnitOperation* operation_ = nullptr;
+  std::string what_;
+  std::string stopped_;
+  std::int32_t value_ = kEnded;  // the bar's width; kEnded while an outcome is shown, or nothing
+
+  static constexpr std::int32_t kEnded = -1;
 };
 
 }  // namespace tendril

@@ -1,20 +1,15 @@
 // SendOperation: writes the working configuration of all eight ports into a unit.
 #pragma once
 
-#include <cstddef>
 #include <cstdint>
-#include <memory>
-#include <string>
 
 #include "config/channel_config.h"
-#include "platform/bytes.h"
-#include "platform/timer.h"
-#include "unitops/command_context.h"
+#include "unitops/unit_operation.h"
 
 namespace tendril {
 
-// Port by port: the options, then a poll of kind "0" until the unit acknowledges (once, and twice more when
-// nothing is heard), then a pause, then the next port.
+// Port by port: the options, then a poll of kind "0" until the unit acknowledges (one poll, and two more when no reply
+// comes), then a pause, then the next port.
 //
 //   Idle --Start: options and poll out--> Polling
 //   Polling --acknowledged--> Pausing
@@ -23,35 +18,24 @@ namespace tendril {
 //   Pausing --300 ms after port 8--> Idle (success)
 //   Idle, Pausing --a field is invalid--> Idle
 //   any --a fault--> Idle
-class SendOperation {
+class SendOperation final : public UnitOperation {
  public:
-  // The poll kind of an acknowledgement.
-  static constexpr std::uint8_t kAcknowledgePoll = '0';
+  // `working` are the records that are sent; context and records must outlive the operation.
+  SendOperation(CommandContext& context, const ChannelTable& working);
 
-  // `working` are the records that are sent; both must outlive the operation.
-  SendOperation(CommandContext& context, TimerFactory& timers, const ChannelTable& working);
-
-  // "SEND(write) Configuration". Shows every failure; raises none.
-  void Start();
-  // The reply, or its absence, to a poll of kind "0". May raise.
-  void OnPollReply(bool replied, std::uint8_t unit, const Bytes& data);
-  // Stops where it is and shows nothing: the window is closing.
-  void Stop();
-
-  // Checks the record of slot `port_index` and hands it on as options to the unit that is chosen. False: a
-  // field is invalid; the person has been told, and nothing was sent. Raises what the link raises, and
-  // kErrOutOfRange for an index above 8.
+  // Encodes the record of slot `port_index` and sends it as options to the chosen unit. False: a field is invalid,
+  // which has been shown, and nothing was sent. Raises what the link raises, and kErrOutOfRange for an index above 8.
   bool EncodeAndSendPort(std::uint8_t port_index);
+
+ protected:
+  void Begin() override;
+  void OnReply(bool replied, std::uint8_t unit, const Bytes& data) override;
 
  private:
   void OnNextPort();
-  void Abort();
-  void Fail(const std::string& text, const std::string& title);
-  void ShowFault(const std::string& description);
 
-  CommandContext& context_;
   const ChannelTable& working_;
-  std::unique_ptr<Timer> next_port_timer_;
+  Timer& tmrDownload_;  // enabled in the pause between two ports
   std::uint8_t port_index_ = 0;
   std::int32_t unanswered_ = 0;  // polls of the current port without a reply
 };

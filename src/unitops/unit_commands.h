@@ -1,7 +1,6 @@
-// UnitCommands: the commands that the window runs against a unit, and who gets which reply.
+// UnitCommands: the commands that the window runs against a unit.
 #pragma once
 
-#include <cstdint>
 #include <functional>
 
 #include "config/channel_config.h"
@@ -9,21 +8,20 @@
 #include "platform/timer.h"
 #include "serial/hw_serial.h"
 #include "unitops/change_id_operation.h"
-#include "unitops/command_context.h"
-#include "unitops/command_progress.h"
 #include "unitops/get_operation.h"
 #include "unitops/running_command.h"
 #include "unitops/send_operation.h"
+#include "unitops/unit_operation.h"
 #include "unitops/unit_target.h"
 
 namespace tendril {
 
-// One object for all of them, since they share the progress display, and only one runs at a time.
-class UnitCommands {
- public:
-  // What the commands tell the window. Either may be empty; neither raises.
+// All commands share the link and the progress display, and only one runs at a time. Another one takes a class derived
+// from UnitOperation and a member here.
+struct UnitCommands {
+  // Callbacks to the window. Each may be empty; none raises.
   struct Events {
-    // A command is about to start, and has sent nothing yet. False: it must not; the person has been told why.
+    // See CommandContext.
     std::function<bool()> starting;
     // A get has just replaced the working configuration, and still runs.
     std::function<void()> replaced;
@@ -36,31 +34,14 @@ class UnitCommands {
   UnitCommands(const UnitCommands&) = delete;
   UnitCommands& operator=(const UnitCommands&) = delete;
 
-  // "SEND(write) Configuration".
-  void Send() { send_.Start(); }
-  // "GET(read) Configuration".
-  void Get() { get_.Start(); }
-  // "UPDATE Unit_ID".
-  void ChangeId() { change_id_.Start(); }
-
-  // Stops whatever runs, and shows nothing: the window is closing.
+  // Stops the running command and shows nothing: the window is closing.
   void Stop();
 
-  // Which of them runs.
-  RunningCommand& Running() { return running_; }
-
-  // The reply, or its absence, to a poll of `kind`. Shows every failure; raises none. The link calls it.
-  void OnPollReply(bool replied, std::uint8_t unit, std::uint8_t kind, const Bytes& data);
-
- private:
-  HwSerial& link_;
-  MessageBoxes& boxes_;
-  CommandProgress progress_;
-  RunningCommand running_;
-  CommandContext context_;
-  SendOperation send_;
-  GetOperation get_;
-  ChangeIdOperation change_id_;
+  RunningCommand running;
+  CommandContext context;
+  SendOperation send;           // "SEND(write) Configuration"
+  GetOperation get;             // "GET(read) Configuration"
+  ChangeIdOperation change_id;  // "UPDATE Unit_ID"
 };
 
 }  // namespace tendril

@@ -3,7 +3,7 @@
 
 #include <string>
 
-#include "unitops/command_progress.h"
+#include "unitops/running_command.h"
 
 namespace tendril::test {
 

@@ -49,8 +49,8 @@ class ChangeId : public CommandTest {
 TEST_F(ChangeId, UnitFromTheFactory_IsFoundGivenItsIdAndConfirmed) {
   auto& unit = Attach("", 0xFF);
   target_.unit = 0x0A;
-  commands_.ChangeId();
-  EXPECT_EQ(commands_.Running().What(), "Giving the unit the ID 0A");
+  commands_.change_id.Start();
+  EXPECT_EQ(commands_.running.What(), "Giving the unit the ID 0A");
   RunToTheEnd();
   ExpectSuccess("SUCCESS: UnitID set to '0A'");
   EXPECT_EQ(unit.id(), 0x0A);
@@ -89,7 +89,7 @@ TEST_F(ChangeId, EveryUnit_EndsAsStated) {
     sent_.clear();
     VirtualUnit& unit = Attach(c.unit, c.id);
     target_.unit = c.new_id;
-    commands_.ChangeId();
+    commands_.change_id.Start();
     RunToTheEnd();
     if (c.success.empty()) {
       ExpectFailure(c.box);
@@ -106,10 +106,10 @@ TEST_F(ChangeId, EveryUnit_EndsAsStated) {
 
 TEST_F(ChangeId, RepliesOfOtherKinds_FindNoUnit) {
   target_.unit = 0x0A;
-  commands_.ChangeId();
+  commands_.change_id.Start();
   world_.time.Advance(399);  // the first poll has timed out, and the next tick is about to come
-  commands_.OnPollReply(true, 0xFF, 'n', Bytes(10, 1));
-  commands_.OnPollReply(true, 0xFF, '0', Bytes{1, 10});
+  commands_.running.Operation()->OnPollReply(true, 0xFF, 'n', Bytes(10, 1));
+  commands_.running.Operation()->OnPollReply(true, 0xFF, '0', Bytes{1, 10});
   RunToTheEnd();
   ExpectFailure(kCannotFind);
   EXPECT_EQ(Sent('*'), 15u);
@@ -118,7 +118,7 @@ TEST_F(ChangeId, RepliesOfOtherKinds_FindNoUnit) {
 TEST_F(ChangeId, IdChosenMeanwhile_DoesNotCount) {
   auto& unit = Attach("", 0xFF);
   target_.unit = 0x0A;
-  commands_.ChangeId();
+  commands_.change_id.Start();
   target_.unit = 0x0B;
   RunToTheEnd();
   EXPECT_EQ(unit.id(), 0x0A);
@@ -127,7 +127,7 @@ TEST_F(ChangeId, IdChosenMeanwhile_DoesNotCount) {
 TEST_F(ChangeId, Faults_StopItAndAreToldOnce) {
   // At the start: the port cannot be opened.
   world_.bench.Unplug(1);
-  commands_.ChangeId();
+  commands_.change_id.Start();
   EXPECT_THAT(world_.boxes.Take(),
               testing::ElementsAre(Fault("Comm Error!", "Open of serial port 1 has failed\r\n")));
   EXPECT_FALSE(progress_.shown);
@@ -137,7 +137,7 @@ TEST_F(ChangeId, Faults_StopItAndAreToldOnce) {
   Attach("", 0xFF);
   for (const bool unplug : {false, true}) {
     target_.unit = 0x0A;
-    commands_.ChangeId();
+    commands_.change_id.Start();
     EXPECT_TRUE(link_.PortOpen());
     world_.time.Advance(390);
     if (unplug) {
@@ -153,17 +153,17 @@ TEST_F(ChangeId, Faults_StopItAndAreToldOnce) {
 
   world_.bench.Replug(1);
   target_.unit = 0x0C;
-  commands_.ChangeId();
+  commands_.change_id.Start();
   RunToTheEnd();
   ExpectSuccess("SUCCESS: UnitID set to '0C'");
 }
 
 TEST_F(ChangeId, RefusedOrStopped_LeavesTheLineAlone) {
   target_.port_chosen = false;
-  commands_.ChangeId();
+  commands_.change_id.Start();
   EXPECT_EQ(world_.boxes.Take().at(0).title, "No Port Selected");
   target_.port_chosen = true;
-  commands_.ChangeId();
+  commands_.change_id.Start();
   commands_.Stop();  // the window closes
   world_.time.Advance(10000);
   EXPECT_THAT(sent_, IsEmpty());

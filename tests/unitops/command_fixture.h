@@ -45,7 +45,7 @@ class CommandTest : public testing::Test {
       SetFromPreset(kPresets[kStartPreset], working_.At(slot));
     // A box runs the event loop: the command has ended and shows it before one opens.
     world_.boxes.while_open = [this] {
-      settled_at_the_box_ = !commands_.Running().Active() && progress_.colour == ProgressColour::kRed;
+      settled_at_the_box_ = !commands_.running.Active() && progress_.colour == ProgressColour::kRed;
     };
   }
 
@@ -59,7 +59,7 @@ class CommandTest : public testing::Test {
   // Lets the command run until it has ended.
   void RunToTheEnd() {
     constexpr std::uint64_t kLongestMs = 12000;
-    ASSERT_TRUE(world_.time.AdvanceUntil([&] { return !commands_.Running().Active(); }, kLongestMs));
+    ASSERT_TRUE(world_.time.AdvanceUntil([&] { return !commands_.running.Active(); }, kLongestMs));
   }
   void ExpectFailure(const testing::Matcher<const BoxMessage&>& box) {
     EXPECT_THAT(world_.boxes.Take(), testing::ElementsAre(box));

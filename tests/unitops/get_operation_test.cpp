@@ -73,16 +73,16 @@ TEST_F(Get, Units_EndAsTheyReportTheirPorts) {
     int replaced = 0;
     on_replaced_ = [&] {
       ++replaced;
-      EXPECT_TRUE(commands_.Running().Active());
+      EXPECT_TRUE(commands_.running.Active());
       ExpectUnitsRecords();
     };
-    commands_.Get();
-    EXPECT_EQ(commands_.Running().What(), "Reading the configuration of unit 05");
+    commands_.get.Start();
+    EXPECT_EQ(commands_.running.What(), "Reading the configuration of unit 05");
     ASSERT_TRUE(world_.time.AdvanceUntil(
         [&] {
           // All at one moment, or not at all.
           EXPECT_TRUE(working_ == before || replaced == 1);
-          return !commands_.Running().Active();
+          return !commands_.running.Active();
         },
         12000));
     EXPECT_EQ(unit.polls_heard(), c.polls);
@@ -106,7 +106,7 @@ TEST_F(Get, PortBeyondTheEighth_EndsItAtOnce) {
     Bytes data(port == 9 ? 10 : 12, 1);  // more than ten bytes are read as well
     data[0] = static_cast<std::uint8_t>(port);
     auto& unit = world_.bench.Attach<ScriptedUnit>(1, std::uint8_t{0x01}, data);
-    commands_.Get();
+    commands_.get.Start();
     RunToTheEnd();
     ExpectFailure({"Upload error: Invalid Port Index Received = " + std::to_string(port - 1), "Error",
                    BoxIcon::kExclamation});
@@ -114,8 +114,8 @@ TEST_F(Get, PortBeyondTheEighth_EndsItAtOnce) {
     world_.bench.Detach(1, unit);
   }
   // A port 0 cannot come over the line, where a zero byte ends the reply.
-  commands_.Get();
-  commands_.OnPollReply(true, 0x01, 'n', Bytes(10, 0));
+  commands_.get.Start();
+  commands_.running.Operation()->OnPollReply(true, 0x01, 'n', Bytes(10, 0));
   ExpectFailure({"Upload error: Invalid Port Index Received = -1", "Error", BoxIcon::kExclamation});
   EXPECT_EQ(working_, before);
 }
@@ -123,9 +123,9 @@ TEST_F(Get, PortBeyondTheEighth_EndsItAtOnce) {
 TEST_F(Get, RepliesOfOtherKinds_AreNotItsOwn) {
   Attach("", 0x01);
   for (const std::uint8_t kind : {'0', '*', '+', 'x'}) {
-    commands_.Get();
-    commands_.OnPollReply(true, 0x01, kind, Bytes(10, 9));
-    commands_.OnPollReply(false, 0x01, kind, {});
+    commands_.get.Start();
+    commands_.running.Operation()->OnPollReply(true, 0x01, kind, Bytes(10, 9));
+    commands_.running.Operation()->OnPollReply(false, 0x01, kind, {});
     RunToTheEnd();
     ExpectSuccess(kGetSuccess);
   }
@@ -134,19 +134,19 @@ TEST_F(Get, RepliesOfOtherKinds_AreNotItsOwn) {
 TEST_F(Get, Refusals_AreToldInTheStatedWords) {
   const ChannelTable before = working_;
   target_.port_chosen = false;
-  commands_.Get();
+  commands_.get.Start();
   EXPECT_EQ(world_.boxes.Take().at(0).title, "No Port Selected");
   target_.port_chosen = true;
 
   target_.unit = 0;
-  commands_.Get();
+  commands_.get.Start();
   EXPECT_THAT(world_.boxes.Take(), ElementsAre(BoxMessage{"Error Uploading Configuration, Please retry",
                                                           "Send Error", BoxIcon::kCritical}));
   EXPECT_FALSE(progress_.shown);
 
   target_.unit = 1;
   Attach("", 0x01);
-  commands_.Get();
+  commands_.get.Start();
   target_.unit = 0;
   RunToTheEnd();
   ExpectFailure({"Error:2 Uploading Configuration, Please retry", "Send Error", BoxIcon::kCritical});
@@ -156,20 +156,20 @@ TEST_F(Get, Refusals_AreToldInTheStatedWords) {
 TEST_F(Get, Unplugged_IsTheStatedFaultAndChangesNothing) {
   const ChannelTable before = working_;
   Attach("", 0x01);
-  commands_.Get();
+  commands_.get.Start();
   world_.time.Advance(60);
   world_.bench.Unplug(1);
   RunToTheEnd();
   ExpectFailure(Fault("Serial Event Error",
                       "Serial Event Error (Poll Type 110)\r\n\r\nOpen of serial port 1 has failed\r\n"));
 
-  commands_.Get();
+  commands_.get.Start();
   EXPECT_THAT(world_.boxes.Take(),
               ElementsAre(Fault("Comm Error!", "Upload Failed\r\nOpen of serial port 1 has failed\r\n")));
   EXPECT_EQ(working_, before);
 
   world_.bench.Replug(1);
-  commands_.Get();
+  commands_.get.Start();
   RunToTheEnd();
   ExpectSuccess(kGetSuccess);
 }
@@ -201,10 +201,10 @@ TEST_F(Get, WhatWasSent_IsWhatIsReadBack) {
         *field -= *field % 10;
       }
     }
-    commands_.Send();
+    commands_.send.Start();
     RunToTheEnd();
     working_ = ChannelTable();
-    commands_.Get();
+    commands_.get.Start();
     RunToTheEnd();
     ASSERT_EQ(working_, expected) << "round " << round;
   }

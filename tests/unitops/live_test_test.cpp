@@ -61,6 +61,7 @@ class Live : public CommandTest {
 
   Live() {
     on_starting_ = [this] { return test_.MakeWay(); };
+    link_.SetPortClosedHandler([this] { test_.OnPortClosed(); });
     choice_.values = working_.At(2);
     world_.bench.Line(1).SetTap([this](const LineByte& byte) { Hear(byte); });
   }
@@ -97,12 +98,14 @@ class Live : public CommandTest {
     test_.OnSliderSends();
   }
 
+  ~Live() override { link_.SetPortClosedHandler(nullptr); }
+
   FakeChoice choice_;
   FakeView view_;
   FakePictures pictures_;
   std::vector<LiveCommand> sent_;
   std::uint64_t start_ms_ = world_.time.ElapsedMs();
-  LiveTest test_{link_, world_.time, world_.boxes, commands_.Running(), target_, choice_, view_, pictures_};
+  LiveTest test_{link_, world_.time, world_.boxes, commands_.running, target_, choice_, view_, pictures_};
 
  private:
   Bytes packet_;
@@ -314,7 +317,7 @@ TEST_F(Live, WaitingPosition_GoesOutUnlessItsRecordsOrItsPortAreGone) {
   drag();
   Attach("", 0x0A);
   const std::size_t logged = world_.log.lines.size();
-  commands_.Get();
+  commands_.get.Start();
   EXPECT_EQ(world_.log.lines.size(), logged + 1) << "at once, before the command's own";
   RunToTheEnd();
   ExpectSuccess("SUCCESS: Upload Complete");
@@ -322,7 +325,7 @@ TEST_F(Live, WaitingPosition_GoesOutUnlessItsRecordsOrItsPortAreGone) {
 
   // Other records have other stops.
   drag();
-  test_.ShowSlider();
+  test_.OnRecordsReplaced();
   Settle();
   EXPECT_THAT(SentPositions(), ElementsAre(140));
 
@@ -340,16 +343,16 @@ TEST_F(Live, UnitCommand_StopsASweepAndHasTheLineToItself) {
   world_.time.Advance(500);
   sent_.clear();
   target_.port_chosen = false;
-  commands_.Send();  // refused: the sweep goes on
+  commands_.send.Start();  // refused: the sweep goes on
   world_.boxes.Take();
   EXPECT_TRUE(view_.captions[0]);
   target_.port_chosen = true;
 
-  commands_.Send();
+  commands_.send.Start();
   EXPECT_THAT(view_.captions, testing::Each(false));
   EXPECT_EQ(test_.ShownPosition(), 1500);
   SetSliderSends(true);
-  while (commands_.Running().Active()) {
+  while (commands_.running.Active()) {
     MoveSliderTo(100 + static_cast<int>(world_.time.ElapsedMs() % 800));
     world_.time.Advance(7);
   }
@@ -420,11 +423,11 @@ TEST_F(Live, FaultOfMakingWay_IsToldAndKeepsTheCommandFromStarting) {
   auto& unit = Attach("", 0x01);
   const auto expect_not_started = [&] {
     world_.log.broken = true;
-    commands_.Get();
+    commands_.get.Start();
     world_.time.Advance(1000);
     EXPECT_THAT(world_.boxes.Take(), ElementsAre(testing::Field(&BoxMessage::title, "Comm Error!")));
     EXPECT_EQ(unit.polls_heard(), 0u);
-    EXPECT_FALSE(commands_.Running().Active());
+    EXPECT_FALSE(commands_.running.Active());
     EXPECT_THAT(view_.captions, testing::Each(false));
     world_.log.broken = false;
   };

@@ -67,7 +67,7 @@ TEST_F(Send, EveryPort_GoesOutAsUnlockOptionsAndPoll) {
       record.NeutralPosition = width(7);
     }
     const Bytes sent = Recorded(world_.bench, c.comm, [&] {
-      commands_.Send();
+      commands_.send.Start();
       RunToTheEnd();
     });
     ExpectSuccess();
@@ -88,8 +88,8 @@ TEST_F(Send, EveryPort_GoesOutAsUnlockOptionsAndPoll) {
 
 TEST_F(Send, Ports_FollowEachOther300msAfterTheAcknowledgement) {
   auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
-  commands_.Send();
-  EXPECT_EQ(commands_.Running().What(), "Sending the configuration to unit 01");
+  commands_.send.Start();
+  EXPECT_EQ(commands_.running.What(), "Sending the configuration to unit 01");
   ASSERT_TRUE(
       world_.time.AdvanceUntil([&] { return unit.polls_heard() == 1 && !link_.PollOutstanding(); }, 200));
   // Nothing until the pause is over.
@@ -120,7 +120,7 @@ TEST_F(Send, BadlyBehavedUnits_EndWithTheirOutcome) {
     SCOPED_TRACE(c.unit);
     VirtualUnit& unit = Attach(c.unit, 0x05);
     target_.unit = 0x05;
-    commands_.Send();
+    commands_.send.Start();
     RunToTheEnd();
     EXPECT_EQ(unit.polls_heard(), c.polls);
     if (c.success) {
@@ -132,7 +132,7 @@ TEST_F(Send, BadlyBehavedUnits_EndWithTheirOutcome) {
 
     // The program is usable afterwards.
     auto& good = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x05});
-    commands_.Send();
+    commands_.send.Start();
     RunToTheEnd();
     ExpectSuccess();
     world_.bench.Detach(1, good);
@@ -152,7 +152,7 @@ TEST_F(Send, OnlyTheReplysSecondByte_Accepts) {
                                          {{}, false}}) {
     SCOPED_TRACE(testing::PrintToString(c.data));
     auto& unit = world_.bench.Attach<ScriptedUnit>(1, std::uint8_t{0x01}, c.data);
-    commands_.Send();
+    commands_.send.Start();
     RunToTheEnd();
     if (c.accepted) {
       ExpectSuccess();
@@ -165,14 +165,14 @@ TEST_F(Send, OnlyTheReplysSecondByte_Accepts) {
 
 TEST_F(Send, IdSetTo00InTheMiddle_IsASendErrorAtTheNextPort) {
   VirtualUnit& mute = Attach("mute", 0x01);
-  commands_.Send();
+  commands_.send.Start();
   target_.unit = 0x00;  // a repeat goes to the unit that did not answer
   RunToTheEnd();
   ExpectFailure(kNoResponse);
   world_.bench.Detach(1, mute);
   target_.unit = 0x01;
   world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
-  commands_.Send();
+  commands_.send.Start();
   target_.unit = 0;
   RunToTheEnd();
   ExpectFailure({"Error sending configuration, Please retry", "Send Error", BoxIcon::kCritical});
@@ -180,11 +180,11 @@ TEST_F(Send, IdSetTo00InTheMiddle_IsASendErrorAtTheNextPort) {
 
 TEST_F(Send, PollTakenBySomebodyElse_IsASendErrorOfTheRepeat) {
   world_.bench.Attach<MuteUnit>(1, std::uint8_t{0x01});
-  commands_.Send();
+  commands_.send.Start();
   // Whoever hears of the missing reply first polls for something of his own.
   auto handler = [&](bool replied, std::uint8_t unit, std::uint8_t kind, Bytes& data) {
     link_.cmdPollStation(0x02, 'n');
-    commands_.OnPollReply(replied, unit, kind, data);
+    commands_.running.Operation()->OnPollReply(replied, unit, kind, data);
   };
   link_.SetPollReplyHandler(handler);
   RunToTheEnd();
@@ -194,16 +194,16 @@ TEST_F(Send, PollTakenBySomebodyElse_IsASendErrorOfTheRepeat) {
 
 TEST_F(Send, Refusals_AreToldAndStartNothing) {
   target_.port_chosen = false;
-  commands_.Send();
+  commands_.send.Start();
   EXPECT_THAT(world_.boxes.Take(),
               ElementsAre(BoxMessage{"No comm port selected!!!\r\n\r\nYou must select a comm port first.",
                                      "No Port Selected", BoxIcon::kExclamation}));
   target_.port_chosen = true;
   target_.unit = 0x00;
-  commands_.Send();
+  commands_.send.Start();
   EXPECT_THAT(world_.boxes.Take(), ElementsAre(BoxMessage{"Error sending configuration, Please retry",
                                                           "Send Error", BoxIcon::kCritical}));
-  EXPECT_FALSE(commands_.Running().Active());
+  EXPECT_FALSE(commands_.running.Active());
   EXPECT_FALSE(progress_.shown);
 }
 
@@ -211,8 +211,8 @@ TEST_F(Send, InvalidRecord_StopsBeforeItsPort) {
   auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
   for (std::size_t slot = 0; slot < kPortCount; ++slot) working_.At(slot).DefaultPosition = 1200;
   working_.At(4).ActualRange[0] = 9;
-  world_.boxes.while_open = [&] { EXPECT_FALSE(commands_.Running().Active()); };
-  commands_.Send();
+  world_.boxes.while_open = [&] { EXPECT_FALSE(commands_.running.Active()); };
+  commands_.send.Start();
   RunToTheEnd();
   EXPECT_THAT(world_.boxes.Take(), ElementsAre(BoxMessage{"Internal Error - Invalid ActualRange(0)=9",
                                                           "Internal Error", BoxIcon::kNone}));
@@ -225,20 +225,20 @@ TEST_F(Send, InvalidRecord_StopsBeforeItsPort) {
   EXPECT_TRUE(progress_.shown);
   EXPECT_EQ(progress_.text, "");
   working_.At(4).ActualRange[0] = 10;
-  commands_.Send();
+  commands_.send.Start();
   RunToTheEnd();
   ExpectSuccess();
 
   working_.At(0).PortType = 7;  // the first port: nothing starts at all
-  commands_.Send();
+  commands_.send.Start();
   EXPECT_THAT(world_.boxes.Take(), ElementsAre(BoxMessage{"Internal Error - Invalid PortType=7",
                                                           "Internal Error", BoxIcon::kNone}));
-  EXPECT_FALSE(commands_.Running().Active());
+  EXPECT_FALSE(commands_.running.Active());
 }
 
 TEST_F(Send, UnpluggedBetweenTwoPorts_IsADownloadFailure) {
   auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
-  commands_.Send();
+  commands_.send.Start();
   ASSERT_TRUE(
       world_.time.AdvanceUntil([&] { return unit.polls_heard() == 2 && !link_.PollOutstanding(); }, 1000));
   world_.bench.Unplug(1);
@@ -248,19 +248,19 @@ TEST_F(Send, UnpluggedBetweenTwoPorts_IsADownloadFailure) {
   ExpectFailure(fault);
 
   // Still gone: the start itself fails. Back again: it works, without choosing the port anew.
-  commands_.Send();
+  commands_.send.Start();
   EXPECT_THAT(world_.boxes.Take(), ElementsAre(fault));
   world_.bench.Replug(1);
-  commands_.Send();
+  commands_.send.Start();
   RunToTheEnd();
   ExpectSuccess();
 }
 
 TEST_F(Send, SecondStartWhileOneRuns_IsIgnored) {
   auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
-  commands_.Send();
+  commands_.send.Start();
   world_.time.Advance(700);
-  commands_.Send();
+  commands_.send.Start();
   RunToTheEnd();
   ExpectSuccess();
   EXPECT_EQ(unit.accepted_commands(), 8u);
@@ -268,7 +268,7 @@ TEST_F(Send, SecondStartWhileOneRuns_IsIgnored) {
 
 TEST_F(Send, StoppedByTheClosingWindow_SaysNothingMore) {
   world_.bench.Attach<MuteUnit>(1, std::uint8_t{0x01});
-  commands_.Send();
+  commands_.send.Start();
   world_.time.Advance(50);
   commands_.Stop();
   world_.time.Advance(60000);
@@ -276,7 +276,7 @@ TEST_F(Send, StoppedByTheClosingWindow_SaysNothingMore) {
 
   auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x02});
   target_.unit = 0x02;
-  commands_.Send();
+  commands_.send.Start();
   world_.time.Advance(200);  // the pause after the first port
   commands_.Stop();
   world_.time.Advance(60000);
@@ -285,8 +285,8 @@ TEST_F(Send, StoppedByTheClosingWindow_SaysNothingMore) {
 
 TEST_F(Send, RepliesOfOtherKinds_AreNotItsOwn) {
   world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
-  commands_.Send();
-  commands_.OnPollReply(true, 0x01, 'n', Bytes{1, 11});
+  commands_.send.Start();
+  commands_.running.Operation()->OnPollReply(true, 0x01, 'n', Bytes{1, 11});
   RunToTheEnd();
   ExpectSuccess();
 }

@@ -1,0 +1,59 @@
+#include "unitops/running_command.h"
+
+namespace tendril {
+namespace {
+
+constexpr std::int32_t kGrowPeriodMs = 15;
+constexpr std::int32_t kShowOutcomeMs = 3000;
+constexpr int kStep = 10;  // the bar's first width, and what it grows by
+
+}  // namespace
+
+RunningCommand::RunningCommand(TimerFactory& timers, CommandProgressView& view)
+    : view_(view), tmrProgress_(timers.CreateTimer([this] { OnTick(); })) {}
+
+void RunningCommand::StartCommandProgress(UnitOperation& operation, std::string what) {
+  operation_ = &operation;
+  what_ = std::move(what);
+  value_ = kStep;
+  if (observer_) observer_();
+  view_.SetText("");
+  view_.SetColour(ProgressColour::kBlue);
+  view_.SetBarWidth(kStep);
+  view_.ShowProgress(true);
+  tmrProgress_->SetInterval(kGrowPeriodMs);
+  tmrProgress_->SetEnabled(true);
+}
+
+void RunningCommand::EndCommandProgress(Outcome outcome, const std::string& text) {
+  Stop();
+  view_.SetColour(outcome == Outcome::kSuccess ? ProgressColour::kGreen : ProgressColour::kRed);
+  view_.SetText(text);
+  value_ = kEnded;
+  tmrProgress_->SetInterval(kShowOutcomeMs);
+  tmrProgress_->SetEnabled(true);
+}
+
+void RunningCommand::Stop(std::string where) {
+  if (!Active()) return;
+  operation_ = nullptr;
+  what_.clear();
+  stopped_ = std::move(where);
+  if (observer_) observer_();
+}
+
+void RunningCommand::OnTick() {
+  if (value_ == kEnded) {
+    tmrProgress_->SetEnabled(false);
+    view_.ShowProgress(false);
+    view_.SetBarWidth(kStep);
+    return;
+  }
+  // A full bar waits for the command's end, or for a wider frame.
+  if (value_ < view_.FrameWidth()) {
+    value_ += kStep;
+    view_.SetBarWidth(value_);
+  }
+}
+
+}  // namespace tendril

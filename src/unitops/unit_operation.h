@@ -1,0 +1,99 @@
+// UnitOperation: a command that runs against a unit.
+#pragma once
+
+#include <cstdint>
+#include <functional>
+#include <memory>
+#include <string>
+#include <string_view>
+#include <utility>
+
+#include "platform/bytes.h"
+#include "platform/message_boxes.h"
+#include "platform/timer.h"
+#include "serial/hw_serial.h"
+#include "unitops/running_command.h"
+#include "unitops/unit_target.h"
+
+namespace tendril {
+
+// What every operation works with. All of it outlives the operations.
+struct CommandContext {
+  HwSerial& link;
+  TimerFactory& timers;
+  MessageBoxes& boxes;
+  RunningCommand& running;
+  const UnitTarget& target;
+  // Called before an operation starts and sends anything. False: it must not start; the user has been told why.
+  // May be empty; raises nothing.
+  std::function<bool()> starting;
+};
+
+// Shows a fault. `failure` is the first line of the box; empty for none.
+void ShowCommError(MessageBoxes& boxes, const std::string& failure, const std::string& description);
+
+// The base of all operations. It ends an operation in one way: timer off, RunningCommand settled, and only then a
+// message box, since a box runs the event loop and the user can start the next operation from there.
+//
+//   Idle --Start: Begin() calls Run()--> Running
+//   Running --Succeed, Fail, StopAt, Stop, or a fault in a reply or a tick--> Idle
+class UnitOperation {
+ public:
+  virtual ~UnitOperation() = default;
+  UnitOperation(const UnitOperation&) = delete;
+  UnitOperation& operator=(const UnitOperation&) = delete;
+
+  // Starts the operation, unless one runs already, no port is chosen or the context objects. Shows every failure;
+  // raises none.
+  void Start();
+  // Ends the operation where it is and shows nothing: the window is closing.
+  void Stop() { StopAt({}); }
+
+  // The reply, or its absence, to a poll. Polls of other kinds belong to an operation that has ended: they are ignored.
+  // Shows every failure; raises none.
+  void OnPollReply(bool replied, std::uint8_t unit, std::uint8_t kind, const Bytes& data);
+
+ protected:
+  // `poll_kinds`: the kinds of this operation's polls, one character each. `fault_text`: the first line of the box that
+  // shows a fault of Begin() or a tick; empty for none.
+  UnitOperation(CommandContext& context, std::string_view poll_kinds, std::string fault_text);
+
+  // Sends the first packets and calls Run(); or shows why it cannot. May raise.
+  virtual void Begin() = 0;
+  // The reply to a poll of the operation's own kinds. May raise.
+  virtual void OnReply(bool replied, std::uint8_t unit, const Bytes& data) = 0;
+
+  // The operation's timer, at most one: disabled, and disabled again when the operation ends. `on_tick` may raise.
+  Timer& MakeTimer(std::int32_t interval_ms, std::function<void()> on_tick);
+
+  // The operation runs from now on. `what`: see RunningCommand::What().
+  void Run(std::string what);
+  // Ends the operation and shows `text` in the progress display.
+  void Succeed(const std::string& text);
+  // Ends the operation as failed and shows `box`.
+  void Fail(const BoxMessage& box);
+  // Ends the operation without an outcome. `where`: see RunningCommand::Stopped().
+  void StopAt(std::string where);
+
+  HwSerial& Link() const { return context_.link; }
+  // The unit ID that is chosen now.
+  std::uint8_t UnitId() const { return context_.target.UnitId(); }
+  // The box for a poll that the link refuses.
+  static BoxMessage SendError(std::string text) {
+    return {std::move(text), "Send Error", BoxIcon::kCritical};
+  }
+  // Shows a box and ends nothing.
+  void Show(const BoxMessage& box) const { context_.boxes.Show(box); }
+
+ private:
+  bool MayStart() const;
+  void Abort();
+  void StopTimer();
+
+  CommandContext& context_;
+  std::string_view poll_kinds_;
+  std::string fault_text_;
+  std::unique_ptr<Timer> timer_;  // nullptr when the operation has none
+};
+
+}  // namespace tendril
