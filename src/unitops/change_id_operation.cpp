@@ -21,7 +21,7 @@ ChangeIdOperation::ChangeIdOperation(CommandContext& context)
 void ChangeIdOperation::Begin() {
   const std::uint8_t new_id = UnitId();
   StartChangeAddress(kAllUnits, new_id);
-  Run("Giving the unit the ID " + TwoHexDigits(new_id));
+  Run("Giving the unit the ID " + HexByte(new_id));
 }
 
 void ChangeIdOperation::StartChangeAddress(std::uint8_t old_id, std::uint8_t new_id) {
@@ -55,7 +55,7 @@ void ChangeIdOperation::OnTick() {
       return;
     case Stage::kConfirming:
       if (reply_seen_) {
-        Succeed("SUCCESS: UnitID set to '" + TwoHexDigits(new_id_) + "'");
+        Succeed("SUCCESS: UnitID set to '" + HexByte(new_id_) + "'");
       } else if (MayPollAgain()) {
         Link().cmdPollStation(new_id_, kConfirmPoll);
       } else {

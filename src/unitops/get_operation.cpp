@@ -27,7 +27,7 @@ void GetOperation::Begin() {
   if (!Link().cmdPollStation(unit, kConfigurationPoll)) {
     return Show(SendError("Error Uploading Configuration, Please retry"));
   }
-  Run("Reading the configuration of unit " + TwoHexDigits(unit));
+  Run("Reading the configuration of unit " + HexByte(unit));
 }
 
 void GetOperation::OnReply(bool replied, std::uint8_t /*unit*/, const Bytes& data) {

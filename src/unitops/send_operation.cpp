@@ -29,7 +29,7 @@ void SendOperation::Begin() {
   if (!EncodeAndSendPort(port_index_)) return;
   const std::uint8_t unit = UnitId();
   if (!Link().cmdPollStation(unit, kAcknowledgePoll)) return Show(SendError(kCannotPoll));
-  Run("Sending the configuration to unit " + TwoHexDigits(unit));
+  Run("Sending the configuration to unit " + HexByte(unit));
 }
 
 void SendOperation::OnReply(bool replied, std::uint8_t unit, const Bytes& data) {
