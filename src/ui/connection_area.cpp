@@ -110,8 +110,8 @@ void ConnectionArea::RereadCommPorts() {
   }
 }
 
-void ConnectionArea::ShowRunning(const RunningCommand& running) {
-  const QString why_not = QString::fromStdString(running.What());
+void ConnectionArea::ShowRunning(const std::string& what) {
+  const QString why_not = QString::fromStdString(what);
   EnableUnless(why_not, cmbNYX_, QString::fromUtf8(kPortTip));
   for (std::size_t digit = 0; digit < CmbUnitID_.size(); ++digit) {
     EnableUnless(why_not, CmbUnitID_[digit], QString::fromUtf8(kUnitIdTips[digit]));

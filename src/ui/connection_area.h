@@ -12,7 +12,6 @@
 #include <vector>
 
 #include "unitops/port_selection.h"
-#include "unitops/running_command.h"
 #include "unitops/unit_target.h"
 
 namespace tendril {
@@ -26,8 +25,8 @@ class ConnectionArea : public QWidget, public UnitTarget {
   void FillUnitIds();
   // Fills the list of comm ports and selects "Select", which opens nothing.
   void ListCommPorts();
-  // Lets port and unit be chosen only while no command runs.
-  void ShowRunning(const RunningCommand& running);
+  // Port and unit can be chosen only while no command runs. `what`: which one does; empty for none.
+  void ShowRunning(const std::string& what);
 
   // Who is told when another unit ID is chosen.
   void SetUnitIdHandler(std::function<void()> handler) { unit_id_changed_ = std::move(handler); }

@@ -276,7 +276,7 @@ void frmNewServoConfig::ShowRunning() {
     focus_before_command_ = focusWidget();
     setFocus();
   }
-  connection_->ShowRunning(running);
+  connection_->ShowRunning(running.What());
   command_buttons_.ShowRunning(running);
   progress_->ShowRunning(running);
   live_test_area_->ShowRunning(running);
