@@ -27,11 +27,11 @@ std::array<PulseFieldText, 5> PulseFieldTexts(const ChannelConfig& record) {
 void SetFromPreset(const Preset& preset, ChannelConfig& record) {
   record.ActualRange = preset.actual_range;
   record.VirtualRange = preset.virtual_range;
-  record.VirtualStops = preset.virtual_stops;
-  record.NeutralPosition = preset.neutral_position;
-  record.DefaultPosition = preset.default_position;
-  record.LostCommOption = preset.lost_comm_option;
-  record.PowerUPOpt = preset.power_up_opt;
+  record.VirtualStops = preset.virtual_range;
+  record.NeutralPosition = kCentrePulseWidth;
+  record.DefaultPosition = kCentrePulseWidth;
+  record.LostCommOption = kLostCommStopPulse;
+  record.PowerUPOpt = kPowerUpFirstCommand;
 }
 
 }  // namespace tendril

@@ -1,4 +1,4 @@
-// ChannelConfig: what one output port of a Tendril unit is set to, and the presets it can start from.
+// ChannelConfig: the configuration of one output port of a Tendril unit, and the presets.
 #pragma once
 
 #include <array>
@@ -9,9 +9,10 @@
 
 namespace tendril {
 
-// Pulse widths are whole microseconds. The unit keeps each as one byte that holds a tenth of it, which gives
-// the limits, and loses the last digit.
+// Pulse widths are whole microseconds. A unit stores each in one byte, as a multiple of the resolution: this gives the
+// limits, and the last digit is lost.
 using Microseconds = std::int32_t;
+inline constexpr Microseconds kPulseResolution = 10;
 inline constexpr Microseconds kMinPulseWidth = 10;
 inline constexpr Microseconds kMaxPulseWidth = 2550;
 inline constexpr Microseconds kCentrePulseWidth = 1500;
@@ -35,17 +36,17 @@ inline constexpr std::int32_t kLostCommDefault = 2;
 inline constexpr std::int32_t kLostCommNeutral = 3;
 inline constexpr std::int32_t kLostCommStopPulse = 4;
 
-// One port's configuration. A record may hold anything: what goes to a unit is checked when it is encoded.
+// One port's configuration. A record may hold any values: EncodeOptions checks them before they go to a unit.
 struct ChannelConfig {
   std::int16_t PortType = kPortServo;
   PulsePair ActualRange{};   // the physical limits: the servo is never driven outside them
-  PulsePair VirtualRange{};  // where intensity 0 and full intensity lie
-  PulsePair VirtualStops{};  // where the pulse width is clamped to inside the virtual range
+  PulsePair VirtualRange{};  // the pulse widths of intensity 0 and of full intensity
+  PulsePair VirtualStops{};  // the pulse width is clamped to these, inside the virtual range
   Microseconds DefaultPosition = 0;
-  Microseconds NeutralPosition = 0;  // the centre, with its trim
+  Microseconds NeutralPosition = 0;  // the centre plus the trim
   std::int32_t PowerUPOpt = 0;
   std::int32_t LostCommOption = 0;
-  bool Received = false;  // read-back table only: this record was filled from a unit's reply
+  bool Received = false;  // read-back table only: a unit's reply has filled this record
 
   friend bool operator==(const ChannelConfig&, const ChannelConfig&) = default;
 };
@@ -53,8 +54,8 @@ struct ChannelConfig {
 // Output ports of a unit. Slot s of a table is port s + 1.
 inline constexpr std::size_t kPortCount = 8;
 
-// A pulse field in words: "virtual range " and "1000 to 2000", "default position " and "1500". The actual range needs
-// no name.
+// A pulse field in words: "virtual range " and "1000 to 2000", "default position " and "1500". The actual range has no
+// name.
 struct PulseFieldText {
   std::string InWords() const { return std::string(name) + value; }
 
@@ -64,7 +65,7 @@ struct PulseFieldText {
 // The pulse fields of `record`: actual range, virtual range, stops, default position, neutral position.
 std::array<PulseFieldText, 5> PulseFieldTexts(const ChannelConfig& record);
 
-// A table of records with one slot more than there are ports; the last is never sent, received or shown.
+// A table of records with one slot more than there are ports. The last slot is never sent, received or shown.
 class ChannelTable {
  public:
   static constexpr std::size_t kSlots = kPortCount + 1;
@@ -79,48 +80,21 @@ class ChannelTable {
   std::array<ChannelConfig, kSlots> records_{};
 };
 
-// A named set of values to start from.
+// A named set of values to start from. In all of them the stops are the ends of the virtual range, neutral and default
+// position are the centre, the pulse stops on lost communications and starts on the first command.
 struct Preset {
   std::string_view name;
   PulsePair actual_range;
   PulsePair virtual_range;
-  PulsePair virtual_stops;
-  Microseconds neutral_position;
-  Microseconds default_position;
-  std::int32_t lost_comm_option;
-  std::int32_t power_up_opt;
 };
 
-// "Standard Preset Values", in the order in which they are listed.
-inline constexpr std::array<Preset, 3> kPresets{{
-    {"Narrow Range",
-     {800, 2200},
-     {1250, 1750},
-     {1250, 1750},
-     1500,
-     1500,
-     kLostCommStopPulse,
-     kPowerUpFirstCommand},
-    {"Medium Range (default)",
-     {600, 2400},
-     {1000, 2000},
-     {1000, 2000},
-     1500,
-     1500,
-     kLostCommStopPulse,
-     kPowerUpFirstCommand},
-    {"Wide Range",
-     {500, 2500},
-     {700, 2300},
-     {700, 2300},
-     1500,
-     1500,
-     kLostCommStopPulse,
-     kPowerUpFirstCommand},
-}};
+// "Standard Preset Values", in the order of the list.
+inline constexpr std::array<Preset, 3> kPresets{{{"Narrow Range", {800, 2200}, {1250, 1750}},
+                                                 {"Medium Range (default)", {600, 2400}, {1000, 2000}},
+                                                 {"Wide Range", {500, 2500}, {700, 2300}}}};
 inline constexpr std::size_t kStartPreset = 1;
 
-// Sets the preset's ten values in `record`; its output kind and its Received flag stay.
+// Sets the preset's ten values in `record`; PortType and Received stay.
 void SetFromPreset(const Preset& preset, ChannelConfig& record);
 
 }  // namespace tendril

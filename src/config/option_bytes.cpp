@@ -1,6 +1,9 @@
 #include "config/option_bytes.h"
 
+#include <algorithm>
 #include <cstddef>
+#include <functional>
+#include <numeric>
 #include <string_view>
 #include <utility>
 
@@ -8,36 +11,17 @@ namespace tendril {
 namespace {
 
 constexpr int kKindBits = 0x03;
-constexpr int kPowerUpToDefault = kFlagPowerUp | kFlagPowerUpDefault;
-constexpr int kPowerUpToNeutral = kFlagPowerUp | kFlagPowerUpNeutral;
-constexpr int kPowerUpBits = kPowerUpToDefault | kPowerUpToNeutral;
-constexpr int kLostCommToDefault = kFlagLostComm | kFlagLostCommDefault;
-constexpr int kLostCommToNeutral = kFlagLostComm | kFlagLostCommNeutral;
-constexpr int kLostCommBits = kLostCommToDefault | kLostCommToNeutral;
-constexpr Microseconds kByteStep = 10;
+// The flags of each PowerUPOpt and of each LostCommOption, from option 1. The last option is no action.
+constexpr std::array<int, kPowerUpFirstCommand> kPowerUpFlags = {kFlagPowerUp | kFlagPowerUpDefault,
+                                                                 kFlagPowerUp | kFlagPowerUpNeutral, 0};
+constexpr std::array<int, kLostCommStopPulse> kLostCommFlags = {
+    kFlagLostComm, kFlagLostComm | kFlagLostCommDefault, kFlagLostComm | kFlagLostCommNeutral, 0};
 
-std::int32_t PowerUpOption(int flags) {
-  switch (flags & kPowerUpBits) {
-    case kPowerUpToDefault:
-      return kPowerUpDefault;
-    case kPowerUpToNeutral:
-      return kPowerUpNeutral;
-    default:
-      return kPowerUpFirstCommand;
-  }
-}
-
-std::int32_t LostCommOption(int flags) {
-  switch (flags & kLostCommBits) {
-    case kFlagLostComm:
-      return kLostCommHold;
-    case kLostCommToDefault:
-      return kLostCommDefault;
-    case kLostCommToNeutral:
-      return kLostCommNeutral;
-    default:
-      return kLostCommStopPulse;
-  }
+// The option whose flags are exactly those that `flags` and its table share; the last if no option has them.
+std::int32_t OptionOf(std::span<const int> table, int flags) {
+  const int mask = std::accumulate(table.begin(), table.end(), 0, std::bit_or());
+  const auto found = std::find(table.begin(), table.end() - 1, flags & mask);
+  return static_cast<std::int32_t>(found - table.begin()) + 1;
 }
 
 InvalidRecord Invalid(std::string_view name, std::int32_t value, std::string field) {
@@ -51,35 +35,14 @@ std::variant<OptionBytes, InvalidRecord> EncodeOptions(const ChannelConfig& reco
     return Invalid("PortType", record.PortType, "output kind " + std::to_string(record.PortType));
   int flags = record.PortType + 1;
 
-  switch (record.PowerUPOpt) {
-    case kPowerUpDefault:
-      flags |= kPowerUpToDefault;
-      break;
-    case kPowerUpNeutral:
-      flags |= kPowerUpToNeutral;
-      break;
-    case kPowerUpFirstCommand:
-      break;
-    default:
-      return Invalid("PowerUPOpt", record.PowerUPOpt, "power-up option " + std::to_string(record.PowerUPOpt));
-  }
+  if (record.PowerUPOpt < kPowerUpDefault || record.PowerUPOpt > kPowerUpFirstCommand)
+    return Invalid("PowerUPOpt", record.PowerUPOpt, "power-up option " + std::to_string(record.PowerUPOpt));
+  flags |= kPowerUpFlags[static_cast<std::size_t>(record.PowerUPOpt) - 1];
 
-  switch (record.LostCommOption) {
-    case kLostCommHold:
-      flags |= kFlagLostComm;
-      break;
-    case kLostCommDefault:
-      flags |= kLostCommToDefault;
-      break;
-    case kLostCommNeutral:
-      flags |= kLostCommToNeutral;
-      break;
-    case kLostCommStopPulse:
-      break;
-    default:
-      return Invalid("LostCommOption", record.LostCommOption,
-                     "lost communications option " + std::to_string(record.LostCommOption));
-  }
+  if (record.LostCommOption < kLostCommHold || record.LostCommOption > kLostCommStopPulse)
+    return Invalid("LostCommOption", record.LostCommOption,
+                   "lost communications option " + std::to_string(record.LostCommOption));
+  flags |= kLostCommFlags[static_cast<std::size_t>(record.LostCommOption) - 1];
 
   struct Width {
     std::string_view name;
@@ -103,14 +66,14 @@ std::variant<OptionBytes, InvalidRecord> EncodeOptions(const ChannelConfig& reco
     const auto& [name, value, field] = widths[i];
     if (value < kMinPulseWidth || value > kMaxPulseWidth)
       return Invalid(name, value, PulseFieldTexts(record)[field].InWords());
-    bytes[i + 1] = static_cast<std::uint8_t>(value / kByteStep);
+    bytes[i + 1] = static_cast<std::uint8_t>(value / kPulseResolution);
   }
   return bytes;
 }
 
 ChannelConfig DecodeOptions(std::span<const std::uint8_t, kOptionByteCount> options) {
   const int flags = options[0];
-  const auto width = [&](std::size_t i) { return options[i] * kByteStep; };
+  const auto width = [&](std::size_t i) { return options[i] * kPulseResolution; };
   ChannelConfig record;
   record.PortType = static_cast<std::int16_t>((flags & kKindBits) - 1);
   record.ActualRange = {width(1), width(2)};
@@ -118,8 +81,8 @@ ChannelConfig DecodeOptions(std::span<const std::uint8_t, kOptionByteCount> opti
   record.VirtualStops = {width(5), width(6)};
   record.DefaultPosition = width(7);
   record.NeutralPosition = width(8);
-  record.PowerUPOpt = PowerUpOption(flags);
-  record.LostCommOption = LostCommOption(flags);
+  record.PowerUPOpt = OptionOf(kPowerUpFlags, flags);
+  record.LostCommOption = OptionOf(kLostCommFlags, flags);
   record.Received = true;
   return record;
 }

@@ -1,8 +1,8 @@
-// The nine option bytes in which a unit takes, and gives back, the configuration of one port:
+// The nine option bytes that carry the configuration of one port to a unit and back:
 //
 //   flags | actual low, high | virtual low, high | stop left, right | default | neutral
 //
-// Each pulse width is one byte, its tenth. The flag byte:
+// Each pulse width is one byte: a tenth of it. The flag byte:
 //
 //   bit 0-1  output kind + 1
 //   bit 2    something happens on lost communication ...
@@ -33,24 +33,23 @@ inline constexpr std::uint8_t kFlagLostCommDefault = 0x20;
 inline constexpr std::uint8_t kFlagPowerUpNeutral = 0x40;
 inline constexpr std::uint8_t kFlagPowerUpDefault = 0x80;
 
-// The option of a unit that holds its servo ports. A port's number and option bytes follow it, or
-// kLivePosition.
+// The option of a unit that holds its servo ports. A port's number and its option bytes follow, or kLivePosition.
 inline constexpr std::uint8_t kOptionServoPort = 17;
-// In the place of a port's number: a mask of ports and a position to move them to follow.
+// In place of a port's number: a mask of ports and the position to move them to follow.
 inline constexpr std::uint8_t kLivePosition = 137;
 
 // Why a record cannot be sent.
 struct InvalidRecord {
   std::string text;   // for a message box
-  std::string field;  // for a sentence: "305 to 2695", "default position 5", "output kind -1"
+  std::string field;  // for a sentence: "305 to 2695", "default position 5" or "output kind -1"
 };
 
-// Checks `record` field by field and packs it. The first field that is out of its range ends it. How the
-// fields lie to each other is not checked here: that is the editor's business.
+// Checks `record` field by field and packs it. Stops at the first field out of its range. Does not check constraints
+// between fields: the editor does that.
 std::variant<OptionBytes, InvalidRecord> EncodeOptions(const ChannelConfig& record);
 
-// The inverse, up to the last digit of each pulse width, with `Received` set. Takes any bytes: flags that no
-// record has are read as no action, and without an output kind PortType is -1, which EncodeOptions refuses.
+// The inverse, except for the last digit of each pulse width. Sets `Received`. Takes any bytes: flag combinations that
+// no option has are read as no action, and without an output kind PortType is -1, which EncodeOptions rejects.
 ChannelConfig DecodeOptions(std::span<const std::uint8_t, kOptionByteCount> options);
 
 }  // namespace tendril

@@ -1,17 +1,14 @@
-// BoundedValue: what a spin button holds.
+// BoundedValue: the value and the limits of a spin button.
 #pragma once
 
 #include <algorithm>
 
 namespace tendril {
 
-// A whole number between two limits. A new value is brought within the limits, a new limit brings the value
-// within it, and the other limit gives way where the two would cross.
+// A whole number between two limits. A new value is clamped to the limits, a new limit clamps the value, and the other
+// limit moves with it where the two would cross.
 class BoundedValue {
  public:
-  // Every value that a record can give fits between these.
-  static constexpr int kWidest = 9999;
-
   int Value() const { return value_; }
   int Minimum() const { return minimum_; }
   int Maximum() const { return maximum_; }
@@ -25,13 +22,11 @@ class BoundedValue {
     maximum_ = maximum;
     SetValue(value_);
   }
-  // Takes the widest limits, and 0.
-  void Reset() { *this = BoundedValue(); }
 
  private:
   int value_ = 0;
-  int minimum_ = -kWidest;
-  int maximum_ = kWidest;
+  int minimum_ = -9999;  // every value that a unit can hold lies between the first limits
+  int maximum_ = 9999;
 };
 
 }  // namespace tendril

@@ -31,17 +31,9 @@ void StoreOwnFields(Parameter parameter, const ChannelConfig& from, ChannelConfi
 }
 
 FollowUp FollowUpOf(Parameter parameter) {
-  switch (parameter) {
-    case Parameter::kVirtualRange:
-    case Parameter::kLeftStop:
-    case Parameter::kRightStop:
-      return FollowUp::kRefreshLivePosition;
-    case Parameter::kActualRange:
-    case Parameter::kNeutralTrim:
-    case Parameter::kDefaultPosition:
-      break;
-  }
-  return FollowUp::kUpdateSimulators;
+  const bool bounds_live_position = parameter == Parameter::kVirtualRange ||
+                                    parameter == Parameter::kLeftStop || parameter == Parameter::kRightStop;
+  return bounds_live_position ? FollowUp::kRefreshLivePosition : FollowUp::kUpdateSimulators;
 }
 
 }  // namespace
@@ -57,57 +49,49 @@ ChannelEditor::ChannelEditor(ChannelTable& working) : working_(working) {
   start(Parameter::kRightStop, 0, 800, 750);
   start(Parameter::kNeutralTrim, -200, 200, 0);
   start(Parameter::kDefaultPosition, -750, 750, 0);
-  StoreMotion(Entered(), values_);
 }
 
-Motion ChannelEditor::Entered() const {
-  return {.actual_half_width = Spin(Parameter::kActualRange).Value(),
-          .virtual_half_width = Spin(Parameter::kVirtualRange).Value(),
-          .trim = Spin(Parameter::kNeutralTrim).Value(),
-          .left_stop = Spin(Parameter::kLeftStop).Value(),
-          .right_stop = Spin(Parameter::kRightStop).Value(),
-          .default_position = Spin(Parameter::kDefaultPosition).Value()};
+ChannelConfig ChannelEditor::WorkingValues() const {
+  ChannelConfig values;
+  StoreMotion({.actual_half_width = Spin(Parameter::kActualRange).Value(),
+               .virtual_half_width = Spin(Parameter::kVirtualRange).Value(),
+               .trim = Spin(Parameter::kNeutralTrim).Value(),
+               .left_stop = Spin(Parameter::kLeftStop).Value(),
+               .right_stop = Spin(Parameter::kRightStop).Value(),
+               .default_position = Spin(Parameter::kDefaultPosition).Value()},
+              values);
+  return values;
 }
 
 void ChannelEditor::RecalcParameters() {
+  const int actual_half_width = Spin(Parameter::kActualRange).Value();
   BoundedValue& virtual_range = SpinOf(Parameter::kVirtualRange);
-  BoundedValue& trim = SpinOf(Parameter::kNeutralTrim);
+  virtual_range.SetMaximum(actual_half_width);
+  virtual_range.SetValue(std::max(virtual_range.Value(), -actual_half_width));
+
+  // A reversed virtual range has a negative half width. It reaches as far to each side.
+  const int reach = std::abs(virtual_range.Value());
+  const int max_trim = actual_half_width - reach;
+  SpinOf(Parameter::kNeutralTrim).SetLimits(-max_trim, max_trim);
+
   BoundedValue& left_stop = SpinOf(Parameter::kLeftStop);
-  BoundedValue& right_stop = SpinOf(Parameter::kRightStop);
-  BoundedValue& default_position = SpinOf(Parameter::kDefaultPosition);
-  Motion motion = Entered();
-
-  motion.LimitVirtualRange();
-  motion.virtual_half_width = std::max(motion.virtual_half_width, -motion.actual_half_width);
-  virtual_range.SetValue(motion.virtual_half_width);
-  virtual_range.SetMaximum(motion.actual_half_width);
-
-  // A reversed virtual range has a negative half width, and reaches as far to each side.
-  const int reach = std::abs(motion.virtual_half_width);
-  const int trim_room = motion.actual_half_width - reach;
-  motion.trim = std::clamp(motion.trim, -trim_room, trim_room);
-  trim.SetValue(motion.trim);
-  trim.SetLimits(-trim_room, trim_room);
-
-  motion.left_stop = std::clamp(motion.left_stop, -reach, reach);
-  motion.right_stop = std::clamp(motion.right_stop, -reach, reach);
-  left_stop.SetValue(motion.left_stop);
   left_stop.SetMinimum(-reach);
-  right_stop.SetValue(motion.right_stop);
+  left_stop.SetValue(std::min(left_stop.Value(), reach));
+  BoundedValue& right_stop = SpinOf(Parameter::kRightStop);
   right_stop.SetMaximum(reach);
+  right_stop.SetValue(std::max(right_stop.Value(), -reach));
 
-  motion.LimitDefault();
-  default_position.SetMinimum(motion.left_stop);
-  default_position.SetMaximum(motion.right_stop);
-  default_position.SetValue(motion.default_position);
-
-  StoreMotion(motion, values_);
+  // In this order: when a record's stops are crossed, the right one decides.
+  BoundedValue& default_position = SpinOf(Parameter::kDefaultPosition);
+  default_position.SetMinimum(left_stop.Value());
+  default_position.SetMaximum(right_stop.Value());
 }
 
 FollowUp ChannelEditor::Change(Parameter parameter, int value) {
   SpinOf(parameter).SetValue(value);
   RecalcParameters();
-  ForEachTarget([&](ChannelConfig& record) { StoreOwnFields(parameter, values_, record); });
+  const ChannelConfig values = WorkingValues();
+  ForEachTarget([&](ChannelConfig& record) { StoreOwnFields(parameter, values, record); });
   return FollowUpOf(parameter);
 }
 
@@ -133,11 +117,12 @@ void ChannelEditor::ClickAllBox(bool ticked) {
 void ChannelEditor::StoreInTicked() {
   if (!channel_) return;
   ticked_[*channel_] = true;
-  ForEachTarget([this](ChannelConfig& record) { CopyPulseFields(values_, record); });
+  const ChannelConfig values = WorkingValues();
+  ForEachTarget([&](ChannelConfig& record) { CopyPulseFields(values, record); });
 }
 
 void ChannelEditor::SelectChannel(std::size_t channel) {
-  if (channel_) CopyPulseFields(values_, working_.At(*channel_));
+  if (channel_) CopyPulseFields(WorkingValues(), working_.At(*channel_));
   all_ticked_ = false;
   ticked_.fill(false);
   channel_ = channel;
@@ -151,8 +136,8 @@ void ChannelEditor::ReloadChannel() {
 
 void ChannelEditor::Load(const ChannelConfig& record) {
   const Motion motion = MotionOf(record);
-  for (BoundedValue& spin : spins_) spin.Reset();
-  // Never wider: together with the bounds that follow from it, this keeps what is stored within what a unit holds.
+  spins_.fill({});
+  // Whatever the record holds: this limit and those that follow from it keep the working values sendable.
   SpinOf(Parameter::kActualRange).SetLimits(0, kMaxHalfWidth);
   SpinOf(Parameter::kActualRange).SetValue(motion.actual_half_width);
   SpinOf(Parameter::kVirtualRange).SetValue(motion.virtual_half_width);
@@ -162,7 +147,7 @@ void ChannelEditor::Load(const ChannelConfig& record) {
   SpinOf(Parameter::kDefaultPosition).SetValue(motion.default_position);
   RecalcParameters();
 
-  // The other limits that follow no parameter give way to a record from elsewhere that is reversed or one-sided.
+  // The fixed limits at 0 give way to a record whose range is reversed or whose stops lie on one side.
   const auto at_least_0 = [](BoundedValue& spin) { spin.SetMinimum(std::min(0, spin.Value())); };
   at_least_0(SpinOf(Parameter::kVirtualRange));
   at_least_0(SpinOf(Parameter::kRightStop));

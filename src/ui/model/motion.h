@@ -1,19 +1,19 @@
-// Constraints between the motion parameters of a channel, and how a record holds them.
+// The motion parameters of a channel, their constraints, and the record fields that hold them.
 //
-//   actual half width a     ActualRange = 1500 -/+ a: always about the centre
+//   actual half width a     ActualRange = 1500 -/+ a: always centred
 //   virtual half width v    at most a
-//   trim t                  NeutralPosition = 1500 + t; between -m and +m, the room m = a - v
+//   trim t                  NeutralPosition = 1500 + t; between -m and +m, where m = a - v
 //   stops L, R              relative to the neutral position, at least -v and at most +v
 //   default D               relative to the neutral position, between the stops
 //
-// The trim moves virtual range, stops and default together.
+// The trim moves virtual range, stops and default position together.
 #pragma once
 
 #include "config/channel_config.h"
 
 namespace tendril {
 
-// The widest half width that can be entered, in microseconds.
+// The largest half width that can be entered, in microseconds.
 inline constexpr int kMaxHalfWidth = 1000;
 
 // All in microseconds.
@@ -24,25 +24,15 @@ struct Motion {
   int left_stop = 0;
   int right_stop = 0;
   int default_position = 0;
-
-  // The room that the trim has, to each side.
-  int TrimRoom() const { return actual_half_width - virtual_half_width; }
-
-  // Each brings its parameter into the bounds that the ones before it set. In this order.
-  void LimitVirtualRange();
-  void LimitTrim();
-  void LimitStops();
-  void LimitDefault();
 };
 
-// The parameters as `record` gives them, whether they keep the bounds or not. Stored again, they put the actual range
-// about 1500 and the virtual range about the neutral position, each as wide as it was, with half the width rounded to
-// even: 600 to 2410 becomes 595 to 2405 (which a unit holds as 590 to 2400). Stops and default are measured from the
-// record's own neutral position, and stay where they are.
+// The parameters of `record`, within the constraints or not. Stored again, they centre the actual range on 1500 and the
+// virtual range on the neutral position, with half of each width rounded to even: 600 to 2410 becomes 595 to 2405, which
+// a unit holds as 590 to 2400. Stops and default position are relative to the record's own neutral position, and stay.
 Motion MotionOf(const ChannelConfig& record);
-// Sets the eight pulse fields of `record`, and no other.
+// Sets the eight pulse fields of `record`, and no other field.
 void StoreMotion(const Motion& motion, ChannelConfig& record);
-// Copies the eight pulse fields, and no other.
+// Copies the eight pulse fields, and no other field.
 void CopyPulseFields(const ChannelConfig& from, ChannelConfig& to);
 
 }  // namespace tendril

@@ -19,7 +19,7 @@ void RecordRemarks::AcceptEdit() {
   }
 }
 
-const ChannelConfig& RecordRemarks::Shown(std::size_t channel, bool editor_shown) const {
+ChannelConfig RecordRemarks::Shown(std::size_t channel, bool editor_shown) const {
   return editor_shown && editor_.Channel() == channel ? editor_.WorkingValues() : working_.At(channel);
 }
 

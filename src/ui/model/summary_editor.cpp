@@ -1,13 +1,21 @@
 #include "ui/model/summary_editor.h"
 
+#include <algorithm>
+
 namespace tendril {
+namespace {
+
+constexpr std::array kFieldNames = {"Actual Range", "Virtual Range", "Stops", "Default Position",
+                                    "Neutral Trim"};  // by SummaryField
+
+}  // namespace
 
 void SummaryEditor::Normalise(std::size_t channel) { ApplySummaryEntry(channel, std::nullopt); }
 
 void SummaryEditor::OpenNumberEntry(std::size_t channel, SummaryField field) {
   const ChannelConfig& record = working_.At(channel);
   entry_ = Entry{channel, field};
-  for (BoundedValue& spin : spins_) spin.Reset();
+  spins_.fill({});
   const Motion motion = MotionOf(record);
   const int actual_width = record.ActualRange[1] - record.ActualRange[0];
   const int virtual_width = record.VirtualRange[1] - record.VirtualRange[0];
@@ -49,39 +57,41 @@ void SummaryEditor::ApplySummaryEntry(std::size_t channel, std::optional<Summary
 
   if (field == SummaryField::kActualRange) motion.actual_half_width = spins_[0].Value();
 
-  if (field == SummaryField::kVirtualRange) motion.virtual_half_width = spins_[0].Value();
-  motion.LimitVirtualRange();
   if (field == SummaryField::kVirtualRange) {
-    spins_[0].SetValue(motion.virtual_half_width);
     spins_[0].SetMaximum(motion.actual_half_width);
+    motion.virtual_half_width = spins_[0].Value();
   }
+  motion.virtual_half_width = std::min(motion.virtual_half_width, motion.actual_half_width);
+  const int half = motion.virtual_half_width;
 
-  if (field == SummaryField::kNeutralTrim) motion.trim = spins_[0].Value();
-  motion.LimitTrim();
+  const int max_trim = motion.actual_half_width - half;
   if (field == SummaryField::kNeutralTrim) {
-    spins_[0].SetValue(motion.trim);
-    spins_[0].SetLimits(-motion.TrimRoom(), motion.TrimRoom());
+    spins_[0].SetLimits(-max_trim, max_trim);
+    motion.trim = spins_[0].Value();
   }
+  motion.trim = std::clamp(motion.trim, -max_trim, max_trim);
 
-  // Stops and default stay where they are: they are measured anew, from the neutral position as it is now.
+  // Stops and default position stay where they are: they are measured again, from the new neutral position.
   const Microseconds neutral = kCentrePulseWidth + motion.trim;
-  motion.left_stop = field == SummaryField::kStops ? spins_[0].Value() : record.VirtualStops[0] - neutral;
-  motion.right_stop = field == SummaryField::kStops ? spins_[1].Value() : record.VirtualStops[1] - neutral;
-  motion.LimitStops();
+  motion.left_stop = record.VirtualStops[0] - neutral;
+  motion.right_stop = record.VirtualStops[1] - neutral;
   if (field == SummaryField::kStops) {
-    spins_[0].SetValue(motion.left_stop);
-    spins_[0].SetMinimum(-motion.virtual_half_width);
-    spins_[1].SetValue(motion.right_stop);
-    spins_[1].SetMaximum(motion.virtual_half_width);
+    spins_[0].SetMinimum(-half);
+    spins_[1].SetMaximum(half);
+    motion.left_stop = spins_[0].Value();
+    motion.right_stop = spins_[1].Value();
   }
+  motion.left_stop = std::max(motion.left_stop, -half);
+  motion.right_stop = std::min(motion.right_stop, half);
 
-  motion.default_position =
-      field == SummaryField::kDefaultPosition ? spins_[0].Value() : record.DefaultPosition - neutral;
-  motion.LimitDefault();
-  if (field == SummaryField::kDefaultPosition) {
+  const bool default_entered = field == SummaryField::kDefaultPosition;
+  motion.default_position = default_entered ? spins_[0].Value() : record.DefaultPosition - neutral;
+  // Not std::clamp: when a record's stops are crossed, the right one decides.
+  motion.default_position = std::min(std::max(motion.default_position, motion.left_stop), motion.right_stop);
+  if (default_entered) {
     spins_[0].SetValue(motion.default_position);
-    spins_[0].SetMinimum(-motion.virtual_half_width);
-    spins_[0].SetMaximum(motion.virtual_half_width);
+    spins_[0].SetMinimum(-half);
+    spins_[0].SetMaximum(half);
   }
 
   StoreMotion(motion, record);
@@ -89,20 +99,8 @@ void SummaryEditor::ApplySummaryEntry(std::size_t channel, std::optional<Summary
 
 std::string SummaryEditor::Title() const {
   if (!entry_) return {};
-  std::string channel = "Channel " + std::to_string(entry_->channel + 1);
-  switch (entry_->field) {
-    case SummaryField::kActualRange:
-      return channel + " Actual Range";
-    case SummaryField::kVirtualRange:
-      return channel + " Virtual Range";
-    case SummaryField::kStops:
-      return channel + " Stops";
-    case SummaryField::kDefaultPosition:
-      return channel + " Default Position";
-    case SummaryField::kNeutralTrim:
-      return channel + " Neutral Trim";
-  }
-  return channel;
+  return "Channel " + std::to_string(entry_->channel + 1) + " " +
+         kFieldNames[static_cast<std::size_t>(entry_->field)];
 }
 
 std::array<std::string, 2> SummaryEditor::Readings() const {

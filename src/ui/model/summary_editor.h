@@ -1,4 +1,4 @@
-// SummaryEditor: what the summary computes and stores, without its controls.
+// SummaryEditor: the model of the summary.
 #pragma once
 
 #include <array>
@@ -15,35 +15,33 @@ namespace tendril {
 // The fields of a row that the number entry can change.
 enum class SummaryField { kActualRange, kVirtualRange, kStops, kDefaultPosition, kNeutralTrim };
 
-// The table's rows, and the number entry that changes one value of one channel. Every change goes to that channel's
-// record at once, whatever is ticked, and brings all its parameters into the bounds of Motion. Unlike in the editor
-// the positions stay where they are when the trim changes, as far as the bounds allow.
+// The rows of the table, and the number entry that changes one value of one channel. Each change is stored in that
+// channel's record at once, whatever is ticked, and applies the constraints of Motion to all its parameters. Unlike in
+// the editor, stops and default position stay where they are when the trim changes, as far as the constraints allow.
 class SummaryEditor {
  public:
-  // The value whose number entry is open.
+  // The value that the number entry changes.
   struct Entry {
     std::size_t channel;
     SummaryField field;
   };
 
-  // `working` are the records, which must outlive it.
+  // `working` are the records; they must outlive this object.
   explicit SummaryEditor(ChannelTable& working) : working_(working) {}
 
-  // Brings the record of `channel`, 0 to 7, into the bounds; the row is about to be shown.
+  // Applies the constraints to the record of `channel`, 0 to 7. Called before its row is shown.
   void Normalise(std::size_t channel);
 
-  // Opens the number entry for a value of `channel`, or moves it there. The limits are those of the start: for the
-  // virtual range and the trim they are wider than after the first change.
+  // Opens the number entry for a value of `channel`, or moves it there. The first limits of the virtual range and of
+  // the trim are wider than those after the first change.
   void OpenNumberEntry(std::size_t channel, SummaryField field);
-  // No value is being changed any more.
   void CloseNumberEntry() { entry_.reset(); }
-  // The value that is being changed, if one is.
+  // The value that the open number entry changes.
   const std::optional<Entry>& OpenEntry() const { return entry_; }
-  // The person set spin button `index` (0, or 1 for the right stop) to `value`. Nothing without an open entry.
+  // The user set spin button `index` (0, or 1 for the right stop) to `value`. No effect while no entry is open.
   void ChangeEntry(std::size_t index, int value);
 
-  // The number entry's title, its spin buttons, how many of them are shown, and what stands beside each; for an
-  // open entry.
+  // The open number entry: its title, its spin buttons, how many of them it shows, and the text beside each.
   std::string Title() const;
   const BoundedValue& Spin(std::size_t index) const { return spins_[index]; }
   std::size_t ShownSpins() const { return entry_ && entry_->field == SummaryField::kStops ? 2 : 1; }
