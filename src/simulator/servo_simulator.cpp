@@ -13,18 +13,13 @@
 namespace tendril {
 namespace {
 
-// The pulse widths that a unit can hold, microseconds.
-constexpr int kLeastPulse = 10;
-constexpr int kMostPulse = 2550;
-constexpr int kPulseStep = 10;
-
 constexpr int kMargin = 5;  // around the picture
 constexpr double kCornerRadius = 4;
 constexpr int kPressedShade = 112;  // percent, as QColor::darker takes it
 constexpr double kFocusRingWidth = 1.5;
 constexpr double kAngleTextScale = 0.75;  // of the control's font
-constexpr double kLeastTextScale = 0.8;   // text is not made smaller than this part of its full size
-constexpr double kLeastTextPixels = 7;
+constexpr double kMinTextScale = 0.8;     // of a text's full size
+constexpr double kMinTextPixels = 7;
 constexpr double kPlateRadius = 2;
 constexpr double kPlateOutline = 1;
 
@@ -35,7 +30,12 @@ QColor ToColour(DialColour colour) {
 
 QPointF ToPoint(DialPoint point) { return {point.x, point.y}; }
 
-// Strokes the elements of a dial, its picture's top left corner at the painter's origin.
+QSize SquareFor(const DialSizes& sizes, int small, int medium, int normal) {
+  const int side = sizes == kSmallSizes ? small : sizes == kMediumSizes ? medium : normal;
+  return {side, side};
+}
+
+// Draws the elements of a dial. The top left corner of the picture is the origin of the painter.
 class DialPainter {
  public:
   DialPainter(QPainter& painter, double picture_width, bool bold_caption)
@@ -66,7 +66,7 @@ class DialPainter {
   }
 
  private:
-  // The box grown on all sides by `growth`, in whole device pixels: an outline is equally wide on each side.
+  // `box` enlarged on all sides by `growth`, in whole device pixels: an outline is equally wide on each side.
   QRectF Grown(const DialElement& box, double growth) const {
     const double grown = std::round(growth * scale_) / scale_;
     return QRectF(ToPoint(box.from), ToPoint(box.to)).adjusted(-grown, -grown, grown, grown);
@@ -74,7 +74,7 @@ class DialPainter {
 
   void Box(const DialElement& box) {
     const double straddling = box.line_width / 2;
-    painter_.setRenderHint(QPainter::Antialiasing, false);  // upright edges are crisp without
+    painter_.setRenderHint(QPainter::Antialiasing, false);  // keeps upright edges crisp
     painter_.fillRect(Grown(box, straddling + box.outline_width), ToColour(box.outline));
     painter_.fillRect(Grown(box, -straddling), ToColour(box.fill));
     painter_.setRenderHint(QPainter::Antialiasing);
@@ -106,13 +106,12 @@ class DialPainter {
     painter_.drawConvexPolygon(contour.data(), static_cast<int>(contour.size()));
   }
 
-  // The text is as large as the control's font, or smaller to keep to its room; what would become too small
-  // to read spreads beyond it instead, up to the picture's width. The plate lets it be read wherever it
-  // spreads.
+  // The text has the size of the control's font, or a smaller one to fit into its room. Text that would become too
+  // small to read extends beyond its room instead, up to the width of the picture. The plate keeps it readable there.
   void Text(const DialElement& element) {
     const bool caption = element.part == DialPart::kCaption;
     const double full_pixels = QFontInfo(font_).pixelSize() * (caption ? 1 : kAngleTextScale);
-    const double least_pixels = std::max(full_pixels * kLeastTextScale, kLeastTextPixels);
+    const double min_pixels = std::max(full_pixels * kMinTextScale, kMinTextPixels);
     const double padding = std::round(full_pixels / 6);
     QString text = QString::fromStdString(element.text);
     QFont font = font_;
@@ -120,7 +119,7 @@ class DialPainter {
     font.setPixelSize(std::max(1, static_cast<int>(full_pixels)));
     double width = QFontMetricsF(font).horizontalAdvance(text);
     if (const double room = element.room - 2 * padding; width > room) {
-      font.setPixelSize(static_cast<int>(std::max(least_pixels, full_pixels * room / width)));
+      font.setPixelSize(static_cast<int>(std::max(min_pixels, full_pixels * room / width)));
       text = QFontMetricsF(font).elidedText(text, Qt::ElideRight,
                                             picture_width_ - 2 * (padding + kPlateOutline));
       width = QFontMetricsF(font).horizontalAdvance(text);
@@ -128,9 +127,9 @@ class DialPainter {
     const double plate_width = width + 2 * padding;
     const QRectF plate(element.from.x - plate_width / 2, element.from.y, plate_width,
                        QFontMetricsF(font).height());
-    const bool spreads = plate_width > element.room;
-    if (spreads || !caption) {
-      painter_.setPen(spreads ? QPen(ToColour(kBodyOutline), kPlateOutline) : QPen(Qt::NoPen));
+    const bool extends = plate_width > element.room;
+    if (extends || !caption) {
+      painter_.setPen(extends ? QPen(ToColour(kBodyOutline), kPlateOutline) : QPen(Qt::NoPen));
       painter_.setBrush(ToColour(element.fill));
       painter_.drawRoundedRect(plate, kPlateRadius, kPlateRadius);
     }
@@ -146,7 +145,7 @@ class DialPainter {
   const QFont font_;
 };
 
-// A drawn servo as assistive technology sees it: a button with a name and the arm's pulse width as its value.
+// The accessible interface: a button with a name, and with the pulse width of the arm as its value.
 class ServoAccessible : public QAccessibleWidget, public QAccessibleValueInterface {
  public:
   explicit ServoAccessible(ServoSimulator* servo)
@@ -192,10 +191,10 @@ class ServoAccessible : public QAccessibleWidget, public QAccessibleValueInterfa
   }
 
   QVariant currentValue() const override { return static_cast<qlonglong>(servo_.dial().arm_pulse()); }
-  void setCurrentValue(const QVariant&) override {}  // the arm only shows; it is moved by the container
-  QVariant minimumValue() const override { return kLeastPulse; }
-  QVariant maximumValue() const override { return kMostPulse; }
-  QVariant minimumStepSize() const override { return kPulseStep; }
+  void setCurrentValue(const QVariant&) override {}  // only the container moves the arm
+  QVariant minimumValue() const override { return kMinPulseWidth; }
+  QVariant maximumValue() const override { return kMaxPulseWidth; }
+  QVariant minimumStepSize() const override { return kPulseResolution; }
 
  private:
   ServoSimulator& servo_;
@@ -284,17 +283,9 @@ void ServoSimulator::AnnounceArm() {
   QAccessible::updateAccessibility(&event);
 }
 
-QSize ServoSimulator::sizeHint() const {
-  if (dial_.sizes() == kSmallSizes) return {110, 110};
-  if (dial_.sizes() == kMediumSizes) return {180, 180};
-  return {320, 320};
-}
+QSize ServoSimulator::sizeHint() const { return SquareFor(dial_.sizes(), 110, 180, 320); }
 
-QSize ServoSimulator::minimumSizeHint() const {
-  if (dial_.sizes() == kSmallSizes) return {72, 72};
-  if (dial_.sizes() == kMediumSizes) return {120, 120};
-  return {200, 200};
-}
+QSize ServoSimulator::minimumSizeHint() const { return SquareFor(dial_.sizes(), 72, 120, 200); }
 
 void ServoSimulator::paintEvent(QPaintEvent*) {
   QPainter painter(this);
@@ -306,7 +297,7 @@ void ServoSimulator::paintEvent(QPaintEvent*) {
     try {
       dial_painter.Stroke(element);
     } catch (const std::exception&) {
-      // An element that cannot be drawn is missing from the picture; the next one is drawn all the same.
+      // A failure to draw one element does not stop the others.
     }
   }
 }
@@ -337,7 +328,7 @@ void ServoSimulator::resizeEvent(QResizeEvent* event) {
   dial_.ResetAfterResize();
   DrawServo();
   Q_EMIT Resized();
-  AnnounceArm();  // only now: an arm that the receiver put back has not moved
+  AnnounceArm();  // only now: the receiver may have put the arm back
 }
 
 void ServoSimulator::keyPressEvent(QKeyEvent* event) {

@@ -11,15 +11,15 @@ class QPainter;
 
 namespace tendril {
 
-// Shows one servo channel as a picture. It knows nothing of a configuration: all that it shows comes in by
-// the operations below, in degrees (0 straight up, positive to the right) or in microseconds (longer turns
-// left). Operations that convert raise RuntimeError(kErrOverflow) where 32-bit arithmetic overflows.
+// Shows one servo channel as a picture. The operations below set what it shows, in degrees (0 straight up, positive to
+// the right) or in microseconds (a longer pulse turns the arm left). Operations that convert raise
+// RuntimeError(kErrOverflow) where 32-bit arithmetic overflows.
 //
-// The whole control is a button: a click with the mouse, the space bar or Enter raises Clicked. The picture
-// lies 5 units inside the control; around it the background tells whether the channel is selected.
+// The whole control is a button: a click with the mouse, the space bar or Enter raises Clicked. The picture lies 5
+// units inside the control. The background around it shows whether the channel is selected.
 //
-// To assistive technology it is a button with a value: named by accessibleName() or else by its caption
-// ("CHAN 3" is spoken "Channel 3"), its value the arm's pulse width ("1500 µs").
+// To assistive technology it is a button with a value. Its name is accessibleName() or else its caption ("CHAN 3" is
+// spoken "Channel 3"), its value is the pulse width of the arm ("1500 µs").
 class ServoSimulator : public QAbstractButton {
   Q_OBJECT
 
@@ -36,28 +36,27 @@ class ServoSimulator : public QAbstractButton {
   // Sets the arm without drawing it.
   void SetMovingArm(std::int32_t degrees);
 
-  // Has the picture painted anew; several calls before the next paint cost one.
+  // Repaints the picture. Several calls before the next paint cost one.
   void DrawServo() { update(); }
 
-  // Whether the angles are printed on the picture, in place of the caption.
+  // Whether the angles are printed on the picture, instead of the caption.
   bool DisplayServoText() const { return dial_.DisplayServoText(); }
   void SetDisplayServoText(bool display);
 
-  // Set the arm or a marker, and draw. A marker that was set once stays shown.
+  // Set the arm or a marker, and draw. Once set, a marker stays visible.
   void SetMovingArmPosition(std::int32_t degrees);
   void SetMovingArmPositionUS(std::int32_t microseconds);
   void SetNeutralPosition(std::int32_t degrees);
   void SetDefaultPosition(std::int32_t degrees);
-  // Shows where 1500 lay under the neutral pulse so far; `microseconds` is the neutral pulse from then on.
+  // Places the marker where 1500 is under the neutral pulse so far. From then on `microseconds` is the neutral pulse.
   void SetNeutralPositionUS(std::int32_t microseconds);
   void SetDefaultPositionUS(std::int32_t microseconds);
 
-  // Takes a row of drawing sizes, and with it the size that the control asks for: 1 small, 2 medium, any
-  // other value normal.
+  // Selects the row of drawing sizes, and with it the size hints: 1 small, 2 medium, any other value normal.
   void DisplaySize(std::int32_t size);
   // Sets the text on the servo's body.
   void DisplayCaption(const QString& text);
-  // Marks the control as the chosen one, or takes the mark away.
+  // Shows the control as selected or not.
   void SelectServo(bool selected);
 
   // What the control shows.
@@ -69,8 +68,8 @@ class ServoSimulator : public QAbstractButton {
  Q_SIGNALS:
   // The user chose this servo.
   void Clicked();
-  // The control was resized: range and limit are back at their first values and the arm at 0 degrees. What
-  // the receiver sets now is painted at once; the first values never reach the screen.
+  // The control was resized: range and limit have their initial values again and the arm 0 degrees. What the receiver
+  // sets now is painted; the initial values are never seen.
   void Resized();
   // DisplayServoText was written.
   void DisplayServoTextChanged();
@@ -85,7 +84,7 @@ class ServoSimulator : public QAbstractButton {
   void PaintBackground(QPainter& painter) const;
 
   ServoDial dial_;
-  std::int64_t announced_pulse_;  // the arm's pulse width that assistive technology knows of
+  std::int64_t announced_pulse_;  // the pulse width of the arm that assistive technology was notified of
 };
 
 }  // namespace tendril

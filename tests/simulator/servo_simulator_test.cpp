@@ -22,7 +22,7 @@ class WatchedServo : public ServoSimulator {
   void paintEvent(QPaintEvent* event) override {
     ++paints;
     ServoSimulator::paintEvent(event);
-    painted_range_start = dial().range_start();
+    painted_range_start = dial().range().start;
   }
 };
 
@@ -126,7 +126,7 @@ TEST(ServoSimulator, Resize_ContainerReappliesBeforeThePaint) {
   Show(servo);
   servo.SetRangeUS(1000, 2000);
   servo.resize(150, 150);
-  EXPECT_EQ(servo.dial().range_start(), ServoDial::Convert(95)) << "nobody re-applies";
+  EXPECT_EQ(servo.dial().range().start, ServoDial::Convert(95)) << "nobody re-applies";
 
   QObject::connect(&servo, &ServoSimulator::Resized, &servo, [&servo] { servo.SetRangeUS(1000, 2000); });
   servo.paints = 0;

@@ -52,10 +52,10 @@ TEST_F(Editor, Stepping_MovesCaptionsRecordAndServos) {
   wanted.SetNeutralPositionUS(1510);  // the record's still
   wanted.SetRangeUS(1200, 1800);
   for (const char* servo : {"ServoSimulator2_2", "ServoSimulator1"})
-    EXPECT_EQ(Dial(servo).range_start(), wanted.range_start()) << servo;
+    EXPECT_EQ(Dial(servo).range().start, wanted.range().start) << servo;
 
   Click("ServoSimulator2_0");
-  EXPECT_EQ(Dial("ServoSimulator2_2").limit_start(), Dial("ServoSimulator2_2").range_start())
+  EXPECT_EQ(Dial("ServoSimulator2_2").limit().start, Dial("ServoSimulator2_2").range().start)
       << "drawn when it is left";
   EXPECT_EQ(Record(2).VirtualRange, (PulsePair{1200, 1800}));
   EXPECT_EQ(Text("lblActPulseLeft"), "600");
@@ -178,7 +178,7 @@ TEST_F(Editor, Presets_GoToAllChannelsAndCanBeChosenAgain) {
   }
   EXPECT_EQ(Text("lblActPulseLeft") + " " + Text("lblVirtPulseRange"), "500 800]");
   EXPECT_TRUE(Checked("optLostComm_3"));
-  EXPECT_EQ(Dial("ServoSimulator2_0").range_start(), Dial("ServoSimulator1").range_start());
+  EXPECT_EQ(Dial("ServoSimulator2_0").range().start, Dial("ServoSimulator1").range().start);
 
   Type("spnActPulseRange", "900");
   auto& presets = Find<QComboBox>("cmbPresets");

@@ -71,10 +71,10 @@ TEST_F(Window, Simulators_ShowTheRecordsAndKeepThemOverAResize) {
       wanted.SetRangeUS(600, 2400);
       wanted.SetLimitUS(1000, 2000);
       wanted.SetStopsUS(1000, 2000);
-      EXPECT_EQ(simulator.dial().range_start(), wanted.range_start());
-      EXPECT_EQ(Find<ServoSimulator>("ServoSimulator1").dial().range_start(), wanted.range_start());
-      EXPECT_EQ(simulator.dial().limit_end(), wanted.limit_end());
-      EXPECT_EQ(simulator.dial().stops_start(), wanted.stops_start());
+      EXPECT_EQ(simulator.dial().range().start, wanted.range().start);
+      EXPECT_EQ(Find<ServoSimulator>("ServoSimulator1").dial().range().start, wanted.range().start);
+      EXPECT_EQ(simulator.dial().limit().end, wanted.limit().end);
+      EXPECT_EQ(simulator.dial().stops().start, wanted.stops().start);
     }
   };
   expect_shown();
@@ -167,9 +167,9 @@ TEST_F(Window, Get_ShowsTheUnitsPortsAndLoadsTheChosenChannelAgain) {
   wanted.SetLimitUS(900, 1900);
   wanted.SetStopsUS(950, 1800);
   for (const char* name : {"ServoSimulator2_0", "ServoSimulator2_7", "ServoSimulator1"}) {
-    EXPECT_EQ(Find<ServoSimulator>(name).dial().range_end(), wanted.range_end()) << name;
-    EXPECT_EQ(Find<ServoSimulator>(name).dial().limit_start(), wanted.limit_start()) << name;
-    EXPECT_EQ(Find<ServoSimulator>(name).dial().stops_start(), wanted.stops_start()) << name;
+    EXPECT_EQ(Find<ServoSimulator>(name).dial().range().end, wanted.range().end) << name;
+    EXPECT_EQ(Find<ServoSimulator>(name).dial().limit().start, wanted.limit().start) << name;
+    EXPECT_EQ(Find<ServoSimulator>(name).dial().stops().start, wanted.stops().start) << name;
   }
   EXPECT_EQ(window_->WorkingConfiguration().At(7).NeutralPosition, 1400);
   EXPECT_EQ(Text("lblVirtPulseRange"), "500]");
