@@ -116,8 +116,7 @@ TEST(ServoDial, SizesAndProportions_FollowTheDisplaySize) {
     std::int32_t size;
     DialSizes sizes;
   };
-  for (const auto& [size, sizes] :
-       {Case{1, {3, 0, 6, 2}}, Case{2, {5, 1, 10, 4}}, Case{0, {8, 2, 20, 4}}}) {
+  for (const auto& [size, sizes] : {Case{1, {3, 0, 6, 2}}, Case{2, {5, 1, 10, 4}}, Case{0, {8, 2, 20, 4}}}) {
     ServoDial dial;
     dial.DisplaySize(size);
     EXPECT_EQ(dial.sizes(), sizes) << size;
