@@ -1,11 +1,9 @@
 #include "platform/memory_registry.h"
 
 #include <algorithm>
-#include <string_view>
-#include <utility>
 
 #include "platform/ansi_text.h"
-#include "platform/unicode.h"
+#include "platform/ascii.h"
 
 namespace tendril {
 namespace {
@@ -39,66 +37,99 @@ std::u16string Joined(std::u16string path, const std::string& subkey) {
   return path;
 }
 
-// Root keys are always there.
 bool IsRoot(std::u16string_view path) { return path.find(u'\\') == path.npos; }
 
 bool HoldsText(std::uint32_t type) { return type == kRegSz || type == kRegExpandSz || type == kRegMultiSz; }
 
-// The data as it crosses: text in ANSI.
+// The data as the caller gets it: text in ANSI.
 Bytes Crossing(const RegistryValue& value) {
-  return HoldsText(value.type) ? AnsiBytes(Utf16Text(value.data)) : value.data;
+  if (!HoldsText(value.type)) return value.data;
+  std::u16string text(value.data.size() / 2, u'\0');
+  for (std::size_t i = 0; i < text.size(); ++i) {
+    text[i] = static_cast<char16_t>(value.data[2 * i] | value.data[2 * i + 1] << 8);
+  }
+  return AnsiBytes(text);
 }
 
+// The data as it is kept.
 Bytes Kept(std::uint32_t type, std::span<const std::uint8_t> data) {
-  if (HoldsText(type)) return Utf16Bytes(AnsiText(data));
-  return {data.begin(), data.end()};
+  if (!HoldsText(type)) return {data.begin(), data.end()};
+  Bytes bytes;
+  for (const char16_t unit : AnsiText(data)) {
+    bytes.push_back(static_cast<std::uint8_t>(unit & 0xFF));
+    bytes.push_back(static_cast<std::uint8_t>(unit >> 8));
+  }
+  return bytes;
 }
 
 }  // namespace
+
+bool RegistryNameLess::operator()(std::u16string_view a, std::u16string_view b) const {
+  // Most names are spelled alike: what is equal as it stands needs no folding.
+  const auto [x, y] = std::mismatch(a.begin(), a.end(), b.begin(), b.end());
+  return std::lexicographical_compare(x, a.end(), y, b.end(), [](char16_t left, char16_t right) {
+    return AsciiUpper(left) < AsciiUpper(right);
+  });
+}
+
+bool IsRegistryPath(std::u16string_view path) {
+  return !path.empty() && path.front() != u'\\' && path.back() != u'\\' &&
+         path.find(u"\\\\") == path.npos &&
+         std::none_of(path.begin(), path.end(), [](char16_t unit) { return unit < u' '; });
+}
+
+bool MemoryRegistry::HasSubkeys(const std::u16string& path) const {
+  const std::u16string above = path + u"\\";
+  const auto next = keys_.lower_bound(above);
+  return next != keys_.end() && !RegistryNameLess()(above, next->first.substr(0, above.size()));
+}
+
+bool MemoryRegistry::Exists(const std::u16string& path) const {
+  return IsRoot(path) || keys_.contains(path) || HasSubkeys(path);
+}
 
 RegistryHandle MemoryRegistry::Opened(std::u16string path, std::uint32_t access) {
   open_keys_.emplace(++last_handle_, OpenedKey{std::move(path), access});
   return last_handle_;
 }
 
-RegistryKey* MemoryRegistry::Reach(RegistryHandle handle, std::uint32_t access, std::int32_t& code) {
-  const auto found = open_keys_.find(handle);
-  if (found == open_keys_.end()) {
-    code = kRegInvalidHandle;
-    return nullptr;
+std::int32_t MemoryRegistry::Reach(RegistryHandle handle, std::uint32_t access, RegistryValues*& values) {
+  const auto opened = open_keys_.find(handle);
+  if (opened == open_keys_.end()) return kRegInvalidHandle;
+  const auto& [path, granted] = opened->second;
+  if ((granted & access) != access) return kRegAccessDenied;
+  auto found = keys_.find(path);
+  if (found == keys_.end()) {
+    if (!Exists(path)) return kRegKeyDeleted;
+    found = keys_.emplace(path, RegistryValues()).first;
   }
-  if ((found->second.access & access) != access) {
-    code = kRegAccessDenied;
-    return nullptr;
-  }
-  const std::u16string& path = found->second.path;
-  RegistryKey* key = IsRoot(path) ? tree_.Create(path) : tree_.Find(path);
-  code = key != nullptr ? kRegSuccess : kRegKeyDeleted;
-  return key;
+  values = &found->second;
+  return kRegSuccess;
 }
 
 std::int32_t MemoryRegistry::OpenKey(RootKey root, const std::string& path, std::uint32_t access,
                                      RegistryHandle& key) {
   std::u16string whole = Joined(RootName(root), path);
-  if (!IsRoot(whole) && tree_.Find(whole) == nullptr) return kRegNotFound;
+  if (!Exists(whole)) return kRegNotFound;
   key = Opened(std::move(whole), access);
   return kRegSuccess;
 }
 
 std::int32_t MemoryRegistry::CreateKey(RootKey root, const std::string& path, RegistryHandle& key) {
   std::u16string whole = Joined(RootName(root), path);
-  if (tree_.Create(whole) == nullptr) return kRegBadPath;
+  if (!IsRegistryPath(whole)) return kRegBadPath;
+  keys_.try_emplace(whole);
   key = Opened(std::move(whole), kKeyAllAccess);
   return kRegSuccess;
 }
 
 std::int32_t MemoryRegistry::QueryValue(RegistryHandle key, const std::string& name, std::uint32_t& type,
                                         std::uint8_t* data, std::uint32_t& size) {
-  std::int32_t code = kRegSuccess;
-  const RegistryKey* reached = Reach(key, kMayQuery, code);
-  if (reached == nullptr) return code;
-  const auto found = reached->values.find(TextOf(name));
-  if (found == reached->values.end()) return kRegNotFound;
+  RegistryValues* values = nullptr;
+  const std::int32_t code = Reach(key, kMayQuery, values);
+  if (code != kRegSuccess) return code;
+  const auto found = values->find(TextOf(name));
+  if (found == values->end()) return kRegNotFound;
   const Bytes crossing = Crossing(found->second);
   const std::uint32_t room = std::exchange(size, static_cast<std::uint32_t>(crossing.size()));
   type = found->second.type;
@@ -110,21 +141,20 @@ std::int32_t MemoryRegistry::QueryValue(RegistryHandle key, const std::string& n
 
 std::int32_t MemoryRegistry::SetValue(RegistryHandle key, const std::string& name, std::uint32_t type,
                                       std::span<const std::uint8_t> data) {
-  std::int32_t code = kRegSuccess;
-  RegistryKey* reached = Reach(key, kMaySet, code);
-  if (reached == nullptr) return code;
-  reached->values.insert_or_assign(TextOf(name), RegistryValue{type, Kept(type, data)});
-  return kRegSuccess;
+  RegistryValues* values = nullptr;
+  const std::int32_t code = Reach(key, kMaySet, values);
+  if (code == kRegSuccess) values->insert_or_assign(TextOf(name), RegistryValue{type, Kept(type, data)});
+  return code;
 }
 
 std::int32_t MemoryRegistry::DeleteKey(RegistryHandle key, const std::string& subkey) {
-  const auto found = open_keys_.find(key);
-  if (found == open_keys_.end()) return kRegInvalidHandle;
-  const std::u16string path = Joined(found->second.path, subkey);
-  const RegistryKey* doomed = tree_.Find(path);
-  if (doomed == nullptr) return kRegNotFound;
-  if (IsRoot(path) || !doomed->subkeys.empty()) return kRegAccessDenied;
-  tree_.Remove(path);
+  const auto opened = open_keys_.find(key);
+  if (opened == open_keys_.end()) return kRegInvalidHandle;
+  const std::u16string path = Joined(opened->second.path, subkey);
+  if (!Exists(path)) return kRegNotFound;
+  if (IsRoot(path) || HasSubkeys(path)) return kRegAccessDenied;
+  keys_.erase(path);
+  keys_.try_emplace(path.substr(0, path.rfind(u'\\')));  // which may have been there for this key alone
   return kRegSuccess;
 }
 

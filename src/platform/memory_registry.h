@@ -4,15 +4,36 @@
 #include <cstdint>
 #include <map>
 #include <string>
+#include <string_view>
 #include <utility>
 
+#include "platform/bytes.h"
 #include "platform/registry_store.h"
-#include "platform/registry_tree.h"
 
 namespace tendril {
 
-// Behaves as the platform's registry does, access masks and the ANSI crossing of texts included. All that can be
-// refused is refused with the platform's code.
+// Orders names of keys and values without regard to the case of ASCII letters.
+struct RegistryNameLess {
+  bool operator()(std::u16string_view a, std::u16string_view b) const;
+};
+
+// A value as the registry keeps it: text in UTF-16, low byte first, with its terminator if it has one.
+struct RegistryValue {
+  std::uint32_t type = 0;
+  Bytes data;
+  bool operator==(const RegistryValue&) const = default;
+};
+
+using RegistryValues = std::map<std::u16string, RegistryValue, RegistryNameLess>;
+
+// Keys by their complete path, such as "HKEY_CURRENT_USER\Software". The keys above a key exist, listed or not.
+using RegistryKeys = std::map<std::u16string, RegistryValues, RegistryNameLess>;
+
+// Whether a key can have this path: one that has no empty part and no control characters.
+bool IsRegistryPath(std::u16string_view path);
+
+// Behaves as the platform's registry does, access masks and the ANSI crossing of texts included. What it refuses, it
+// refuses with the platform's code.
 class MemoryRegistry final : public RegistryStore {
  public:
   std::int32_t OpenKey(RootKey root, const std::string& path, std::uint32_t access,
@@ -25,23 +46,24 @@ class MemoryRegistry final : public RegistryStore {
   std::int32_t DeleteKey(RegistryHandle key, const std::string& subkey) override;
   std::int32_t CloseKey(RegistryHandle key) override;
 
-  const RegistryTree& tree() const { return tree_; }
-  // Open keys stay open: they are then those of the same path, or deleted ones.
-  void SetTree(RegistryTree tree) { tree_ = std::move(tree); }
+  const RegistryKeys& keys() const { return keys_; }
+  // Open keys stay open: each is then the new key of its path, or a deleted one.
+  void SetKeys(RegistryKeys keys) { keys_ = std::move(keys); }
   bool HasOpenKeys() const { return !open_keys_.empty(); }
 
  private:
-  // Not a pointer to the key: that may be deleted meanwhile.
   struct OpenedKey {
     std::u16string path;
     std::uint32_t access = 0;
   };
 
-  // The key that `handle` has open for `access`; null with the reason in `code` otherwise.
-  RegistryKey* Reach(RegistryHandle handle, std::uint32_t access, std::int32_t& code);
+  bool HasSubkeys(const std::u16string& path) const;
+  bool Exists(const std::u16string& path) const;
   RegistryHandle Opened(std::u16string path, std::uint32_t access);
+  // Gives the values of the key that `handle` has open for `access`.
+  std::int32_t Reach(RegistryHandle handle, std::uint32_t access, RegistryValues*& values);
 
-  RegistryTree tree_;
+  RegistryKeys keys_;
   std::map<RegistryHandle, OpenedKey> open_keys_;
   RegistryHandle last_handle_ = 0;
 };
