@@ -73,8 +73,7 @@ bool RegistryNameLess::operator()(std::u16string_view a, std::u16string_view b) 
 }
 
 bool IsRegistryPath(std::u16string_view path) {
-  return !path.empty() && path.front() != u'\\' && path.back() != u'\\' &&
-         path.find(u"\\\\") == path.npos &&
+  return !path.empty() && path.front() != u'\\' && path.back() != u'\\' && path.find(u"\\\\") == path.npos &&
          std::none_of(path.begin(), path.end(), [](char16_t unit) { return unit < u' '; });
 }
 
@@ -84,43 +83,40 @@ bool MemoryRegistry::HasSubkeys(const std::u16string& path) const {
   return next != keys_.end() && !RegistryNameLess()(above, next->first.substr(0, above.size()));
 }
 
-bool MemoryRegistry::Exists(const std::u16string& path) const {
-  return IsRoot(path) || keys_.contains(path) || HasSubkeys(path);
+RegistryValues* MemoryRegistry::Find(const std::u16string& path) {
+  const auto found = keys_.find(path);
+  if (found != keys_.end()) return &found->second;
+  return IsRoot(path) || HasSubkeys(path) ? &keys_[path] : nullptr;
 }
 
-RegistryHandle MemoryRegistry::Opened(std::u16string path, std::uint32_t access) {
-  open_keys_.emplace(++last_handle_, OpenedKey{std::move(path), access});
-  return last_handle_;
+void MemoryRegistry::SetKeys(RegistryKeys keys) {
+  keys_ = std::move(keys);
+  for (auto& [handle, key] : open_keys_) key.values = Find(key.path);
 }
 
 std::int32_t MemoryRegistry::Reach(RegistryHandle handle, std::uint32_t access, RegistryValues*& values) {
   const auto opened = open_keys_.find(handle);
   if (opened == open_keys_.end()) return kRegInvalidHandle;
-  const auto& [path, granted] = opened->second;
-  if ((granted & access) != access) return kRegAccessDenied;
-  auto found = keys_.find(path);
-  if (found == keys_.end()) {
-    if (!Exists(path)) return kRegKeyDeleted;
-    found = keys_.emplace(path, RegistryValues()).first;
-  }
-  values = &found->second;
-  return kRegSuccess;
+  if ((opened->second.access & access) != access) return kRegAccessDenied;
+  values = opened->second.values;
+  return values != nullptr ? kRegSuccess : kRegKeyDeleted;
 }
 
 std::int32_t MemoryRegistry::OpenKey(RootKey root, const std::string& path, std::uint32_t access,
                                      RegistryHandle& key) {
-  std::u16string whole = Joined(RootName(root), path);
-  if (!Exists(whole)) return kRegNotFound;
-  key = Opened(std::move(whole), access);
+  const std::u16string whole = Joined(RootName(root), path);
+  RegistryValues* values = Find(whole);
+  if (values == nullptr) return kRegNotFound;
+  key = ++last_handle_;
+  open_keys_.emplace(key, OpenedKey{whole, access, values});
   return kRegSuccess;
 }
 
 std::int32_t MemoryRegistry::CreateKey(RootKey root, const std::string& path, RegistryHandle& key) {
-  std::u16string whole = Joined(RootName(root), path);
+  const std::u16string whole = Joined(RootName(root), path);
   if (!IsRegistryPath(whole)) return kRegBadPath;
   keys_.try_emplace(whole);
-  key = Opened(std::move(whole), kKeyAllAccess);
-  return kRegSuccess;
+  return OpenKey(root, path, kKeyAllAccess, key);
 }
 
 std::int32_t MemoryRegistry::QueryValue(RegistryHandle key, const std::string& name, std::uint32_t& type,
@@ -151,8 +147,12 @@ std::int32_t MemoryRegistry::DeleteKey(RegistryHandle key, const std::string& su
   const auto opened = open_keys_.find(key);
   if (opened == open_keys_.end()) return kRegInvalidHandle;
   const std::u16string path = Joined(opened->second.path, subkey);
-  if (!Exists(path)) return kRegNotFound;
+  const RegistryValues* doomed = Find(path);
+  if (doomed == nullptr) return kRegNotFound;
   if (IsRoot(path) || HasSubkeys(path)) return kRegAccessDenied;
+  for (auto& [handle, open] : open_keys_) {
+    if (open.values == doomed) open.values = nullptr;
+  }
   keys_.erase(path);
   keys_.try_emplace(path.substr(0, path.rfind(u'\\')));  // which may have been there for this key alone
   return kRegSuccess;

@@ -48,18 +48,19 @@ class MemoryRegistry final : public RegistryStore {
 
   const RegistryKeys& keys() const { return keys_; }
   // Open keys stay open: each is then the new key of its path, or a deleted one.
-  void SetKeys(RegistryKeys keys) { keys_ = std::move(keys); }
+  void SetKeys(RegistryKeys keys);
   bool HasOpenKeys() const { return !open_keys_.empty(); }
 
  private:
   struct OpenedKey {
     std::u16string path;
     std::uint32_t access = 0;
+    RegistryValues* values = nullptr;  // null once the key is deleted
   };
 
   bool HasSubkeys(const std::u16string& path) const;
-  bool Exists(const std::u16string& path) const;
-  RegistryHandle Opened(std::u16string path, std::uint32_t access);
+  // The values of the key at `path`; null when there is none.
+  RegistryValues* Find(const std::u16string& path);
   // Gives the values of the key that `handle` has open for `access`.
   std::int32_t Reach(RegistryHandle handle, std::uint32_t access, RegistryValues*& values);
 

@@ -1,5 +1,5 @@
-// RegistryStore: the registry's calls as the platform has them. What they mean to the program, which values count
-// and what a failure is called, stands in the layer above.
+// RegistryStore: the registry's calls as the platform has them. The layer above decides which values count and what a
+// failure is called.
 #pragma once
 
 #include <cstdint>
@@ -9,7 +9,7 @@
 
 namespace tendril {
 
-// Where a part of the program tells what it passed over. One line, UTF-8.
+// Gets what a part of the program skipped: one line, UTF-8. It must not throw.
 using WarningSink = std::function<void(const std::string& warning)>;
 
 enum class RootKey { kClassesRoot, kCurrentUser, kLocalMachine, kUsers, kCurrentConfig };
@@ -29,13 +29,12 @@ inline constexpr std::uint32_t kRegBinary = 3;
 inline constexpr std::uint32_t kRegDword = 4;
 inline constexpr std::uint32_t kRegMultiSz = 7;
 
-// The platform's return codes, as far as the program tells them apart or a store makes them itself.
+// The platform's return codes that the program distinguishes or a store returns by itself.
 inline constexpr std::int32_t kRegSuccess = 0;
 inline constexpr std::int32_t kRegNotFound = 2;
 inline constexpr std::int32_t kRegAccessDenied = 5;
 inline constexpr std::int32_t kRegInvalidHandle = 6;
 inline constexpr std::int32_t kRegLockViolation = 33;
-inline constexpr std::int32_t kRegDiskFull = 112;
 inline constexpr std::int32_t kRegBadPath = 161;
 inline constexpr std::int32_t kRegMoreData = 234;
 inline constexpr std::int32_t kRegIoFailed = 1016;
@@ -53,8 +52,8 @@ class RegistryStore {
                                RegistryHandle& key) = 0;
   // Opens the key for all access, and creates it and the keys above it where they are missing.
   virtual std::int32_t CreateKey(RootKey root, const std::string& path, RegistryHandle& key) = 0;
-  // Tells the value's type and size in bytes (a text's with its terminator), and copies its data to `data`
-  // unless that is null. `size` says on entry how much `data` holds; too little gives kRegMoreData.
+  // Gives the value's type and size in bytes (a text's with its terminator), and copies its data to `data`
+  // unless that is null. `size` is on entry what `data` can hold; too little gives kRegMoreData.
   virtual std::int32_t QueryValue(RegistryHandle key, const std::string& name, std::uint32_t& type,
                                   std::uint8_t* data, std::uint32_t& size) = 0;
   // A text's data has its terminator.
@@ -62,7 +61,7 @@ class RegistryStore {
                                 std::span<const std::uint8_t> data) = 0;
   // Deletes the key `subkey` below `key` with its values. One that has subkeys stays: kRegAccessDenied.
   virtual std::int32_t DeleteKey(RegistryHandle key, const std::string& subkey) = 0;
-  // A store that keeps changes only now says so with this code if it cannot.
+  // Fails also if the store writes changes only now and cannot.
   virtual std::int32_t CloseKey(RegistryHandle key) = 0;
 };
 

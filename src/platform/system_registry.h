@@ -1,4 +1,4 @@
-// The registry of this system. Each system compiles its own implementation: posix/ or windows/.
+// The registry of this system. Each system compiles its own implementation: windows/, or qt/ on the others.
 #pragma once
 
 #include <memory>
@@ -8,7 +8,7 @@
 namespace tendril {
 
 // Windows: the current user's registry, by the platform's own calls. Linux, macOS: the file `registry.reg` in the
-// configuration folder, which is not made before something is written; what of it cannot be read is told to `warn`.
+// configuration folder, which is not created before something is written; `warn` gets what of it cannot be read.
 std::unique_ptr<RegistryStore> OpenSystemRegistry(const WarningSink& warn);
 
 }  // namespace tendril

@@ -35,7 +35,8 @@ std::string Utf8(std::u16string_view text) {
   const char16_t* from = nullptr;
   char8_t* to = nullptr;
   std::use_facet<Codec>(std::locale::classic())
-      .out(state, text.data(), text.data() + text.size(), from, bytes.data(), bytes.data() + bytes.size(), to);
+      .out(state, text.data(), text.data() + text.size(), from, bytes.data(), bytes.data() + bytes.size(),
+           to);
   return {bytes.data(), to};
 }
 

@@ -1,15 +1,32 @@
 #include "prefs/network_preferences.h"
 
+#include <array>
+#include <limits>
+#include <variant>
+
 #include "platform/runtime_error.h"
-#include "prefs/preference_table.h"
 
 namespace tendril {
 namespace {
 
-// The serial port of the regular network, unless it is said otherwise.
-constexpr std::uint8_t kRegularPort = 1;
+// A value's name in the registry and the member that holds it. The member's type is the value's: a number, a number
+// kept as a byte, a Boolean or a string.
+template <typename Owner>
+struct Preference {
+  const char* name;
+  std::variant<std::int32_t Owner::*, std::uint8_t Owner::*, bool Owner::*, std::string Owner::*> member;
+};
 
-// "NetworkKelvane" is the number of the network's serial port.
+template <typename Owner, std::size_t kRows>
+using PreferenceTable = std::array<Preference<Owner>, kRows>;
+
+constexpr PreferenceTable<GeneralNetworkPreferences, 4> kGeneralTable = {{
+    {"ListNetworks", &GeneralNetworkPreferences::ListNetworks},
+    {"NetworkBrisk", &GeneralNetworkPreferences::BriskPort},
+    {"NetworkX10", &GeneralNetworkPreferences::X10Port},
+    {"DMXListenerPort", &GeneralNetworkPreferences::CommListenerPort},
+}};
+
 constexpr PreferenceTable<NyxNetworkPreferences, 9> kNyxTable = {{
     {"NetworkKelvane", &NyxNetworkPreferences::Port},
     {"NyxSpeed", &NyxNetworkPreferences::Speed},
@@ -32,6 +49,46 @@ constexpr PreferenceTable<DMXUniversePrefs, 7> kUniverseTable = {{
     {"Comment", &DMXUniversePrefs::Comment},
 }};
 
+std::int32_t Read(const RegistryBranch& key, const char* name, std::int32_t fallback) {
+  return key.GetNumber(name, fallback);
+}
+// A number that does not fit into a byte counts as missing.
+std::uint8_t Read(const RegistryBranch& key, const char* name, std::uint8_t fallback) {
+  const std::int32_t number = key.GetNumber(name, fallback);
+  const bool fits = number >= 0 && number <= std::numeric_limits<std::uint8_t>::max();
+  return fits ? static_cast<std::uint8_t>(number) : fallback;
+}
+bool Read(const RegistryBranch& key, const char* name, bool fallback) {
+  return key.GetBoolean(name, fallback);
+}
+std::string Read(const RegistryBranch& key, const char* name, const std::string& fallback) {
+  return key.GetString(name, fallback);
+}
+
+void Write(const RegistryBranch& key, const char* name, std::int32_t value) { key.SetNumber(name, value); }
+void Write(const RegistryBranch& key, const char* name, bool value) { key.SetBoolean(name, value); }
+void Write(const RegistryBranch& key, const char* name, const std::string& value) {
+  key.SetString(name, value);
+}
+
+// Reads all values of the table; a missing one becomes what `defaults` holds.
+template <typename Owner, std::size_t kRows>
+void ReadAll(const PreferenceTable<Owner, kRows>& table, const RegistryBranch& key, const Owner& defaults,
+             Owner& owner) {
+  for (const auto& row : table) {
+    std::visit([&](auto member) { owner.*member = Read(key, row.name, defaults.*member); }, row.member);
+  }
+}
+
+// Creates the key where it is missing, and writes all values of the table.
+template <typename Owner, std::size_t kRows>
+void WriteAll(const PreferenceTable<Owner, kRows>& table, const RegistryBranch& key, const Owner& owner) {
+  key.CreateKey();
+  for (const auto& row : table) {
+    std::visit([&](auto member) { Write(key, row.name, owner.*member); }, row.member);
+  }
+}
+
 RegistryBranch NyxKey(const RegistryBranch& network_key, std::size_t index) {
   if (index == 0) return network_key;
   return network_key.Below(std::string("Aux") + static_cast<char>('A' + index - 1));
@@ -49,19 +106,6 @@ auto& ItemAt(Items& items, std::size_t number, std::size_t first) {
   return items[number - first];
 }
 
-template <typename Items>
-bool AnyDiffers(const Items& a, const Items& b) {
-  for (std::size_t i = 0; i < a.size(); ++i) {
-    if (a[i].DiffersFrom(b[i])) return true;
-  }
-  return false;
-}
-
-template <typename Items>
-void CopyAll(const Items& from, Items& to) {
-  for (std::size_t i = 0; i < from.size(); ++i) to[i].CopyFrom(from[i]);
-}
-
 }  // namespace
 
 void NyxNetworkPreferences::InitFromRegistry(const RegistryBranch& key, std::uint8_t default_port,
@@ -76,55 +120,29 @@ void NyxNetworkPreferences::InitFromRegistry(const RegistryBranch& key, std::uin
   defaults.ACNIPType = default_acn_ip_type;
   defaults.ACNIPAddress = default_acn_ip_address;
   defaults.ACNSendToPort = default_acn_send_to_port;
-  ReadPreferences(kNyxTable, key, defaults, *this);
+  ReadAll(kNyxTable, key, defaults, *this);
 }
 
 void NyxNetworkPreferences::SaveToRegistry(const RegistryBranch& key) const {
-  WritePreferences(kNyxTable, key, *this);
-}
-
-void NyxNetworkPreferences::CopyFrom(const NyxNetworkPreferences& other) {
-  CopyPreferences(kNyxTable, other, *this);
-}
-
-bool NyxNetworkPreferences::DiffersFrom(const NyxNetworkPreferences& other) const {
-  return PreferencesDiffer(kNyxTable, *this, other);
+  WriteAll(kNyxTable, key, *this);
 }
 
 void DMXUniversePrefs::InitFromRegistry(const RegistryBranch& key) {
-  ReadPreferences(kUniverseTable, key, {}, *this);
+  ReadAll(kUniverseTable, key, {}, *this);
 }
 
 void DMXUniversePrefs::SaveToRegistry(const RegistryBranch& key) const {
-  WritePreferences(kUniverseTable, key, *this);
-}
-
-void DMXUniversePrefs::CopyFrom(const DMXUniversePrefs& other) {
-  CopyPreferences(kUniverseTable, other, *this);
-}
-
-bool DMXUniversePrefs::DiffersFrom(const DMXUniversePrefs& other) const {
-  return PreferencesDiffer(kUniverseTable, *this, other);
-}
-
-const auto& NetworkPreferences::GeneralTable() {
-  static constexpr PreferenceTable<General, 4> kTable = {{
-      {"ListNetworks", &General::ListNetworks},
-      {"NetworkBrisk", &General::BriskPort},
-      {"NetworkX10", &General::X10Port},
-      {"DMXListenerPort", &General::CommListenerPort},
-  }};
-  return kTable;
+  WriteAll(kUniverseTable, key, *this);
 }
 
 NetworkPreferences::NetworkPreferences(Registry& registry)
     : registry_(registry), networks_(kNetworks), universes_(kUniverses) {}
 
 RegistryBranch NetworkPreferences::NetworkKey() const {
-  // No key has a longer name, and the paths of a thousand keys are made with it.
-  constexpr std::size_t kLongestName = 255;
+  // No key has a longer name, and the paths of a thousand keys contain it.
+  constexpr std::size_t kMaxNameLength = 255;
   const RegistryBranch shared = RegistryBranch::Shared(registry_);
-  return shared.Below("Network" + shared.Below("NetVersion").GetString("Ver", "").substr(0, kLongestName));
+  return shared.Below("Network" + shared.Below("NetVersion").GetString("Ver", "").substr(0, kMaxNameLength));
 }
 
 void NetworkPreferences::InitFromRegistry(bool force) {
@@ -132,7 +150,7 @@ void NetworkPreferences::InitFromRegistry(bool force) {
   try {
     registry_.InOneGo([this] { Load(); });
   } catch (...) {
-    // The values are there; only that they were read in one go could not be brought to its end.
+    // All values have been read: only the key that was held open could not be closed.
   }
   RemovePortClashes();
   initialised_ = true;
@@ -140,13 +158,15 @@ void NetworkPreferences::InitFromRegistry(bool force) {
 
 void NetworkPreferences::Load() {
   const RegistryBranch key = NetworkKey();
-  ReadPreferences(GeneralTable(), key, {}, general_);
-  const NyxNetworkPreferences other;
+  ReadAll(kGeneralTable, key, {}, general_);
+  const NyxNetworkPreferences defaults;
   for (std::size_t i = 0; i < kNetworks; ++i) {
+    constexpr std::uint8_t kRegularPort = 1;
     const bool is_regular = i == 0;
     const bool old_mcp = is_regular && key.GetBoolean("NyxOldMCP", false);
-    networks_[i].InitFromRegistry(NyxKey(key, i), is_regular ? kRegularPort : other.Port, old_mcp,
-                                  other.UsesACN, other.ACNIPType, other.ACNIPAddress, other.ACNSendToPort);
+    networks_[i].InitFromRegistry(NyxKey(key, i), is_regular ? kRegularPort : defaults.Port, old_mcp,
+                                  defaults.UsesACN, defaults.ACNIPType, defaults.ACNIPAddress,
+                                  defaults.ACNSendToPort);
   }
   for (std::size_t number = 1; number <= kUniverses; ++number) {
     DMXUniverse(number).InitFromRegistry(UniverseKey(key, number));
@@ -169,24 +189,23 @@ void NetworkPreferences::RemovePortClashes() {
 void NetworkPreferences::SaveToRegistry() const {
   registry_.InOneGo([this] {
     const RegistryBranch key = NetworkKey();
-    WritePreferences(GeneralTable(), key, general_);
+    WriteAll(kGeneralTable, key, general_);
     for (std::size_t i = 0; i < kNetworks; ++i) networks_[i].SaveToRegistry(NyxKey(key, i));
     for (std::size_t number = 1; number <= kUniverses; ++number) {
-      DMXUniverse(number).SaveToRegistry(UniverseKey(key, number));
+      universes_[number - 1].SaveToRegistry(UniverseKey(key, number));
     }
   });
 }
 
 void NetworkPreferences::CopyFrom(const NetworkPreferences& other) {
   initialised_ = other.initialised_;
-  CopyPreferences(GeneralTable(), other.general_, general_);
-  CopyAll(other.networks_, networks_);
-  CopyAll(other.universes_, universes_);
+  general_ = other.general_;
+  networks_ = other.networks_;
+  universes_ = other.universes_;
 }
 
 bool NetworkPreferences::DiffersFrom(const NetworkPreferences& other) const {
-  return PreferencesDiffer(GeneralTable(), general_, other.general_) ||
-         AnyDiffers(networks_, other.networks_) || AnyDiffers(universes_, other.universes_);
+  return general_ != other.general_ || networks_ != other.networks_ || universes_ != other.universes_;
 }
 
 NyxNetworkPreferences& NetworkPreferences::NyxNetwork(std::size_t index) {
@@ -194,10 +213,6 @@ NyxNetworkPreferences& NetworkPreferences::NyxNetwork(std::size_t index) {
 }
 
 DMXUniversePrefs& NetworkPreferences::DMXUniverse(std::size_t number) {
-  return ItemAt(universes_, number, 1);
-}
-
-const DMXUniversePrefs& NetworkPreferences::DMXUniverse(std::size_t number) const {
   return ItemAt(universes_, number, 1);
 }
 

@@ -1,4 +1,4 @@
-// The lighting networks of a show installation, as the maker's programs describe them in the current user's registry.
+// The lighting networks of a show installation, as the maker's programs keep them in the current user's registry.
 #pragma once
 
 #include <cstddef>
@@ -27,10 +27,12 @@ struct NyxNetworkPreferences {
   void InitFromRegistry(const RegistryBranch& key, std::uint8_t default_port, bool default_old_mcp,
                         bool default_uses_acn, std::int32_t default_acn_ip_type,
                         const std::string& default_acn_ip_address, std::int32_t default_acn_send_to_port);
-  // Makes the key where it is missing and writes all values. Raises the registry's failures.
+  // Creates the key where it is missing and writes all values. Raises the registry's failures.
   void SaveToRegistry(const RegistryBranch& key) const;
-  void CopyFrom(const NyxNetworkPreferences& other);
-  bool DiffersFrom(const NyxNetworkPreferences& other) const;
+  void CopyFrom(const NyxNetworkPreferences& other) { *this = other; }
+  bool DiffersFrom(const NyxNetworkPreferences& other) const { return *this != other; }
+
+  bool operator==(const NyxNetworkPreferences&) const = default;
 };
 
 // One DMX universe.
@@ -46,11 +48,23 @@ struct DMXUniversePrefs {
   // As for a serial network, with the defaults above.
   void InitFromRegistry(const RegistryBranch& key);
   void SaveToRegistry(const RegistryBranch& key) const;
-  void CopyFrom(const DMXUniversePrefs& other);
-  bool DiffersFrom(const DMXUniversePrefs& other) const;
+  void CopyFrom(const DMXUniversePrefs& other) { *this = other; }
+  bool DiffersFrom(const DMXUniversePrefs& other) const { return *this != other; }
+
+  bool operator==(const DMXUniversePrefs&) const = default;
 };
 
-// All of them. Copies of it would be large: use CopyFrom().
+// The values of the network key that belong to no single network.
+struct GeneralNetworkPreferences {
+  bool ListNetworks = false;
+  std::uint8_t BriskPort = 0;
+  std::uint8_t X10Port = 0;
+  std::int32_t CommListenerPort = 8837;
+
+  bool operator==(const GeneralNetworkPreferences&) const = default;
+};
+
+// All of them.
 class NetworkPreferences {
  public:
   static constexpr std::size_t kNetworks = 16;    // the regular one, 0, and the auxiliary ones
@@ -62,12 +76,12 @@ class NetworkPreferences {
   NetworkPreferences& operator=(const NetworkPreferences&) = delete;
 
   // Loads everything; what is missing gets its default. A serial port that several networks claim is left to the
-  // first of them: of the serial networks the lower number comes first, then X10, then Brisk. Returns at once when the
+  // first of them: of the serial networks the lower number comes first, then X10, then Brisk. Does nothing when the
   // object was loaded before, unless `force`. Never fails.
   void InitFromRegistry(bool force);
   // Writes everything to where InitFromRegistry() would read it. Raises the registry's failures.
   void SaveToRegistry() const;
-  // Takes over the values, and whether they were loaded; not the registry.
+  // Copies the values, and whether they were loaded; not the registry.
   void CopyFrom(const NetworkPreferences& other);
   bool DiffersFrom(const NetworkPreferences& other) const;
 
@@ -87,26 +101,15 @@ class NetworkPreferences {
   NyxNetworkPreferences& NyxNetwork(std::size_t index);
   // Universes 1 to 999. Raises kErrOutOfRange for another one.
   DMXUniversePrefs& DMXUniverse(std::size_t number);
-  const DMXUniversePrefs& DMXUniverse(std::size_t number) const;
 
  private:
-  // The values of the network key that belong to no single network.
-  struct General {
-    bool ListNetworks = false;
-    std::uint8_t BriskPort = 0;
-    std::uint8_t X10Port = 0;
-    // Its name in the registry is "DMXListenerPort".
-    std::int32_t CommListenerPort = 8837;
-  };
-  static const auto& GeneralTable();
-
   RegistryBranch NetworkKey() const;
   void Load();
   void RemovePortClashes();
 
   Registry& registry_;
   bool initialised_ = false;
-  General general_;
+  GeneralNetworkPreferences general_;
   std::vector<NyxNetworkPreferences> networks_;
   std::vector<DMXUniversePrefs> universes_;
 };

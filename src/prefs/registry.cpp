@@ -25,7 +25,7 @@ constexpr char kQueryFailure[] = "RegQueryValueEx failure";
 constexpr char kSetFailure[] = "RegSetValueEx failure";
 constexpr char kDeleteFailure[] = "RegDeleteKey failure";
 
-// The platform's codes for a value that is there but cannot be used.
+// The platform's codes for a value that cannot be used.
 constexpr std::int32_t kUnsupportedType = 1630;
 constexpr std::int32_t kTooLong = kRegMoreData;
 
@@ -52,7 +52,7 @@ std::string TextOf(const Bytes& ansi) {
 
 Registry::Registry(RegistryStore& store, WarningSink warn) : store_(store), warn_(std::move(warn)) {}
 
-// Does `call` and closes `key`, and only then lets a failure go on.
+// Does `call` and closes `key`, and only then passes on a failure.
 template <typename Call>
 void Registry::WithKey(RegistryHandle key, const char* failure_text, const Call& call) {
   std::optional<SavedErr> failure;
@@ -67,12 +67,8 @@ void Registry::WithKey(RegistryHandle key, const char* failure_text, const Call&
 }
 
 void Registry::Warn(const std::string& where, const SavedErr& failure) {
-  if (!warn_ || ++warnings_ > kMostWarnings) return;
-  try {
-    warn_(where + ": " + failure.description() + " (error " + std::to_string(failure.number()) + ").");
-  } catch (...) {
-    // That nobody hears of it changes nothing.
-  }
+  if (!warn_ || ++warnings_ > kMaxWarnings) return;
+  warn_(where + ": " + failure.description() + " (error " + std::to_string(failure.number()) + ").");
 }
 
 template <typename Query>
@@ -150,7 +146,7 @@ std::string Registry::GetString(RootKey root, const std::string& path, const std
     if (code == kRegNotFound) return;
     Check(code, kLengthFailure);
     Check(type == kRegSz ? kRegSuccess : kUnsupportedType, kLengthFailure);
-    Check(size <= kMostTextBytes ? kRegSuccess : kTooLong, kLengthFailure);
+    Check(size <= kMaxTextBytes ? kRegSuccess : kTooLong, kLengthFailure);
     Bytes data(size);
     Check(store_.QueryValue(key, ansi_name, type, data.data(), size), kQueryFailure);
     data.resize(size);

@@ -18,12 +18,12 @@ namespace tendril {
 // Texts and names are UTF-8 here and cross to the platform in the system's ANSI code; a character that the code lacks
 // becomes "?".
 //
-// The get operations do not fail: they give the caller's default instead. That a key or a value is missing is normal;
-// anything else is told as a warning that names both, up to kMostWarnings of them.
+// The get operations do not fail: they return the caller's default instead. A missing key or value is normal; anything
+// else gives a warning that names both, up to kMaxWarnings of them.
 class Registry {
  public:
-  static constexpr std::uint32_t kMostTextBytes = 1U << 20;  // with the terminator
-  static constexpr int kMostWarnings = 50;
+  static constexpr std::uint32_t kMaxTextBytes = 1U << 20;  // with the terminator
+  static constexpr int kMaxWarnings = 50;
 
   // `store` must outlive it. `warn` may be empty.
   Registry(RegistryStore& store, WarningSink warn);
@@ -33,7 +33,7 @@ class Registry {
   // Fails only if the store cannot keep what was changed: "RegCloseKey failure".
   void CloseKey(RegistryHandle key);
 
-  // Makes the key, and those above it, unless it is there. "RegCreateKeyEx failure".
+  // Creates the key, and those above it, unless they exist. "RegCreateKeyEx failure".
   void CreateKey(RootKey root, const std::string& path);
   // Deletes the key `subkey` below `path`; it must have no subkeys. "RegDeleteKey failure".
   void DeleteKey(RootKey root, const std::string& path, const std::string& subkey);
@@ -43,18 +43,18 @@ class Registry {
                          std::int32_t fallback);
   // A number other than 0 is true.
   bool GetBoolean(RootKey root, const std::string& path, const std::string& name, bool fallback);
-  // The text without its final terminator, which it may lack. A value that is no text, or of more than kMostTextBytes,
+  // The text without its final terminator, which it may lack. A value that is no text, or of more than kMaxTextBytes,
   // gives the default. "RegQueryValueEx failure (length)", "RegQueryValueEx failure".
   std::string GetString(RootKey root, const std::string& path, const std::string& name,
                         const std::string& fallback);
 
-  // These write a value of a key that is there already. "RegSetValueEx failure".
+  // These write a value of a key that exists. "RegSetValueEx failure".
   void SetNumber(RootKey root, const std::string& path, const std::string& name, std::int32_t value);
   void SetBoolean(RootKey root, const std::string& path, const std::string& name, bool value);  // 1 or 0
   void SetString(RootKey root, const std::string& path, const std::string& name, const std::string& value);
 
   // Runs `operations` with a key held open, so that a store that is a file reads it once before them and writes it
-  // once after them. They run all the same where no key can be held open. What fails goes on to the caller.
+  // once after them. They also run where no key can be held open. Passes on their failures.
   void InOneGo(const std::function<void()>& operations);
 
  private:
@@ -71,8 +71,8 @@ class Registry {
   int warnings_ = 0;
 };
 
-// A key of the current user's hive. The maker's programs keep all they have below the company key, and what they share
-// below its key "Shared". Each operation is the Registry's on this key; so are its failures.
+// A key of the current user's hive. The maker's programs keep their values below the company key, and those that they
+// share below its key "Shared". Each operation is the Registry's on this key; so are its failures.
 class RegistryBranch {
  public:
   // `registry` must outlive the branch.
@@ -81,7 +81,6 @@ class RegistryBranch {
 
   // The key at the path `subkey` below this one; this one for "".
   RegistryBranch Below(std::string_view subkey) const;
-  const std::string& path() const { return path_; }
 
   RegistryHandle OpenKey(std::uint32_t access) const;
   void CreateKey() const;

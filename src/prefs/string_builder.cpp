@@ -9,15 +9,14 @@ namespace tendril {
 
 void StringBuilder::Append(std::u16string_view text) {
   if (text.empty()) return;
-  constexpr std::size_t kMostUnits = std::numeric_limits<std::int32_t>::max() / sizeof(char16_t);
-  if (buffer_.size() - length_ < text.size()) {
-    if (text.size() > kMostUnits / 2 - std::min(length_, kMostUnits / 2)) {
-      throw RuntimeError(kErrOverflow, "Overflow");
-    }
-    buffer_.resize(2 * (length_ + text.size()));
+  const std::size_t needed = length_ + text.size();
+  if (buffer_.size() < needed) {
+    constexpr std::size_t kMaxUnits = std::numeric_limits<std::int32_t>::max() / sizeof(char16_t);
+    if (needed > kMaxUnits / 2) throw RuntimeError(kErrOverflow, "Overflow");
+    buffer_.resize(2 * needed);
   }
   std::copy(text.begin(), text.end(), buffer_.begin() + static_cast<std::ptrdiff_t>(length_));
-  length_ += text.size();
+  length_ = needed;
 }
 
 void StringBuilder::Reset() {

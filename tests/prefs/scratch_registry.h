@@ -1,10 +1,9 @@
-// Registries for tests: one that can be told to fail, and the system's own with nothing in it.
+// Registries for tests: one that can be made to fail, and on Windows the system's own with nothing in it.
 #pragma once
 
 #include <gtest/gtest.h>
 
 #include <cstdint>
-#include <filesystem>
 #include <memory>
 #include <string>
 #include <vector>
@@ -15,8 +14,6 @@
 
 #ifdef _WIN32
 #include <windows.h>
-#else
-#include <cstdlib>
 #endif
 
 namespace tendril::test {
@@ -45,34 +42,11 @@ class EmptyHive {
   HKEY key_ = nullptr;
 };
 
-#else
-
-// While it lives, the configuration folder is an empty one, which goes with it.
-class EmptyHive {
- public:
-  EmptyHive() {
-    std::string folder = std::filesystem::temp_directory_path() / "tendril-hive-XXXXXX";
-    folder_ = ::mkdtemp(folder.data());
-    ::setenv("XDG_CONFIG_HOME", folder_.c_str(), 1);
-  }
-  ~EmptyHive() {
-    ::unsetenv("XDG_CONFIG_HOME");
-    std::filesystem::remove_all(folder_);
-  }
-  EmptyHive(const EmptyHive&) = delete;
-  EmptyHive& operator=(const EmptyHive&) = delete;
-
- private:
-  std::filesystem::path folder_;
-};
-
 #endif
 
 // Passes every call on, counts calls and open keys, and fails where it is told to.
 class UnreliableStore final : public RegistryStore {
  public:
-  explicit UnreliableStore(RegistryStore& store) : store_(store) {}
-
   std::int32_t OpenKey(RootKey root, const std::string& path, std::uint32_t access,
                        RegistryHandle& key) override {
     return Opened(Fails() ? code : store_.OpenKey(root, path, access, key));
@@ -98,29 +72,39 @@ class UnreliableStore final : public RegistryStore {
   }
 
   int failing_call = 0;  // the number of the call that fails, counted from 1; -1 for all of them
-  std::int32_t code = kRegIoFailed;
   int calls = 0;
   int open_keys = 0;
 
  private:
+  static constexpr std::int32_t code = kRegIoFailed;
+
   bool Fails() { return ++calls == failing_call || failing_call < 0; }
   std::int32_t Opened(std::int32_t result) {
     if (result == kRegSuccess) ++open_keys;
     return result;
   }
 
-  RegistryStore& store_;
+  MemoryRegistry store_;
 };
 
-// What every registry must do alike; the parameter is "memory" or "system".
-class EveryRegistry : public testing::TestWithParam<const char*> {
+// What every registry must do alike. The parameter says whether it is the system's.
+class EveryRegistry : public testing::TestWithParam<bool> {
  protected:
-  bool is_system = GetParam() == std::string("system");
-  std::unique_ptr<EmptyHive> hive = is_system ? std::make_unique<EmptyHive>() : nullptr;
-  std::vector<std::string> warnings;
+#ifdef _WIN32
+  std::unique_ptr<EmptyHive> hive = GetParam() ? std::make_unique<EmptyHive>() : nullptr;
   std::unique_ptr<RegistryStore> store =
-      is_system ? OpenSystemRegistry({}) : std::make_unique<MemoryRegistry>();
+      GetParam() ? OpenSystemRegistry({}) : std::make_unique<MemoryRegistry>();
+#else
+  std::unique_ptr<RegistryStore> store = std::make_unique<MemoryRegistry>();
+#endif
+  std::vector<std::string> warnings;
   Registry registry{*store, [this](const std::string& warning) { warnings.push_back(warning); }};
 };
+
+#ifdef _WIN32
+inline const auto kEveryStore = testing::Bool();
+#else
+inline const auto kEveryStore = testing::Values(false);
+#endif
 
 }  // namespace tendril::test

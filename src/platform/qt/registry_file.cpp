@@ -19,7 +19,8 @@ constexpr int kLockMs = 2000;  // other programs hold the lock for moments
 QString ReadWhole(const QString& path, QByteArray& bytes) {
   const QFileInfo about(path);
   if (!about.exists()) return QStringLiteral(" is not there.");
-  if (!about.isFile()) return QStringLiteral(" is not read: it is no regular file.");  // opening a pipe would wait
+  if (!about.isFile())
+    return QStringLiteral(" is not read: it is no regular file.");  // opening a pipe would wait
   if (about.size() > RegistryFile::kMaxBytes) {
     return QStringLiteral(" is not read: it is larger than %1 MiB.").arg(RegistryFile::kMaxBytes >> 20);
   }
@@ -89,9 +90,9 @@ std::int32_t RegistryFile::Settle() {
   if (std::exchange(changed_, false)) {
     bytes_ = WriteRegistryText(memory_.keys());
     QSaveFile file(path_);
-    // A larger one could not be read again.
+    // A larger one could not be read again. Qt 6.4 commits what it could not flush.
     kept = bytes_.size() <= kMaxBytes && file.open(QIODevice::WriteOnly) &&
-           file.write(bytes_) == bytes_.size() && file.commit();
+           file.write(bytes_) == bytes_.size() && file.flush() && file.commit();
     fault_.clear();
     loaded_ = kept;  // what could not be kept is forgotten too
     if (!kept) Warn(QStringLiteral(" cannot be written: ") + file.errorString());

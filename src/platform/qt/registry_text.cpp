@@ -48,16 +48,17 @@ bool Take(QStringView& text, QStringView prefix) {
 std::optional<QString> TakeQuoted(QStringView& line) {
   if (!Take(line, u"\"")) return std::nullopt;
   QString text;
-  while (!line.isEmpty()) {
-    if (Take(line, u"\"")) return text;
-    if (Take(line, u"\\n")) {
-      text += u'\n';
-    } else if (Take(line, u"\\r")) {
-      text += u'\r';
+  for (auto unit = line.begin(); unit != line.end(); ++unit) {
+    if (*unit == u'"') {
+      line = QStringView(unit + 1, line.end());
+      return text;
+    }
+    const QChar escaped = *unit == u'\\' && unit + 1 != line.end() ? unit[1] : QChar();
+    if (escaped == u'\\' || escaped == u'"' || escaped == u'n' || escaped == u'r') {
+      ++unit;
+      text += escaped == u'n' ? u'\n' : escaped == u'r' ? u'\r' : escaped;
     } else {
-      if (line.startsWith(u"\\\\") || line.startsWith(u"\\\"")) line = line.sliced(1);
-      text += line.front();
-      line = line.sliced(1);
+      text += *unit;
     }
   }
   return std::nullopt;
@@ -132,13 +133,13 @@ QString Quoted(QString text) {
 }
 
 QString Written(const RegistryValue& value) {
-  const QByteArray data(reinterpret_cast<const char*>(value.data.data()),
-                        static_cast<qsizetype>(value.data.size()));
+  QByteArray data(reinterpret_cast<const char*>(value.data.data()),
+                  static_cast<qsizetype>(value.data.size()));
   const QString text = value.type == kRegSz && data.size() % 2 == 0 ? Utf16Text(value.data) : QString();
   if (!text.isEmpty() && text.indexOf(QChar(0)) == text.size() - 1) return Quoted(text.chopped(1));
   if (value.type == kRegDword && data.size() == 4) {
-    const QByteArray high_byte_first(data.rbegin(), data.rend());
-    return QStringLiteral("dword:") + QLatin1String(high_byte_first.toHex());
+    std::reverse(data.begin(), data.end());
+    return QStringLiteral("dword:") + QLatin1String(data.toHex());
   }
   const QString type = value.type == kRegBinary ? QString() : QStringLiteral("(%1)").arg(value.type, 0, 16);
   return QStringLiteral("hex") + type + u':' + QLatin1String(data.toHex(','));
@@ -150,7 +151,8 @@ RegistryKeys ReadRegistryText(const QByteArray& bytes, const UnreadLineSink& unr
   const QString text = Decoded(bytes);
   const auto lines = QStringView(text).tokenize(u'\n');
   RegistryKeys keys;
-  RegistryValues* values = nullptr;  // of the key that the lines belong to; none below a key that cannot be read
+  RegistryValues* values =
+      nullptr;  // of the key that the lines belong to; none below a key that cannot be read
   std::size_t line_number = 0;
   std::size_t items = 0;
   for (auto next = lines.begin(); next != lines.end();) {
@@ -178,7 +180,7 @@ RegistryKeys ReadRegistryText(const QByteArray& bytes, const UnreadLineSink& unr
 }
 
 QByteArray WriteRegistryText(const RegistryKeys& keys) {
-  QString text = kHeader + QStringLiteral("\r\n");
+  QString text = kHeader.toString() + QStringLiteral("\r\n");
   for (const auto& [path, values] : keys) {
     text += QStringLiteral("\r\n[") + QString::fromStdU16String(path) + QStringLiteral("]\r\n");
     for (const auto& [name, value] : values) {
