@@ -117,7 +117,7 @@ class Run {
   void Arrive(const Bytes& bytes, std::size_t flood = 0) {
     if (!client_.IsConnected()) return;
     Append(arrived_, bytes);
-    arrived_.resize(std::min(arrived_.size() + flood, kLargestFrame), 'x');
+    arrived_.resize(std::min(arrived_.size() + flood, kMaxFrame), 'x');
     const std::int32_t outcome = Outcome();
     if (outcome != kNothing) {
       arrived_.clear();
@@ -128,7 +128,7 @@ class Run {
     socket_.flood = flood;
     largest_piece = 0;
     socket_.events.data_arrived();
-    Check(largest_piece <= 2 * kLargestFrame, "no more is kept of a reply than the largest has");
+    Check(largest_piece <= 2 * kMaxFrame, "no more is kept of a reply than the largest has");
     Check(told_ == (outcome == kNothing ? std::vector<std::int32_t>() : std::vector{outcome}),
           "what arrives has the outcome that it should have, once");
   }

@@ -11,7 +11,7 @@ namespace {
 constexpr std::size_t kLengthOffset = 2;
 
 void WriteLength(std::size_t length, Bytes& frame) {
-  if (length > kLargestPayload) {
+  if (length > kMaxPayload) {
     throw RuntimeError(kErrInternal, "Invalid length for length field: " + std::to_string(length));
   }
   for (std::size_t offset = kFrameHeaderSize; offset-- > kLengthOffset; length /= 10) {
@@ -19,7 +19,7 @@ void WriteLength(std::size_t length, Bytes& frame) {
   }
 }
 
-// From the last digit to the first, so that of several wrong ones the last is named.
+// Reads from the last digit to the first: of several wrong bytes, the last is named.
 std::size_t ReadLength(std::span<const std::uint8_t> header) {
   std::size_t length = 0;
   std::size_t weight = 1;
@@ -47,11 +47,6 @@ Bytes BuildFrame(std::uint8_t identifier, std::uint8_t sequence, std::span<const
 std::optional<FrameHeader> ParseFrameHeader(std::span<const std::uint8_t> bytes) {
   if (bytes.size() < kFrameHeaderSize) return std::nullopt;
   return FrameHeader{bytes[0], bytes[1], ReadLength(bytes)};
-}
-
-std::uint8_t SequenceCharacters::Take() {
-  if (next_ > '9') next_ = '0';
-  return next_++;
 }
 
 }  // namespace tendril

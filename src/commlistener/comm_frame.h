@@ -16,30 +16,21 @@
 namespace tendril {
 
 inline constexpr std::size_t kFrameHeaderSize = 7;
-inline constexpr std::size_t kLargestPayload = 99999;  // five digits
-inline constexpr std::size_t kLargestFrame = kFrameHeaderSize + kLargestPayload;
+inline constexpr std::size_t kMaxPayload = 99999;  // five digits
+inline constexpr std::size_t kMaxFrame = kFrameHeaderSize + kMaxPayload;
 
-// What the first seven bytes of a frame say.
+// The first seven bytes of a frame.
 struct FrameHeader {
   std::uint8_t identifier;
   std::uint8_t sequence;
   std::size_t length;  // of the payload
 };
 
-// A whole frame. Raises RuntimeError(kErrInternal) for a payload over kLargestPayload.
+// A whole frame. Raises RuntimeError(kErrInternal) for a payload over kMaxPayload.
 Bytes BuildFrame(std::uint8_t identifier, std::uint8_t sequence, std::span<const std::uint8_t> payload);
 
-// The header of a frame of which `bytes` have arrived; nothing when that is not the whole header yet. Raises
-// RuntimeError(kErrInternal) when the length has a byte that is no digit.
+// The header of a frame that begins with `bytes`; nothing when they are fewer than a header has. Raises
+// RuntimeError(kErrInternal) when a byte of the length is no digit.
 std::optional<FrameHeader> ParseFrameHeader(std::span<const std::uint8_t> bytes);
-
-// Gives out the sequence characters: "0" to "9", and "0" again.
-class SequenceCharacters {
- public:
-  std::uint8_t Take();
-
- private:
-  std::uint8_t next_ = '0';
-};
 
 }  // namespace tendril

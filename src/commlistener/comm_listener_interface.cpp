@@ -29,11 +29,6 @@ Control& Present(Control* control, const char* name) {
   return *control;
 }
 
-template <typename Event, typename... Args>
-void Raise(const Event& event, const Args&... args) {
-  if (event) event(args...);
-}
-
 }  // namespace
 
 CommListenerInterface::~CommListenerInterface() {
@@ -58,10 +53,10 @@ void CommListenerInterface::InitializeControls(TcpSocket* socket, Timer* connect
 
 void CommListenerInterface::Connect(bool send_all_off_on_disconnect, const std::string& client_identification,
                                     bool send_physical_lights_control, bool physical_lights_control) {
-  all_off_on_disconnect_ = all_off_on_disconnect_pending_ = send_all_off_on_disconnect;
+  all_off_on_disconnect_pending_ = send_all_off_on_disconnect;
   client_identification_ = client_identification;
   client_identification_pending_ = true;
-  physical_lights_enabled_ = physical_lights_pending_ = send_physical_lights_control;
+  physical_lights_pending_ = send_physical_lights_control;
   physical_lights_control_ = physical_lights_control;
   active_ = true;
   try {
@@ -85,7 +80,7 @@ void CommListenerInterface::Disconnect() {
     active_ = false;
     if (Closed()) return;
     TCPCommWinsock_->Close();
-    Raise(events_.CommClosed);
+    events_.CommClosed();
     SetConnectedFlag(false);
   } catch (...) {
     cli_error_message_ = "Error disconnecting";
@@ -96,7 +91,7 @@ void CommListenerInterface::PrepareForShutdown() {
   StopTimers();
   if (TCPCommWinsock_ != nullptr) {
     Disconnect();
-    // The owner may have connected again when it was told.
+    // The owner may have connected again in CommClosed.
     TCPCommWinsock_->SetEvents({});
     TCPCommWinsock_->Close();
     StopTimers();
@@ -130,7 +125,7 @@ void CommListenerInterface::StartConnecting() {
     TCPConnectTimer_->SetEnabled(true);
     TCPCommWinsock_->Connect(remote_address_, remote_port);
     request_outstanding_ = false;
-    receive_buffer_.clear();  // the rest of a reply on the old connection belongs to nothing on this one
+    receive_buffer_.clear();  // may hold half a reply of the old connection
     cli_error_message_.clear();
     tcp_error_message_.clear();
     tcp_error_ = 0;
@@ -147,7 +142,7 @@ void CommListenerInterface::OnSocketConnected() {
       SendMessage(unacknowledged.front(), unacknowledged);
       last_request_.reset();
     }
-    Raise(events_.CommConnected);
+    events_.CommConnected();
     if (!IsConnected()) return;  // the owner has disconnected
     SetConnectedFlag(true);
     WorkOffPendingRequests();
@@ -183,44 +178,39 @@ void CommListenerInterface::Fail(std::int32_t code, const std::string& message, 
   TCPConnectTimer_->SetEnabled(false);
   TCPRequestTimer_->SetEnabled(false);
   request_outstanding_ = false;
-  Raise(events_.CommError, code, message, tcp_error, tcp_error_message);
+  events_.CommError(code, message, tcp_error, tcp_error_message);
   SetConnectedFlag(false);
-  if (TCPReconnectTimer_ == nullptr || !Closed()) return;  // the owner has ended it all, or connects already
+  if (TCPReconnectTimer_ == nullptr || !Closed())
+    return;  // the owner has shut down, or connected, in an event
   TCPReconnectTimer_->SetInterval(comm_reconnect_time_);
   TCPReconnectTimer_->SetEnabled(true);
 }
 
 void CommListenerInterface::SetConnectedFlag(bool connected) {
-  if (std::exchange(connected_, connected) != connected) Raise(events_.CommStateChanged);
+  if (std::exchange(connected_, connected) != connected) events_.CommStateChanged();
 }
 
-// More than the largest frame is never kept: what is beyond a frame is dropped with it anyway.
+// Never keeps more than the largest frame: what is beyond a frame is dropped with it anyway.
 void CommListenerInterface::OnDataArrived() {
   try {
-    Bytes arrived;
     for (;;) {
-      const Bytes more = TCPCommWinsock_->Receive(kLargestFrame);
-      if (more.empty()) break;
-      const std::size_t room = kLargestFrame - receive_buffer_.size() - arrived.size();
-      const auto kept = static_cast<std::ptrdiff_t>(std::min(room, more.size()));
-      arrived.insert(arrived.end(), more.begin(), more.begin() + kept);
+      const Bytes arrived = TCPCommWinsock_->Receive(kMaxFrame);
+      if (arrived.empty()) break;
+      const auto kept = std::min(arrived.size(), kMaxFrame - receive_buffer_.size());
+      receive_buffer_.insert(receive_buffer_.end(), arrived.begin(),
+                             arrived.begin() + static_cast<std::ptrdiff_t>(kept));
     }
-    ProcessReply(arrived);
   } catch (...) {
-    Fail(kCLIFault, "Error in TCPCommWinsock_DataArrival " + DescribeCurrentFailure());
+    return Fail(kCLIFault, "Error in TCPCommWinsock_DataArrival " + DescribeCurrentFailure());
   }
-}
-
-void CommListenerInterface::ProcessReply(std::span<const std::uint8_t> arrived) {
-  receive_buffer_.insert(receive_buffer_.end(), arrived.begin(), arrived.end());
   try {
-    TakeReply();
+    ProcessReply();
   } catch (...) {
     Fail(kCLIFault, "Error on comm reply " + DescribeCurrentFailure());
   }
 }
 
-void CommListenerInterface::TakeReply() {
+void CommListenerInterface::ProcessReply() {
   constexpr std::uint8_t kAcknowledged = '1';
   constexpr std::uint8_t kRefused = '0';
   if (receive_buffer_.size() < kFrameHeaderSize) return;
@@ -243,16 +233,16 @@ void CommListenerInterface::TakeReply() {
   last_request_.reset();
   TCPRequestTimer_->SetEnabled(false);
   WorkOffPendingRequests();
-  Raise(events_.CommReply, payload, std::int32_t{0});
+  events_.CommReply(payload, 0);
 }
 
 void CommListenerInterface::SendMessage(std::uint8_t identifier, std::span<const std::uint8_t> payload) {
   if (!ReadyToTransmit()) return;
   try {
-    const std::uint8_t sequence = sequence_.Take();
-    if (payload.size() > kLargestPayload) {
-      return Raise(events_.CommError, kCLIRequestTooLong, std::string("Request message too long"), 0,
-                   std::string());
+    if (next_sequence_ > '9') next_sequence_ = '0';
+    const std::uint8_t sequence = next_sequence_++;
+    if (payload.size() > kMaxPayload) {
+      return events_.CommError(kCLIRequestTooLong, "Request message too long", 0, "");
     }
     Bytes frame = BuildFrame(identifier, sequence, payload);
     TCPCommWinsock_->Send(frame);

@@ -11,7 +11,7 @@ namespace {
 
 constexpr std::int32_t kGiveBack = 256;  // added to the port number in an entry of the port control queue
 
-// Lighting data, built number by number.
+// Builds the data of a lighting record.
 class LightingData {
  public:
   LightingData& Byte(std::uint8_t value) {
@@ -30,16 +30,13 @@ class LightingData {
     if (count < 0 || static_cast<std::size_t>(count) > values.size()) {
       throw RuntimeError(kErrOutOfRange, "Subscript out of range");
     }
-    return Word(static_cast<std::uint16_t>(count)).Values(values.first(static_cast<std::size_t>(count)));
+    Word(static_cast<std::uint16_t>(count));
+    bytes_.insert(bytes_.end(), values.begin(), values.begin() + count);
+    return *this;
   }
   const Bytes& bytes() const { return bytes_; }
 
  private:
-  LightingData& Values(std::span<const std::uint8_t> values) {
-    bytes_.insert(bytes_.end(), values.begin(), values.end());
-    return *this;
-  }
-
   Bytes bytes_;
 };
 
@@ -57,18 +54,16 @@ void CommListenerInterface::Guarded(const char* failure, Request request) {
 
 // Each step sends only when nothing is outstanding, so that at most one of them does.
 void CommListenerInterface::WorkOffPendingRequests() {
-  if (ReadyToTransmit() && std::exchange(physical_lights_pending_, false) && physical_lights_enabled_) {
-    SendPhysicalLightsControl();
-  }
+  if (ReadyToTransmit() && std::exchange(physical_lights_pending_, false)) SendPhysicalLightsControl();
   if (client_identification_pending_) SendClientIdentification();
-  if (all_off_on_disconnect_ && all_off_on_disconnect_pending_) SendAllOffOnDisconnect();
+  if (all_off_on_disconnect_pending_) SendAllOffOnDisconnect();
   if (ReadyToTransmit() && !port_control_queue_.empty()) SendCommPortControl();
   if (ReadyToTransmit()) SendLightingData();
 }
 
 void CommListenerInterface::SetPhysicalLightsControl(bool control) {
   physical_lights_control_ = control;
-  physical_lights_enabled_ = physical_lights_pending_ = true;
+  physical_lights_pending_ = true;
   WorkOffPendingRequests();
 }
 
@@ -119,8 +114,8 @@ void CommListenerInterface::SendCommPortControl() {
 void CommListenerInterface::SendLightingData() {
   if (const auto batch = lighting_.TakeBatch()) {
     SendMessage('L', *batch);
-  } else if (lighting_.fill() > 0) {
-    SendMessageB('L', lighting_.buffer(), lighting_.fill());
+  } else if (!lighting_.buffer().empty()) {
+    SendMessageB('L', lighting_.buffer(), lighting_.buffer().size());
     lighting_.ClearBuffer();
   }
 }
@@ -159,7 +154,7 @@ void CommListenerInterface::SendDMXIntensities(std::uint16_t a, std::uint16_t b,
   });
 }
 
-// A fault has the text of the other intensities, as it always had.
+// A fault has the text of SendDMXIntensities.
 void CommListenerInterface::SendNyxIntensities(std::uint8_t a, std::uint8_t b, std::uint16_t c,
                                                std::int16_t count, std::span<const std::uint8_t> values) {
   Guarded("Error in SendDMXIntensities", [=, this] {

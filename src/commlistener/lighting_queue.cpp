@@ -12,7 +12,12 @@ namespace {
 
 constexpr std::size_t kRecordHeadSize = 4;
 constexpr std::size_t kRecordAlignment = 4;
-constexpr std::size_t kMostBatches = 200;
+constexpr std::size_t kMaxBatches = 200;
+
+void AppendWord(std::size_t value, Bytes& bytes) {
+  bytes.push_back(static_cast<std::uint8_t>(value & 0xFF));
+  bytes.push_back(static_cast<std::uint8_t>(value >> 8));
+}
 
 }  // namespace
 
@@ -22,25 +27,15 @@ void LightingQueue::Append(LightingRecordType type, std::span<const std::uint8_t
   }
   const std::size_t unpadded = kRecordHeadSize + data.size();
   const std::size_t size = (unpadded + kRecordAlignment - 1) / kRecordAlignment * kRecordAlignment;
-
-  if (fill_ != 0 && fill_ + size > kLargestPayload) {
-    batches_.emplace_back(buffer_.begin(), buffer_.begin() + static_cast<std::ptrdiff_t>(fill_));
-    fill_ = 0;
+  if (!buffer_.empty() && buffer_.size() + size > kMaxPayload) {
+    batches_.push_back(std::exchange(buffer_, {}));
   }
-  while (batches_.size() >= kMostBatches) batches_.pop_front();
-  std::size_t capacity = buffer_.size();
-  while (capacity < fill_ + size) capacity = 2 * capacity + 1;
-  buffer_.resize(capacity);
+  while (batches_.size() >= kMaxBatches) batches_.pop_front();
 
-  const auto number = static_cast<std::uint16_t>(type);
-  const std::uint8_t head[kRecordHeadSize] = {
-      static_cast<std::uint8_t>(number & 0xFF), static_cast<std::uint8_t>(number >> 8),
-      static_cast<std::uint8_t>(data.size() & 0xFF), static_cast<std::uint8_t>(data.size() >> 8)};
-  const auto record =
-      std::copy(std::begin(head), std::end(head), buffer_.begin() + static_cast<std::ptrdiff_t>(fill_));
-  const auto padding = std::copy(data.begin(), data.end(), record);
-  std::fill_n(padding, size - unpadded, std::uint8_t{0});
-  fill_ += size;
+  AppendWord(static_cast<std::size_t>(type), buffer_);
+  AppendWord(data.size(), buffer_);
+  buffer_.insert(buffer_.end(), data.begin(), data.end());
+  buffer_.resize(buffer_.size() + size - unpadded);
 }
 
 std::optional<Bytes> LightingQueue::TakeBatch() {

@@ -1,4 +1,4 @@
-// LightingQueue: lighting data that waits to be sent, as a run of records laid end to end:
+// LightingQueue: lighting data that waits to be sent, as records laid end to end:
 //
 //   offset 0  2 bytes  record type
 //          2  2 bytes  n, length of the data, signed
@@ -26,8 +26,8 @@ enum class LightingRecordType : std::uint16_t {
   kNyxIntensities = 4
 };
 
-// Collects records in a buffer as large as one message can be. When that is full it becomes a batch; when
-// nobody takes the batches, the oldest are dropped, since new lighting data is worth more than old.
+// Collects records in a buffer as large as a message's payload can be. A full buffer becomes a batch. When too many
+// batches wait, the oldest are dropped: new lighting data is worth more than old.
 class LightingQueue {
  public:
   // Appends a record. Raises RuntimeError(kErrOverflow) for data beyond 32767 bytes.
@@ -37,14 +37,12 @@ class LightingQueue {
   std::optional<Bytes> TakeBatch();
 
   std::size_t batches() const { return batches_.size(); }
-  // The buffer, of which the first fill() bytes are records.
-  std::span<const std::uint8_t> buffer() const { return buffer_; }
-  std::size_t fill() const { return fill_; }
-  void ClearBuffer() { fill_ = 0; }
+  // The records that are in no batch yet.
+  const Bytes& buffer() const { return buffer_; }
+  void ClearBuffer() { buffer_.clear(); }
 
  private:
-  Bytes buffer_;          // its size is the capacity
-  std::size_t fill_ = 0;  // at most buffer_.size()
+  Bytes buffer_;  // at most kMaxPayload
   std::deque<Bytes> batches_;
 };
 

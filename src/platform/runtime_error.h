@@ -8,8 +8,8 @@
 
 namespace tendril {
 
-// Error numbers that the program raises or tells apart. The serial ones follow the published list of the
-// platform's serial control, so that a support person can look them up.
+// Error numbers that the program raises or distinguishes. The serial ones follow the published list of the platform's
+// serial control, so that support staff can look them up.
 inline constexpr std::int32_t kErrOverflow = 6;
 inline constexpr std::int32_t kErrOutOfRange = 9;  // an index outside its table
 inline constexpr std::int32_t kErrDivisionByZero = 11;
@@ -25,20 +25,20 @@ inline constexpr std::int32_t kErrPortNotOpen = 8012;
 inline constexpr std::int32_t kErrSettingsRefused = 8015;
 inline constexpr std::int32_t kErrReadFault = 8020;
 
-// A failure with a number and a description, as the person sees it. An operation that passes one on adds a
-// line "Trace: ..." to the description, so that the description tells the way that the failure took.
+// A failure with a number and a description, as the user sees it. An operation that passes one on adds a line
+// "Trace: ..." to the description, so that the description shows the path of the failure.
 class RuntimeError : public std::exception {
  public:
-  // `description` is UTF-8, its lines separated by CR LF. `source` names the part that raised it.
-  RuntimeError(std::int32_t number, std::string description, std::string source = {});
+  // `description` is UTF-8, its lines separated by CR LF. `source` names the part that raised it; the last two say where
+  // help on the failure is.
+  RuntimeError(std::int32_t number, std::string description, std::string source = {},
+               std::string help_file = {}, std::int32_t help_context = 0);
 
   std::int32_t number() const { return number_; }
   const std::string& description() const { return description_; }
   const std::string& source() const { return source_; }
   const std::string& help_file() const { return help_file_; }
   std::int32_t help_context() const { return help_context_; }
-  // Where help on this failure is found; empty and 0 unless set.
-  void SetHelp(std::string file, std::int32_t context);
 
   // Adds a line to the description (a CR LF, then `line`).
   void AddLine(std::string_view line);
@@ -50,28 +50,24 @@ class RuntimeError : public std::exception {
   std::string description_;
   std::string source_;
   std::string help_file_;
-  std::int32_t help_context_ = 0;
+  std::int32_t help_context_;
 };
 
-// The exception that is being handled; one that is no RuntimeError becomes one (kErrInternal) with its own
-// description. Call it in a catch block only.
+// The exception that is being handled, converted to a RuntimeError (kErrInternal) if it is none. Call it in a catch
+// block only.
 RuntimeError CurrentFault();
 
-// Describes the exception that is being handled: a RuntimeError's description, any other exception's what(),
-// or "Unknown error". Call it in a catch block only.
+// Its description: "Unknown error" for an exception that is no std::exception.
 std::string DescribeCurrentFault();
 
-// Runs `operation`; a failure in it goes on with the line `trace` added. What is no RuntimeError becomes one
-// (kErrInternal) on the way, so that no failure loses its trace.
+// Runs `operation`, and adds the line `trace` to a failure in it. An exception of another type becomes a RuntimeError
+// (kErrInternal), so that no failure loses its trace.
 template <typename Operation>
 decltype(auto) Traced(std::string_view trace, Operation&& operation) {
   try {
     return operation();
-  } catch (RuntimeError& error) {
-    error.AddLine(trace);
-    throw;
   } catch (...) {
-    RuntimeError traced(kErrInternal, DescribeCurrentFault());
+    RuntimeError traced = CurrentFault();
     traced.AddLine(trace);
     throw traced;
   }

@@ -11,20 +11,22 @@
 
 namespace tendril {
 
-// What the socket tells its owner, always from the event loop and never from inside a call.
+// What the socket reports to its owner, always from the event loop and never from inside a call. The handlers must not
+// be empty.
 struct TcpEvents {
-  std::function<void()> connected;
-  std::function<void()> data_arrived;
-  // The attempt or the connection ended by itself: refused, closed by the peer, unreachable. The socket is
-  // closed when this comes; it comes once an attempt, and never after Close().
-  std::function<void(std::int32_t number, const std::string& description)> ended;
+  std::function<void()> connected = [] {};
+  std::function<void()> data_arrived = [] {};
+  // The attempt or the connection ended by itself: refused, closed by the peer, unreachable. The socket is closed
+  // by then. At most once an attempt, and never after Close().
+  std::function<void(std::int32_t number, const std::string& description)> ended = [](std::int32_t,
+                                                                                      const std::string&) {};
 };
 
 // Why a connection ended, in the numbers of the platform's published list.
 inline constexpr std::int32_t kConnectionReset = 10054;
 inline constexpr std::int32_t kConnectionRefused = 10061;
 
-// The states of a socket that its owner tells apart, with the numbers of that list.
+// The states of a socket that its owner distinguishes, with the numbers of that list.
 enum class TcpState : std::int32_t { kClosed = 0, kConnecting = 6, kConnected = 7 };
 
 // One connection at a time; Connect() may be called again after the connection has ended.
@@ -33,12 +35,12 @@ class TcpSocket {
   virtual ~TcpSocket() = default;
 
   virtual void SetEvents(TcpEvents events) = 0;
-  // Starts connecting to the numeric address `host`; `connected` or `ended` follows. A connection that the
-  // system made from the port to itself counts as refused.
+  // Starts connecting to the numeric address `host`; `connected` or `ended` follows. A connection of a port to itself
+  // counts as refused.
   virtual void Connect(const std::string& host, std::uint16_t port) = 0;
   // Closes at once, without an event; what was sent before still goes out.
   virtual void Close() = 0;
-  // As its owner knows it: it changes with Connect(), Close() and the events.
+  // As reported so far: it changes with Connect(), Close() and the events.
   virtual TcpState State() const = 0;
   // The local port that the next Connect() uses; 0, as in a fresh socket, lets the system choose.
   virtual void SetLocalPort(std::uint16_t port) = 0;
@@ -46,8 +48,8 @@ class TcpSocket {
   virtual std::uint16_t LocalPort() const = 0;
   // Queues all of `bytes`. Ignored when not connected.
   virtual void Send(std::span<const std::uint8_t> bytes) = 0;
-  // Takes at most `limit` bytes of what has arrived; empty when there is nothing more. What is not taken is held
-  // back at the sender once a bounded buffer is full.
+  // Takes at most `limit` bytes of what has arrived; empty when there is nothing more. Once a bounded buffer is full,
+  // the sender has to wait.
   virtual Bytes Receive(std::size_t limit) = 0;
 };
 

@@ -1,4 +1,4 @@
-// ClientWorld: a comm listener client in virtual time whose listener is the test.
+// ClientWorld: a comm listener client in virtual time; the test is its listener.
 #pragma once
 
 #include <gmock/gmock.h>
@@ -21,7 +21,7 @@ struct ClientWorld {
   ClientWorld() {
     client.SetEvents({.CommReply =
                           [this](const Bytes& payload, std::int32_t status) {
-                            EXPECT_LE(payload.capacity(), 2 * kLargestFrame) << "no flood is kept";
+                            EXPECT_LE(payload.capacity(), 2 * kMaxFrame) << "a flood is kept";
                             Note("reply " + std::to_string(status) + " " +
                                  std::string(payload.begin(), payload.end()));
                           },
@@ -40,9 +40,10 @@ struct ClientWorld {
   void Note(std::string event) { events.push_back(std::move(event)); }
   std::vector<std::string> Events() { return std::exchange(events, {}); }
 
+  void Connect() { client.Connect(false, "x", false, true); }
   // Connects, and has the identification acknowledged, which takes the sequence character "0".
   void ConnectIdle() {
-    client.Connect(false, "x", false, true);
+    Connect();
     socket.Accept();
     socket.Deliver("1000000");
     EXPECT_TRUE(client.ReadyToTransmit());
@@ -51,7 +52,7 @@ struct ClientWorld {
     Events();
   }
 
-  // The next connection after a failure, within the time that it takes.
+  // Lets the next attempt after a failure succeed.
   void Reconnected() {
     EXPECT_TRUE(client.Closed());
     EXPECT_EQ(time.RunningTimers(), 1);
@@ -72,7 +73,7 @@ struct ClientWorld {
   std::unique_ptr<Timer> connect_timer_ = time.CreateTimer([this] { client.OnConnectTimer(); });
   std::unique_ptr<Timer> reconnect_timer_ = time.CreateTimer([this] { client.OnReconnectTimer(); });
   std::unique_ptr<Timer> request_timer_ = time.CreateTimer([this] { client.OnRequestTimer(); });
-  CommListenerInterface client;     // lets go of the timers before they go
+  CommListenerInterface client;     // destroyed before the timers
   std::vector<std::string> events;  // since Events() was called last
 };
 

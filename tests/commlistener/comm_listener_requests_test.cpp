@@ -1,11 +1,6 @@
 // What the client's requests carry, and in which order they go out.
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
-
-#include <string>
-#include <vector>
-
 #include "client_fixture.h"
+#include "platform/runtime_error.h"
 
 namespace tendril::test {
 namespace {
@@ -15,7 +10,7 @@ using testing::IsEmpty;
 
 class RequestsTest : public ClientTest {
  protected:
-  // Acknowledges request after request until nothing is sent any more; what was sent, in its order.
+  // Acknowledges request after request until no more is sent; returns what was sent.
   std::vector<Bytes> AcknowledgeAll() {
     std::vector<Bytes> all;
     for (;;) {
@@ -48,18 +43,10 @@ TEST_F(RequestsTest, PendingRequests_GoOutInTheirOrder) {
   EXPECT_FALSE(client.PhysicalLightsControl());
 }
 
-TEST_F(RequestsTest, SequenceCharacter_ComesRoundAgain) {
-  ConnectIdle();
-  for (const char sequence : std::string("1234567890")) {
-    client.SendAllOffOnDisconnect();
-    EXPECT_THAT(AcknowledgeAll(), ElementsAre(BytesOf(std::string("A") + sequence + "00000")));
-  }
-}
-
-TEST_F(RequestsTest, PhysicalLights_AreToldWhenSetAndNotWhenOnlyKept) {
+TEST_F(RequestsTest, PhysicalLights_AreSentWhenSetAndNotWhenOnlyStored) {
   ConnectIdle();
   client.SetPhysicalLightsControl(false);
-  client.SetPhysicalLightsControl(true);  // waits, and goes out with what holds then
+  client.SetPhysicalLightsControl(true);  // waits, and is sent with the value of then
   EXPECT_THAT(AcknowledgeAll(), ElementsAre(Frame("P100001", {0}), Frame("P200001", {1})));
   client.Reconnect(false, "y", false, false);
   socket.Accept();
@@ -85,35 +72,47 @@ TEST_F(RequestsTest, LightingData_IsLaidOutByRecordType) {
                                     4,  3, 2,  0, 9, 8, 4, 0, 6, 0, 1, 2, 4,    3,    0,    0,    0,  0})));
 }
 
-TEST_F(RequestsTest, LightingData_BeyondOneMessageGoesOutBatchByBatch) {
+TEST_F(RequestsTest, LightingData_GoesOutBatchByBatchWithoutTheOldest) {
   ConnectIdle();
   client.RequestCommPortControl(1);
   socket.Take();
-  const Bytes values(30000, 7);
-  for (int record = 0; record < 4; ++record) client.SendDMXIntensities(0, 0, 30000, values);
+  for (int batch = 0; batch <= 200; ++batch) {  // three records fit into a message, the fourth does not
+    const Bytes values(32000, static_cast<std::uint8_t>(batch));
+    for (int record = 0; record < 3; ++record) client.SendDMXIntensities(0, 0, 32000, values);
+  }
   socket.Deliver("1100000");
   const auto sent = AcknowledgeAll();
-  ASSERT_EQ(sent.size(), 2u);
-  EXPECT_EQ(sent[0].size(), 7u + 3 * 30012);
-  EXPECT_EQ(sent[1].size(), 7u + 30012);
-  EXPECT_EQ(std::string(sent[1].begin(), sent[1].begin() + 7), "L330012");
+  ASSERT_EQ(sent.size(), 200u);
+  for (std::size_t i = 0; i < sent.size(); ++i) {
+    ASSERT_EQ(std::string(sent[i].begin(), sent[i].begin() + 7),
+              "L" + std::to_string((i + 2) % 10) + "96036");
+    EXPECT_EQ(sent[i].size(), 7u + 96036u);
+    EXPECT_EQ(sent[i].back(), 0) << "padding";
+    EXPECT_EQ(sent[i][17], i + 1) << "the first value";
+  }
 }
 
-TEST(CommListenerRequests, FaultyArguments_FailWithTheNameOfTheRequest) {
+TEST_F(RequestsTest, FaultyArguments_FailWithTheNameOfTheRequest) {
   // Negative, beyond the values, and beyond a record's length.
   for (const auto& [count, values] : {std::pair(std::int16_t{-1}, Bytes(9)),
                                       {std::int16_t{10}, Bytes(9)},
                                       {std::int16_t{32762}, Bytes(32762)}}) {
     for (const bool dmx : {true, false}) {
-      ClientWorld world;
-      world.ConnectIdle();
-      if (dmx) world.client.SendDMXIntensities(0, 0, count, values);
-      if (!dmx) world.client.SendNyxIntensities(0, 0, 0, count, values);
-      EXPECT_THAT(world.Events(), ElementsAre("error 4 Error in SendDMXIntensities|0|", "state"));
-      world.Reconnected();
-      EXPECT_THAT(world.socket.Take(), IsEmpty());
+      client.Reconnect(false, "x", false, true);
+      socket.Accept();
+      AcknowledgeAll();
+      Events();
+      if (dmx) client.SendDMXIntensities(0, 0, count, values);
+      if (!dmx) client.SendNyxIntensities(0, 0, 0, count, values);
+      EXPECT_THAT(Events(), ElementsAre("error 4 Error in SendDMXIntensities|0|", "state"));
+      EXPECT_THAT(socket.Take(), IsEmpty());
     }
   }
+}
+
+TEST(CommFrame, PayloadBeyondItsLengthField_IsRefused) {
+  EXPECT_THAT([] { BuildFrame('L', '0', Bytes(100000)); },
+              testing::ThrowsMessage<RuntimeError>("Invalid length for length field: 100000"));
 }
 
 }  // namespace

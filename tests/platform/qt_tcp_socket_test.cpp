@@ -41,8 +41,8 @@ TEST(QtTcpSocket, Bytes_PassBothWaysUntilThePeerCloses) {
   Bytes received;
   std::int32_t end = 0;
   QtTcpSocket socket([](const std::string& fault) { ADD_FAILURE() << fault; });
-  socket.SetEvents(
-      {{}, [&] { received = socket.Receive(100); }, [&](std::int32_t number, const auto&) { end = number; }});
+  socket.SetEvents({.data_arrived = [&] { received = socket.Receive(100); },
+                    .ended = [&](std::int32_t number, const auto&) { end = number; }});
   socket.Connect("127.0.0.1", server.serverPort());
   ASSERT_TRUE(
       WaitFor([&] { return socket.State() == TcpState::kConnected && server.hasPendingConnections(); }));

@@ -291,23 +291,6 @@ TEST_F(SerialDeviceTest, DeviceThatGoesWithoutAWord_IsNoticedWithinASecond) {
   EXPECT_THAT(events_, ElementsAre(SerialEvent::kDeviceLost));
 }
 
-TEST(SerialInbox, EventsNotedTogether_AreAllDeliveredDataFirst) {
-  std::string seen;
-  SerialInbox inbox({}, [&] { seen += "close "; });
-  inbox.SetEventHandler([&](SerialEvent event) {
-    seen += event == SerialEvent::kDataReceived ? "data "
-            : event == SerialEvent::kDeviceLost ? "lost "
-                                                : "overflow ";
-    if (event == SerialEvent::kDeviceLost) inbox.Reset();
-  });
-  inbox.SetReceiveThreshold(1);
-  inbox.NoteLoss();
-  inbox.Add(Bytes(kSerialInputBufferBytes + 1, 0));
-  EXPECT_EQ(seen, "") << "never from inside a call";
-  RunFor(20);
-  EXPECT_EQ(seen, "data overflow close lost ");
-}
-
 TEST_F(SerialDeviceTest, PortInUse_IsBusy) {
   const int other = line_.OpenAsAnother();
   ::flock(other, LOCK_EX);

@@ -19,14 +19,12 @@ namespace {
 
 namespace fs = std::filesystem;
 
-constexpr char kSource[] = "SerialHold";
-
 RuntimeError Busy(const fs::path& device) {
-  return {kErrPortAlreadyOpen, device.string() + " is in use by another program.", kSource};
+  return {kErrPortAlreadyOpen, device.string() + " is in use by another program."};
 }
 
 RuntimeError NoSuchDevice(const fs::path& device) {
-  return {kErrInvalidPort, "There is no serial device at " + device.string() + ".", kSource};
+  return {kErrInvalidPort, "There is no serial device at " + device.string() + "."};
 }
 
 DeviceAccess LookUpAccess(const fs::path& device) {
@@ -56,7 +54,7 @@ int OpenDevice(const fs::path& device) {
   switch (errno) {
     case EACCES:
     case EPERM:
-      throw RuntimeError(kErrNotAllowed, ExplainNotAllowed(LookUpAccess(device)), kSource);
+      throw RuntimeError(kErrNotAllowed, ExplainNotAllowed(LookUpAccess(device)));
     case EBUSY:
       throw Busy(device);
     case ENOENT:
@@ -66,9 +64,8 @@ int OpenDevice(const fs::path& device) {
     case EIO:  // the far end of a pseudo-terminal is gone
       throw NoSuchDevice(device);
     default:
-      throw RuntimeError(
-          kErrInvalidPort,
-          device.string() + " cannot be opened: " + std::generic_category().message(errno) + ".", kSource);
+      throw RuntimeError(kErrInvalidPort, device.string() + " cannot be opened: " +
+                                              std::generic_category().message(errno) + ".");
   }
 }
 

@@ -22,8 +22,6 @@
 namespace tendril {
 namespace {
 
-constexpr char kSource[] = "SerialTerminal";
-
 // A device whose speed is off by more than this is not understood: the error adds up over a byte's ten bits.
 constexpr std::int64_t kMaxSpeedErrorPercent = 3;
 
@@ -110,11 +108,10 @@ SerialTerminal::~SerialTerminal() {
 void SerialTerminal::Configure(std::int32_t baud) {
   const auto refuse = [&](const std::string& reason) {
     if (HungUp()) {  // it went just now
-      throw RuntimeError(kErrInvalidPort, "There is no serial device at " + device_.string() + ".", kSource);
+      throw RuntimeError(kErrInvalidPort, "There is no serial device at " + device_.string() + ".");
     }
-    throw RuntimeError(
-        kErrSettingsRefused,
-        device_.string() + " cannot be set to " + std::to_string(baud) + " bit/s: " + reason + ".", kSource);
+    throw RuntimeError(kErrSettingsRefused, device_.string() + " cannot be set to " + std::to_string(baud) +
+                                                " bit/s: " + reason + ".");
   };
   auto before = std::make_unique<Settings>();
   if (!Load(descriptor(), before->values)) refuse(Reason(errno));
@@ -146,8 +143,7 @@ std::size_t SerialTerminal::Write(std::span<const std::uint8_t> bytes) {
   const ssize_t taken = ::write(descriptor(), bytes.data(), bytes.size());
   if (taken >= 0) return static_cast<std::size_t>(taken);
   if (errno == EAGAIN || errno == EINTR) return 0;
-  throw RuntimeError(kErrDeviceIo, device_.string() + " cannot be written to: " + Reason(errno) + ".",
-                     kSource);
+  throw RuntimeError(kErrDeviceIo, device_.string() + " cannot be written to: " + Reason(errno) + ".");
 }
 
 std::size_t SerialTerminal::QueuedOutput() const {
@@ -162,10 +158,8 @@ bool SerialTerminal::SetRts(bool asserted) {
   int line = TIOCM_RTS;
   if (::ioctl(descriptor(), asserted ? TIOCMBIS : TIOCMBIC, &line) == 0) return true;
   if (errno == ENOTTY || errno == EINVAL) return false;
-  throw RuntimeError(kErrDeviceIo,
-                     "RTS of " + device_.string() + " cannot be " + (asserted ? "asserted" : "cleared") +
-                         ": " + Reason(errno) + ".",
-                     kSource);
+  throw RuntimeError(kErrDeviceIo, "RTS of " + device_.string() + " cannot be " +
+                                       (asserted ? "asserted" : "cleared") + ": " + Reason(errno) + ".");
 }
 
 bool SerialTerminal::HungUp() const {

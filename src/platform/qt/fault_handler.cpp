@@ -6,7 +6,7 @@
 
 namespace tendril {
 
-void TellFault(const FaultHandler& on_fault, const std::string& description) noexcept {
+void ReportFault(const FaultHandler& on_fault, const std::string& description) noexcept {
   try {
     if (on_fault) return on_fault(description);
   } catch (...) {
@@ -19,7 +19,7 @@ void CallGuarded(const FaultHandler& on_fault, const std::function<void()>& call
   try {
     call();
   } catch (...) {
-    TellFault(on_fault, DescribeCurrentFault());
+    ReportFault(on_fault, DescribeCurrentFault());
   }
 }
 

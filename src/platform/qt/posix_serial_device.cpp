@@ -11,8 +11,6 @@
 namespace tendril {
 namespace {
 
-constexpr char kSource[] = "SerialDevice";
-
 // A driver that lets a device go without a word is noticed within this time.
 constexpr int kDeadDeviceCheckMs = 1000;
 
@@ -51,10 +49,10 @@ std::string PosixSerialDevice::Describe(std::int32_t number) const {
 }
 
 void PosixSerialDevice::Open(std::int32_t number, std::int32_t baud) {
-  if (port_) throw RuntimeError(kErrPortAlreadyOpen, CommName(number_) + " is open already.", kSource);
+  if (port_) throw RuntimeError(kErrPortAlreadyOpen, CommName(number_) + " is open already.");
   const auto device = FindSerialDevice(number);
   if (!device) {
-    throw RuntimeError(kErrInvalidPort, "There is no serial device for " + CommName(number) + ".", kSource);
+    throw RuntimeError(kErrInvalidPort, "There is no serial device for " + CommName(number) + ".");
   }
   port_ = std::make_unique<Port>(*device, baud);
   number_ = number;
@@ -81,14 +79,14 @@ void PosixSerialDevice::SetReceiveThreshold(std::int32_t bytes) { inbox_.SetRece
 
 void PosixSerialDevice::SetRts(bool asserted) {
   Port& port = OpenPort();
-  if (inbox_.LossNoted()) return;
+  if (inbox_.LossPosted()) return;
   try {
     if (!port.terminal.SetRts(asserted)) {
       TraceRts(CommName(number_) + " has no RTS line; its adapter has to turn the line around by itself.");
     }
   } catch (const RuntimeError& fault) {
     CheckForLoss();
-    if (inbox_.LossNoted()) return;
+    if (inbox_.LossPosted()) return;
     TraceRts(fault.description());
     throw;
   }
@@ -96,12 +94,10 @@ void PosixSerialDevice::SetRts(bool asserted) {
 
 void PosixSerialDevice::Write(std::span<const std::uint8_t> bytes) {
   Port& port = OpenPort();
-  if (inbox_.LossNoted()) return;
+  if (inbox_.LossPosted()) return;
   if (port.output.size() + bytes.size() > kMaxWaitingOutput) {
-    throw RuntimeError(kErrDeviceIo,
-                       CommName(number_) + " takes nothing: " + std::to_string(port.output.size()) +
-                           " bytes wait to be sent.",
-                       kSource);
+    throw RuntimeError(kErrDeviceIo, CommName(number_) + " takes nothing: " +
+                                         std::to_string(port.output.size()) + " bytes wait to be sent.");
   }
   port.output.insert(port.output.end(), bytes.begin(), bytes.end());
   SendWaiting();
@@ -122,16 +118,16 @@ void PosixSerialDevice::ClearInput() {
 
 std::size_t PosixSerialDevice::PendingOutput() const {
   const Port& port = OpenPort();
-  return inbox_.LossNoted() ? 0 : port.output.size() + port.terminal.QueuedOutput();
+  return inbox_.LossPosted() ? 0 : port.output.size() + port.terminal.QueuedOutput();
 }
 
 PosixSerialDevice::Port& PosixSerialDevice::OpenPort() const {
-  if (!port_) throw RuntimeError(kErrPortNotOpen, "No serial port is open.", kSource);
+  if (!port_) throw RuntimeError(kErrPortNotOpen, "No serial port is open.");
   return *port_;
 }
 
 bool PosixSerialDevice::Receive(std::size_t limit) {
-  if (inbox_.LossNoted()) return false;
+  if (inbox_.LossPosted()) return false;
   std::array<std::uint8_t, kPieceBytes> piece;
   const std::size_t got = port_->terminal.Read(std::span(piece).first(std::min(limit, piece.size())));
   if (got == 0) {
@@ -152,14 +148,14 @@ void PosixSerialDevice::SendWaiting() {
     output.clear();
     port_->writable.setEnabled(false);
     CheckForLoss();
-    if (!inbox_.LossNoted()) throw;
+    if (!inbox_.LossPosted()) throw;
   }
   port_->writable.setEnabled(!output.empty());
 }
 
 // A dead device stays readable, but not for long: the delivery of the loss closes it.
 void PosixSerialDevice::CheckForLoss() {
-  if (port_->terminal.HungUp()) inbox_.NoteLoss();
+  if (port_->terminal.HungUp()) inbox_.PostLoss();
 }
 
 void PosixSerialDevice::TraceRts(const std::string& line) {

@@ -59,7 +59,7 @@ void Retire(std::unique_ptr<QTcpSocket> socket) {
 
 }  // namespace
 
-QtTcpSocket::QtTcpSocket(FaultHandler on_fault) : on_fault_(std::move(on_fault)) {}
+QtTcpSocket::QtTcpSocket(FaultHandler on_fault) : mailbox_(std::move(on_fault)) {}
 
 QtTcpSocket::~QtTcpSocket() { Close(); }
 
@@ -71,35 +71,27 @@ void QtTcpSocket::Connect(const std::string& host, std::uint16_t port) {
   QTcpSocket* const socket = socket_.get();
   socket->setProxy(QNetworkProxy::NoProxy);  // the connection never leaves for where a proxy would be
   socket->setReadBufferSize(kReadBufferBytes);
-  QObject::connect(socket, &QTcpSocket::connected, &context_, [this] { OnConnected(); });
-  QObject::connect(socket, &QTcpSocket::readyRead, &context_, [this] {
-    data_noted_ = true;
-    PostDelivery();
-  });
-  // A refusal comes with an error and nothing else, a peer's close with an error while still connected and
-  // a `disconnected` afterwards: whichever is first ends the attempt.
-  QObject::connect(socket, &QTcpSocket::errorOccurred, &context_, [this, socket] {
-    NoteEnd({ErrorNumber(socket->error()), socket->errorString().toStdString()});
-  });
-  QObject::connect(socket, &QTcpSocket::disconnected, &context_, [this] {
-    NoteEnd({kConnectionReset, "The connection was closed"});
-  });
+  QObject::connect(socket, &QTcpSocket::connected, socket, [this] { OnConnected(); });
+  QObject::connect(socket, &QTcpSocket::readyRead, socket, [this] { PostData(); });
+  // A refusal comes with an error and nothing else, a peer's close with an error while still connected and a
+  // `disconnected` afterwards: the first of them ends the attempt.
+  QObject::connect(socket, &QTcpSocket::errorOccurred, socket, [this] { OnError(); });
+  QObject::connect(socket, &QTcpSocket::disconnected, socket,
+                   [this] { PostEnd(kConnectionReset, "The connection was closed"); });
 
   const QHostAddress address(QString::fromStdString(host));
-  if (address.isNull()) return NoteEnd({kHostNotFound, "\"" + host + "\" is no numeric address"});
+  if (address.isNull()) return PostEnd(kHostNotFound, "\"" + host + "\" is no numeric address");
   const bool ipv6 = address.protocol() == QAbstractSocket::IPv6Protocol;
   const QHostAddress any(ipv6 ? QHostAddress::AnyIPv6 : QHostAddress::AnyIPv4);
-  if (local_port_ != 0 && !socket->bind(any, local_port_)) {
-    return NoteEnd({ErrorNumber(socket->error()), socket->errorString().toStdString()});
-  }
+  if (local_port_ != 0 && !socket->bind(any, local_port_)) return OnError();
   socket->connectToHost(address, port);
 }
 
 void QtTcpSocket::Close() {
-  if (socket_) socket_->disconnect(&context_);
+  if (socket_) socket_->disconnect();
   Retire(std::move(socket_));
-  connected_ = connected_noted_ = data_noted_ = false;
-  end_noted_.reset();
+  connected_ = data_posted_ = end_posted_ = false;
+  mailbox_.Clear();
 }
 
 TcpState QtTcpSocket::State() const {
@@ -124,43 +116,35 @@ std::uint16_t QtTcpSocket::LocalPort() const { return connected_ ? socket_->loca
 
 void QtTcpSocket::OnConnected() {
   if (IsConnectedToItself(*socket_)) {
-    NoteEnd({kConnectionRefused, "Connection refused"});
+    PostEnd(kConnectionRefused, "Connection refused");
     return socket_->abort();
   }
-  connected_noted_ = true;
-  PostDelivery();
-}
-
-void QtTcpSocket::NoteEnd(End end) {
-  if (end_noted_) return;
-  end_noted_ = std::move(end);
-  PostDelivery();
-}
-
-void QtTcpSocket::PostDelivery() {
-  if (std::exchange(delivery_posted_, true)) return;
-  QMetaObject::invokeMethod(
-      &context_, [this] { DeliverNext(); }, Qt::QueuedConnection);
-}
-
-void QtTcpSocket::DeliverNext() {
-  delivery_posted_ = false;
-  std::function<void()> event;
-  if (std::exchange(connected_noted_, false)) {
+  mailbox_.Post([this] {
     connected_ = true;
-    event = events_.connected;
-  } else if (std::exchange(data_noted_, false)) {
-    event = events_.data_arrived;
-  } else if (end_noted_) {
-    event = [ended = events_.ended, end = *std::move(end_noted_)] {
-      if (ended) ended(end.number, end.description);
-    };
-    Close();
-  }
-  if (connected_noted_ || data_noted_ || end_noted_) PostDelivery();
+    const auto connected = events_.connected;  // which may destroy this object
+    connected();
+  });
+}
 
-  // The event may close, reconnect or destroy this object: nothing of it is touched any more.
-  if (event) CallGuarded(FaultHandler(on_fault_), event);
+void QtTcpSocket::OnError() { PostEnd(ErrorNumber(socket_->error()), socket_->errorString().toStdString()); }
+
+void QtTcpSocket::PostData() {
+  if (std::exchange(data_posted_, true)) return;
+  mailbox_.Post([this] {
+    data_posted_ = false;
+    const auto data_arrived = events_.data_arrived;
+    data_arrived();
+  });
+}
+
+void QtTcpSocket::PostEnd(std::int32_t number, const std::string& description) {
+  if (std::exchange(end_posted_, true)) return;
+  if (socket_->bytesAvailable() > 0) PostData();
+  mailbox_.Post([this, number, description] {
+    const auto ended = events_.ended;
+    Close();
+    ended(number, description);
+  });
 }
 
 }  // namespace tendril

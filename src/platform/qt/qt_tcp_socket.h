@@ -1,13 +1,11 @@
 // QtTcpSocket: a TCP client connection on QTcpSocket.
 #pragma once
 
-#include <QObject>
 #include <QTcpSocket>
 #include <memory>
-#include <optional>
 #include <string>
 
-#include "platform/qt/fault_handler.h"
+#include "platform/qt/mailbox.h"
 #include "platform/tcp_socket.h"
 
 namespace tendril {
@@ -21,7 +19,7 @@ class QtTcpSocket final : public TcpSocket {
   ~QtTcpSocket() override;
 
   void SetEvents(TcpEvents events) override;
-  // Ends a connection or attempt that there still is, as Close() does.
+  // Closes an earlier connection or attempt first.
   void Connect(const std::string& host, std::uint16_t port) override;
   void Close() override;
   TcpState State() const override;
@@ -31,33 +29,21 @@ class QtTcpSocket final : public TcpSocket {
   Bytes Receive(std::size_t limit) override;
 
  private:
-  // Why an attempt or a connection ended.
-  struct End {
-    std::int32_t number;
-    std::string description;
-  };
-
-  // Notes what the socket says, to be told from the event loop.
   void OnConnected();
-  void NoteEnd(End end);
-  void PostDelivery();
-  // Tells the owner of one thing that was noted, the earliest in the order of events.
-  void DeliverNext();
+  void OnError();
+  void PostData();
+  void PostEnd(std::int32_t number, const std::string& description);
 
   TcpEvents events_;
-  FaultHandler on_fault_;
   std::uint16_t local_port_ = 0;
 
   std::unique_ptr<QTcpSocket> socket_;  // one per attempt; none while closed
-  bool connected_ = false;              // the owner knows of the connection
+  bool connected_ = false;              // `connected` was delivered
 
-  // Noted and not told yet.
-  bool connected_noted_ = false;
-  bool data_noted_ = false;
-  std::optional<End> end_noted_;
-  bool delivery_posted_ = false;
-
-  QObject context_;  // what is connected and posted ends with this object
+  // Posted and not delivered yet.
+  bool data_posted_ = false;
+  bool end_posted_ = false;
+  Mailbox mailbox_;
 };
 
 }  // namespace tendril

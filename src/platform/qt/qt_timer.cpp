@@ -56,7 +56,7 @@ class QtTimer final : public Timer {
     CallGuarded(
         [&](const std::string& description) {
           if (alive) SetEnabled(false);
-          TellFault(tick->on_fault, description);
+          ReportFault(tick->on_fault, description);
         },
         tick->on_tick);
     tick->running = false;

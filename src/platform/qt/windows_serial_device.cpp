@@ -12,8 +12,6 @@
 namespace tendril {
 namespace {
 
-constexpr char kSource[] = "SerialDevice";
-
 // A driver that lets a device go without a word is noticed within this time.
 constexpr int kDeadDeviceCheckMs = 1000;
 
@@ -24,14 +22,13 @@ constexpr std::size_t kMaxWaitingOutput = std::size_t{64} * 1024;
 [[noreturn]] void Explain(const QSerialPort& port, std::int32_t number) {
   const QSerialPort::SerialPortError error = port.error();
   if (error == QSerialPort::DeviceNotFoundError) {
-    throw RuntimeError(kErrInvalidPort, "There is no serial device for " + CommName(number) + ".", kSource);
+    throw RuntimeError(kErrInvalidPort, "There is no serial device for " + CommName(number) + ".");
   }
   if (error == QSerialPort::PermissionError || error == QSerialPort::OpenError) {
-    throw RuntimeError(kErrPortAlreadyOpen, CommName(number) + " is in use by another program.", kSource);
+    throw RuntimeError(kErrPortAlreadyOpen, CommName(number) + " is in use by another program.");
   }
   throw RuntimeError(kErrSettingsRefused,
-                     CommName(number) + " cannot be set up: " + port.errorString().toStdString() + ".",
-                     kSource);
+                     CommName(number) + " cannot be set up: " + port.errorString().toStdString() + ".");
 }
 
 }  // namespace
@@ -60,10 +57,10 @@ std::string WindowsSerialDevice::Describe(std::int32_t number) const {
 }
 
 void WindowsSerialDevice::Open(std::int32_t number, std::int32_t baud) {
-  if (port_) throw RuntimeError(kErrPortAlreadyOpen, CommName(number_) + " is open already.", kSource);
+  if (port_) throw RuntimeError(kErrPortAlreadyOpen, CommName(number_) + " is open already.");
   const auto device = FindSerialDevice(number);
   if (!device) {
-    throw RuntimeError(kErrInvalidPort, "There is no serial device for " + CommName(number) + ".", kSource);
+    throw RuntimeError(kErrInvalidPort, "There is no serial device for " + CommName(number) + ".");
   }
   auto port = std::make_unique<QSerialPort>();
   port->setPortName(QString::fromStdString(device->string()));
@@ -98,27 +95,25 @@ void WindowsSerialDevice::SetReceiveThreshold(std::int32_t bytes) { inbox_.SetRe
 
 void WindowsSerialDevice::SetRts(bool asserted) {
   QSerialPort& port = OpenPort();
-  if (inbox_.LossNoted() || port.setRequestToSend(asserted)) return;
+  if (inbox_.LossPosted() || port.setRequestToSend(asserted)) return;
   CheckForLoss();
-  if (inbox_.LossNoted()) return;
+  if (inbox_.LossPosted()) return;
   if (port.error() == QSerialPort::UnsupportedOperationError) {
     TraceRts(CommName(number_) + " has no RTS line; its adapter has to turn the line around by itself.");
     return;
   }
-  const RuntimeError fault(kErrDeviceIo,
-                           "RTS of " + CommName(number_) + " cannot be " +
-                               (asserted ? "asserted" : "cleared") + ": " + port.errorString().toStdString() +
-                               ".",
-                           kSource);
+  const RuntimeError fault(kErrDeviceIo, "RTS of " + CommName(number_) + " cannot be " +
+                                             (asserted ? "asserted" : "cleared") + ": " +
+                                             port.errorString().toStdString() + ".");
   TraceRts(fault.description());
   throw fault;
 }
 
 void WindowsSerialDevice::Write(std::span<const std::uint8_t> bytes) {
   QSerialPort& port = OpenPort();
-  if (inbox_.LossNoted() || bytes.empty()) return;
+  if (inbox_.LossPosted() || bytes.empty()) return;
   if (static_cast<std::size_t>(port.bytesToWrite()) + bytes.size() > kMaxWaitingOutput) {
-    throw RuntimeError(kErrDeviceIo, CommName(number_) + " takes nothing.", kSource);
+    throw RuntimeError(kErrDeviceIo, CommName(number_) + " takes nothing.");
   }
   port.write(reinterpret_cast<const char*>(bytes.data()), static_cast<qint64>(bytes.size()));
   port.flush();  // otherwise sending starts when the event loop is idle
@@ -126,25 +121,25 @@ void WindowsSerialDevice::Write(std::span<const std::uint8_t> bytes) {
 
 Bytes WindowsSerialDevice::ReadAll() {
   QSerialPort& port = OpenPort();
-  while (!inbox_.LossNoted() && inbox_.Room() > 0 && port.waitForReadyRead(0)) {
+  while (!inbox_.LossPosted() && inbox_.Room() > 0 && port.waitForReadyRead(0)) {
   }
   return inbox_.Take();
 }
 
 void WindowsSerialDevice::ClearInput() {
   QSerialPort& port = OpenPort();
-  if (!inbox_.LossNoted()) port.clear(QSerialPort::Input);
+  if (!inbox_.LossPosted()) port.clear(QSerialPort::Input);
   inbox_.Take();
 }
 
 // A write counts as pending in the port itself until the driver has sent it.
 std::size_t WindowsSerialDevice::PendingOutput() const {
   const QSerialPort& port = OpenPort();
-  return inbox_.LossNoted() ? 0 : static_cast<std::size_t>(port.bytesToWrite());
+  return inbox_.LossPosted() ? 0 : static_cast<std::size_t>(port.bytesToWrite());
 }
 
 QSerialPort& WindowsSerialDevice::OpenPort() const {
-  if (!port_) throw RuntimeError(kErrPortNotOpen, "No serial port is open.", kSource);
+  if (!port_) throw RuntimeError(kErrPortNotOpen, "No serial port is open.");
   return *port_;
 }
 
@@ -155,9 +150,9 @@ void WindowsSerialDevice::TakeArrived() {
 }
 
 void WindowsSerialDevice::CheckForLoss() {
-  if (inbox_.LossNoted() || FindSerialDevice(number_)) return;
+  if (inbox_.LossPosted() || FindSerialDevice(number_)) return;
   dead_device_check_.stop();
-  inbox_.NoteLoss();
+  inbox_.PostLoss();
 }
 
 void WindowsSerialDevice::TraceRts(const std::string& line) {
