@@ -2,14 +2,10 @@
 
 #include <QFormLayout>
 
-#include "ui/controls.h"
-
 namespace tendril {
 namespace {
 
 constexpr std::int32_t kShownMs = 1000;
-// 200 form units to the right and below the label's corner.
-constexpr QPoint kBesideLabel(200 / kFormUnitsPerPixel, 200 / kFormUnitsPerPixel);
 
 struct Row {
   const char* caption;
@@ -25,18 +21,14 @@ constexpr std::array<Row, 6> kRows{{{"Virtual range, low", "lblVirtPulseLeftAct"
 }  // namespace
 
 ActualsFrame::ActualsFrame(TimerFactory& timers, QWidget& window)
-    : QFrame(&window), tmrShowActuals_(timers.CreateTimer([this] {
+    : PopUp("fraActuals", window), tmrShowActuals_(timers.CreateTimer([this] {
         hide();
         tmrShowActuals_->SetEnabled(false);
       })) {
-  setObjectName(QStringLiteral("fraActuals"));
-  setFrameStyle(QFrame::Box | QFrame::Plain);
-  setAutoFillBackground(true);
-  hide();
   auto* form = new QFormLayout(this);
-  form->addRow(BoldLabel(QStringLiteral("Physical Values with Trim")));
+  form->addRow(BoldLabel("Physical Values with Trim"));
   for (std::size_t row = 0; row < kRows.size(); ++row) {
-    values_[row] = Named(new QLabel, QString::fromUtf8(kRows[row].label));
+    values_[row] = Named(new QLabel, kRows[row].label);
     values_[row]->setAlignment(Qt::AlignRight);
     form->addRow(QString::fromUtf8(kRows[row].caption), values_[row]);
   }
@@ -45,10 +37,7 @@ ActualsFrame::ActualsFrame(TimerFactory& timers, QWidget& window)
 }
 
 void ActualsFrame::ShowActuals(const QWidget& label) {
-  adjustSize();
-  move(WithinParent(*this, label.mapTo(parentWidget(), QPoint()) + kBesideLabel));
-  raise();
-  show();
+  OpenBeside(label, 200, 200);
   tmrShowActuals_->SetEnabled(true);
 }
 

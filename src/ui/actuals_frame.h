@@ -1,23 +1,23 @@
 // ActualsFrame: the pop-up with the parameters as absolute pulse widths.
 #pragma once
 
-#include <QFrame>
 #include <QLabel>
 #include <array>
 #include <memory>
 
 #include "config/channel_config.h"
 #include "platform/timer.h"
+#include "ui/controls.h"
 
 namespace tendril {
 
-// The frame `fraActuals`. It floats over the window, hidden until it is asked for, and hides itself after a second.
-class ActualsFrame : public QFrame {
+// The frame `fraActuals`. Hides itself after a second.
+class ActualsFrame : public PopUp {
  public:
   // `window` owns it.
   ActualsFrame(TimerFactory& timers, QWidget& window);
 
-  // Pops up beside `label`, for one timer period.
+  // Opens beside `label`, for one timer period.
   void ShowActuals(const QWidget& label);
   // Sets what it shows.
   void SetValues(const ChannelConfig& values);

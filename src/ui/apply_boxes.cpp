@@ -3,67 +3,56 @@
 #include <QHBoxLayout>
 
 #include "ui/channel_columns.h"
-#include "ui/controls.h"
 
 namespace tendril {
-namespace {
 
-QString Tip(std::size_t index) {
-  const QString who =
-      index < kPortCount ? QStringLiteral("channel %1").arg(index + 1) : QStringLiteral("all channels");
-  return QStringLiteral(
-             "Gives %1 the pulse values of the channel that is edited, and lets it follow its edits.")
-      .arg(who);
-}
-
-}  // namespace
-
-ApplyBoxes::ApplyBoxes(ChannelEditor& editor, const std::function<void()>& clicked, QWidget* parent)
-    : FrameBox(QStringLiteral("Channels to Apply Changes"), parent), editor_(editor) {
-  setObjectName(QStringLiteral("fraApplyChans"));
+ApplyBoxes::ApplyBoxes(ChannelEditor& editor)
+    : FrameBox(QStringLiteral("Channels to Apply Changes")), editor_(editor) {
+  setObjectName("fraApplyChans");
   QGridLayout* grid = MakeChannelColumns(this);
-  for (int index = 0; index <= kAllColumn; ++index) {
-    const bool all = index == kAllColumn;
-    const QString number = QString::number(index + 1);
-    auto* box = Named(new QCheckBox(all ? QStringLiteral("ALL") : QString()),
-                      ArrayName(QStringLiteral("chkUpdate"), index));
-    box->setAccessibleName(all ? QStringLiteral("Apply changes to all channels")
-                               : QStringLiteral("Apply changes to channel %1").arg(number));
-    // "clicked" is the person's own; what the program ticks is none.
-    QObject::connect(box, &QAbstractButton::clicked, this, [this, index, all, clicked](bool ticked) {
-      if (all) {
-        editor_.ClickAllBox(ticked);
-      } else {
-        editor_.ClickApplyBox(static_cast<std::size_t>(index), ticked);
-      }
-      ShowTicks();
-      clicked();
-    });
-    chkUpdate_[static_cast<std::size_t>(index)] = box;
+  for (std::size_t i = 0; i < chkUpdate_.size(); ++i) {
+    const bool all = i == kPortCount;
+    const QString number = QString::number(i + 1);
+    const QString who = all ? QStringLiteral("all channels") : QStringLiteral("channel %1").arg(number);
+    auto* box = chkUpdate_[i] = Named(new QCheckBox, "chkUpdate", i);
+    box->setAccessibleName(QStringLiteral("Apply changes to %1").arg(who));
+    Describe(box,
+             QStringLiteral(
+                 "Gives %1 the pulse values of the channel that is edited, and lets it follow its edits.")
+                 .arg(who));
+    // Only the user's clicks emit "clicked"; ticks that the program sets do not.
+    connect(box, &QAbstractButton::clicked, this, [this, i](bool ticked) { OnClicked(i, ticked); });
     if (all) {
-      grid->addWidget(box, 0, index);
+      box->setText(QStringLiteral("ALL"));
+      grid->addWidget(box, 0, kAllColumn);
       continue;
     }
-    auto* label = Named(new QLabel(number), ArrayName(QStringLiteral("lblUpdateNum"), index));
+    auto* label = lblUpdateNum_[i] = Named(new QLabel(number), "lblUpdateNum", i);
     label->setBuddy(box);
-    lblUpdateNum_[static_cast<std::size_t>(index)] = label;
     auto* pair = new QHBoxLayout;
     pair->addStretch();
     pair->addWidget(box);
     pair->addWidget(label);
     pair->addStretch();
-    grid->addLayout(pair, 0, index);
+    grid->addLayout(pair, 0, static_cast<int>(i));
   }
-  ShowEditing(true);
+}
+
+void ApplyBoxes::OnClicked(std::size_t index, bool ticked) {
+  if (index == kPortCount) {
+    editor_.ClickAllBox(ticked);
+  } else {
+    editor_.ClickApplyBox(index, ticked);
+  }
+  ShowTicks();
+  Q_EMIT Applied();
 }
 
 void ApplyBoxes::ShowEditing(bool editing) {
   const QString why_not =
       editing ? QString() : QStringLiteral("In the summary each change goes to its own channel alone.");
   for (QLabel* label : lblUpdateNum_) label->setEnabled(editing);
-  for (std::size_t index = 0; index < chkUpdate_.size(); ++index) {
-    EnableUnless(why_not, chkUpdate_[index], Tip(index));
-  }
+  for (QCheckBox* box : chkUpdate_) EnableUnless(why_not, box);
 }
 
 void ApplyBoxes::ShowTicks() {

@@ -1,10 +1,10 @@
-// ApplyBoxes: the boxes that say which channels an edit changes.
+// ApplyBoxes: the boxes that choose which channels an edit changes.
 #pragma once
 
 #include <QCheckBox>
 #include <QLabel>
 #include <array>
-#include <functional>
+#include <cstddef>
 
 #include "config/channel_config.h"
 #include "ui/controls.h"
@@ -14,16 +14,24 @@ namespace tendril {
 
 // The frame `fraApplyChans`: a box for each channel, and "ALL".
 class ApplyBoxes : public FrameBox {
+  Q_OBJECT
+
  public:
-  // Clicks go to `editor`, which must outlive the area; `clicked` is called after each.
-  ApplyBoxes(ChannelEditor& editor, const std::function<void()>& clicked, QWidget* parent = nullptr);
+  // Clicks go to `editor`, which must outlive the area.
+  explicit ApplyBoxes(ChannelEditor& editor);
 
   // Shows which boxes are ticked.
   void ShowTicks();
-  // Lets the boxes be clicked while the editor is shown.
+  // Enables the boxes while the editor is shown.
   void ShowEditing(bool editing);
 
+ Q_SIGNALS:
+  // A click has changed the records of the ticked channels.
+  void Applied();
+
  private:
+  void OnClicked(std::size_t index, bool ticked);
+
   ChannelEditor& editor_;
   std::array<QLabel*, kPortCount> lblUpdateNum_{};
   std::array<QCheckBox*, kPortCount + 1> chkUpdate_{};  // the last is "ALL"

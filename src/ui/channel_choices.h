@@ -1,13 +1,11 @@
-// ChannelChoices: presets, output kind, and what happens at power-up and when communication is lost.
+// ChannelChoices: presets, output kind, and the behaviour at power-up and when communication is lost.
 #pragma once
 
-#include <QAbstractButton>
+#include <QBoxLayout>
 #include <QButtonGroup>
-#include <QStringList>
 #include <QWidget>
 #include <cstddef>
 #include <cstdint>
-#include <functional>
 #include <vector>
 
 #include "config/channel_config.h"
@@ -17,40 +15,39 @@
 namespace tendril {
 
 class ChannelChoices : public QWidget {
+  Q_OBJECT
+
  public:
-  // What only the window can carry out.
-  struct Events {
-    std::function<void(std::int16_t kind)> kind_chosen;
-    std::function<void(std::size_t preset)> preset_chosen;
-  };
+  // `editor` and `working`, its records, must outlive the area. The preset that the records start from is selected,
+  // but not applied.
+  ChannelChoices(ChannelEditor& editor, const ChannelTable& working);
 
-  // `editor` and `working`, its records, must outlive the area.
-  ChannelChoices(ChannelEditor& editor, const ChannelTable& working, Events events,
-                 QWidget* parent = nullptr);
-
-  // Start-up: lists the presets and selects the one that the records start from; applies nothing.
-  void ListPresets();
-  // Checks what the edited channel's record says; nothing when it says nothing known, or while none is edited.
+  // Checks what the edited channel's record holds; nothing for unknown values, or while no channel is edited.
   void ShowChoices();
 
+ Q_SIGNALS:
+  // The user chose an output kind, 0 to 2.
+  void KindChosen(std::int16_t kind);
+  // The user chose this row of kPresets.
+  void PresetChosen(std::size_t preset);
+
  private:
-  struct Option {
-    QAbstractButton* button;
+  struct Choice {
+    QString caption;
     QString tip;
   };
 
-  QButtonGroup* MakeOptions(QLayout& column, const QString& title, const QString& array,
-                            const QStringList& captions, const QStringList& tips, bool side_by_side);
+  static std::vector<Choice> Choices(std::initializer_list<const char*> captions, const char* when);
+  QWidget* MakePresets();
+  QButtonGroup* AddOptions(const QString& title, const char* array, const std::vector<Choice>& choices,
+                           QBoxLayout::Direction direction);
 
   ChannelEditor& editor_;
   const ChannelTable& working_;
-  Events events_;
-  CalmComboBox* cmbPresets_;
-  // The buttons' ids are the record's values.
+  // The buttons' ids are the record's values; those of the output kind are one more.
   QButtonGroup* optChannelType_;
   QButtonGroup* optPowerUp_;
   QButtonGroup* optLostComm_;
-  std::vector<Option> options_;  // of all three
 };
 
 }  // namespace tendril

@@ -5,8 +5,6 @@
 #include <QStackedWidget>
 #include <array>
 #include <cstddef>
-#include <functional>
-#include <utility>
 
 #include "config/channel_config.h"
 #include "simulator/servo_simulator.h"
@@ -15,33 +13,34 @@
 namespace tendril {
 
 class ChannelStrip : public FrameBox {
+  Q_OBJECT
+
  public:
   // `working` are the records that are shown; they must outlive the strip.
-  explicit ChannelStrip(const ChannelTable& working, QWidget* parent = nullptr);
+  explicit ChannelStrip(const ChannelTable& working);
 
-  // Start-up: captions and output labels.
-  void SetUpSimulators();
-  // What happens when the person chooses a channel, 0 to 7.
-  void SetSelectHandler(std::function<void(std::size_t channel)> handler) { select_ = std::move(handler); }
   // Marks `channel` as the chosen one.
   void ShowSelected(std::size_t channel);
-  // Shows each channel as what its record's output kind says: a servo, or a button with the kind's name.
+  // Shows each channel according to its record's output kind: as a servo, or as a button with the kind's name.
   void ShowKinds();
   // Shows the record of `channel`, with the arm at `arm`.
   void UpdateSimulator(std::size_t channel, Microseconds arm);
   // Moves the arm alone.
   void MoveArm(std::size_t channel, Microseconds arm);
 
+ Q_SIGNALS:
+  // The user chose a channel, 0 to 7.
+  void ChannelChosen(std::size_t channel);
+
  private:
-  void ShowKind(std::size_t slot);
+  QWidget* MakeCell(std::size_t channel);
+  void ShowKind(std::size_t channel);
 
   const ChannelTable& working_;
-  std::function<void(std::size_t)> select_;
   std::array<Microseconds, kPortCount> arms_{};  // where each arm was drawn last
-  std::array<ServoSimulator*, kPortCount> ServoSimulator2_{};
-  // Each shows either of the two.
+  // Each cell shows its servo, or when the port drives none, its button.
   std::array<QStackedWidget*, kPortCount> cells_{};
-  // What stands in the servo's place when the port drives no servo.
+  std::array<ServoSimulator*, kPortCount> ServoSimulator2_{};
   std::array<QPushButton*, kPortCount> cmdDigitalOutput_{};
 };
 

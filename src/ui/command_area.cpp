@@ -1,85 +1,60 @@
 #include "ui/command_area.h"
 
-#include <QHBoxLayout>
-#include <QPushButton>
 #include <QVBoxLayout>
-#include <utility>
 
 #include "ui/controls.h"
 
 namespace tendril {
-namespace {
 
-constexpr char kUpdateTip[] =
-    "Gives the unit on the line the chosen ID. "
-    "Connect one unit only: every unit that hears it would take the same ID.";
-constexpr char kNoUnitZero[] = "A unit cannot have the ID 00: nothing could ever find it again.";
+CommandArea::CommandArea()
+    : cmdSend_(Named(new QPushButton(QStringLiteral("&SEND(write) Configuration")), "Command3_0")),
+      cmdGet_(Named(new QPushButton(QStringLiteral("&GET(read) Configuration")), "Command3_1")),
+      cmdChangeId_(Named(new QPushButton(QStringLiteral("&UPDATE Unit_ID")), "Command3_2")),
+      cmdShowSummary_(Named(new QPushButton(QStringLiteral("Summar&y")), "cmdShowSummary")) {
+  Describe(cmdSend_, kSendTip);
+  Describe(cmdGet_, kGetTip);
+  Describe(cmdChangeId_,
+           "Gives the unit on the line the chosen ID. "
+           "Connect one unit only: every unit that hears it would take the same ID.");
+  Describe(cmdShowSummary_, "Shows all eight channels in one table.");
+  connect(cmdSend_, &QAbstractButton::clicked, this, &CommandArea::SendPressed);
+  connect(cmdGet_, &QAbstractButton::clicked, this, &CommandArea::GetPressed);
+  connect(cmdChangeId_, &QAbstractButton::clicked, this, &CommandArea::ChangeIdPressed);
+  connect(cmdShowSummary_, &QAbstractButton::clicked, this, &CommandArea::SummaryPressed);
 
-}  // namespace
+  auto* frame = Named(new FrameBox(QStringLiteral("Unit")), "frmUpDownLoad");
+  auto* commands = AddLayout<QHBoxLayout>(frame, {7, 4, 7, 6}, 5);
+  for (QPushButton* button : {cmdSend_, cmdGet_, cmdChangeId_}) commands->addWidget(button);
 
-void CommandButtons::Add(QAbstractButton* button, const QString& tip, std::function<void()> action,
-                         Objection objection) {
-  QObject::connect(button, &QAbstractButton::clicked, button, [action = std::move(action)] { action(); });
-  Describe(button, tip);
-  entries_.push_back({button, tip, std::move(objection)});
-}
+  // Without function.
+  auto* write = Named(new QPushButton(QStringLiteral("Export Config")), "cmdWriteConfig");
+  auto* read = Named(new QPushButton(QStringLiteral("Import Config")), "cmdReadConfig");
+  EnableUnless(QStringLiteral("Exporting a configuration is not available."), write);
+  EnableUnless(QStringLiteral("Importing a configuration is not available."), read);
 
-void CommandButtons::ShowRunning(const RunningCommand& running) {
-  for (const auto& [button, tip, objection] : entries_) {
-    QString why_not = QString::fromStdString(running.What());
-    if (why_not.isEmpty() && objection) why_not = objection();
-    EnableUnless(why_not, button, tip);
-  }
-}
-
-CommandArea::CommandArea(UnitCommands& commands, const UnitTarget& target, CommandButtons& buttons,
-                         std::function<void()> show_summary, QWidget* parent)
-    : QWidget(parent),
-      cmdShowSummary_(Named(new QPushButton(QStringLiteral("Summar&y")), QStringLiteral("cmdShowSummary"))),
-      cmdWriteConfig_(
-          Named(new QPushButton(QStringLiteral("Export Config")), QStringLiteral("cmdWriteConfig"))),
-      cmdReadConfig_(
-          Named(new QPushButton(QStringLiteral("Import Config")), QStringLiteral("cmdReadConfig"))) {
-  auto* send =
-      Named(new QPushButton(QStringLiteral("&SEND(write) Configuration")), QStringLiteral("Command3_0"));
-  auto* get =
-      Named(new QPushButton(QStringLiteral("&GET(read) Configuration")), QStringLiteral("Command3_1"));
-  auto* update = Named(new QPushButton(QStringLiteral("&UPDATE Unit_ID")), QStringLiteral("Command3_2"));
-  buttons.Add(send, kSendTip, [&commands] { commands.send.Start(); });
-  buttons.Add(get, kGetTip, [&commands] { commands.get.Start(); });
-  buttons.Add(
-      update, QString::fromUtf8(kUpdateTip), [&commands] { commands.change_id.Start(); },
-      [&target] { return target.UnitId() == 0 ? QString::fromUtf8(kNoUnitZero) : QString(); });
-
-  auto* frame = Named(new FrameBox(QStringLiteral("Unit")), QStringLiteral("frmUpDownLoad"));
-  auto* commands_row = new QHBoxLayout(frame);
-  commands_row->setContentsMargins(7, 4, 7, 6);
-  commands_row->setSpacing(5);
-  for (QPushButton* button : {send, get, update}) commands_row->addWidget(button);
-
-  QObject::connect(cmdShowSummary_, &QAbstractButton::clicked, this, std::move(show_summary));
-  ShowSummaryButton(true);
-
-  auto* row = new QHBoxLayout(this);
-  row->setContentsMargins(0, 0, 0, 0);
+  auto* row = AddLayout<QHBoxLayout>(this, {});
   row->addWidget(frame);
   row->addStretch();
   row->addWidget(cmdShowSummary_, 0, Qt::AlignVCenter);
   auto* files = new QVBoxLayout;
   files->setSpacing(3);
-  files->addWidget(cmdWriteConfig_);
-  files->addWidget(cmdReadConfig_);
+  files->addWidget(write);
+  files->addWidget(read);
   row->addLayout(files);
+}
+
+void CommandArea::EnableCommands(const QString& running_command, std::uint8_t unit_id) {
+  EnableUnless(running_command, cmdSend_);
+  EnableUnless(running_command, cmdGet_);
+  EnableUnless(running_command.isEmpty() && unit_id == 0
+                   ? QStringLiteral("A unit cannot have the ID 00: nothing could ever find it again.")
+                   : running_command,
+               cmdChangeId_);
 }
 
 void CommandArea::ShowSummaryButton(bool enabled) {
   EnableUnless(enabled ? QString() : QStringLiteral("The summary is shown. \"Simulator\" goes back."),
-               cmdShowSummary_, QStringLiteral("Shows all eight channels in one table."));
-}
-
-void CommandArea::DisableExportAndImport() {
-  Disable(cmdWriteConfig_, QStringLiteral("Exporting a configuration is not available."));
-  Disable(cmdReadConfig_, QStringLiteral("Importing a configuration is not available."));
+               cmdShowSummary_);
 }
 
 }  // namespace tendril

@@ -3,89 +3,59 @@
 #include <QHBoxLayout>
 #include <QLabel>
 #include <QSignalBlocker>
-#include <functional>
-#include <utility>
-
-#include "ui/controls.h"
 
 namespace tendril {
 namespace {
 
 constexpr int kDigits = 16;
-constexpr std::array kUnitIdTips{
-    "First hexadecimal digit of the unit's ID, 0 to F. A unit fresh from the factory has FF.",
-    "Second hexadecimal digit of the unit's ID, 0 to F. A unit fresh from the factory has FF."};
 constexpr int kLongestPortLine = 7;  // "Comm 25"
-constexpr char kPortTip[] = "The serial port that the units are connected to. Choosing it opens it at once.";
-
-// Says when it is about to be opened.
-class PortList final : public CalmComboBox {
- public:
-  explicit PortList(std::function<void()> opening) : opening_(std::move(opening)) {}
-
-  void showPopup() override {
-    opening_();
-    CalmComboBox::showPopup();
-  }
-
- private:
-  std::function<void()> opening_;
-};
 
 }  // namespace
 
-ConnectionArea::ConnectionArea(PortSelection& ports, QWidget* parent)
-    : QWidget(parent),
-      ports_(ports),
-      cmbNYX_(Named(new PortList([this] { RereadCommPorts(); }), QStringLiteral("cmbNYX"))) {
+ConnectionArea::ConnectionArea(PortSelection& ports)
+    : ports_(ports), cmbNYX_(Named(new CalmComboBox, "cmbNYX")) {
   auto* port_label = new QLabel(QStringLiteral("&Comm Port"));
   port_label->setBuddy(cmbNYX_);
   cmbNYX_->setSizeAdjustPolicy(QComboBox::AdjustToContents);
   cmbNYX_->setMinimumContentsLength(kLongestPortLine);
   cmbNYX_->setSizePolicy(QSizePolicy::Fixed, QSizePolicy::Fixed);
   cmbNYX_->setAccessibleName(QStringLiteral("Comm Port"));
+  Describe(cmbNYX_, "The serial port that the units are connected to. Choosing it opens it at once.");
+  connect(cmbNYX_, &CalmComboBox::Opening, this, &ConnectionArea::RereadCommPorts);
+  // The user's own choice, also of the current line; what the program selects does not emit "activated".
+  connect(cmbNYX_, &QComboBox::activated, this,
+          [this](int line) { ports_.Choose(static_cast<std::size_t>(line)); });
 
+  CmbUnitID_ = {MakeDigit(0, "First"), MakeDigit(1, "Second")};
+  CmbUnitID_[1]->setCurrentIndex(1);
   auto* id_label = new QLabel(QStringLiteral("Select Unit &ID"));
+  id_label->setBuddy(CmbUnitID_[0]);
+
   auto* group = new FrameBox(QStringLiteral("Connection"));
-  auto* row = new QHBoxLayout(group);
-  row->setContentsMargins(7, 4, 7, 6);
-  row->setSpacing(5);
+  auto* row = AddLayout<QHBoxLayout>(group, {7, 4, 7, 6}, 5);
   row->addWidget(port_label);
   row->addWidget(cmbNYX_);
   row->addSpacing(6);
   row->addWidget(id_label);
-  for (std::size_t digit = 0; digit < CmbUnitID_.size(); ++digit) {
-    auto* box = Named(new CalmComboBox, ArrayName(QStringLiteral("CmbUnitID"), static_cast<int>(digit)));
-    box->setMaxVisibleItems(kDigits);
-    box->setSizeAdjustPolicy(QComboBox::AdjustToMinimumContentsLengthWithIcon);
-    box->setMinimumContentsLength(1);
-    box->setIconSize({0, 0});  // there are no icons to keep room for
-    box->setSizePolicy(QSizePolicy::Fixed, QSizePolicy::Fixed);
-    box->setAccessibleName(digit == 0 ? QStringLiteral("Unit ID, first digit")
-                                      : QStringLiteral("Unit ID, second digit"));
-    row->addWidget(box);
-    QObject::connect(box, &QComboBox::currentIndexChanged, this, [this] {
-      if (unit_id_changed_) unit_id_changed_();
-    });
-    CmbUnitID_[digit] = box;
-  }
-  id_label->setBuddy(CmbUnitID_[0]);
-
-  auto* layout = new QHBoxLayout(this);
-  layout->setContentsMargins(0, 0, 0, 0);
-  layout->addWidget(group);
-  ShowRunning({});
-
-  // "activated" is the person's own choice, of the same line again too; what the program selects is none.
-  QObject::connect(cmbNYX_, &QComboBox::activated, this,
-                   [this](int entry) { ports_.Choose(static_cast<std::size_t>(entry)); });
+  for (CalmComboBox* digit : CmbUnitID_) row->addWidget(digit);
+  AddLayout<QHBoxLayout>(this, {})->addWidget(group);
 }
 
-void ConnectionArea::FillUnitIds() {
-  for (QComboBox* box : CmbUnitID_) {
-    for (int digit = 0; digit < kDigits; ++digit) box->addItem(QString::number(digit, kDigits).toUpper());
-  }
-  CmbUnitID_[1]->setCurrentIndex(1);
+CalmComboBox* ConnectionArea::MakeDigit(std::size_t index, const char* which) {
+  const QString place = QString::fromUtf8(which);
+  auto* box = Named(new CalmComboBox, "CmbUnitID", index);
+  for (int digit = 0; digit < kDigits; ++digit) box->addItem(QString::number(digit, kDigits).toUpper());
+  box->setMaxVisibleItems(kDigits);
+  box->setSizeAdjustPolicy(QComboBox::AdjustToMinimumContentsLengthWithIcon);
+  box->setMinimumContentsLength(1);
+  box->setIconSize({0, 0});  // keeps no room for icons
+  box->setSizePolicy(QSizePolicy::Fixed, QSizePolicy::Fixed);
+  box->setAccessibleName(QStringLiteral("Unit ID, %1 digit").arg(place.toLower()));
+  Describe(box, QStringLiteral(
+                    "%1 hexadecimal digit of the unit's ID, 0 to F. A unit fresh from the factory has FF.")
+                    .arg(place));
+  connect(box, &QComboBox::currentIndexChanged, this, &ConnectionArea::UnitIdChanged);
+  return box;
 }
 
 void ConnectionArea::ListCommPorts() { ShowPorts(ports_.ListCommPorts(), 0); }
@@ -96,8 +66,8 @@ void ConnectionArea::ShowPorts(const std::vector<std::string>& lines, std::size_
   cmbNYX_->setCurrentIndex(static_cast<int>(selected));
 }
 
-// An adapter that was plugged in since then is found by whoever looks for it. The ports are described now, since
-// asking the system about each takes a moment that the start-up does not have.
+// Finds adapters that were plugged in meanwhile. Describes the ports now, not at start-up: it takes the system a moment
+// for each.
 void ConnectionArea::RereadCommPorts() {
   const QSignalBlocker nothing_is_chosen(cmbNYX_);
   auto selected = static_cast<std::size_t>(cmbNYX_->currentIndex());
@@ -110,12 +80,8 @@ void ConnectionArea::RereadCommPorts() {
   }
 }
 
-void ConnectionArea::ShowRunning(const std::string& what) {
-  const QString why_not = QString::fromStdString(what);
-  EnableUnless(why_not, cmbNYX_, QString::fromUtf8(kPortTip));
-  for (std::size_t digit = 0; digit < CmbUnitID_.size(); ++digit) {
-    EnableUnless(why_not, CmbUnitID_[digit], QString::fromUtf8(kUnitIdTips[digit]));
-  }
+void ConnectionArea::EnableControls(const QString& running_command) {
+  for (CalmComboBox* box : {cmbNYX_, CmbUnitID_[0], CmbUnitID_[1]}) EnableUnless(running_command, box);
 }
 
 bool ConnectionArea::PortChosen() const { return cmbNYX_->currentIndex() > 0; }

@@ -1,47 +1,47 @@
 // ConnectionArea: which comm port, and which unit.
 #pragma once
 
-#include <QComboBox>
+#include <QString>
 #include <QWidget>
 #include <array>
 #include <cstddef>
 #include <cstdint>
-#include <functional>
 #include <string>
-#include <utility>
 #include <vector>
 
+#include "ui/controls.h"
 #include "unitops/port_selection.h"
 #include "unitops/unit_target.h"
 
 namespace tendril {
 
+// Unit 01 is chosen at first.
 class ConnectionArea : public QWidget, public UnitTarget {
+  Q_OBJECT
+
  public:
   // `ports` must outlive the area.
-  explicit ConnectionArea(PortSelection& ports, QWidget* parent = nullptr);
+  explicit ConnectionArea(PortSelection& ports);
 
-  // Start-up: the digits of the unit ID, unit 01 chosen.
-  void FillUnitIds();
   // Fills the list of comm ports and selects "Select", which opens nothing.
   void ListCommPorts();
-  // Port and unit can be chosen only while no command runs. `what`: which one does; empty for none.
-  void ShowRunning(const std::string& what);
-
-  // Who is told when another unit ID is chosen.
-  void SetUnitIdHandler(std::function<void()> handler) { unit_id_changed_ = std::move(handler); }
+  // Enables the controls. `running_command` is what runs; empty when nothing does.
+  void EnableControls(const QString& running_command);
 
   bool PortChosen() const override;
   std::uint8_t UnitId() const override;
 
+ Q_SIGNALS:
+  void UnitIdChanged();
+
  private:
+  CalmComboBox* MakeDigit(std::size_t index, const char* which);
   void ShowPorts(const std::vector<std::string>& lines, std::size_t selected);
   void RereadCommPorts();
 
   PortSelection& ports_;
-  std::function<void()> unit_id_changed_;
-  QComboBox* cmbNYX_;
-  std::array<QComboBox*, 2> CmbUnitID_{};  // the high digit, then the low one
+  CalmComboBox* cmbNYX_;
+  std::array<CalmComboBox*, 2> CmbUnitID_{};  // the high digit, then the low one
 };
 
 }  // namespace tendril

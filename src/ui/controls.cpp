@@ -4,18 +4,20 @@
 #include <QGuiApplication>
 #include <QKeyEvent>
 #include <QPainter>
-#include <QPalette>
 #include <QSignalBlocker>
 #include <QStyleOptionGroupBox>
-#include <QWheelEvent>
 #include <algorithm>
-#include <utility>
 
 #include "config/channel_config.h"
 
 namespace tendril {
 
-void CalmComboBox::wheelEvent(QWheelEvent* event) { event->ignore(); }
+namespace {
+
+constexpr char kDescription[] = "description";  // the property that keeps a control's description
+constexpr int kFormUnitsPerPixel = 15;
+
+}  // namespace
 
 void CalmComboBox::Choose(int line) {
   if (!isEnabled()) return;
@@ -24,14 +26,19 @@ void CalmComboBox::Choose(int line) {
   Q_EMIT activated(line);
 }
 
-PressableText::PressableText(std::function<void()> pressed) : pressed_(std::move(pressed)) {
+void CalmComboBox::showPopup() {
+  Q_EMIT Opening();
+  QComboBox::showPopup();
+}
+
+PressableText::PressableText() {
   setReadOnly(true);
-  // Selected, it would look as if it could be typed over.
+  // A selection would make it look editable.
   connect(this, &QLineEdit::selectionChanged, this, &QLineEdit::deselect);
 }
 
 void PressableText::Press() {
-  if (isEnabled()) pressed_();
+  if (isEnabled()) Q_EMIT Pressed();
 }
 
 void PressableText::mousePressEvent(QMouseEvent* event) {
@@ -57,7 +64,7 @@ CalmSpinBox::CalmSpinBox(QWidget* parent) : QSpinBox(parent) {
   setSingleStep(10);
   setSuffix(QStringLiteral(" µs"));
   ApplyLimits();
-  setFixedWidth(sizeHint().width());  // whatever its limits become, nothing around it moves
+  setFixedWidth(sizeHint().width());  // new limits move nothing around it
 }
 
 void CalmSpinBox::Show(const BoundedValue& value) {
@@ -67,8 +74,8 @@ void CalmSpinBox::Show(const BoundedValue& value) {
   setValue(value.Value());
 }
 
-// New limits would end the arrow's repetition. The release is not seen here when a box has opened meanwhile: only the
-// mouse button itself says that it is over.
+// New limits would stop a held arrow from repeating. The release does not arrive here when a message box has opened
+// meanwhile, so the state of the mouse button decides.
 bool CalmSpinBox::ArrowHeld() const {
   return pressed_ && QGuiApplication::mouseButtons().testFlag(Qt::LeftButton);
 }
@@ -101,39 +108,38 @@ void CalmSpinBox::wheelEvent(QWheelEvent* event) {
 
 void FrameBox::paintEvent(QPaintEvent* /*event*/) {
   QPainter painter(this);
-  // The picture's corners are made for one pixel to a unit.
+  // The pixmap's corners fit one pixel to a unit.
   painter.setRenderHint(QPainter::SmoothPixmapTransform, devicePixelRatioF() != 1);
   QStyleOptionGroupBox option;
   initStyleOption(&option);
   style()->drawComplexControl(QStyle::CC_GroupBox, &option, &painter, this);
 }
 
-QString ArrayName(const QString& array, int index) { return QStringLiteral("%1_%2").arg(array).arg(index); }
-
-void Describe(QWidget* widget, const QString& what_it_does) { widget->setToolTip(what_it_does); }
-
-void Disable(QWidget* widget, const QString& why) {
-  widget->setEnabled(false);
-  Describe(widget, why);
+PopUp::PopUp(const char* name, QWidget& window) : QFrame(&window) {
+  setObjectName(name);
+  setFrameStyle(QFrame::Box | QFrame::Plain);
+  setAutoFillBackground(true);
+  hide();
 }
 
-QLabel* DimLabel(const QString& text) {
-  auto* label = new QLabel(text);
-  label->setForegroundRole(QPalette::PlaceholderText);
-  return label;
+void PopUp::OpenBeside(const QWidget& widget, int right, int below) {
+  adjustSize();
+  const QPoint wanted =
+      widget.mapTo(parentWidget(), QPoint(right / kFormUnitsPerPixel, below / kFormUnitsPerPixel));
+  const QSize room = parentWidget()->size() - size();
+  move(std::max(0, std::min(wanted.x(), room.width())), std::max(0, std::min(wanted.y(), room.height())));
+  raise();
+  show();
 }
 
-QLabel* BoldLabel(const QString& text) {
-  auto* label = new QLabel(text);
-  QFont font = label->font();
-  font.setBold(true);
-  label->setFont(font);
-  return label;
+void Describe(QWidget* widget, QAnyStringView what_it_does) {
+  widget->setProperty(kDescription, what_it_does.toString());
+  widget->setToolTip(what_it_does.toString());
 }
 
-void EnableUnless(const QString& why_not, QWidget* widget, const QString& what_it_does) {
+void EnableUnless(const QString& why_not, QWidget* widget) {
   widget->setEnabled(why_not.isEmpty());
-  Describe(widget, why_not.isEmpty() ? what_it_does : why_not);
+  widget->setToolTip(why_not.isEmpty() ? widget->property(kDescription).toString() : why_not);
 }
 
 void CheckOnly(QButtonGroup& group, int id) {
@@ -141,16 +147,37 @@ void CheckOnly(QButtonGroup& group, int id) {
   group.setExclusive(false);  // an exclusive group does not let go of its last button
   for (QAbstractButton* button : group.buttons()) button->setChecked(button == checked);
   group.setExclusive(true);
-  // The Tab key stops at one of them; arrow keys go on from there.
+  // The Tab key stops at one of them; the arrow keys move on from there.
   const QAbstractButton* stop = checked != nullptr ? checked : group.buttons().constFirst();
   for (QAbstractButton* button : group.buttons()) {
     button->setFocusPolicy(button == stop ? Qt::StrongFocus : Qt::ClickFocus);
   }
 }
 
-QPoint WithinParent(const QWidget& panel, QPoint wanted) {
-  const QSize room = panel.parentWidget()->size() - panel.size();
-  return {std::max(0, std::min(wanted.x(), room.width())), std::max(0, std::min(wanted.y(), room.height()))};
+QLabel* DimLabel(QAnyStringView text) {
+  auto* label = new QLabel(text.toString());
+  label->setForegroundRole(QPalette::PlaceholderText);
+  return label;
+}
+
+QLabel* BoldLabel(QAnyStringView text) {
+  auto* label = new QLabel(text.toString());
+  QFont font = label->font();
+  font.setBold(true);
+  label->setFont(font);
+  return label;
+}
+
+void ScaleType(QWidget* widget, double factor) {
+  QFont font = widget->font();
+  font.setPointSizeF(font.pointSizeF() * factor);
+  widget->setFont(font);
+}
+
+void SetPaletteColour(QWidget* widget, QPalette::ColorRole role, const QColor& colour) {
+  QPalette palette = widget->palette();
+  palette.setColor(role, colour);
+  widget->setPalette(palette);
 }
 
 QString OutputLabel(std::int16_t port_type) {

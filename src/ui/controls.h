@@ -1,41 +1,52 @@
 // Small helpers that the areas of the window share.
 #pragma once
 
+#include <QAnyStringView>
 #include <QButtonGroup>
 #include <QComboBox>
+#include <QFrame>
 #include <QGroupBox>
 #include <QLabel>
 #include <QLineEdit>
-#include <QPoint>
+#include <QMargins>
+#include <QPalette>
 #include <QSpinBox>
 #include <QString>
-#include <QWidget>
+#include <QWheelEvent>
+#include <cstddef>
 #include <cstdint>
-#include <functional>
 
 #include "ui/model/bounded_value.h"
 
 namespace tendril {
 
-// A combo box that a turn of the mouse wheel does not change: the wheel scrolls what lies around it.
+// A combo box that the mouse wheel does not change: the wheel scrolls what lies around it.
 class CalmComboBox : public QComboBox {
+  Q_OBJECT
+
  public:
   using QComboBox::QComboBox;
 
-  // Does what the user's choice of `line` does, of the line that is chosen already too. Nothing while it is disabled.
+  // Does what the user's choice of `line` does, also of the current line. Does nothing while the box is disabled.
   void Choose(int line);
 
+  void showPopup() override;
+
+ Q_SIGNALS:
+  // The list is about to open.
+  void Opening();
+
  protected:
-  void wheelEvent(QWheelEvent* event) override;
+  void wheelEvent(QWheelEvent* event) override { event->ignore(); }
 };
 
-// A spin box in microseconds. The wheel changes it only while it has the focus, and what is typed counts when it
-// is whole: at Enter, or when the focus leaves.
+// A spin box in microseconds. The wheel changes it only while it has the focus. Typed text takes effect when it is
+// complete: at Enter, or when the focus leaves.
 class CalmSpinBox : public QSpinBox {
  public:
   explicit CalmSpinBox(QWidget* parent = nullptr);
 
-  // Shows a value and its limits. Runs no handler.
+  // Shows a value and its limits. Emits no signal.
   void Show(const BoundedValue& value);
 
  protected:
@@ -48,29 +59,30 @@ class CalmSpinBox : public QSpinBox {
   bool ArrowHeld() const;
 
   BoundedValue shown_;
-  bool pressed_ = false;  // the mouse button went down on it; it may have come up on something else
+  bool pressed_ = false;  // a mouse button went down here; the release may have gone to another widget
 };
 
-// A text that cannot be edited, but pressed: with the left mouse button, Enter or the space bar.
+// A read-only text that can be pressed: with the left mouse button, Enter or the space bar.
 class PressableText : public QLineEdit {
- public:
-  // `pressed` is what a press does.
-  explicit PressableText(std::function<void()> pressed);
+  Q_OBJECT
 
-  // Does what a press does. Nothing while it is disabled.
+ public:
+  PressableText();
+
+  // Does what a press does. Does nothing while the text is disabled.
   void Press();
+
+ Q_SIGNALS:
+  void Pressed();
 
  protected:
   void mousePressEvent(QMouseEvent* event) override;
   void mouseDoubleClickEvent(QMouseEvent* event) override { mousePressEvent(event); }
   void keyPressEvent(QKeyEvent* event) override;
-
- private:
-  std::function<void()> pressed_;
 };
 
-// A group box that is painted several times as fast. A style may stretch the picture of a frame over the whole box;
-// Qt's own group box has that done smoothly, by threads that must first be started, and it looks the same.
+// A group box that paints several times as fast. A style may stretch the frame's pixmap over the whole box. Qt's own
+// group box smooths that, in threads that it has to start first; the result looks the same.
 class FrameBox : public QGroupBox {
  public:
   using QGroupBox::QGroupBox;
@@ -79,44 +91,64 @@ class FrameBox : public QGroupBox {
   void paintEvent(QPaintEvent* event) override;
 };
 
+// A frame that floats over the window, hidden until it is opened.
+class PopUp : public QFrame {
+ public:
+  // `window` owns it.
+  PopUp(const char* name, QWidget& window);
+
+ protected:
+  // Shows it this far to the right of and below the top left corner of `widget`, in form units, but within the window.
+  void OpenBeside(const QWidget& widget, int right, int below);
+};
+
 // Gives `widget` its design name, and returns it.
 template <typename Widget>
-Widget* Named(Widget* widget, const QString& name) {
+Widget* Named(Widget* widget, const char* name) {
   widget->setObjectName(name);
   return widget;
 }
 
-// The name of element `index` of a control array.
-QString ArrayName(const QString& array, int index);
+// The same for element `index` of a control array: "chkUpdate_3".
+template <typename Widget>
+Widget* Named(Widget* widget, const char* array, std::size_t index) {
+  widget->setObjectName(QStringLiteral("%1_%2").arg(QString::fromUtf8(array)).arg(index));
+  return widget;
+}
 
-// Sets what the control does, for the mouse (tool tip) and for assistive technology.
-void Describe(QWidget* widget, const QString& what_it_does);
+// Gives `parent` a layout with these margins. A negative spacing is the style's.
+template <typename Layout>
+Layout* AddLayout(QWidget* parent, const QMargins& margins, int spacing = -1) {
+  auto* layout = new Layout(parent);
+  layout->setContentsMargins(margins);
+  layout->setSpacing(spacing);
+  return layout;
+}
 
-// Disables the control; its tool tip says why.
-void Disable(QWidget* widget, const QString& why);
+// Sets what the control does, as its tool tip and for assistive technology.
+void Describe(QWidget* widget, QAnyStringView what_it_does);
 
-// Enables the control and says what it does; with a reason not to, disables it and gives that.
-void EnableUnless(const QString& why_not, QWidget* widget, const QString& what_it_does);
+// Enables the control when `why_not` is empty. Otherwise disables it, and its tool tip gives the reason in the place
+// of the description.
+void EnableUnless(const QString& why_not, QWidget* widget);
 
-// Checks the button of an exclusive group that has this id; none when no button has it. Runs no handler of clicks.
+// Checks the button of an exclusive group that has this id; none when no button has it. Emits no clicked signal.
 void CheckOnly(QButtonGroup& group, int id);
 
-// A label in the theme's less prominent text colour.
-QLabel* DimLabel(const QString& text);
+// Labels in the theme's less prominent text colour, and in bold type.
+QLabel* DimLabel(QAnyStringView text);
+QLabel* BoldLabel(QAnyStringView text = {});
 
-// A label in bold type.
-QLabel* BoldLabel(const QString& text);
+// Multiplies the type size of `widget`.
+void ScaleType(QWidget* widget, double factor);
 
-// The unit of a form's measures is a fifteenth of a pixel.
-inline constexpr int kFormUnitsPerPixel = 15;
+// Sets one colour of the widget's palette.
+void SetPaletteColour(QWidget* widget, QPalette::ColorRole role, const QColor& colour);
 
-// The place next to `wanted` at which `panel` lies wholly within its parent, as far as it fits.
-QPoint WithinParent(const QWidget& panel, QPoint wanted);
-
-// What a port that drives no servo is labelled with, on two lines; empty for a servo and for an unknown kind.
+// The text on two lines for a port that drives no servo; empty for a servo and for an unknown kind.
 QString OutputLabel(std::int16_t port_type);
 
-// Whether the palette in force has light text on a dark ground.
+// Whether the palette has light text on a dark background.
 bool IsDark(const QWidget& widget);
 
 }  // namespace tendril

@@ -19,7 +19,7 @@ namespace {
 constexpr QSize kFirstSize(1280, 800);
 // Where the content does not fit, the window scrolls.
 constexpr QSize kSmallestWindow(480, 360);
-// The table is filled, then seen.
+// The table is filled before it is shown.
 constexpr std::int32_t kSummaryScreenMs = 20;
 
 }  // namespace
@@ -33,6 +33,15 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
       ports_(link, boxes, control_panel),
       connection_(new ConnectionArea(ports_)),
       progress_(new ProgressArea),
+      command_area_(new CommandArea),
+      apply_boxes_(new ApplyBoxes(channel_editor_)),
+      channels_(new ChannelStrip(working_)),
+      servo_(new ChosenServo(channel_editor_, working_)),
+      parameters_(new MotionParameters(channel_editor_)),
+      choices_(new ChannelChoices(channel_editor_, working_)),
+      live_test_area_(new LiveTestArea(*parameters_)),
+      actuals_(new ActualsFrame(timers, *this)),
+      views_(new QStackedWidget),
       commands_(link, timers, boxes, *progress_, *connection_, working_,
                 {.starting =
                      [this] {
@@ -44,60 +53,38 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
                        remarks_.AcceptRecords();
                        OnReplaced();
                      }}),
-      command_area_(new CommandArea(commands_, *connection_, command_buttons_, [this] { ShowSummary(); })),
-      apply_boxes_(new ApplyBoxes(channel_editor_, [this] { OnApplied(); })),
-      channels_(new ChannelStrip(working_)),
-      live_test_area_(new LiveTestArea),
-      editor_(new EditorArea(
-          channel_editor_, working_,
-          {.parameters = {.edited = [this](FollowUp follow_up) { OnEdited(follow_up); },
-                          .values_wanted = [this](const QWidget& label) { ShowActuals(label); }},
-           .choices = {.kind_chosen = [this](std::int16_t kind) { OnKindChosen(kind); },
-                       .preset_chosen = [this](std::size_t preset) { OnPresetChosen(preset); }}},
-          live_test_area_->TestButtons())),
-      views_(new QStackedWidget),
-      simulators_(*channels_, *editor_, channel_editor_),
-      live_test_(link, timers, boxes, commands_.running, *connection_, *editor_, *live_test_area_,
+      simulators_(*channels_, *servo_, channel_editor_),
+      live_test_(link, timers, boxes, commands_.running, *connection_, *servo_, *live_test_area_,
                  simulators_),
       tmrSummaryScreen_(timers.CreateTimer([this] { OnSummaryScreen(); })),
       shutdown_(link, timers, control_panel, [this] { close(); }) {
-  setObjectName(QStringLiteral("frmNewServoConfig"));
+  setObjectName("frmNewServoConfig");
   LayOut();
-  commands_.running.SetObserver([this] { ShowRunning(); });
-  connection_->SetUnitIdHandler([this] { command_buttons_.ShowRunning(commands_.running); });
-  channels_->SetSelectHandler([this](std::size_t channel) { SelectChannel(channel); });
-  live_test_area_->Connect(live_test_);
-  ports_.SetOpeningHandler([this] { live_test_.OnTestButton(LiveTest::kNoButton); });
-  link_.SetPortClosedHandler([this] { live_test_.OnPortClosed(); });
+  Connect();
   StartUp(version);
 }
 
 frmNewServoConfig::~frmNewServoConfig() {
-  hide();  // what is being typed is taken over now, and not when half of the window is gone
+  hide();  // typed text takes effect now, while all parts of the window exist
   commands_.running.SetObserver(nullptr);
   link_.SetPortClosedHandler(nullptr);
 }
 
-// Stacks and scroll areas show a widget as soon as they get it, and with that lay it out. So they get theirs
-// while it is empty, and only when they are in this window themselves: without a parent, what they show would
-// be a window of its own.
+// Stacks and scroll areas show a widget, and lay it out, as soon as they get it. So they get it empty, and only once
+// they are in this window: without a parent, what they show would become a window.
 void frmNewServoConfig::LayOut() {
   setMinimumSize(kSmallestWindow);
-  // A frame and a task bar want room too.
+  // Leaves room for a frame and a task bar.
   resize(kFirstSize.boundedTo(screen()->availableSize() - QSize(8, 40)));
-  auto* whole = new QVBoxLayout(this);
-  whole->setContentsMargins(0, 0, 0, 0);
   auto* scroll = new QScrollArea;
   scroll->setFrameShape(QFrame::NoFrame);
   scroll->setWidgetResizable(true);
   scroll->setFocusPolicy(Qt::NoFocus);
-  whole->addWidget(scroll);
+  AddLayout<QVBoxLayout>(this, {})->addWidget(scroll);
 
   auto* content = new QWidget;
   scroll->setWidget(content);
-  auto* column = new QVBoxLayout(content);
-  column->setContentsMargins(8, 4, 8, 8);
-  column->setSpacing(4);
+  auto* column = AddLayout<QVBoxLayout>(content, {8, 4, 8, 8}, 4);
   auto* top = new QHBoxLayout;
   top->addWidget(connection_);
   top->addWidget(command_area_, 1);
@@ -110,12 +97,42 @@ void frmNewServoConfig::LayOut() {
   auto* simulator_view = new QWidget;
   simulator_view->installEventFilter(this);  // for its first paint
   views_->addWidget(simulator_view);
-  auto* simulator_column = new QVBoxLayout(simulator_view);
-  simulator_column->setContentsMargins(0, 0, 0, 0);
-  simulator_column->setSpacing(4);
+  auto* simulator_column = AddLayout<QVBoxLayout>(simulator_view, {}, 4);
+  auto* editor = new QWidget;
+  auto* editor_row = AddLayout<QHBoxLayout>(editor, {});
+  editor_row->addWidget(servo_, 3);
+  editor_row->addWidget(parameters_, 5);
+  editor_row->addWidget(choices_, 2);
   simulator_column->addWidget(channels_, 1);
-  simulator_column->addWidget(editor_, 3);
+  simulator_column->addWidget(editor, 3);
   simulator_column->addWidget(live_test_area_);
+}
+
+void frmNewServoConfig::Connect() {
+  QObject* const c = &connections_;
+  connect(connection_, &ConnectionArea::UnitIdChanged, c, [this] { EnableControls(); });
+  connect(command_area_, &CommandArea::SendPressed, c, [this] { commands_.send.Start(); });
+  connect(command_area_, &CommandArea::GetPressed, c, [this] { commands_.get.Start(); });
+  connect(command_area_, &CommandArea::ChangeIdPressed, c, [this] { commands_.change_id.Start(); });
+  connect(command_area_, &CommandArea::SummaryPressed, c, [this] { ShowSummary(); });
+  connect(apply_boxes_, &ApplyBoxes::Applied, c, [this] { OnApplied(); });
+  connect(channels_, &ChannelStrip::ChannelChosen, c,
+          [this](std::size_t channel) { SelectChannel(channel); });
+  connect(parameters_, &MotionParameters::Edited, c, [this](FollowUp follow_up) { OnEdited(follow_up); });
+  connect(parameters_, &MotionParameters::LabelPressed, c,
+          [this](const QWidget* label) { actuals_->ShowActuals(*label); });
+  connect(parameters_, &MotionParameters::TestPressed, c,
+          [this](int button) { live_test_.OnTestButton(button); });
+  connect(choices_, &ChannelChoices::KindChosen, c, [this](std::int16_t kind) { OnKindChosen(kind); });
+  connect(choices_, &ChannelChoices::PresetChosen, c, [this](std::size_t preset) { OnPresetChosen(preset); });
+  connect(live_test_area_, &LiveTestArea::SliderMoved, c, [this] { live_test_.OnSlider(); });
+  connect(live_test_area_, &LiveTestArea::SliderSendsChanged, c, [this] {
+    EnableControls();
+    live_test_.OnSliderSends();
+  });
+  commands_.running.SetObserver([this] { ShowRunning(); });
+  link_.SetPortClosedHandler([this] { live_test_.OnPortClosed(); });
+  ports_.SetOpeningHandler([this] { live_test_.OnTestButton(LiveTest::kNoButton); });
 }
 
 void frmNewServoConfig::StartUp(const Version& version) {
@@ -123,16 +140,10 @@ void frmNewServoConfig::StartUp(const Version& version) {
                      .arg(version.major_number)
                      .arg(version.minor_number)
                      .arg(version.revision));
-  command_area_->DisableExportAndImport();
-  editor_->SetUpSimulator();
-  channels_->SetUpSimulators();
-  connection_->FillUnitIds();
-  editor_->ShowEditor();
-  progress_->ShowProgress(false);
-  editor_->ListPresets();
-  for (std::size_t slot = 0; slot < kPortCount; ++slot)
-    SetFromPreset(kPresets[kStartPreset], working_.At(slot));
+  for (std::size_t channel = 0; channel < kPortCount; ++channel)
+    SetFromPreset(kPresets[kStartPreset], working_.At(channel));
   remarks_.AcceptRecords();
+  ShowEditor();
   connection_->ListCommPorts();
   control_panel_.ReadPreferences();
   control_panel_.InitializeCommListenerInterface();
@@ -153,8 +164,10 @@ void frmNewServoConfig::SelectChannel(std::size_t channel) {
 void frmNewServoConfig::ShowEditor() {
   Freeze freeze;
   freeze.SetForm(this);
-  editor_->ShowEditor();
-  if (actuals_ != nullptr) actuals_->SetValues(channel_editor_.WorkingValues());
+  parameters_->ShowValues();
+  choices_->ShowChoices();
+  servo_->ShowChannel();
+  actuals_->SetValues(channel_editor_.WorkingValues());
   ShowRemarks();
 }
 
@@ -163,15 +176,10 @@ void frmNewServoConfig::ShowRemarks() {
   if (SummaryShown()) {
     summary_->ShowRemarks(sentences);
   } else {
-    editor_->ShowRemarks(sentences);
+    parameters_->ShowRemarks(sentences);
   }
 }
 
-void frmNewServoConfig::ShowActuals(const QWidget& label) {
-  if (actuals_ != nullptr) actuals_->ShowActuals(label);
-}
-
-// The person has edited a parameter.
 void frmNewServoConfig::OnEdited(FollowUp follow_up) {
   remarks_.AcceptEdit();
   ShowEditor();
@@ -185,7 +193,6 @@ void frmNewServoConfig::OnEdited(FollowUp follow_up) {
   }
 }
 
-// The person has clicked an apply box.
 void frmNewServoConfig::OnApplied() {
   remarks_.AcceptEdit();
   ShowRemarks();
@@ -212,7 +219,7 @@ void frmNewServoConfig::OnPresetChosen(std::size_t preset) {
   QGuiApplication::restoreOverrideCursor();
 }
 
-// The records were replaced: all that is seen of them is shown anew, and nothing is stored.
+// Shows the records again after they were replaced. Stores nothing.
 void frmNewServoConfig::ShowRecords() {
   channels_->ShowKinds();
   ShowEditor();
@@ -224,11 +231,11 @@ void frmNewServoConfig::OnReplaced() {
   channel_editor_.ReloadChannel();
   ShowRecords();
   if (!SummaryShown()) return;
-  summary_->ShowRecords();
+  summary_->NormaliseAndShowRecords();
   ShowRemarks();
 }
 
-// What is being typed counts from now on: a key can set off what uses it without taking the focus away.
+// Lets typed text take effect. A key can trigger what uses it without taking the focus away.
 void frmNewServoConfig::CommitTyping() {
   if (auto* spin = qobject_cast<QAbstractSpinBox*>(focusWidget())) spin->interpretText();
 }
@@ -236,7 +243,7 @@ void frmNewServoConfig::CommitTyping() {
 void frmNewServoConfig::ShowSummary() {
   CommitTyping();
   live_test_.OnTestButton(LiveTest::kNoButton);
-  MakeUnseenParts();
+  MakeSummary();
   tmrSummaryScreen_->SetInterval(kSummaryScreenMs);
   tmrSummaryScreen_->SetEnabled(true);
 }
@@ -245,8 +252,8 @@ void frmNewServoConfig::OnSummaryScreen() {
   tmrSummaryScreen_->SetEnabled(false);
   focus_before_summary_ = focusWidget();
   actuals_->hide();
-  summary_->ShowRecords();
-  live_test_.OnRecordsReplaced();  // showing the records can have changed them
+  summary_->NormaliseAndShowRecords();
+  live_test_.OnRecordsReplaced();  // the records may have changed
   views_->setCurrentWidget(summary_);
   command_area_->ShowSummaryButton(false);
   apply_boxes_->ShowEditing(false);
@@ -270,16 +277,14 @@ bool frmNewServoConfig::SummaryShown() const {
 
 void frmNewServoConfig::ShowRunning() {
   const RunningCommand& running = commands_.running;
-  // Disabling takes the focus off what was used last, and it would fall on some servo or button, and scroll there. It
-  // rests on the window meanwhile and then goes back, unless the person has moved it since.
+  // Disabling a button moves its focus on to some servo or button, and scrolls there. So the focus rests on the window
+  // while a command runs, and then goes back unless the user has moved it.
   if (running.Active()) {
     focus_before_command_ = focusWidget();
     setFocus();
   }
-  connection_->ShowRunning(running.What());
-  command_buttons_.ShowRunning(running);
+  EnableControls();
   progress_->ShowRunning(running);
-  live_test_area_->ShowRunning(running);
   if (!focus_before_command_) return;
   if (running.Active()) {
     if (focus_before_command_->isEnabled()) focus_before_command_->setFocus();
@@ -289,39 +294,44 @@ void frmNewServoConfig::ShowRunning() {
   }
 }
 
-// The summary has more controls than all the rest, and is not seen at first: the first picture of the window
-// does not wait for it.
+void frmNewServoConfig::EnableControls() {
+  const QString running_command = QString::fromStdString(commands_.running.What());
+  connection_->EnableControls(running_command);
+  command_area_->EnableCommands(running_command, connection_->UnitId());
+  live_test_area_->EnableControls(running_command);
+  if (summary_ != nullptr) summary_->EnableCommands(running_command);
+}
+
+// The summary has more controls than everything else. The window is painted first.
 bool frmNewServoConfig::eventFilter(QObject* object, QEvent* event) {
   if (event->type() == QEvent::Paint) {
     object->removeEventFilter(this);
-    QTimer::singleShot(0, this, [this] { MakeUnseenParts(); });
+    QTimer::singleShot(0, &connections_, [this] { MakeSummary(); });
   }
   return QWidget::eventFilter(object, event);
 }
 
-void frmNewServoConfig::MakeUnseenParts() {
+void frmNewServoConfig::MakeSummary() {
   if (summary_ != nullptr) return;
-  summary_ = new SummaryArea(commands_, command_buttons_, timers_, working_,
-                             {.back = [this] { ShowConfig(); },
-                              .edited =
-                                  [this](std::size_t channel) {
-                                    remarks_.AcceptRecord(channel);
-                                    ShowRemarks();
-                                  }},
-                             views_);
-  summary_->SetRangeCaptions(QStringLiteral("1000--2000"));
+  summary_ = new SummaryArea(timers_, working_, views_);
   views_->addWidget(summary_);
-  actuals_ = new ActualsFrame(timers_, *this);
-  actuals_->SetValues(channel_editor_.WorkingValues());
-  ShowRunning();  // the buttons that came
+  EnableControls();
+  QObject* const c = &connections_;
+  connect(summary_, &SummaryArea::SendPressed, c, [this] { commands_.send.Start(); });
+  connect(summary_, &SummaryArea::GetPressed, c, [this] { commands_.get.Start(); });
+  connect(summary_, &SummaryArea::SimulatorPressed, c, [this] { ShowConfig(); });
+  connect(summary_, &SummaryArea::Edited, c, [this](std::size_t channel) {
+    remarks_.AcceptRecord(channel);
+    ShowRemarks();
+  });
 }
 
 void frmNewServoConfig::closeEvent(QCloseEvent* event) {
-  CommitTyping();  // later it would set off what has been stopped
+  CommitTyping();  // later it would start again what is stopped here
   commands_.Stop();
   live_test_.OnTestButton(LiveTest::kNoButton);
   if (!shutdown_.MayClose()) {
-    setEnabled(false);  // nothing opens the port again while it is given back
+    setEnabled(false);  // nothing can open the port again while it is given back
     event->ignore();
     return;
   }

@@ -1,9 +1,9 @@
 // frmNewServoConfig: the program's window.
 #pragma once
 
+#include <QObject>
 #include <QPointer>
 #include <QStackedWidget>
-#include <QString>
 #include <QWidget>
 #include <cstddef>
 #include <cstdint>
@@ -15,13 +15,15 @@
 #include "serial/hw_serial.h"
 #include "ui/actuals_frame.h"
 #include "ui/apply_boxes.h"
+#include "ui/channel_choices.h"
 #include "ui/channel_strip.h"
+#include "ui/chosen_servo.h"
 #include "ui/command_area.h"
 #include "ui/connection_area.h"
-#include "ui/editor_area.h"
 #include "ui/live_test_area.h"
 #include "ui/model/channel_editor.h"
 #include "ui/model/record_remarks.h"
+#include "ui/motion_parameters.h"
 #include "ui/progress_area.h"
 #include "ui/simulators.h"
 #include "ui/summary_area.h"
@@ -40,11 +42,10 @@ struct Version {
   int revision;
 };
 
-// Lays out the areas, wires them to what the program does, and runs start-up and shutdown. Each area takes
-// care of itself.
+// Lays out the areas, connects them with the program's operations, and runs start-up and shutdown.
 class frmNewServoConfig : public QWidget {
  public:
-  // Everything handed in must outlive the window. `link` and `control_panel` are not to be used by anyone else.
+  // Everything handed in must outlive the window. `link` and `control_panel` must have no other user.
   frmNewServoConfig(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes, ControlPanel& control_panel,
                     const Version& version);
   ~frmNewServoConfig() override;
@@ -58,10 +59,10 @@ class frmNewServoConfig : public QWidget {
 
  private:
   void LayOut();
+  void Connect();
   void StartUp(const Version& version);
   void SelectChannel(std::size_t channel);
   void ShowEditor();
-  void ShowActuals(const QWidget& label);
   void OnEdited(FollowUp follow_up);
   void OnApplied();
   void OnKindChosen(std::int16_t kind);
@@ -70,12 +71,13 @@ class frmNewServoConfig : public QWidget {
   void ShowRemarks();
   void OnReplaced();
   void CommitTyping();
+  void MakeSummary();
   void ShowSummary();
   void OnSummaryScreen();
   void ShowConfig();
   bool SummaryShown() const;
   void ShowRunning();
-  void MakeUnseenParts();
+  void EnableControls();
 
   HwSerial& link_;
   TimerFactory& timers_;
@@ -84,22 +86,22 @@ class frmNewServoConfig : public QWidget {
   ChannelEditor channel_editor_{working_};
   RecordRemarks remarks_{working_, channel_editor_};
   PortSelection ports_;
-  CommandButtons command_buttons_;
 
   // Owned by the window, as its child widgets.
   ConnectionArea* connection_;
   ProgressArea* progress_;
-  UnitCommands commands_;
   CommandArea* command_area_;
   ApplyBoxes* apply_boxes_;
   ChannelStrip* channels_;
+  ChosenServo* servo_;
+  MotionParameters* parameters_;
+  ChannelChoices* choices_;
   LiveTestArea* live_test_area_;
-  EditorArea* editor_;
+  ActualsFrame* actuals_;
   QStackedWidget* views_;
-  // Made after the first paint, or when the summary is asked for before that.
-  SummaryArea* summary_ = nullptr;
-  ActualsFrame* actuals_ = nullptr;
+  SummaryArea* summary_ = nullptr;  // made after the first paint, or when it is first needed
 
+  UnitCommands commands_;
   Simulators simulators_;
   LiveTest live_test_;
   // Where the focus was when the running command began, and where it went when its button was disabled.
@@ -109,6 +111,7 @@ class frmNewServoConfig : public QWidget {
 
   std::unique_ptr<Timer> tmrSummaryScreen_;
   Shutdown shutdown_;
+  QObject connections_;  // the context of all connections: destroyed first, it ends them
 };
 
 }  // namespace tendril

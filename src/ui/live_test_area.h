@@ -3,50 +3,51 @@
 
 #include <QCheckBox>
 #include <QLabel>
-#include <QPushButton>
 #include <QSlider>
 #include <QString>
 #include <array>
 
 #include "ui/controls.h"
+#include "ui/motion_parameters.h"
 #include "unitops/live_test.h"
-#include "unitops/running_command.h"
 
 namespace tendril {
 
-// The slider, its read-outs and its box lie in the area itself. The test buttons stand elsewhere, each beside
-// the parameter that it tests.
+// The slider, its read-outs and its box. The test buttons are part of MotionParameters.
 class LiveTestArea : public FrameBox, public LiveTestView {
+  Q_OBJECT
+
  public:
-  explicit LiveTestArea(QWidget* parent = nullptr);
+  // `tests` has the test buttons, and must outlive the area.
+  explicit LiveTestArea(MotionParameters& tests);
 
-  // The test buttons; whoever lays them out becomes their parent.
-  const std::array<QPushButton*, LiveTest::kTestButtons>& TestButtons() const { return cmdTest_; }
-  // Lets the controls act on `test`, which must outlive them.
-  void Connect(LiveTest& test);
-  // Nothing can be moved while a unit command runs.
-  void ShowRunning(const RunningCommand& running);
+  // Enables slider and test buttons. `running_command` is what runs; empty when nothing does.
+  void EnableControls(const QString& running_command);
 
-  void ShowTestRunning(int button, bool running) override;
-  int SliderValue() const override;
+  void ShowTestRunning(int button, bool running) override { tests_.ShowTestRunning(button, running); }
+  int SliderValue() const override { return HScrollSendServoPosition_->value(); }
   void SetSlider(int value) override;
   void ShowReadOut(const SliderReadOut& read_out) override;
-  bool SliderSends() const override;
-  void ClearSliderSends() override;
+  bool SliderSends() const override { return chkSendSlideCommands_->isChecked(); }
+  void ClearSliderSends() override { chkSendSlideCommands_->setChecked(false); }
+
+ Q_SIGNALS:
+  // The user moved the slider.
+  void SliderMoved();
+  // "Use Slider to Test Intensity Values" was ticked or cleared.
+  void SliderSendsChanged();
 
  protected:
   void changeEvent(QEvent* event) override;
 
  private:
   void ColourWarning();
-  void EnableControls();
 
+  MotionParameters& tests_;
   QLabel* warning_;
   QSlider* HScrollSendServoPosition_;
   QCheckBox* chkSendSlideCommands_;
   std::array<QLabel*, 3> read_outs_{};
-  std::array<QPushButton*, LiveTest::kTestButtons> cmdTest_{};
-  QString running_command_;  // what runs; empty when nothing does
 };
 
 }  // namespace tendril

@@ -1,8 +1,6 @@
 #include "ui/motion_parameters.h"
 
 #include <QEvent>
-#include <QGridLayout>
-#include <utility>
 
 namespace tendril {
 namespace {
@@ -16,7 +14,7 @@ struct Row {
   const char* caption;
   const char* what;  // for the tool tip
 };
-// In the order of Parameter. Row 3 has the heading of those that are measured from the neutral position.
+// In the order of Parameter.
 constexpr std::array<Row, kParameterCount> kRows{
     {{0, "Actual Pulse Range", "spnActPulseRange", "lblActPulseRight",
       "Half the width of the pulse range beyond which the servo is never driven, about 1500 µs"},
@@ -30,21 +28,28 @@ constexpr std::array<Row, kParameterCount> kRows{
       "The longest pulse that intensities can give, relative to the neutral position"},
      {6, "Default Position", "spnDefaultPos", "lblDefaultPos",
       "Where the servo rests, relative to the neutral position"}}};
-constexpr int kHeadingRow = 3;
-constexpr int kLastRow = 7;
+constexpr int kHeadingRow = 3;  // of those that are measured from the neutral position
+constexpr int kRemarksRow = 7;
 
-// Each test stands beside the parameter that it tries; the one of the stops beside both. From top to bottom, as the
-// Tab key goes.
-struct TestPlace {
-  std::size_t test;
+// Each test stands beside the parameter that it tries; that of the stops beside both.
+struct Test {
+  const char* what;
+  const char* tip;
   int row, rows;
-  Parameter after;  // the spin button before it
+  Parameter after;  // the spin button before it in the tab order
 };
-constexpr std::array<TestPlace, LiveTest::kTestButtons> kTestPlaces{{{3, 0, 1, Parameter::kActualRange},
-                                                                     {0, 1, 1, Parameter::kVirtualRange},
-                                                                     {4, 2, 1, Parameter::kNeutralTrim},
-                                                                     {1, 4, 2, Parameter::kRightStop},
-                                                                     {2, 6, 1, Parameter::kDefaultPosition}}};
+constexpr std::array<Test, LiveTest::kTestButtons> kTests{
+    {{"virtual pulse range",
+      "Moves the servo to and fro through its virtual range, until the button is pressed again.", 1, 1,
+      Parameter::kVirtualRange},
+     {"virtual stops",
+      "Moves the servo to and fro between its virtual stops, until the button is pressed again.", 4, 2,
+      Parameter::kRightStop},
+     {"default position", "Moves the servo to its default position.", 6, 1, Parameter::kDefaultPosition},
+     {"actual pulse range",
+      "Moves the servo to and fro through its whole actual range, until the button is pressed again.", 0, 1,
+      Parameter::kActualRange},
+     {"centre", "Moves the servo to the centre, 1500 µs.", 2, 1, Parameter::kNeutralTrim}}};
 
 QString WithSign(int value) { return (value < 1 ? QString() : QStringLiteral("+")) + QString::number(value); }
 
@@ -65,7 +70,7 @@ QString CaptionOf(Parameter parameter, int value) {
   return WithSign(value);
 }
 
-// The pulse widths that the parameter comes to.
+// The pulse widths that result from the parameter.
 QString PhysicalValue(Parameter parameter, const ChannelConfig& values) {
   const auto range = [](const PulsePair& pair) {
     return QStringLiteral("%1 to %2 µs").arg(pair[0]).arg(pair[1]);
@@ -90,58 +95,81 @@ QString PhysicalValue(Parameter parameter, const ChannelConfig& values) {
 
 }  // namespace
 
-MotionParameters::MotionParameters(ChannelEditor& editor, Events events,
-                                   const std::array<QPushButton*, LiveTest::kTestButtons>& test_buttons,
-                                   QWidget* parent)
-    : FrameBox(QStringLiteral("Motion Parameters"), parent),
+MotionParameters::MotionParameters(ChannelEditor& editor)
+    : FrameBox(QStringLiteral("Motion Parameters")),
       editor_(editor),
-      events_(std::move(events)),
-      lblActPulseLeft_(Named(BoldLabel({}), QStringLiteral("lblActPulseLeft"))),
-      remarks_(Named(new RemarksLabel, ArrayName(QStringLiteral("lblRemarks"), 0))) {
-  auto* grid = new QGridLayout(this);
-  grid->setContentsMargins(12, 8, 12, 8);
+      lblActPulseLeft_(Named(BoldLabel(), "lblActPulseLeft")),
+      remarks_(Named(new RemarksLabel, "lblRemarks", 0)) {
+  auto* grid = AddLayout<QGridLayout>(this, {12, 8, 12, 8});
   grid->setHorizontalSpacing(10);
+  AddParameters(*grid);
+  AddTests(*grid);
+  grid->setColumnStretch(kName, 2);
+  grid->setColumnStretch(kRightValue, 1);
+  grid->addWidget(remarks_, kRemarksRow, kName, 1, kTest - kName + 1, Qt::AlignTop);
+  grid->setRowStretch(kRemarksRow, 1);
+}
+
+void MotionParameters::AddParameters(QGridLayout& grid) {
   for (std::size_t i = 0; i < kRows.size(); ++i) {
     const Row& row = kRows[i];
     const auto parameter = static_cast<Parameter>(i);
-    auto* spin = Named(new CalmSpinBox, QString::fromUtf8(row.spin));
+    auto* spin = spins_[i] = Named(new CalmSpinBox, row.spin);
     auto* name = new QLabel(QString::fromUtf8(row.name));
     name->setBuddy(spin);
     spin->setAccessibleName(name->text());
-    spins_[i] = spin;
-    captions_[i] = Named(BoldLabel({}), QString::fromUtf8(row.caption));
-    grid->addWidget(name, row.row, kName);
-    grid->addWidget(captions_[i], row.row, kRightValue);
-    grid->addWidget(spin, row.row, kSpin);
-    QObject::connect(spin, &QSpinBox::valueChanged, this,
-                     [this, parameter](int value) { events_.edited(editor_.Change(parameter, value)); });
+    captions_[i] = Named(BoldLabel(), row.caption);
+    grid.addWidget(name, row.row, kName);
+    grid.addWidget(captions_[i], row.row, kRightValue);
+    grid.addWidget(spin, row.row, kSpin);
+    connect(spin, &QSpinBox::valueChanged, this,
+            [this, parameter](int value) { Q_EMIT Edited(editor_.Change(parameter, value)); });
   }
-  auto* bracket = Named(BoldLabel(QStringLiteral("[ +/-")), QStringLiteral("Label13"));
-  grid->addWidget(lblActPulseLeft_, 0, kLeftValue, Qt::AlignRight | Qt::AlignVCenter);
-  grid->addWidget(bracket, 1, kLeftValue, Qt::AlignRight | Qt::AlignVCenter);
-  grid->addWidget(DimLabel(QStringLiteral("Relative to Neutral")), kHeadingRow, kName, 1, 3, Qt::AlignBottom);
-  for (const TestPlace& place : kTestPlaces) {
-    grid->addWidget(test_buttons[place.test], place.row, kTest, place.rows, 1);
-    setTabOrder(spins_[static_cast<std::size_t>(place.after)], test_buttons[place.test]);
-  }
-  grid->setColumnStretch(kName, 2);
-  grid->setColumnStretch(kRightValue, 1);
-  grid->addWidget(remarks_, kLastRow, kName, 1, kTest - kName + 1, Qt::AlignTop);
-  grid->setRowStretch(kLastRow, 1);
-
-  for (QLabel* label : {bracket, captions_[static_cast<std::size_t>(Parameter::kVirtualRange)],
-                        captions_[static_cast<std::size_t>(Parameter::kLeftStop)],
-                        captions_[static_cast<std::size_t>(Parameter::kRightStop)],
-                        captions_[static_cast<std::size_t>(Parameter::kDefaultPosition)]}) {
-    label->installEventFilter(this);
-    label->setCursor(Qt::PointingHandCursor);
-    label->setToolTip(QStringLiteral("Press to see the physical values with trim."));
+  auto* bracket = Named(BoldLabel("[ +/-"), "Label13");
+  grid.addWidget(lblActPulseLeft_, 0, kLeftValue, Qt::AlignRight | Qt::AlignVCenter);
+  grid.addWidget(bracket, 1, kLeftValue, Qt::AlignRight | Qt::AlignVCenter);
+  grid.addWidget(DimLabel("Relative to Neutral"), kHeadingRow, kName, 1, 3, Qt::AlignBottom);
+  MakePressable(bracket);
+  for (const Parameter parameter :
+       {Parameter::kVirtualRange, Parameter::kLeftStop, Parameter::kRightStop, Parameter::kDefaultPosition}) {
+    MakePressable(captions_[static_cast<std::size_t>(parameter)]);
   }
 }
 
+void MotionParameters::AddTests(QGridLayout& grid) {
+  for (std::size_t i = 0; i < kTests.size(); ++i) {
+    const Test& test = kTests[i];
+    const int button = static_cast<int>(i);
+    cmdTest_[i] = Named(new QPushButton, "cmdTest", i);
+    Describe(cmdTest_[i], test.tip);
+    ShowTestRunning(button, false);
+    grid.addWidget(cmdTest_[i], test.row, kTest, test.rows, 1);
+    setTabOrder(spins_[static_cast<std::size_t>(test.after)], cmdTest_[i]);
+    connect(cmdTest_[i], &QAbstractButton::clicked, this, [this, button] { Q_EMIT TestPressed(button); });
+  }
+}
+
+void MotionParameters::MakePressable(QLabel* label) {
+  label->installEventFilter(this);
+  label->setCursor(Qt::PointingHandCursor);
+  Describe(label, "Press to see the physical values with trim.");
+}
+
 bool MotionParameters::eventFilter(QObject* object, QEvent* event) {
-  if (event->type() == QEvent::MouseButtonPress) events_.values_wanted(*static_cast<QWidget*>(object));
+  if (event->type() == QEvent::MouseButtonPress) Q_EMIT LabelPressed(static_cast<QWidget*>(object));
   return FrameBox::eventFilter(object, event);
+}
+
+void MotionParameters::ShowTestRunning(int button, bool running) {
+  const auto i = static_cast<std::size_t>(button);
+  cmdTest_[i]->setText(running ? QStringLiteral("Stop") : QStringLiteral("Test"));
+  cmdTest_[i]->setAccessibleName(
+      (running ? QStringLiteral("Stop testing the %1") : QStringLiteral("Test the %1"))
+          .arg(QString::fromUtf8(kTests[i].what)));
+}
+
+void MotionParameters::EnableTests(const QString& why_not) {
+  for (QPushButton* test : cmdTest_) EnableUnless(why_not, test);
 }
 
 void MotionParameters::ShowValues() {

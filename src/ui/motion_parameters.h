@@ -1,10 +1,10 @@
 // MotionParameters: the six parameters that spin buttons set, each with its test beside it.
 #pragma once
 
+#include <QGridLayout>
 #include <QLabel>
 #include <QPushButton>
 #include <array>
-#include <functional>
 #include <string>
 #include <vector>
 
@@ -15,32 +15,43 @@
 
 namespace tendril {
 
-// Shows what ChannelEditor holds, and brings it what the person sets.
+// Shows what ChannelEditor holds, and passes it what the user sets.
 class MotionParameters : public FrameBox {
+  Q_OBJECT
+
  public:
-  struct Events {
-    std::function<void(FollowUp)> edited;                     // the records have changed
-    std::function<void(const QWidget& label)> values_wanted;  // a parameter's label was pressed
-  };
+  // `editor` must outlive the area.
+  explicit MotionParameters(ChannelEditor& editor);
 
-  // `editor` must outlive the area. `test_buttons` find their places here.
-  MotionParameters(ChannelEditor& editor, Events events,
-                   const std::array<QPushButton*, LiveTest::kTestButtons>& test_buttons,
-                   QWidget* parent = nullptr);
-
-  // Shows values, limits and captions. Runs no handler.
+  // Shows values, limits and captions. Emits no signal.
   void ShowValues();
-  // Shows what is to be said about the records.
+  // Shows remarks on the records.
   void ShowRemarks(const std::vector<std::string>& sentences) { remarks_->ShowRemarks(sentences); }
+  // Captions test button `button`, 0 to 4: "Stop" while its sweep runs, else "Test".
+  void ShowTestRunning(int button, bool running);
+  // Enables the test buttons unless there is a reason not to.
+  void EnableTests(const QString& why_not);
+
+ Q_SIGNALS:
+  // The user has changed the records.
+  void Edited(FollowUp follow_up);
+  // The user pressed a parameter's label.
+  void LabelPressed(const QWidget* label);
+  // The user pressed a test button, 0 to 4.
+  void TestPressed(int button);
 
  protected:
   bool eventFilter(QObject* object, QEvent* event) override;
 
  private:
+  void AddParameters(QGridLayout& grid);
+  void AddTests(QGridLayout& grid);
+  void MakePressable(QLabel* label);
+
   ChannelEditor& editor_;
-  Events events_;
   std::array<CalmSpinBox*, kParameterCount> spins_{};
   std::array<QLabel*, kParameterCount> captions_{};
+  std::array<QPushButton*, LiveTest::kTestButtons> cmdTest_{};
   QLabel* lblActPulseLeft_;
   RemarksLabel* remarks_;
 };

@@ -2,48 +2,40 @@
 
 #include <QGridLayout>
 #include <QKeyEvent>
-#include <utility>
 
 namespace tendril {
 namespace {
 
 constexpr std::int32_t kOpenMs = 3500;
-// 200 and 300 form units to the right and below the text's corner.
-constexpr QPoint kBesideText(200 / kFormUnitsPerPixel, 300 / kFormUnitsPerPixel);
 
 }  // namespace
 
-NumberEntry::NumberEntry(SummaryEditor& editor, TimerFactory& timers,
-                         const std::function<void(std::size_t channel)>& changed, QWidget& window)
-    : QFrame(&window),
+NumberEntry::NumberEntry(SummaryEditor& editor, TimerFactory& timers, QWidget& window)
+    : PopUp("fraNumberEntry", window),
       editor_(editor),
       tmrAdjustDual_(timers.CreateTimer([this] { OnAdjustDual(); })),
-      lblDisplay_(Named(BoldLabel({}), QStringLiteral("lblDisplay"))) {
-  setObjectName(QStringLiteral("fraNumberEntry"));
-  setFrameStyle(QFrame::Box | QFrame::Plain);
-  setAutoFillBackground(true);
-  hide();
+      lblDisplay_(Named(BoldLabel(), "lblDisplay")) {
   tmrAdjustDual_->SetInterval(kOpenMs);
   auto* grid = new QGridLayout(this);
   grid->addWidget(lblDisplay_, 0, 0, 1, 2);
-  for (int index = 0; index < 2; ++index) {
-    const auto i = static_cast<std::size_t>(index);
-    spnSumValue_[i] = Named(new CalmSpinBox, ArrayName(QStringLiteral("spnSumValue"), index));
-    spnSumValue_[i]->setAccessibleName(index == 0 ? QStringLiteral("New value")
-                                                  : QStringLiteral("New right stop"));
-    Describe(spnSumValue_[i], QStringLiteral("The new value, in µs."));
-    lblSumValue_[i] = Named(new QLabel, ArrayName(QStringLiteral("lblSumValue"), index));
-    lblSumValue_[i]->setAlignment(Qt::AlignCenter);
-    grid->addWidget(spnSumValue_[i], 1, index);
-    grid->addWidget(lblSumValue_[i], 2, index);
-    QObject::connect(spnSumValue_[i], &QSpinBox::valueChanged, this, [this, i, changed](int value) {
-      if (!editor_.OpenEntry()) return;
-      tmrAdjustDual_->SetEnabled(true);
-      editor_.ChangeEntry(i, value);
-      ShowEntry();
-      changed(editor_.OpenEntry()->channel);
-    });
+  for (std::size_t i = 0; i < spnSumValue_.size(); ++i) {
+    auto* spin = spnSumValue_[i] = Named(new CalmSpinBox, "spnSumValue", i);
+    spin->setAccessibleName(i == 0 ? QStringLiteral("New value") : QStringLiteral("New right stop"));
+    Describe(spin, "The new value, in µs.");
+    auto* reading = lblSumValue_[i] = Named(new QLabel, "lblSumValue", i);
+    reading->setAlignment(Qt::AlignCenter);
+    grid->addWidget(spin, 1, static_cast<int>(i));
+    grid->addWidget(reading, 2, static_cast<int>(i));
+    connect(spin, &QSpinBox::valueChanged, this, [this, i](int value) { OnSpin(i, value); });
   }
+}
+
+void NumberEntry::OnSpin(std::size_t index, int value) {
+  if (!editor_.OpenEntry()) return;
+  tmrAdjustDual_->SetEnabled(true);
+  editor_.ChangeEntry(index, value);
+  ShowEntry();
+  Q_EMIT Changed(editor_.OpenEntry()->channel);
 }
 
 void NumberEntry::OpenNumberEntry(std::size_t channel, SummaryField field, QWidget& text) {
@@ -51,11 +43,8 @@ void NumberEntry::OpenNumberEntry(std::size_t channel, SummaryField field, QWidg
   text_ = &text;
   editor_.OpenNumberEntry(channel, field);
   ShowEntry();
-  adjustSize();
-  move(WithinParent(*this, text.mapTo(parentWidget(), QPoint()) + kBesideText));
-  raise();
-  show();
-  // The Tab key goes on from here as it would from the text.
+  OpenBeside(text, 200, 300);
+  // The Tab key moves on from here as it would from the text.
   setTabOrder(&text, spnSumValue_[0]);
   setTabOrder(spnSumValue_[0], spnSumValue_[1]);
   spnSumValue_[0]->setFocus();
@@ -68,11 +57,10 @@ void NumberEntry::ShowEntry() {
   const bool two = editor_.ShownSpins() > 1;
   for (std::size_t i = 0; i < spnSumValue_.size(); ++i) {
     CalmSpinBox& spin = *spnSumValue_[i];
+    const QString side = !two ? QString() : i == 0 ? QStringLiteral(", left") : QStringLiteral(", right");
     spin.Show(editor_.Spin(i));
     spin.setVisible(i == 0 || two);
-    spin.setAccessibleName(!two     ? lblDisplay_->text()
-                           : i == 0 ? lblDisplay_->text() + QStringLiteral(", left")
-                                    : lblDisplay_->text() + QStringLiteral(", right"));
+    spin.setAccessibleName(lblDisplay_->text() + side);
     Describe(
         &spin,
         QStringLiteral("From %1 to %2 µs. Escape closes the entry.").arg(spin.minimum()).arg(spin.maximum()));
@@ -82,7 +70,7 @@ void NumberEntry::ShowEntry() {
 
 void NumberEntry::OnAdjustDual() {
   tmrAdjustDual_->SetEnabled(false);
-  for (CalmSpinBox* spin : spnSumValue_) spin->interpretText();  // what is being typed is a change, too
+  for (CalmSpinBox* spin : spnSumValue_) spin->interpretText();  // typed text is a change, too
   if (!tmrAdjustDual_->Enabled()) Close();
 }
 

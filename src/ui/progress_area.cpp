@@ -2,11 +2,7 @@
 
 #include <QAccessible>
 #include <QEvent>
-#include <QFrame>
 #include <QVBoxLayout>
-#include <algorithm>
-
-#include "ui/controls.h"
 
 namespace tendril {
 namespace {
@@ -27,26 +23,24 @@ QColor Shade(ProgressColour colour, bool dark) {
 
 }  // namespace
 
-ProgressArea::ProgressArea(QWidget* parent)
-    // The title stands until there is more to say, and keeps room for that.
-    : FrameBox(QStringLiteral("Progress"), parent),
-      pctProgress_(Named(new QWidget(this), QStringLiteral("pctProgress"))),
-      ShapeProgress_(Named(new QWidget(pctProgress_), QStringLiteral("ShapeProgress"))),
-      lblProgress_(Named(BoldLabel({}), QStringLiteral("lblProgress"))) {
-  setObjectName(QStringLiteral("frmProgress"));
+ProgressArea::ProgressArea()
+    // The title keeps room for those of the commands.
+    : FrameBox(QStringLiteral("Progress")),
+      pctProgress_(Named(new QWidget(this), "pctProgress")),
+      ShapeProgress_(Named(new QWidget(pctProgress_), "ShapeProgress")),
+      lblProgress_(Named(BoldLabel(), "lblProgress")) {
+  setObjectName("frmProgress");
   pctProgress_->setFixedHeight(kBarHeight);
   pctProgress_->setAutoFillBackground(true);
   pctProgress_->setBackgroundRole(QPalette::Base);
   pctProgress_->setAccessibleName(QStringLiteral("Command progress"));
   ShapeProgress_->setAutoFillBackground(true);
-  ShapeProgress_->setBackgroundRole(QPalette::Window);  // not the trough's, which it would inherit
+  ShapeProgress_->setBackgroundRole(QPalette::Window);  // otherwise inherited from the trough
   lblProgress_->setAlignment(Qt::AlignCenter);
 
-  auto* layout = new QVBoxLayout(this);
-  layout->setContentsMargins(9, 0, 9, 3);
-  layout->setSpacing(2);
-  layout->addWidget(lblProgress_);
-  layout->addWidget(pctProgress_);
+  auto* column = AddLayout<QVBoxLayout>(this, {9, 0, 9, 3}, 2);
+  column->addWidget(lblProgress_);
+  column->addWidget(pctProgress_);
   ApplyColour();
 }
 
@@ -86,12 +80,8 @@ void ProgressArea::changeEvent(QEvent* event) {
 
 void ProgressArea::ApplyColour() {
   const QColor colour = Shade(colour_, IsDark(*this));
-  QPalette bar = ShapeProgress_->palette();
-  bar.setColor(QPalette::Window, colour);
-  ShapeProgress_->setPalette(bar);
-  QPalette label = lblProgress_->palette();
-  label.setColor(QPalette::WindowText, colour);
-  lblProgress_->setPalette(label);
+  SetPaletteColour(ShapeProgress_, QPalette::Window, colour);
+  SetPaletteColour(lblProgress_, QPalette::WindowText, colour);
 }
 
 }  // namespace tendril

@@ -14,7 +14,7 @@ namespace tendril {
 // around them moves when one gives way to the other.
 class ProgressArea : public FrameBox, public CommandProgressView {
  public:
-  explicit ProgressArea(QWidget* parent = nullptr);
+  ProgressArea();
 
   // Puts `other` and this area into `place`. `other` is shown while this is not, and first.
   void SharePlace(QStackedLayout& place, QWidget* other);

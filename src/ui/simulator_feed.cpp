@@ -11,17 +11,15 @@ void SetRanges(ServoSimulator& simulator, const ChannelConfig& record) {
 
 }  // namespace
 
-void FeedSimulator(ServoSimulator& simulator, const ChannelConfig& record, std::int32_t size,
-                   Microseconds arm) {
-  // What is set is measured from the neutral position that the servo had before: with another one, only the second
-  // time shows the record as it will look from then on.
+void FeedSimulator(ServoSimulator& simulator, const ChannelConfig& record, Microseconds arm) {
+  // The servo measures from its neutral position so far. With a new one, only the second pass shows the record as it
+  // will look from then on.
   const int times = simulator.dial().neutral_pulse() == record.NeutralPosition ? 1 : 2;
   for (int time = 0; time < times; ++time) {
     SetRanges(simulator, record);
     simulator.SetNeutralPositionUS(record.NeutralPosition);  // before the default, which is measured from it
     simulator.SetDefaultPositionUS(record.DefaultPosition);
   }
-  simulator.DisplaySize(size);
   simulator.SetMovingArmPositionUS(arm);
   simulator.DrawServo();
 }

@@ -1,4 +1,4 @@
-// How a record is put into a simulator.
+// How a simulator gets a record.
 #pragma once
 
 #include "config/channel_config.h"
@@ -6,16 +6,15 @@
 
 namespace tendril {
 
-// What ServoSimulator::DisplaySize takes.
+// Arguments of ServoSimulator::DisplaySize.
 inline constexpr std::int32_t kSmallSimulator = 2;
 inline constexpr std::int32_t kLargeSimulator = 0;
 
 // Shows `record` with the arm at `arm`.
-void FeedSimulator(ServoSimulator& simulator, const ChannelConfig& record, std::int32_t size,
-                   Microseconds arm);
+void FeedSimulator(ServoSimulator& simulator, const ChannelConfig& record, Microseconds arm);
 
-// Shows it again after a resize, which lost the ranges and the arm. The neutral position stays: setting it
-// once more would move its marker.
+// Shows it again after a resize, which lost the ranges and the arm. Leaves the neutral position: setting it again would
+// move its marker.
 void RefeedResizedSimulator(ServoSimulator& simulator, const ChannelConfig& record, Microseconds arm);
 
 }  // namespace tendril

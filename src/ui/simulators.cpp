@@ -2,24 +2,21 @@
 
 namespace tendril {
 
-Simulators::Simulators(ChannelStrip& channels, EditorArea& editor, const ChannelEditor& ticks)
-    : channels_(channels), editor_(editor), ticks_(ticks) {}
-
 void Simulators::UpdateAll(Microseconds arm) {
-  for (std::size_t slot = 0; slot < kPortCount; ++slot) channels_.UpdateSimulator(slot, arm);
-  editor_.UpdateSimulator(arm);
+  for (std::size_t channel = 0; channel < kPortCount; ++channel) channels_.UpdateSimulator(channel, arm);
+  chosen_.UpdateSimulator(arm);
 }
 
 void Simulators::UpdateSimulators(Microseconds arm) {
-  for (std::size_t slot = 0; slot < kPortCount; ++slot) {
-    if (ticks_.Ticked(slot)) channels_.UpdateSimulator(slot, arm);
+  for (std::size_t channel = 0; channel < kPortCount; ++channel) {
+    if (ticks_.Ticked(channel)) channels_.UpdateSimulator(channel, arm);
   }
-  editor_.UpdateSimulator(arm);
+  chosen_.UpdateSimulator(arm);
 }
 
 void Simulators::MoveArm(Microseconds position) {
-  if (const auto channel = editor_.Channel()) channels_.MoveArm(*channel, position);
-  editor_.MoveArm(position);
+  if (const auto channel = chosen_.Channel()) channels_.MoveArm(*channel, position);
+  chosen_.MoveArm(position);
 }
 
 }  // namespace tendril

@@ -1,15 +1,12 @@
 #include "ui/summary_area.h"
 
 #include <QFrame>
-#include <QHBoxLayout>
 #include <QKeyEvent>
 #include <QPainter>
-#include <QPushButton>
 #include <QRadioButton>
 #include <QVBoxLayout>
-#include <utility>
 
-#include "ui/controls.h"
+#include "ui/command_area.h"
 
 namespace tendril {
 namespace {
@@ -30,22 +27,22 @@ constexpr int kHeaderLines = 2;
 constexpr int kTrailerLine = kHeaderLines + static_cast<int>(kPortCount);
 constexpr int kTallestTable = 500;
 
-// Captions are broken into lines, so that the columns can be narrow.
+// The captions' line breaks keep the columns narrow.
 struct Value {
   const char* caption;
-  const char* text;
+  const char* name;
   SummaryField field;
+  const char* first_text;
 };
-constexpr std::size_t kRangeValues = 3;  // the first ones show two pulse widths
 constexpr std::array<Value, 5> kValues{
-    {{"Actual\nRange", "txtSumActualRange", SummaryField::kActualRange},
-     {"Virtual\nRange", "txtSumVirtualRange", SummaryField::kVirtualRange},
-     {"Virtual\nStops", "txtSumStopRange", SummaryField::kStops},
-     {"Neutral\nPosition", "txtSumNeutralPosition", SummaryField::kNeutralTrim},
-     {"Default\nPosition", "txtSumDefaultPosition", SummaryField::kDefaultPosition}}};
+    {{"Actual\nRange", "txtSumActualRange", SummaryField::kActualRange, "1000--2000"},
+     {"Virtual\nRange", "txtSumVirtualRange", SummaryField::kVirtualRange, "1000--2000"},
+     {"Virtual\nStops", "txtSumStopRange", SummaryField::kStops, "1000--2000"},
+     {"Neutral\nPosition", "txtSumNeutralPosition", SummaryField::kNeutralTrim, ""},
+     {"Default\nPosition", "txtSumDefaultPosition", SummaryField::kDefaultPosition, ""}}};
 struct Option {
   const char* caption;
-  const char* button;
+  const char* name;
 };
 constexpr std::array<Option, 7> kOptions{{{"Move to\nDefault\nPosition", "optSumPUDefault"},
                                           {"Move to\nNeutral\nPosition", "optSumPUNeutral"},
@@ -59,7 +56,7 @@ QString OnOneLine(const char* caption) {
   return QString::fromUtf8(caption).replace(QLatin1Char('\n'), QLatin1Char(' '));
 }
 
-// What lies in the columns does not make them wider.
+// Fixed columns, whatever they contain.
 void SetUpColumns(QGridLayout& table) {
   table.setContentsMargins(0, 0, 0, 0);
   table.setHorizontalSpacing(4);
@@ -72,7 +69,7 @@ void SetUpColumns(QGridLayout& table) {
   }
 }
 
-// A thin outline. It keeps clear of the edge, which is cut where a pixel is no whole number of device pixels.
+// A thin outline. Keeps away from the edge, which is cut off where a pixel is not a whole number of device pixels.
 class Outline : public QFrame {
  protected:
   void paintEvent(QPaintEvent* /*event*/) override {
@@ -82,18 +79,16 @@ class Outline : public QFrame {
   }
 };
 
-// The frame of one or more lines, behind what stands in them.
-QFrame* AddFrame(QGridLayout& table, QFrame* frame, const QString& name, int line, int lines) {
-  frame->setObjectName(name);
+// Adds the frame of one or more lines, behind their controls.
+void AddFrame(QGridLayout& table, QFrame* frame, int line, int lines) {
   table.addWidget(frame, line, 0, lines, kLastColumn + 1);
-  return frame;
 }
 
 void LeaveWidthToColumn(QWidget* widget) {
   widget->setSizePolicy(QSizePolicy::Ignored, widget->sizePolicy().verticalPolicy());
 }
 
-// Hidden, it leaves its place empty.
+// Keeps the widget's place while the widget is hidden.
 void KeepPlace(QWidget* widget) {
   QSizePolicy policy = widget->sizePolicy();
   policy.setRetainSizeWhenHidden(true);
@@ -101,7 +96,7 @@ void KeepPlace(QWidget* widget) {
 }
 
 QLabel* MakeCaption(const char* text) {
-  auto* caption = BoldLabel(QString::fromUtf8(text));
+  auto* caption = BoldLabel(text);
   caption->setAlignment(Qt::AlignHCenter | Qt::AlignBottom);
   LeaveWidthToColumn(caption);
   return caption;
@@ -109,47 +104,44 @@ QLabel* MakeCaption(const char* text) {
 
 }  // namespace
 
-SummaryArea::SummaryArea(UnitCommands& commands, CommandButtons& buttons, TimerFactory& timers,
-                         ChannelTable& working, Events events, QWidget* parent)
-    : QWidget(parent), working_(working), editor_(working), events_(std::move(events)) {
-  auto* column = new QVBoxLayout(this);
-  column->setContentsMargins(0, 0, 0, 0);
+SummaryArea::SummaryArea(TimerFactory& timers, ChannelTable& working, QWidget* parent)
+    : QWidget(parent), working_(working), editor_(working) {
+  auto* column = AddLayout<QVBoxLayout>(this, {});
   auto* table_area = new QWidget;
   table_area->setMaximumHeight(kTallestTable);
   column->addWidget(table_area, 1);
   auto& table = *new QGridLayout(table_area);
   SetUpColumns(table);
   AddHeader(table);
-  for (int channel = 0; channel < static_cast<int>(kPortCount); ++channel) AddRow(table, channel);
+  for (std::size_t channel = 0; channel < kPortCount; ++channel) AddRow(table, channel);
   AddTrailer(table);
-  column->addLayout(MakeButtons(commands, buttons));
+  column->addLayout(MakeButtons());
   column->addStretch();
-  entry_ = new NumberEntry(
-      editor_, timers,
-      [this](std::size_t channel) {
-        ShowTexts(channel);
-        events_.edited(channel);
-      },
-      *window());
+  entry_ = new NumberEntry(editor_, timers, *window());
+  connect(entry_, &NumberEntry::Changed, this, [this](std::size_t channel) {
+    ShowTexts(channel);
+    Q_EMIT Edited(channel);
+  });
 }
 
-QLayout* SummaryArea::MakeButtons(UnitCommands& commands, CommandButtons& buttons) {
-  // The same actions as those of the unit commands above.
-  auto* send = Named(new QPushButton(QStringLiteral("Send to Tendril")), QStringLiteral("Command3_3"));
-  buttons.Add(send, kSendTip, [&commands] { commands.send.Start(); });
-  auto* get = Named(new QPushButton(QStringLiteral("Get from Tendril")), QStringLiteral("Command3_4"));
-  buttons.Add(get, kGetTip, [&commands] { commands.get.Start(); });
-  auto* simulator = Named(new QPushButton(QStringLiteral("Si&mulator")), QStringLiteral("cmdShowConfig"));
-  Describe(simulator, QStringLiteral("Shows the servos and the editor again."));
-  QObject::connect(simulator, &QAbstractButton::clicked, this, events_.back);
+QLayout* SummaryArea::MakeButtons() {
+  cmdSend_ = Named(new QPushButton(QStringLiteral("Send to Tendril")), "Command3_3");
+  cmdGet_ = Named(new QPushButton(QStringLiteral("Get from Tendril")), "Command3_4");
+  auto* simulator = Named(new QPushButton(QStringLiteral("Si&mulator")), "cmdShowConfig");
+  Describe(cmdSend_, kSendTip);
+  Describe(cmdGet_, kGetTip);
+  Describe(simulator, "Shows the servos and the editor again.");
+  connect(cmdSend_, &QAbstractButton::clicked, this, &SummaryArea::SendPressed);
+  connect(cmdGet_, &QAbstractButton::clicked, this, &SummaryArea::GetPressed);
+  connect(simulator, &QAbstractButton::clicked, this, &SummaryArea::SimulatorPressed);
   auto* row = new QHBoxLayout;
   row->addStretch();
-  for (QPushButton* button : {send, get, simulator}) row->addWidget(button);
+  for (QPushButton* button : {cmdSend_, cmdGet_, simulator}) row->addWidget(button);
   return row;
 }
 
 void SummaryArea::AddHeader(QGridLayout& table) {
-  AddFrame(table, new QFrame, QStringLiteral("frmSumHeader"), 0, kHeaderLines);
+  AddFrame(table, Named(new QFrame, "frmSumHeader"), 0, kHeaderLines);
   table.addWidget(MakeCaption("Actual Motion Parameters in µs"), 0, kValueColumn, 1,
                   kPowerUpColumn - kValueColumn);
   table.addWidget(MakeCaption("Power Up Params"), 0, kPowerUpColumn, 2, kLostCommColumn - kPowerUpColumn);
@@ -158,70 +150,70 @@ void SummaryArea::AddHeader(QGridLayout& table) {
   for (const Value& value : kValues) table.addWidget(MakeCaption(value.caption), 1, column++);
 }
 
-void SummaryArea::AddRow(QGridLayout& table, int channel) {
-  Row& row = rows_[static_cast<std::size_t>(channel)];
-  const int line = kHeaderLines + channel;
-  QFrame* frame = AddFrame(table, new Outline, ArrayName(QStringLiteral("frmSumTable"), channel), line, 1);
+void SummaryArea::AddRow(QGridLayout& table, std::size_t channel) {
+  Row& row = rows_[channel];
+  const int line = kHeaderLines + static_cast<int>(channel);
+  auto* frame = Named(new Outline, "frmSumTable", channel);
   frame->setSizePolicy(QSizePolicy::Preferred, QSizePolicy::Expanding);
+  AddFrame(table, frame, line, 1);
   const QString name = QStringLiteral("CHAN %1").arg(channel + 1);
-  table.addWidget(Named(BoldLabel(name), ArrayName(QStringLiteral("lblSumChannel"), channel)), line,
-                  kChannelColumn);
-  int column = kValueColumn;
+  table.addWidget(Named(BoldLabel(name), "lblSumChannel", channel), line, kChannelColumn);
   for (std::size_t value = 0; value < kValues.size(); ++value) {
     const QString caption = OnOneLine(kValues[value].caption);
-    auto* text = Named(new PressableText([this, value, slot = static_cast<std::size_t>(channel)] {
-                         entry_->OpenNumberEntry(slot, kValues[value].field, *rows_[slot].texts[value]);
-                       }),
-                       ArrayName(QString::fromUtf8(kValues[value].text), channel));
+    auto* text = row.texts[value] = Named(new PressableText, kValues[value].name, channel);
+    text->setText(QString::fromUtf8(kValues[value].first_text));
     text->setAlignment(Qt::AlignCenter);
-    text->setAccessibleName(name + QStringLiteral(", ") + caption);
+    text->setAccessibleName(QStringLiteral("%1, %2").arg(name, caption));
     Describe(text, QStringLiteral("%1 of channel %2, in µs. Press on it, or Enter, to change it.")
                        .arg(caption)
                        .arg(channel + 1));
     LeaveWidthToColumn(text);
     KeepPlace(text);
-    table.addWidget(text, line, column++);
-    row.texts[value] = text;
+    table.addWidget(text, line, kValueColumn + static_cast<int>(value));
+    connect(text, &PressableText::Pressed, this, [this, channel, text, field = kValues[value].field] {
+      entry_->OpenNumberEntry(channel, field, *text);
+    });
   }
-
   AddOptions(table, channel, name);
 
-  row.lblSumDIOPWM = Named(BoldLabel({}), ArrayName(QStringLiteral("lblSumDIOPWM"), channel));
+  row.lblSumDIOPWM = Named(BoldLabel(), "lblSumDIOPWM", channel);
   row.lblSumDIOPWM->setAlignment(Qt::AlignCenter);
   row.lblSumDIOPWM->hide();
   table.addWidget(row.lblSumDIOPWM, line, kValueColumn, 1, kLastColumn - kValueColumn);
 }
 
-void SummaryArea::AddOptions(QGridLayout& table, int channel, const QString& name) {
-  const auto slot = static_cast<std::size_t>(channel);
-  Row& row = rows_[slot];
-  const int line = kHeaderLines + channel;
-  int column = kPowerUpColumn;
+void SummaryArea::AddOptions(QGridLayout& table, std::size_t channel, const QString& name) {
+  Row& row = rows_[channel];
   row.power_up = new QButtonGroup(this);
   row.lost_comm = new QButtonGroup(this);
+  int column = kPowerUpColumn;
   for (const Option& option : kOptions) {
     const bool power_up = column < kLostCommColumn;
     QButtonGroup& group = power_up ? *row.power_up : *row.lost_comm;
-    auto* button = Named(new QRadioButton, ArrayName(QString::fromUtf8(option.button), channel));
+    auto* button = Named(new QRadioButton, option.name, channel);
     const QString what = power_up ? QStringLiteral("power up") : QStringLiteral("lost communications");
     button->setAccessibleName(QStringLiteral("%1, %2: %3").arg(name, what, OnOneLine(option.caption)));
     Describe(button, button->accessibleName());
     group.addButton(button, static_cast<int>(group.buttons().size()) + 1);
     KeepPlace(button);
-    table.addWidget(button, line, column++, Qt::AlignCenter);
-    row.options.push_back(button);
+    table.addWidget(button, kHeaderLines + static_cast<int>(channel), column++, Qt::AlignCenter);
   }
-  QObject::connect(row.power_up, &QButtonGroup::idClicked, this, [this, slot](int id) {
+  connect(row.power_up, &QButtonGroup::idClicked, this, [this, channel](int id) {
     entry_->Close();
-    working_.At(slot).PowerUPOpt = id;
+    working_.At(channel).PowerUPOpt = id;
   });
-  QObject::connect(row.lost_comm, &QButtonGroup::idClicked, this, [this, slot](int id) {
+  connect(row.lost_comm, &QButtonGroup::idClicked, this, [this, channel](int id) {
     entry_->Close();
-    working_.At(slot).LostCommOption = id;
+    working_.At(channel).LostCommOption = id;
   });
 }
 
-void SummaryArea::ShowRecords() {
+void SummaryArea::EnableCommands(const QString& running_command) {
+  EnableUnless(running_command, cmdSend_);
+  EnableUnless(running_command, cmdGet_);
+}
+
+void SummaryArea::NormaliseAndShowRecords() {
   entry_->Close();
   for (std::size_t channel = 0; channel < kPortCount; ++channel) {
     editor_.Normalise(channel);
@@ -233,8 +225,10 @@ void SummaryArea::ShowRow(std::size_t channel) {
   const ChannelConfig& record = working_.At(channel);
   const Row& row = rows_[channel];
   const bool servo = record.PortType == kPortServo;
-  for (QLineEdit* text : row.texts) text->setVisible(servo);
-  for (QAbstractButton* option : row.options) option->setVisible(servo);
+  for (PressableText* text : row.texts) text->setVisible(servo);
+  for (const QButtonGroup* group : {row.power_up, row.lost_comm}) {
+    for (QAbstractButton* option : group->buttons()) option->setVisible(servo);
+  }
   row.lblSumDIOPWM->setVisible(!servo);
   row.lblSumDIOPWM->setText(record.PortType == kPortDigital ? QStringLiteral("Digital")
                             : record.PortType == kPortPwm   ? QStringLiteral("PWM")
@@ -247,9 +241,9 @@ void SummaryArea::ShowRow(std::size_t channel) {
 void SummaryArea::ShowTexts(std::size_t channel) {
   const ChannelConfig& record = working_.At(channel);
   const auto range = [](const PulsePair& pair) { return QStringLiteral("%1-%2").arg(pair[0]).arg(pair[1]); };
-  const std::array<QString, kFields> texts{
-      range(record.ActualRange), range(record.VirtualRange), range(record.VirtualStops),
-      QString::number(record.NeutralPosition), QString::number(record.DefaultPosition)};
+  const std::array<QString, kTexts> texts{range(record.ActualRange), range(record.VirtualRange),
+                                          range(record.VirtualStops), QString::number(record.NeutralPosition),
+                                          QString::number(record.DefaultPosition)};
   for (std::size_t value = 0; value < texts.size(); ++value)
     rows_[channel].texts[value]->setText(texts[value]);
 }
@@ -271,24 +265,15 @@ void SummaryArea::TakeFocus() {
 }
 
 void SummaryArea::AddTrailer(QGridLayout& table) {
-  AddFrame(table, new QFrame, QStringLiteral("frmSumTrailer"), kTrailerLine, 1);
-  remarks_ = Named(new RemarksLabel, ArrayName(QStringLiteral("lblRemarks"), 1));
+  AddFrame(table, Named(new QFrame, "frmSumTrailer"), kTrailerLine, 1);
+  remarks_ = Named(new RemarksLabel, "lblRemarks", 1);
   table.addWidget(remarks_, kTrailerLine, kChannelColumn, 1, kPowerUpColumn - kChannelColumn, Qt::AlignTop);
-  for (int option = 0; option < static_cast<int>(kOptions.size()); ++option) {
-    auto* caption = Named(new QLabel(QString::fromUtf8(kOptions[static_cast<std::size_t>(option)].caption)),
-                          ArrayName(QStringLiteral("lblParameters"), option));
+  for (std::size_t i = 0; i < kOptions.size(); ++i) {
+    auto* caption = Named(new QLabel(QString::fromUtf8(kOptions[i].caption)), "lblParameters", i);
     caption->setAlignment(Qt::AlignHCenter | Qt::AlignTop);
-    QFont small = caption->font();
-    small.setPointSizeF(small.pointSizeF() * 0.9);
-    caption->setFont(small);
+    ScaleType(caption, 0.9);
     LeaveWidthToColumn(caption);
-    table.addWidget(caption, kTrailerLine, kPowerUpColumn + option);
-  }
-}
-
-void SummaryArea::SetRangeCaptions(const QString& caption) {
-  for (const Row& row : rows_) {
-    for (std::size_t value = 0; value < kRangeValues; ++value) row.texts[value]->setText(caption);
+    table.addWidget(caption, kTrailerLine, kPowerUpColumn + static_cast<int>(i));
   }
 }
 

@@ -1,0 +1,41 @@
+// ChosenServo: the large servo of the chosen channel.
+#pragma once
+
+#include <QLabel>
+#include <QStackedWidget>
+#include <cstddef>
+#include <optional>
+
+#include "config/channel_config.h"
+#include "simulator/servo_simulator.h"
+#include "ui/controls.h"
+#include "ui/model/channel_editor.h"
+#include "unitops/live_test.h"
+
+namespace tendril {
+
+class ChosenServo : public FrameBox, public ChannelChoice {
+ public:
+  // `editor` and `working`, its records, must outlive the area.
+  ChosenServo(const ChannelEditor& editor, const ChannelTable& working);
+
+  // Shows the edited channel's number, and its servo or what its port drives instead.
+  void ShowChannel();
+  // Shows Values() on the servo, with the arm at `arm`.
+  void UpdateSimulator(Microseconds arm);
+  // Moves the arm alone.
+  void MoveArm(Microseconds arm);
+
+  std::optional<std::size_t> Channel() const override { return editor_.Channel(); }
+  ChannelConfig Values() const override;
+
+ private:
+  const ChannelEditor& editor_;
+  const ChannelTable& working_;
+  QStackedWidget* servo_or_output_;
+  ServoSimulator* ServoSimulator1_;
+  QLabel* lblOutput_;  // takes the servo's place when the port drives none
+  Microseconds arm_ = kCentrePulseWidth;
+};
+
+}  // namespace tendril
