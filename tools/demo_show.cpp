@@ -18,8 +18,7 @@
 #include <variant>
 
 #include "app/demo_program.h"
-#include "bench/line_printer.h"
-#include "bench/panel_printer.h"
+#include "bench/printers.h"
 #include "config/option_bytes.h"
 #include "platform/hex_text.h"
 #include "platform/wait_for.h"

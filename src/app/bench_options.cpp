@@ -22,22 +22,16 @@ constexpr char kOnTheName[] =
     "that\nchanges a process's name: copy the bench to a file of that name and run the copy.";
 #endif
 
-// A line of --help about one of the things that have a name.
-QString ListEntry(std::string_view name, std::string_view description) {
-  return QStringLiteral("\n  %1 %2")
-      .arg(QString::fromLatin1(name.data(), qsizetype(name.size())), -16)
-      .arg(QString::fromLatin1(description.data(), qsizetype(description.size())));
+QString ToText(std::string_view latin1) {
+  return QString::fromLatin1(latin1.data(), qsizetype(latin1.size()));
 }
 
-QString ListOfFaults() {
+// The lines of --help about things that have a name and a description.
+QString ListOf(const auto& kinds) {
   QString list;
-  for (const FaultKind& kind : FaultKinds()) list += ListEntry(kind.name, kind.description);
-  return list;
-}
-
-QString ListOfPanelBehaviours() {
-  QString list;
-  for (const PanelBehaviourKind& kind : PanelBehaviourKinds()) list += ListEntry(kind.name, kind.description);
+  for (const auto& kind : kinds) {
+    list += QStringLiteral("\n  %1 %2").arg(ToText(kind.name), -16).arg(ToText(kind.description));
+  }
   return list;
 }
 

@@ -3,7 +3,7 @@
 #include <span>
 #include <utility>
 
-#include "bench/panel_printer.h"
+#include "bench/printers.h"
 #include "platform/runtime_error.h"
 #include "platform/serial_device.h"
 

@@ -9,7 +9,7 @@
 
 #include "app/console.h"
 #include "app/pseudo_terminal.h"
-#include "bench/line_printer.h"
+#include "bench/printers.h"
 #include "bench/virtual_line.h"
 
 namespace tendril {

@@ -23,6 +23,7 @@
 #include "app/paced_line.h"
 #include "app/pseudo_terminal.h"
 #include "app/quit_on_signal.h"
+#include "bench/printers.h"
 #include "bench/virtual_line.h"
 #include "bench/virtual_unit.h"
 #include "platform/hex_text.h"

@@ -1,7 +1,7 @@
 #include "bench/faulty_units.h"
 
 #include <algorithm>
-#include <array>
+#include <cstddef>
 
 namespace tendril {
 namespace {
@@ -9,87 +9,162 @@ namespace {
 constexpr std::uint8_t kPollCode = 0x88;
 constexpr std::uint8_t kUnlockCode = 0x8A;
 
-}  // namespace
+class WrongAnswerUnit final : public VirtualUnit {
+ public:
+  using VirtualUnit::VirtualUnit;
 
-std::optional<Bytes> MuteUnit::ReplyData(std::uint8_t /*kind*/) { return std::nullopt; }
+ protected:
+  std::optional<Bytes> ReplyData(std::uint8_t kind) override {
+    return kind == '0' ? Bytes{1, 11} : VirtualUnit::ReplyData(kind);
+  }
+};
 
-std::optional<Bytes> WrongAnswerUnit::ReplyData(std::uint8_t kind) {
-  if (kind == '0') return Bytes{1, 11};
-  return VirtualUnit::ReplyData(kind);
-}
+// Does not know the unlock packet, and so refuses every configuration command.
+class LockedUnit final : public VirtualUnit {
+ public:
+  using VirtualUnit::VirtualUnit;
 
-bool LockedUnit::Attends(std::uint8_t code, std::uint64_t /*at_us*/) { return code != kUnlockCode; }
+ protected:
+  bool Attends(std::uint8_t code, std::uint64_t /*at_us*/) override { return code != kUnlockCode; }
+};
 
-bool DeafUnit::Attends(std::uint8_t code, std::uint64_t /*at_us*/) {
-  return code != kPollCode || ++polls_ % every_ != 0;
-}
+class DeafUnit final : public VirtualUnit {
+ public:
+  using VirtualUnit::VirtualUnit;
 
-Transmission RamblingUnit::Reply(std::uint8_t kind, const Bytes& data, std::uint64_t poll_end_us) {
-  Transmission reply = VirtualUnit::Reply(kind, data, poll_end_us);
-  Bytes noise;
-  for (std::size_t i = 0; i < noise_bytes_; ++i) noise.push_back(static_cast<std::uint8_t>(0x11 + i % 0xB5));
-  noise.push_back(0);
-  reply.bytes.insert(reply.bytes.begin() + static_cast<std::ptrdiff_t>(timing().pads), noise.begin(),
-                     noise.end());
-  return reply;
-}
+ protected:
+  bool Attends(std::uint8_t code, std::uint64_t /*at_us*/) override {
+    return code != kPollCode || ++polls_ % 2 != 0;
+  }
 
-Transmission SlowUnit::Reply(std::uint8_t kind, const Bytes& data, std::uint64_t poll_end_us) {
-  Transmission reply = VirtualUnit::Reply(kind, data, poll_end_us);
-  reply.gap_us = gap_us_;
-  return reply;
-}
+ private:
+  std::size_t polls_ = 0;
+};
 
-Transmission WrongAddressUnit::Reply(std::uint8_t kind, const Bytes& data, std::uint64_t poll_end_us) {
-  Transmission reply = VirtualUnit::Reply(kind, data, poll_end_us);
-  reply.bytes[timing().pads] = id();
-  return reply;
-}
+// Sends `noise_bytes` non-zero bytes and one zero byte between its pads and the reply.
+class RamblingUnit final : public VirtualUnit {
+ public:
+  RamblingUnit(std::uint8_t id, int noise_bytes) : VirtualUnit(id), noise_bytes_(noise_bytes) {}
 
-Transmission UnfinishedUnit::Reply(std::uint8_t kind, const Bytes& data, std::uint64_t poll_end_us) {
-  Transmission reply = VirtualUnit::Reply(kind, data, poll_end_us);
-  reply.bytes.pop_back();
-  return reply;
-}
+ protected:
+  Transmission Reply(std::uint8_t kind, const Bytes& data, std::uint64_t poll_end_us) override {
+    Transmission reply = VirtualUnit::Reply(kind, data, poll_end_us);
+    Bytes noise;
+    for (int i = 0; i < noise_bytes_; ++i) noise.push_back(static_cast<std::uint8_t>(0x11 + i % 0xB5));
+    noise.push_back(0);
+    const auto first = reply.bytes.begin() + static_cast<std::ptrdiff_t>(timing().pads);
+    reply.bytes.insert(first, noise.begin(), noise.end());
+    return reply;
+  }
 
-std::optional<Bytes> ShortReplyUnit::ReplyData(std::uint8_t kind) {
-  std::optional<Bytes> data = VirtualUnit::ReplyData(kind);
-  if (data && ++replies_ % every_ == 0) data->pop_back();
-  return data;
-}
+ private:
+  int noise_bytes_;
+};
 
-std::uint8_t ScrambledUnit::NextReportedPort() {
-  constexpr std::array<std::uint8_t, kUnitPorts> kOrder = {3, 8, 1, 6, 2, 7, 5, 4};
-  return kOrder[reports_++ % kOrder.size()];
-}
+// Sends one byte at a time with a silence of `gap_us` between them.
+class SlowUnit final : public VirtualUnit {
+ public:
+  SlowUnit(std::uint8_t id, int gap_us) : VirtualUnit(id), gap_us_(gap_us) {}
 
-std::uint8_t RepeatingUnit::NextReportedPort() {
-  return static_cast<std::uint8_t>(reports_++ / 2 % kUnitPorts + 1);
-}
+ protected:
+  Transmission Reply(std::uint8_t kind, const Bytes& data, std::uint64_t poll_end_us) override {
+    Transmission reply = VirtualUnit::Reply(kind, data, poll_end_us);
+    reply.gap_us = static_cast<std::uint64_t>(gap_us_);
+    return reply;
+  }
 
-std::uint8_t MissingPortUnit::NextReportedPort() {
-  const std::uint8_t port = VirtualUnit::NextReportedPort();
-  return port == 5 ? VirtualUnit::NextReportedPort() : port;
-}
+ private:
+  int gap_us_;
+};
 
-std::uint8_t NinthPortUnit::NextReportedPort() {
-  return static_cast<std::uint8_t>(reports_++ % (kUnitPorts + 1) + 1);
-}
+class LateUnit final : public VirtualUnit {
+ public:
+  explicit LateUnit(std::uint8_t id) : VirtualUnit(id, {.turn_round_us = 150'000}) {}
+};
 
-bool RestartingUnit::Attends(std::uint8_t /*code*/, std::uint64_t at_us) { return at_us >= deaf_until_us_; }
+class WrongAddressUnit final : public VirtualUnit {
+ public:
+  using VirtualUnit::VirtualUnit;
 
-void RestartingUnit::TakeAddress(std::uint8_t id, std::uint64_t at_us) {
-  VirtualUnit::TakeAddress(id, at_us);
-  deaf_until_us_ = at_us + restart_us_;
-}
+ protected:
+  Transmission Reply(std::uint8_t kind, const Bytes& data, std::uint64_t poll_end_us) override {
+    Transmission reply = VirtualUnit::Reply(kind, data, poll_end_us);
+    reply.bytes[timing().pads] = id();
+    return reply;
+  }
+};
 
-void StubbornUnit::TakeAddress(std::uint8_t /*id*/, std::uint64_t /*at_us*/) {}
+// Leaves out the zero byte that ends a reply.
+class UnfinishedUnit final : public VirtualUnit {
+ public:
+  using VirtualUnit::VirtualUnit;
 
-namespace {
+ protected:
+  Transmission Reply(std::uint8_t kind, const Bytes& data, std::uint64_t poll_end_us) override {
+    Transmission reply = VirtualUnit::Reply(kind, data, poll_end_us);
+    reply.bytes.pop_back();
+    return reply;
+  }
+};
 
-template <typename Unit>
+class ShortReplyUnit final : public VirtualUnit {
+ public:
+  using VirtualUnit::VirtualUnit;
+
+ protected:
+  std::optional<Bytes> ReplyData(std::uint8_t kind) override {
+    std::optional<Bytes> data = VirtualUnit::ReplyData(kind);
+    if (data && ++replies_ % 3 == 0) data->pop_back();
+    return data;
+  }
+
+ private:
+  std::size_t replies_ = 0;
+};
+
+// Reports `ports` in this order, again and again.
+template <std::uint8_t... ports>
+class OrderedUnit final : public VirtualUnit {
+ public:
+  using VirtualUnit::VirtualUnit;
+
+ protected:
+  std::uint8_t NextReportedPort() override {
+    constexpr std::uint8_t kOrder[] = {ports...};
+    return kOrder[reports_++ % std::size(kOrder)];
+  }
+
+ private:
+  std::size_t reports_ = 0;
+};
+
+class RestartingUnit final : public VirtualUnit {
+ public:
+  using VirtualUnit::VirtualUnit;
+
+ protected:
+  bool Attends(std::uint8_t /*code*/, std::uint64_t at_us) override { return at_us >= deaf_until_us_; }
+  void TakeAddress(std::uint8_t id, std::uint64_t at_us) override {
+    VirtualUnit::TakeAddress(id, at_us);
+    deaf_until_us_ = at_us + 1'000'000;
+  }
+
+ private:
+  std::uint64_t deaf_until_us_ = 0;
+};
+
+// Acknowledges a new ID and keeps its old one.
+class StubbornUnit final : public VirtualUnit {
+ public:
+  using VirtualUnit::VirtualUnit;
+
+ protected:
+  void TakeAddress(std::uint8_t /*id*/, std::uint64_t /*at_us*/) override {}
+};
+
+template <typename Unit, int... arguments>
 std::unique_ptr<VirtualUnit> Make(std::uint8_t id) {
-  return std::make_unique<Unit>(id);
+  return std::make_unique<Unit>(id, arguments...);
 }
 
 constexpr FaultKind kFaultKinds[] = {
@@ -97,19 +172,22 @@ constexpr FaultKind kFaultKinds[] = {
     {"wrong-answer", "never acknowledges", Make<WrongAnswerUnit>},
     {"locked", "refuses every configuration command", Make<LockedUnit>},
     {"deaf", "does not hear every second poll", Make<DeafUnit>},
-    {"rambling", "sends noise before its reply", Make<RamblingUnit>},
-    {"flooding", "sends 5200 bytes of noise before its reply", Make<FloodingUnit>},
-    {"slow", "sends one byte every 4.5 ms, just fast enough", Make<SlowUnit>},
-    {"too-slow", "sends one byte every 30 ms", Make<TooSlowUnit>},
+    {"rambling", "sends noise before its reply", Make<RamblingUnit, 5>},
+    // More than an input buffer holds, for some 2.7 s.
+    {"flooding", "sends 5200 bytes of noise before its reply", Make<RamblingUnit, 5200>},
+    // A reply with ten data bytes is within the shortest time-out of a poll.
+    {"slow", "sends one byte every 4.5 ms, just fast enough", Make<SlowUnit, 4000>},
+    {"too-slow", "sends one byte every 30 ms", Make<SlowUnit, 30'000>},
     {"late", "begins its reply 150 ms after the poll", Make<LateUnit>},
     {"wrong-address", "replies under its own ID", Make<WrongAddressUnit>},
     {"unfinished", "does not end its replies", Make<UnfinishedUnit>},
     {"short-reply", "leaves out a byte of every third reply", Make<ShortReplyUnit>},
-    {"scrambled", "reports its ports in another order", Make<ScrambledUnit>},
-    {"repeating", "reports every port twice", Make<RepeatingUnit>},
-    {"missing-port", "never reports port 5", Make<MissingPortUnit>},
-    {"stuck-port", "reports port 3 all the time", Make<StuckPortUnit>},
-    {"ninth-port", "reports a port 9", Make<NinthPortUnit>},
+    {"scrambled", "reports its ports in another order", Make<OrderedUnit<3, 8, 1, 6, 2, 7, 5, 4>>},
+    {"repeating", "reports every port twice",
+     Make<OrderedUnit<1, 1, 2, 2, 3, 3, 4, 4, 5, 5, 6, 6, 7, 7, 8, 8>>},
+    {"missing-port", "never reports port 5", Make<OrderedUnit<1, 2, 3, 4, 6, 7, 8>>},
+    {"stuck-port", "reports port 3 all the time", Make<OrderedUnit<3>>},
+    {"ninth-port", "reports a port 9", Make<OrderedUnit<1, 2, 3, 4, 5, 6, 7, 8, 9>>},
     {"restarting", "hears nothing for a second after it took a new ID", Make<RestartingUnit>},
     {"stubborn", "does not take a new ID", Make<StubbornUnit>},
 };

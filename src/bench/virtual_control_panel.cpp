@@ -52,32 +52,6 @@ bool IsFrame(std::span<const std::uint8_t> bytes) {
 
 bool IsSwitch(std::uint8_t byte) { return byte <= 1; }
 
-std::size_t Word(std::span<const std::uint8_t> bytes, std::size_t at) {
-  return bytes[at] + std::size_t{256} * bytes[at + 1];
-}
-
-// Lighting records end to end: type, length of the data (two bytes each, low byte first), the data, and zeros
-// up to a multiple of four.
-bool AreLightingRecords(std::span<const std::uint8_t> bytes) {
-  while (!bytes.empty()) {
-    if (bytes.size() < 4) return false;
-    const std::size_t type = Word(bytes, 0);
-    const std::size_t size = Word(bytes, 2);
-    const std::size_t padded = (4 + size + 3) / 4 * 4;
-    if (bytes.size() < padded) return false;
-    const auto padding = bytes.subspan(4 + size, padded - 4 - size);
-    if (std::any_of(padding.begin(), padding.end(), [](std::uint8_t byte) { return byte != 0; }))
-      return false;
-    const bool effect = type == 0 || type == 2;
-    const bool intensities = type == 3 || type == 4;  // their number ends the first six bytes
-    const bool known = (effect && size == 12) || (type == 1 && size == 0) ||
-                       (intensities && size >= 6 && Word(bytes, 8) == size - 6);
-    if (!known) return false;
-    bytes = bytes.subspan(padded);
-  }
-  return true;
-}
-
 }  // namespace
 
 std::span<const PanelBehaviourKind> PanelBehaviourKinds() { return kBehaviourKinds; }
@@ -130,6 +104,7 @@ bool VirtualControlPanel::Obey(const PanelRequest& request) {
   if (request.nested) return true;
   switch (request.identifier) {
     case 'I':
+    case 'L':  // what the lights do is not seen here
       return true;
     case 'C':
       if (payload.size() != 2 || !IsSwitch(payload[1])) return false;
@@ -139,8 +114,6 @@ bool VirtualControlPanel::Obey(const PanelRequest& request) {
       return payload.size() == 1 && IsSwitch(payload[0]);
     case 'A':
       return payload.empty();
-    case 'L':
-      return AreLightingRecords(payload);
     default:
       return false;
   }

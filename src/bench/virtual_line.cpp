@@ -108,17 +108,13 @@ void VirtualLine::AdvanceTo(std::uint64_t now_us) {
     }
     if (next == nullptr || next_key.first > now_us) break;
     now_us_ = std::max(now_us_, next_key.first);
-    RunEvent(*next);
+    if (next->sending) {
+      EndByte(*next);
+    } else {
+      StartByte(*next);
+    }
   }
   now_us_ = std::max(now_us_, now_us);
-}
-
-void VirtualLine::RunEvent(Talker& talker) {
-  if (talker.sending) {
-    EndByte(talker);
-  } else {
-    StartByte(talker);
-  }
 }
 
 void VirtualLine::StartByte(Talker& talker) {
@@ -158,12 +154,8 @@ VirtualLine::Fate VirtualLine::Collide(const Talker& talker, ByteOnWire& startin
     if (&other == &talker || !other.sending || other.sending->fate == Fate::kLost) continue;
     ByteOnWire& present = *other.sending;
     const bool with_program = talker.unit == nullptr || other.unit == nullptr;
-    if (with_program && starting.pad) {
-      ++counters_.lost_pads;
-      return Fate::kLost;
-    }
+    if (with_program && starting.pad) return Fate::kLost;
     if (with_program && present.pad) {
-      ++counters_.lost_pads;
       present.fate = Fate::kLost;
       continue;
     }
@@ -193,11 +185,10 @@ void VirtualLine::NoteTalkIntoReply(const Talker& talker, ByteOnWire& starting) 
 
 // A unit's byte while the program's driver holds the line.
 void VirtualLine::OverrideByDriver(ByteOnWire& byte) {
-  if (!byte.pad) {
-    Spoil(byte);
-  } else if (byte.fate != Fate::kLost) {
+  if (byte.pad) {
     byte.fate = Fate::kLost;
-    ++counters_.lost_pads;
+  } else {
+    Spoil(byte);
   }
 }
 

@@ -49,7 +49,6 @@ struct VirtualLineOptions {
 // What went wrong on a line since it was made.
 struct LineCounters {
   std::size_t garbled_bytes = 0;  // bytes that did not get through whole, of units and program
-  std::size_t lost_pads = 0;      // pads that went under in the program's driver
   // Bytes that the program sent between the first byte after the pads and the end of a unit's reply.
   std::size_t program_talked_into_reply = 0;
   std::size_t undriven_bytes = 0;  // bytes that the program sent while its driver was off
@@ -143,7 +142,6 @@ class VirtualLine {
   bool FollowsRts() const { return options_.echo && options_.driver_follows_rts; }
   static std::uint64_t NextStartUs(const Talker& talker);
   static std::optional<std::uint64_t> NextEventUs(const Talker& talker);
-  void RunEvent(Talker& talker);
   void StartByte(Talker& talker);
   Fate Collide(const Talker& talker, ByteOnWire& starting);
   void NoteTalkIntoReply(const Talker& talker, ByteOnWire& starting);

@@ -95,7 +95,7 @@ std::vector<Transmission> VirtualUnit::HandlePacket(const Bytes& packet, std::ui
   const bool unlocked = std::exchange(unlocked_, false);
   if (code == kUnlock) {
     unlocked_ = packet.size() == kHeader + 1 && SumsUp(std::span(packet).subspan(kHeader));
-    if (!unlocked_) rejections_.push_back({RejectReason::kChecksum, packet});
+    if (!unlocked_) ++rejected_commands_;
   } else if (code == kSetOption || code == kSetAddress) {
     HandleConfiguration(packet, unlocked, at_us);
   } else if (code == kPoll && packet.size() == kHeader + 2) {
@@ -108,15 +108,11 @@ std::vector<Transmission> VirtualUnit::HandlePacket(const Bytes& packet, std::ui
 
 void VirtualUnit::HandleConfiguration(const Bytes& packet, bool unlocked, std::uint64_t at_us) {
   const std::uint8_t code = packet[1];
-  if (!unlocked) {
-    rejections_.push_back({RejectReason::kLocked, packet});
-    return;
-  }
   const std::vector<Bytes> bodies = PossibleBodies(std::span(packet).subspan(kHeader));
   const auto known =
       std::find_if(bodies.begin(), bodies.end(), [&](const Bytes& body) { return IsKnownBody(code, body); });
-  if (known == bodies.end()) {
-    rejections_.push_back({bodies.empty() ? RejectReason::kChecksum : RejectReason::kMalformed, packet});
+  if (!unlocked || known == bodies.end()) {
+    ++rejected_commands_;
     return;
   }
   ++accepted_commands_;

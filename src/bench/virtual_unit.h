@@ -36,18 +36,6 @@ using PortOptionBytes = std::array<std::uint8_t, 9>;
 // What each port of a unit fresh from the factory holds.
 inline constexpr PortOptionBytes kFreshPortOptions = {1, 60, 240, 100, 200, 100, 200, 150, 150};
 
-enum class RejectReason {
-  kLocked,    // no unlock directly before it
-  kChecksum,  // wrong or missing checksum
-  kMalformed  // right checksum, but no body that the unit knows
-};
-
-// A configuration command that the unit refused; the packet without its zero bytes.
-struct Rejection {
-  RejectReason reason = RejectReason::kLocked;
-  Bytes packet;
-};
-
 // How a unit answers a poll.
 struct ReplyTiming {
   std::uint64_t turn_round_us = 2000;  // from the end of the poll to the first pad
@@ -70,7 +58,8 @@ class VirtualUnit : public LineUnit {
   std::optional<std::uint8_t> LivePosition(int port) const;
 
   std::size_t accepted_commands() const { return accepted_commands_; }
-  const std::vector<Rejection>& rejections() const { return rejections_; }
+  // Unlocks and configuration commands that were locked, damaged or unknown.
+  std::size_t rejected_commands() const { return rejected_commands_; }
   std::size_t polls_heard() const { return polls_heard_; }
 
  protected:
@@ -104,7 +93,7 @@ class VirtualUnit : public LineUnit {
   std::uint8_t next_port_ = 1;  // for NextReportedPort()
   std::size_t accepted_commands_ = 0;
   std::size_t polls_heard_ = 0;
-  std::vector<Rejection> rejections_;
+  std::size_t rejected_commands_ = 0;
 };
 
 }  // namespace tendril

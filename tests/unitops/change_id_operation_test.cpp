@@ -54,7 +54,7 @@ TEST_F(ChangeId, UnitFromTheFactory_IsFoundGivenItsIdAndConfirmed) {
   RunToTheEnd();
   ExpectSuccess("SUCCESS: UnitID set to '0A'");
   EXPECT_EQ(unit.id(), 0x0A);
-  EXPECT_THAT(unit.rejections(), IsEmpty());
+  EXPECT_EQ(unit.rejected_commands(), 0u);
 
   const std::vector<Bytes> expected{
       {0xFF, 0x88, '*', 45}, {0xFF, 0x8A, 0x56}, {0xFF, 0x0F, 0x0A, 0x0A, 0x0A, 0x38}, {0x0A, 0x88, '+', 45}};

@@ -159,7 +159,7 @@ TEST_F(Live, Sweeps_StepAndRestToTheMillisecond) {
     EXPECT_EQ(test_.ShownPosition(), 1500);
   }
   EXPECT_EQ(world_.time.RunningTimers(), 0);
-  EXPECT_THAT(unit.rejections(), IsEmpty());
+  EXPECT_EQ(unit.rejected_commands(), 0u);
 }
 
 TEST_F(Live, Buttons_SwitchMoveAndReset) {

@@ -1,17 +1,19 @@
-// LinePrinter: what crosses a line, for a person to read.
+// What crosses a line or a connection to the Control Panel, for the user to read.
 #pragma once
 
 #include <cstdint>
 #include <functional>
+#include <span>
 #include <string>
 
+#include "bench/virtual_control_panel.h"
 #include "bench/virtual_line.h"
 #include "platform/bytes.h"
 
 namespace tendril {
 
-// Puts the bytes of a line together to packets and prints each as one line of text: the time of its last byte
-// in seconds, who sent it, its bytes in hexadecimal, and what it means.
+// Puts the bytes of a line together to packets and prints each as one line of text: the time of its last byte in
+// seconds, who sent it, its bytes in hexadecimal, and what it means.
 //
 //     1.284375  program  00 01 88 30 2D 00                               poll unit 01, kind '0'
 //     1.290104  unit     00 00 00 FE 30 01 0A 00                         reply to '0': acknowledged
@@ -22,7 +24,7 @@ class LinePrinter {
 
   // The next byte, as from VirtualLine::SetTap().
   void Note(const LineByte& byte);
-  // Prints what has come of a packet that is not complete. To be called when the line falls silent.
+  // Prints an incomplete packet. To be called when the line falls silent.
   void Flush();
 
  private:
@@ -33,5 +35,11 @@ class LinePrinter {
   bool garbled_ = false;
   bool has_content_ = false;  // one of bytes_ is not zero
 };
+
+// One line of text about a frame on a connection to the Control Panel, in the same columns.
+//
+//     3.284375  program  43 31 30 30 30 30 32 03 00                      request 1: give up Comm 3
+//     3.284402  panel    31 31 30 30 30 30 30                            reply to 1: done
+std::string PrintPanelBytes(std::uint64_t at_us, PanelSide from, std::span<const std::uint8_t> bytes);
 
 }  // namespace tendril

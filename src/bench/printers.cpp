@@ -1,7 +1,8 @@
-#include "bench/line_printer.h"
+#include "bench/printers.h"
 
 #include <algorithm>
 #include <cstdio>
+#include <optional>
 #include <span>
 #include <string_view>
 #include <utility>
@@ -11,13 +12,14 @@
 namespace tendril {
 namespace {
 
-constexpr std::size_t kShownBytes = 40;      // more than any packet has; noise can be much longer
+constexpr std::size_t kShownOfPacket = 40;   // more than any packet has; noise can be much longer
+constexpr std::size_t kShownOfFrame = 24;    // more than any frame but those with a text or lighting data
 constexpr std::size_t kShownZeros = 4;       // in a row at the beginning
 constexpr std::uint64_t kSilenceUs = 2'000;  // zero bytes this far apart do not belong together
 constexpr std::size_t kHexWidth = 47;        // of a packet of 16 bytes, as those with a port's options are
 
-// Many zero bytes at the beginning, the pads of a patient unit, are given as a count.
-std::string HexList(const Bytes& bytes) {
+// At most `shown` bytes. Many zero bytes at the beginning, the pads of a patient unit, are given as a count.
+std::string HexList(std::span<const std::uint8_t> bytes, std::size_t shown) {
   const auto begin = std::find_if(bytes.begin(), bytes.end(), [](std::uint8_t byte) { return byte != 0; });
   const auto zeros = static_cast<std::size_t>(begin - bytes.begin());
   std::span<const std::uint8_t> rest = bytes;
@@ -26,9 +28,16 @@ std::string HexList(const Bytes& bytes) {
     rest = rest.subspan(zeros);
     text = std::to_string(zeros) + " x 00" + (rest.empty() ? "" : " ");
   }
-  text += HexBytes(rest.first(std::min(rest.size(), kShownBytes)));
-  if (rest.size() > kShownBytes) text += " ... (" + std::to_string(bytes.size()) + " bytes)";
+  text += HexBytes(rest.first(std::min(rest.size(), shown)));
+  if (rest.size() > shown) text += " ... (" + std::to_string(bytes.size()) + " bytes)";
   return text;
+}
+
+std::string Columns(std::uint64_t at_us, const char* from, std::string hex, const std::string& meaning) {
+  char time_and_side[32];
+  std::snprintf(time_and_side, sizeof time_and_side, "%12.6f  %-9s", static_cast<double>(at_us) / 1e6, from);
+  hex.resize(std::max(hex.size(), kHexWidth), ' ');
+  return time_and_side + hex + "  " + meaning;
 }
 
 std::string Kind(std::uint8_t kind) {
@@ -102,6 +111,57 @@ std::string DescribePacket(LineSide from, const Bytes& bytes) {
   return from == LineSide::kProgram ? DescribeCommand(packet) : DescribeReply(packet);
 }
 
+std::string Printable(std::span<const std::uint8_t> text) {
+  std::string printable;
+  for (const std::uint8_t byte : text.first(std::min(text.size(), kShownOfFrame))) {
+    printable += byte >= ' ' && byte < 0x7F ? static_cast<char>(byte) : '.';
+  }
+  return printable;
+}
+
+std::string CountBytes(std::size_t count) {
+  return std::to_string(count) + (count == 1 ? " byte" : " bytes");
+}
+
+std::string OnOff(std::uint8_t value) { return value != 0 ? "on" : "off"; }
+
+std::string DescribeRequest(const PanelRequest& request) {
+  const Bytes& payload = request.payload;
+  const std::string sized = ", " + CountBytes(payload.size());
+  switch (request.identifier) {
+    case 'I':
+      return "here is \"" + Printable(payload) + "\"";
+    case 'C':
+      if (payload.size() != 2) return "port control" + sized;
+      return (payload[1] != 0 ? "take back Comm " : "give up Comm ") + std::to_string(payload[0]);
+    case 'P':
+      return "physical lights control " + (payload.size() == 1 ? OnOff(payload[0]) : sized.substr(2));
+    case 'A':
+      return "all lights off on disconnect";
+    case 'L':
+      return "lighting data" + sized;
+    default:
+      return "unknown" + sized;
+  }
+}
+
+// What bytes on a connection mean: "request 1: give up Comm 3".
+std::string DescribePanelBytes(PanelSide from, std::span<const std::uint8_t> bytes) {
+  const std::optional<PanelRequest> frame = ParsePanelFrame(bytes);
+  if (from == PanelSide::kPanel) {
+    if (!frame) return CountBytes(bytes.size());
+    const std::string reply = std::string("reply to ") + static_cast<char>(frame->sequence) + ": ";
+    if (frame->identifier == '1') return reply + "done";
+    return reply + (frame->identifier == '0' ? "refused" : "neither done nor refused");
+  }
+  if (!frame) return "no request";
+  std::string text = std::string("request ") + static_cast<char>(frame->sequence) + ": ";
+  if (!frame->nested) return text + DescribeRequest(*frame);
+  const std::optional<PanelRequest> inner = ParsePanelFrame(frame->payload);
+  return text + "repeats " + static_cast<char>(inner->sequence) +
+         " inside, to no effect: " + DescribeRequest(*inner);
+}
+
 }  // namespace
 
 LinePrinter::LinePrinter(std::function<void(const std::string&)> print) : print_(std::move(print)) {}
@@ -125,12 +185,13 @@ void LinePrinter::Flush() {
   const bool garbled = std::exchange(garbled_, false);
   has_content_ = false;
   if (bytes.empty()) return;
-  char time_and_side[32];
-  std::snprintf(time_and_side, sizeof time_and_side, "%12.6f  %-9s", static_cast<double>(last_us_) / 1e6,
-                from_ == LineSide::kProgram ? "program" : "unit");
-  std::string hex = HexList(bytes);
-  hex.resize(std::max(hex.size(), kHexWidth), ' ');
-  print_(time_and_side + hex + "  " + DescribePacket(from_, bytes) + (garbled ? " (garbled)" : ""));
+  print_(Columns(last_us_, from_ == LineSide::kProgram ? "program" : "unit", HexList(bytes, kShownOfPacket),
+                 DescribePacket(from_, bytes) + (garbled ? " (garbled)" : "")));
+}
+
+std::string PrintPanelBytes(std::uint64_t at_us, PanelSide from, std::span<const std::uint8_t> bytes) {
+  return Columns(at_us, from == PanelSide::kProgram ? "program" : "panel", HexList(bytes, kShownOfFrame),
+                 DescribePanelBytes(from, bytes));
 }
 
 }  // namespace tendril
