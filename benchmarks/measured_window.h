@@ -13,7 +13,6 @@
 #include <string>
 
 #include "app/qt_platform.h"
-#include "counting_device.h"
 #include "measuring.h"
 #include "platform/paths.h"
 #include "platform/qt/qt_tcp_socket.h"
@@ -24,6 +23,7 @@
 #include "serial/command_log.h"
 #include "serial/hw_serial.h"
 #include "support/bench_process.h"
+#include "support/counting_device.h"
 #include "support/find_control.h"
 #include "ui/frm_new_servo_config.h"
 #include "unitops/control_panel.h"
@@ -89,7 +89,7 @@ class MeasuredWindow {
   const std::unique_ptr<SerialDevice> serial_ = CreateSystemSerialDevice(platform_.on_fault);
 
  public:
-  CountingDevice device{*serial_};
+  test::CountingDevice device{*serial_};
 
  private:
   FileCommandLog log_{CommandLogPath()};

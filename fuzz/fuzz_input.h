@@ -20,8 +20,6 @@ inline void Check(bool holds, const char* what) {
   std::abort();
 }
 
-inline void Append(Bytes& bytes, const Bytes& more) { bytes.insert(bytes.end(), more.begin(), more.end()); }
-
 // The input. Beyond its end all is zero, or empty.
 class Input {
  public:
@@ -33,12 +31,20 @@ class Input {
     rest_ = rest_.subspan(taken.size());
     return {taken.begin(), taken.end()};
   }
-  Bytes TakeAll() { return Take(rest_.size()); }
   std::uint8_t Byte() { return empty() ? std::uint8_t{0} : Take(1).front(); }
   bool Flag() { return Byte() % 2 != 0; }
 
  private:
   std::span<const std::uint8_t> rest_;
 };
+
+// The shape of a target: `Run` takes the input step by step, then ends.
+template <typename Run>
+int RunSteps(Input input) {
+  Run run;
+  while (!input.empty()) run.Step(input);
+  run.End();
+  return 0;
+}
 
 }  // namespace tendril::fuzz

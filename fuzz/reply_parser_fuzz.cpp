@@ -1,4 +1,4 @@
-// Input: the polled unit, then what the line carries. A reply that is complete is followed by the next poll.
+// Input: the polled unit, then what the line carries. A complete reply is followed by the next poll.
 #include "serial/reply_parser.h"
 
 #include "fuzz/fuzz_input.h"
@@ -8,60 +8,65 @@ namespace {
 
 using Verdict = ReplyParser::Verdict;
 
-// Reads the line a packet at a time, each when its zero byte has come.
-struct SlowReading {
-  explicit SlowReading(std::uint8_t polled_unit) : unit(polled_unit) {}
+// Compares the parser with a slow reading of the line, a packet at a time.
+class Run {
+ public:
+  void Step(Input& input) {
+    if (!std::exchange(started_, true)) {
+      unit_ = input.Byte();
+      return Start();
+    }
+    const std::uint8_t byte = input.Byte();
+    const Verdict verdict = parser_.Push(byte);
+    Check(verdict == Read(byte), "parser and slow reading come to the same verdict");
+    Check(parser_.pads() == pads_, "every zero byte that ends nothing is a pad");
+    Check(parser_.data().size() <= ReplyParser::kMaxData, "no more data is kept than the limit");
+    if (verdict != Verdict::kReplyComplete) return;
+    Check(parser_.code() == (packet_.size() > 1 ? packet_[1] : 0), "the reply's code is its second byte");
+    packet_.erase(packet_.begin(), packet_.begin() + std::min<std::ptrdiff_t>(2, std::ssize(packet_)));
+    packet_.resize(std::min(packet_.size(), ReplyParser::kMaxData));
+    Check(parser_.data() == packet_, "the reply's data follows the code");
+    Start();
+  }
+  void End() {}
 
-  Verdict Push(std::uint8_t byte) {
+ private:
+  void Start() {
+    parser_.Start(unit_);
+    coming_.clear();
+    pads_ = 0;
+    in_step_ = echo_seen_ = false;
+  }
+  Verdict Read(std::uint8_t byte) {
     if (byte != 0) {
-      coming.push_back(byte);
+      coming_.push_back(byte);
       return Verdict::kNeedMore;
     }
-    packet = std::exchange(coming, {});
-    if (!std::exchange(in_step, true)) packet.clear();  // the rest of one that began earlier
-    if (!packet.empty() && packet[0] == 0xFE) return Verdict::kReplyComplete;
-    if (!reply_expected && packet.size() > 1 && packet[0] == unit && packet[1] == 0x88) {
-      reply_expected = true;
-      pads = 0;
+    packet_ = std::exchange(coming_, {});
+    if (!std::exchange(in_step_, true)) packet_.clear();  // the rest of one that began earlier
+    if (!packet_.empty() && packet_[0] == 0xFE) return Verdict::kReplyComplete;
+    if (!echo_seen_ && packet_.size() > 1 && packet_[0] == unit_ && packet_[1] == 0x88) {
+      echo_seen_ = true;
+      pads_ = 0;
       return Verdict::kEchoSeen;
     }
-    ++pads;
+    ++pads_;
     return Verdict::kNeedMore;
   }
 
-  std::uint8_t unit;
-  Bytes coming;
-  Bytes packet;  // the last one
-  std::uint32_t pads = 0;
-  bool in_step = false;
-  bool reply_expected = false;
+  ReplyParser parser_;
+  std::uint8_t unit_ = 0;
+  Bytes coming_;
+  Bytes packet_;  // the last one
+  std::uint32_t pads_ = 0;
+  bool started_ = false;
+  bool in_step_ = false;
+  bool echo_seen_ = false;
 };
 
 }  // namespace
 }  // namespace tendril::fuzz
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* bytes, std::size_t size) {
-  using namespace tendril;
-  using namespace tendril::fuzz;
-  Input input(bytes, size);
-  const std::uint8_t unit = input.Byte();
-  ReplyParser parser;
-  parser.Start(unit);
-  SlowReading reading(unit);
-  for (const std::uint8_t byte : input.TakeAll()) {
-    const Verdict verdict = parser.Push(byte);
-    Check(verdict == reading.Push(byte), "parser and slow reading come to the same verdict");
-    Check(parser.pads() == reading.pads, "every zero byte that ends nothing is a pad");
-    Check(parser.data().size() <= ReplyParser::kMaxData, "no more data is kept than the limit says");
-    if (verdict != Verdict::kReplyComplete) continue;
-
-    Bytes& data = reading.packet;
-    Check(parser.code() == (data.size() > 1 ? data[1] : 0), "the reply's code is its second byte");
-    data.erase(data.begin(), data.begin() + std::min<std::ptrdiff_t>(2, std::ssize(data)));
-    data.resize(std::min(data.size(), ReplyParser::kMaxData));
-    Check(parser.data() == data, "the reply's data is what follows the code");
-    parser.Start(unit);
-    reading = SlowReading(unit);
-  }
-  return 0;
+  return tendril::fuzz::RunSteps<tendril::fuzz::Run>({bytes, size});
 }

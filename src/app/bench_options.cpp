@@ -45,8 +45,8 @@ std::uint8_t ParseUnitId(const QString& text) {
   return static_cast<std::uint8_t>(id);
 }
 
-// Gives the unit that `text`, "<name>[:ID]", speaks of its fault; without an ID, the first unit. A unit with
-// that ID is added if there is none.
+// Gives the unit that `text`, "<name>[:ID]", names its fault; without an ID, the first unit. Adds a unit with that
+// ID if there is none.
 void AddFault(std::vector<BenchUnit>& units, const QString& text) {
   const QString name = text.section(QLatin1Char(':'), 0, 0);
   const FaultKind* kind = FindFaultKind(name.toStdString());
@@ -91,7 +91,7 @@ BenchPanelOptions ParsePanel(const QString& tcp_port, const std::filesystem::pat
           .comm_port = static_cast<std::uint8_t>(*comm_port)};
 }
 
-// Gives the panel the behaviour that `text`, "<name>[:replies]", speaks of.
+// Gives the panel the behaviour that `text`, "<name>[:replies]", names.
 void SetBehaviour(BenchPanelOptions& panel, const QString& text) {
   const QString name = text.section(QLatin1Char(':'), 0, 0);
   panel.behaviour = FindPanelBehaviour(name.toStdString());
@@ -106,46 +106,55 @@ void SetBehaviour(BenchPanelOptions& panel, const QString& text) {
   }
 }
 
+QString Text(const char* latin1) { return QString::fromLatin1(latin1); }
+
+struct CommandLine {
+  QCommandLineOption unit{Text("unit"),
+                          Text("ID of a unit, in hexadecimal; may be given repeatedly. Default: 01 and 0A."),
+                          Text("ID")};
+  QCommandLineOption fault{Text("fault"), Text("Let a unit behave badly; without an ID the first one."),
+                           Text("name[:ID]")};
+  QCommandLineOption link{Text("link"), Text("Where to put the link to the device."), Text("path"),
+                          QString::fromStdString((ConfigFolder() / "ports" / "com1").string())};
+  QCommandLineOption no_echo{
+      Text("no-echo"),
+      Text("Do not echo what the program sends, as adapters do that switch their direction by themselves.")};
+  QCommandLineOption control_panel{
+      Text("control-panel"),
+      Text("Play the Control Panel too: hold the device until a program asks for it at this TCP port of "
+           "127.0.0.1. With 0 the system chooses one."),
+      Text("TCP port")};
+  QCommandLineOption panel_behaviour{
+      Text("panel-behaviour"),
+      Text("Let the Control Panel behave badly; with a number, in its first replies only."),
+      Text("name[:replies]")};
+  QCommandLineOption quiet{Text("quiet"),
+                           Text("Do not print what crosses the line, nor the Control Panel's connections.")};
+
+  QString Description() const {
+    return Text(
+               "Virtual units on a serial line of 19200 baud, for trying tendril-utility without hardware. "
+               "The "
+               "line is\na pseudo-terminal; its link makes it a comm port of the utility.\n\nFaults:") +
+           ListOf(FaultKinds()) + Text("\n\nBehaviours of the Control Panel:") +
+           ListOf(PanelBehaviourKinds()) + Text(kOnTheName).arg(Text(kControlPanelProgram)) +
+           Text(
+               "\n\nThe exit code is 0 when the bench is stopped, 1 for invalid options, and 2 when the "
+               "device, "
+               "its link\nor the TCP port is not available.");
+  }
+};
+
 }  // namespace
 
 BenchOptions ParseBenchOptions(const QCoreApplication& application) {
-  const auto text = [](const char* latin1) { return QString::fromLatin1(latin1); };
-  const QString default_link = QString::fromStdString((ConfigFolder() / "ports" / "com1").string());
-  const QCommandLineOption unit(text("unit"),
-                                text("ID of a unit, in hexadecimal; may be given repeatedly. "
-                                     "Default: 01 and 0A."),
-                                text("ID"));
-  const QCommandLineOption fault(
-      text("fault"), text("Lets a unit behave badly; without an ID the first one."), text("name[:ID]"));
-  const QCommandLineOption link(text("link"), text("Where to put the link to the device."), text("path"),
-                                default_link);
-  const QCommandLineOption no_echo(text("no-echo"),
-                                   text("Do not echo what the program sends, as adapters do that "
-                                        "switch their direction by themselves."));
-  const QCommandLineOption quiet(
-      text("quiet"), text("Do not print what crosses the line, nor the Control Panel's connections."));
-  const QCommandLineOption control_panel(
-      text("control-panel"),
-      text("Play the Control Panel too: hold the device until a program asks for it at this TCP port of "
-           "127.0.0.1. 0 lets the system choose one."),
-      text("TCP port"));
-  const QCommandLineOption panel_behaviour(
-      text("panel-behaviour"),
-      text("Lets the Control Panel behave badly; with a number, in its first replies only."),
-      text("name[:replies]"));
+  const CommandLine line;
   QCommandLineParser parser;
-  parser.setApplicationDescription(
-      text("Virtual units on a serial line of 19200 baud, for trying tendril-utility without hardware. The "
-           "line is\n"
-           "a pseudo-terminal; its link makes it a comm port of the utility.\n\nFaults:") +
-      ListOfFaults() + text("\n\nBehaviours of the Control Panel:") + ListOfPanelBehaviours() +
-      text(kOnTheName).arg(text(kControlPanelProgram)) +
-      text("\n\nEnds with 0 when it is stopped, with 1 for options that make no sense, and with 2 when the "
-           "device,\n"
-           "its link or the TCP port cannot be had."));
+  parser.setApplicationDescription(line.Description());
   parser.addHelpOption();
   parser.addVersionOption();
-  parser.addOptions({unit, fault, link, no_echo, control_panel, panel_behaviour, quiet});
+  parser.addOptions(
+      {line.unit, line.fault, line.link, line.no_echo, line.control_panel, line.panel_behaviour, line.quiet});
   parser.process(application);
   if (!parser.positionalArguments().isEmpty()) {
     throw std::invalid_argument("\"" + parser.positionalArguments().constFirst().toStdString() +
@@ -153,17 +162,18 @@ BenchOptions ParseBenchOptions(const QCoreApplication& application) {
   }
 
   BenchOptions options;
-  for (const QString& id : parser.values(unit)) options.units.push_back({.id = ParseUnitId(id)});
+  for (const QString& id : parser.values(line.unit)) options.units.push_back({.id = ParseUnitId(id)});
   if (options.units.empty()) options.units = {{.id = 0x01}, {.id = 0x0A}};
-  for (const QString& each : parser.values(fault)) AddFault(options.units, each);
-  options.link = parser.value(link).toStdString();
+  for (const QString& each : parser.values(line.fault)) AddFault(options.units, each);
+  options.link = parser.value(line.link).toStdString();
   if (options.link.empty()) throw std::invalid_argument("--link needs a path.");
-  options.echo = !parser.isSet(no_echo);
-  options.quiet = parser.isSet(quiet);
-  if (parser.isSet(control_panel)) options.panel = ParsePanel(parser.value(control_panel), options.link);
-  if (parser.isSet(panel_behaviour)) {
+  options.echo = !parser.isSet(line.no_echo);
+  options.quiet = parser.isSet(line.quiet);
+  if (parser.isSet(line.control_panel))
+    options.panel = ParsePanel(parser.value(line.control_panel), options.link);
+  if (parser.isSet(line.panel_behaviour)) {
     if (!options.panel) throw std::invalid_argument("--panel-behaviour needs --control-panel.");
-    SetBehaviour(*options.panel, parser.value(panel_behaviour));
+    SetBehaviour(*options.panel, parser.value(line.panel_behaviour));
   }
   return options;
 }

@@ -56,7 +56,6 @@ class VirtualControlPanelTest : public testing::Test {
 };
 
 TEST_F(VirtualControlPanelTest, Requests_AreDoneOrRefused) {
-  const std::string two_records = "\3\0\x0B\0\1\0\2\0\5\0abcde\0"s + "\1\0\0\0"s;
   const struct {
     std::string request;
     std::string reply;
@@ -66,35 +65,18 @@ TEST_F(VirtualControlPanelTest, Requests_AreDoneOrRefused) {
       {"C200002\7\0"s, "1200000"},         // not one of its ports
       {"C300009C200002\7\1"s, "1300000"},  // a repeated request
       {"C400002\3\2", "0400000"},
-      {"C500001\3", "0500000"},
       {"P600001\1", "1600000"},
       {"P700001\2", "0700000"},
       {"A800000", "1800000"},
       {"A900001x", "0900000"},
-      {"L000020" + two_records, "1000000"},
-      {"L100019" + two_records.substr(0, 19), "0100000"},
-      {"L200016" + two_records.substr(0, 15) + "x", "0200000"},  // padded with something
+      {"L200004\1\0\0\0"s, "1200000"},
       {"Z300002??", "0300000"},
       {"C400009D200002\3\0"s, "0400000"},  // another request inside is none
-      {"C500008C200002\3", "0500000"},     // nor is one that is cut off
-      {"P600002\1\1", "0600000"},
-      {"L700002\1\0"s, "0700000"},
-      {"L800004\5\0\0\0"s, "0800000"},                  // an unknown record
-      {"L900008\1\0\4\0abcd"s, "0900000"},              // one with too much data
-      {"L000004\0\0\x0C\0"s, "0000000"},                // an effect without its data
-      {"L100012\4\0\6\0\0\0\0\0\1\0\0\0"s, "0100000"},  // intensities, one less than their number
-      {"L200008\4\0\4\0\0\0\0\0"s, "0200000"},
-      {"L300044\0\0\x0C\0abcdefghijkl\2\0\x0C\0abcdefghijkl\4\0\6\0\0\0\0\0\0\0\0\0"s, "1300000"},
   };
   for (const auto& each : cases) EXPECT_EQ(Say(each.request), each.reply) << each.request;
-
-  EXPECT_EQ(panel_.requests().size(), std::size(cases));
   EXPECT_EQ(panel_.requests()[0],
             (PanelRequest{.identifier = 'I', .sequence = '0', .payload = Raw("Tendril Utility")}));
   EXPECT_TRUE(panel_.requests()[3].nested);
-  for (int i = 0; i < 1000; ++i) Say("A800000");
-  EXPECT_EQ(panel_.requests().size(), 1000u);
-  EXPECT_EQ(panel_.requests()[0].identifier, 'A') << "the oldest are forgotten";
 }
 
 TEST_F(VirtualControlPanelTest, Requests_ComeInAnyPieces) {
@@ -103,21 +85,17 @@ TEST_F(VirtualControlPanelTest, Requests_ComeInAnyPieces) {
   std::string byte_by_byte;
   for (const char byte : three) byte_by_byte += Say({&byte, 1});
   EXPECT_EQ(byte_by_byte, "110000012000001300000");
-  EXPECT_EQ(Say("I199999" + std::string(99'999, 'x')), "1100000");
 }
 
 TEST_F(VirtualControlPanelTest, Garbage_EndsTheConnectionAtItsFirstByte) {
-  for (const std::string begin : {"\1", "1", "[", "{", "Cx", "C0-", "C0000x"}) {
+  for (const std::string begin : {"1", "[", "Cx", "C0-", "C0000x"}) {
     PanelSession session(panel_, Connection());
     shown_.clear();
     session.Receive(Raw("A100000" + begin));
     EXPECT_EQ(std::exchange(said_, {}), "1100000<end>");
     EXPECT_EQ(shown_, ">A100000<1100000>" + begin);
     session.Receive(Raw("A200000"));
-    panel_.SetListener(PanelListener::kOff);  // ends those that have not ended
-    panel_.SetListener(PanelListener::kOpen);
-    EXPECT_EQ(std::exchange(said_, {}), begin == "\1" ? "<end>" : "")
-        << "the one that has said nothing wrong";
+    EXPECT_EQ(said_, "");
   }
 }
 
@@ -129,10 +107,17 @@ TEST_F(VirtualControlPanelTest, Port_IsGivenUpAndTakenBackOnce) {
   Say("C200002\3\0"s);
   Say("C300009C100002\3\1");  // repeated inside another: to no effect
   Say("C400002\4\0"s);
-  { PanelSession(panel_, Connection()).Receive(Raw("C500002\3\1")); }  // whoever asks
+  PanelSession(panel_, Connection()).Receive(Raw("C500002\3\1"));  // on any connection
   EXPECT_TRUE(panel_.Holds(3));
   EXPECT_FALSE(panel_.Holds(4));
   EXPECT_THAT(port_changes_, ElementsAre(Pair(3, false), Pair(3, true)));
+
+  panel_.SetBehaviour(PanelBehaviour::kRefuse, 1);
+  Say("C600002\3\0"s);
+  EXPECT_TRUE(panel_.Holds(3));
+  panel_.SetBehaviour(PanelBehaviour::kSilent, 1);
+  Say("C700002\3\0"s);  // heard and done
+  EXPECT_FALSE(panel_.Holds(3));
 }
 
 TEST_F(VirtualControlPanelTest, Behaviours_ShowInTheReply) {
@@ -163,40 +148,15 @@ TEST_F(VirtualControlPanelTest, Behaviours_ShowInTheReply) {
     EXPECT_EQ(said, each.said);
     EXPECT_EQ(Say("A200000"), "1200000");  // only the first reply was bad
   }
-  EXPECT_EQ(std::size(cases) + 1, PanelBehaviourKinds().size());  // all but the flood
-  EXPECT_EQ(FindPanelBehaviour("polite"), nullptr);
 }
 
-TEST_F(VirtualControlPanelTest, Flood_IsFarMoreThanAFrameAndEndsWithTheConnection) {
+TEST_F(VirtualControlPanelTest, Flood_IsFarMoreThanAFrame) {
   panel_.SetBehaviour(PanelBehaviour::kFlood);
-  {
-    PanelSession session(panel_, Connection());
-    session.Receive(Raw("A400000"));
-    time_.Advance(500);
-    EXPECT_EQ(said_.substr(0, 7), "1499999");
-    EXPECT_GT(said_.size(), 900'000u);
-    session.Receive(Raw("A500000"));
-    EXPECT_EQ(time_.RunningTimers(), 1);
-  }
-  EXPECT_EQ(time_.RunningTimers(), 0);
-}
-
-TEST_F(VirtualControlPanelTest, Refused_IsNotDone) {
-  panel_.SetBehaviour(PanelBehaviour::kRefuse, 1);
-  Say("C100002\3\0"s);
-  EXPECT_TRUE(panel_.Holds(3));
-  panel_.SetBehaviour(PanelBehaviour::kSilent, 1);
-  Say("C100002\3\0"s);  // heard and done
-  EXPECT_FALSE(panel_.Holds(3));
-}
-
-TEST_F(VirtualControlPanelTest, SlowReplies_KeepTheirOrder) {
-  panel_.SetBehaviour(PanelBehaviour::kSlow, 1);
-  Say("A100000A200000");
-  time_.Advance(599);
-  EXPECT_EQ(said_, "");
-  time_.Advance(1);
-  EXPECT_EQ(said_, "11000001200000");
+  PanelSession session(panel_, Connection());
+  session.Receive(Raw("A400000"));
+  time_.Advance(90);
+  EXPECT_EQ(said_.substr(0, 7), "1499999");
+  EXPECT_GT(said_.size(), 800'000u);
 }
 
 class VirtualTcpSocketTest : public testing::Test {
@@ -204,30 +164,20 @@ class VirtualTcpSocketTest : public testing::Test {
   static constexpr std::uint16_t kPort = 8837;
 
   VirtualTcpSocketTest() {
-    socket_.SetEvents(
-        {.connected = [this] { Note("connected"); },
-         .data_arrived = [this] { Note("data " + Text(socket_.Receive(7))); },
-         .ended = [this](std::int32_t number,
-                         const std::string& /*description*/) { Note("ended " + std::to_string(number)); }});
+    socket_.SetEvents({.connected = [this] { events_.push_back("connected"); },
+                       .data_arrived = [this] { events_.push_back("data " + Text(socket_.Receive(7))); },
+                       .ended =
+                           [this](std::int32_t number, const std::string& /*description*/) {
+                             events_.push_back("ended " + std::to_string(number));
+                           }});
   }
 
-  void Note(const std::string& event) {
-    EXPECT_FALSE(in_call_) << event;
-    events_.push_back(event);
-  }
-  // Calls the socket, which must not tell anything meanwhile.
-  template <typename Call>
-  void Quietly(const Call& call) {
-    in_call_ = true;
-    call();
-    in_call_ = false;
-  }
   std::vector<std::string> EventsOf(std::uint64_t ms) {
     time_.Advance(ms);
     return std::exchange(events_, {});
   }
   void ConnectAndWait() {
-    Quietly([&] { socket_.Connect("127.0.0.1", kPort); });
+    socket_.Connect("127.0.0.1", kPort);
     ASSERT_THAT(EventsOf(5), ElementsAre("connected"));
   }
 
@@ -235,24 +185,21 @@ class VirtualTcpSocketTest : public testing::Test {
   VirtualControlPanel panel_{time_};
   VirtualTcpSocket socket_{panel_, kPort, time_};
   std::vector<std::string> events_;
-  bool in_call_ = false;
 };
 
 TEST_F(VirtualTcpSocketTest, RequestAndReply_CrossAfterTheConnect) {
   socket_.SetLocalPort(4000);
-  Quietly([&] { socket_.Connect("127.0.0.1", kPort); });
+  socket_.Connect("127.0.0.1", kPort);
   EXPECT_EQ(socket_.State(), TcpState::kConnecting);
-  socket_.Send(Raw(kPhysicalLightsOn));  // too early: ignored
   EXPECT_THAT(EventsOf(5), ElementsAre("connected"));
   EXPECT_EQ(socket_.State(), TcpState::kConnected);
   EXPECT_EQ(socket_.LocalPort(), 4000);
 
-  Quietly([&] { socket_.Send(Raw(kPhysicalLightsOn)); });
+  socket_.Send(Raw(kPhysicalLightsOn));
   EXPECT_THAT(EventsOf(5), ElementsAre("data 1700000"));
-  EXPECT_THAT(socket_.Receive(100), IsEmpty());
   EXPECT_EQ(panel_.requests().size(), 1u);
 
-  Quietly([&] { socket_.Close(); });
+  socket_.Close();
   EXPECT_THAT(EventsOf(100), IsEmpty());
   EXPECT_EQ(panel_.connections(), 0u);
   socket_.SetLocalPort(0);
@@ -270,12 +217,11 @@ TEST_F(VirtualTcpSocketTest, NoPanel_RefusesOrStaysSilent) {
   } cases[] = {
       {"127.0.0.1", kPort, PanelListener::kOff, {"ended 10061"}, TcpState::kClosed},
       {"127.0.0.1", 1, PanelListener::kOpen, {"ended 10061"}, TcpState::kClosed},
-      {"192.0.2.1", kPort, PanelListener::kOpen, {"ended 10061"}, TcpState::kClosed},
       {"127.0.0.1", kPort, PanelListener::kStuck, {}, TcpState::kConnecting},
   };
   for (const auto& each : cases) {
     panel_.SetListener(each.listener);
-    Quietly([&] { socket_.Connect(each.host, each.port); });
+    socket_.Connect(each.host, each.port);
     EXPECT_EQ(EventsOf(60'000), each.events);
     EXPECT_EQ(socket_.State(), each.state);
   }
@@ -284,35 +230,24 @@ TEST_F(VirtualTcpSocketTest, NoPanel_RefusesOrStaysSilent) {
   ConnectAndWait();  // once more, from within an attempt
 }
 
-TEST_F(VirtualTcpSocketTest, PanelThatEnds_IsToldAfterItsLastWords) {
+TEST_F(VirtualTcpSocketTest, PanelThatEnds_IsReportedAfterItsLastData) {
   ConnectAndWait();
-  Quietly([&] {
-    socket_.Send(Raw(kPhysicalLightsOn));
-    panel_.SetListener(PanelListener::kOff);
-  });
+  socket_.Send(Raw(kPhysicalLightsOn));
+  panel_.SetListener(PanelListener::kOff);
+  EXPECT_THAT(events_, IsEmpty()) << "no event comes from within a call";
   EXPECT_EQ(socket_.State(), TcpState::kConnected);
   EXPECT_THAT(EventsOf(5), ElementsAre("data 1700000", "ended 10054"));
   EXPECT_EQ(socket_.State(), TcpState::kClosed);
 }
 
-TEST_F(VirtualTcpSocketTest, Close_LetsTheLastRequestThroughAndNoEvent) {
-  panel_.AddPort(3);
-  ConnectAndWait();
-  Quietly([&] {
-    socket_.Send(Raw("C100002\3\0"s));
-    socket_.Close();
-  });
-  EXPECT_FALSE(panel_.Holds(3));
-  EXPECT_THAT(EventsOf(100), IsEmpty());
-
-  // From within an event, with another one due.
+TEST_F(VirtualTcpSocketTest, ReconnectInAnEvent_DropsTheEventsThatAreDue) {
   ConnectAndWait();
   TcpEvents reconnecting;
   reconnecting.data_arrived = [this] {
-    Note("data");
+    events_.push_back("data");
     socket_.Connect("127.0.0.1", kPort);
   };
-  reconnecting.ended = [this](std::int32_t, const std::string&) { Note("ended"); };
+  reconnecting.ended = [this](std::int32_t, const std::string&) { events_.push_back("ended"); };
   socket_.SetEvents(std::move(reconnecting));
   panel_.SetBehaviour(PanelBehaviour::kCloseInMiddle);
   socket_.Send(Raw(kPhysicalLightsOn));

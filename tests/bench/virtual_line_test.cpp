@@ -96,22 +96,15 @@ TEST_F(VirtualLineTest, Echo_FollowsTheAdapter) {
 TEST_F(VirtualLineTest, OtherSpeed_MakesGarbageOfWhatTheOtherEndHears) {
   ScriptedUnit unit({0xFE, 0x30, 0});
   UseLine({.driver_follows_rts = false}, {&unit});
-  Write({0x11}, 0);
+  Write({0x88}, 0);
   line->AdvanceTo(600);
   line->SetProgramBaud(9600, 600);
-  Write({0x22}, 600);
-  line->AdvanceTo(2'000);
-  EXPECT_THAT(arrived,
-              ElementsAre(Pair(0x11, 521), Pair(0x22, 1'642)));  // twice as long, and its own echo whole
-  EXPECT_THAT(Values(listener.heard), ElementsAre(0x11, Not(0x22)));
-
-  line->SetProgramBaud(19200, 2'000);
-  Write({0x88}, 2'000);
-  line->AdvanceTo(2'600);
-  line->SetProgramBaud(9600, 2'600);
   line->AdvanceTo(10'000);
-  EXPECT_THAT(Values(arrived), ElementsAre(0x11, 0x22, 0x88, Not(0xFE), Not(0x30), Not(0)));
-  EXPECT_EQ(line->counters().garbled_bytes, 0u) << "the line itself carried them whole";
+  Write({0x22}, 10'000);
+  line->AdvanceTo(20'000);
+  EXPECT_THAT(Values(arrived), ElementsAre(0x88, Not(0xFE), Not(0x30), Not(0), 0x22));
+  EXPECT_EQ(arrived.back().second, 11'042u);  // twice as long, and its own echo whole
+  EXPECT_NE(listener.heard.back().first, 0x22);
 }
 
 TEST_F(VirtualLineTest, Driver_KeepsTheUnitFromBeingHeardWhileRtsIsUp) {
@@ -119,13 +112,13 @@ TEST_F(VirtualLineTest, Driver_KeepsTheUnitFromBeingHeardWhileRtsIsUp) {
   const struct {
     VirtualLineOptions options;
     std::uint64_t released_us;  // the reply runs from 1521 on
-    std::size_t heard, lost_pads, garbled;
+    std::size_t heard, garbled;
   } cases[] = {
-      {{}, 700, 6, 0, 0},
-      {{}, 30'000, 4, 2, 4},
-      {{}, 2'100, 4, 2, 0},  // within the second pad, which is lost as well
-      {{.driver_follows_rts = false}, 30'000, 6, 0, 0},
-      {{.echo = false}, 30'000, 6, 0, 0},  // the adapter's own doing
+      {{}, 700, 6, 0},
+      {{}, 30'000, 4, 4},
+      {{}, 2'100, 4, 0},  // within the second pad, which is lost as well
+      {{.driver_follows_rts = false}, 30'000, 6, 0},
+      {{.echo = false}, 30'000, 6, 0},  // the adapter's own doing
   };
   for (const auto& each : cases) {
     SCOPED_TRACE(each.released_us);
@@ -144,7 +137,6 @@ TEST_F(VirtualLineTest, Driver_KeepsTheUnitFromBeingHeardWhileRtsIsUp) {
       EXPECT_THAT(Values(arrived), Not(Contains(AnyOf(0x00, 0xFE, 10))));
     }
     EXPECT_EQ(line->counters().garbled_bytes, each.garbled);
-    EXPECT_EQ(line->counters().lost_pads, each.lost_pads);
   }
 }
 
@@ -197,7 +189,6 @@ TEST_F(VirtualLineTest, ProgramTalksIntoReply_IsNoticedUnlessOnlyPadsSuffer) {
   Write({0x11}, 1'600);
   line->AdvanceTo(20'000);
   EXPECT_EQ(Values(listener.heard), (Bytes{0x88, 0x11, 0, 0xFE, 0}));
-  EXPECT_EQ(line->counters().lost_pads, 2u);
   EXPECT_EQ(line->counters().garbled_bytes, 0u);
   EXPECT_EQ(line->counters().program_talked_into_reply, 0u);
 }

@@ -10,7 +10,7 @@
 
 #include "platform/serial_device.h"
 
-namespace tendril {
+namespace tendril::test {
 
 // Hands everything on to another device. On an echoing line the bytes that come in are all bytes on the wire,
 // each once.
@@ -43,10 +43,10 @@ class CountingDevice final : public SerialDevice {
 
   std::size_t sent = 0;
   std::size_t received = 0;
-  std::function<void(std::span<const std::uint8_t>)> on_write;  // shown each packet when it is written
+  std::function<void(std::span<const std::uint8_t>)> on_write;  // called with each packet before it is written
 
  private:
   SerialDevice& device_;
 };
 
-}  // namespace tendril
+}  // namespace tendril::test
