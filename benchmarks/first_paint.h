@@ -1,25 +1,16 @@
 // FirstPaint: ends a program once its window has been painted.
 #pragma once
 
-#include <unistd.h>
-
 #include <QApplication>
 #include <QEvent>
 #include <cstdio>
 #include <cstdlib>
-#include <fstream>
+
+#include "measuring.h"
 
 namespace tendril {
 
-// Resident memory of this process in KiB.
-inline long ResidentKib() {
-  long pages = 0;
-  long resident = 0;
-  std::ifstream("/proc/self/statm") >> pages >> resident;
-  return resident * (sysconf(_SC_PAGESIZE) / 1024);
-}
-
-// Prints the resident memory once the window, or what covers it, has been painted, and ends the process.
+// Prints the resident memory in MiB once the window, or what covers it, has been painted, and ends the process.
 class FirstPaint : public QObject {
  public:
   FirstPaint() { qApp->installEventFilter(this); }
@@ -31,7 +22,7 @@ class FirstPaint : public QObject {
     QMetaObject::invokeMethod(
         qApp,
         [] {
-          std::printf("%ld\n", ResidentKib());
+          std::printf("%f\n", ResidentBytes() / (1024 * 1024));
           std::fflush(stdout);
           std::_Exit(EXIT_SUCCESS);
         },

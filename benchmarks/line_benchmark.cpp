@@ -12,7 +12,6 @@
 #include "config/option_bytes.h"
 #include "measured_window.h"
 #include "measuring.h"
-#include "run_benchmark.h"
 #include "simulator/servo_simulator.h"
 
 namespace tendril {

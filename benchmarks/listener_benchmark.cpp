@@ -17,7 +17,6 @@
 #include "measuring.h"
 #include "platform/qt/qt_tcp_socket.h"
 #include "platform/qt/qt_timer.h"
-#include "run_benchmark.h"
 
 namespace tendril {
 namespace {

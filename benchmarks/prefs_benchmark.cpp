@@ -3,8 +3,6 @@
 #include <QFileInfo>
 #include <QTemporaryDir>
 #include <cstdio>
-#include <cstdlib>
-#include <exception>
 #include <stdexcept>
 #include <string>
 #include <vector>
@@ -75,11 +73,4 @@ bool Measure() {
 }  // namespace
 }  // namespace tendril
 
-int main() {
-  try {
-    return tendril::Measure() ? EXIT_SUCCESS : EXIT_FAILURE;
-  } catch (const std::exception& fault) {
-    std::printf("%s\n", fault.what());
-    return EXIT_FAILURE;
-  }
-}
+int main(int argc, char** argv) { return tendril::RunBenchmark(argc, argv, tendril::Measure); }

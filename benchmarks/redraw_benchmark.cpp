@@ -17,7 +17,6 @@
 #include <vector>
 
 #include "measuring.h"
-#include "run_benchmark.h"
 #include "serial/hw_serial.h"
 #include "simulator/servo_simulator.h"
 #include "support/find_control.h"

@@ -6,14 +6,14 @@
 #include <QProcess>
 #include <QTemporaryDir>
 #include <cstdio>
-#include <cstdlib>
+#include <stdexcept>
+#include <string>
 #include <vector>
 
 #include "measuring.h"
 
+namespace tendril {
 namespace {
-
-using tendril::Median;
 
 constexpr int kRuns = 25;
 constexpr double kMaxRatio = 1.5;
@@ -25,14 +25,13 @@ struct Measure {
 void RunOnce(const char* program, Measure& measure) {
   const QString path = QDir(QCoreApplication::applicationDirPath()).filePath(QString::fromLatin1(program));
   QProcess child;
-  const tendril::Stopwatch stopwatch;
+  const Stopwatch stopwatch;
   child.start(path, QStringList());
   if (!child.waitForReadyRead(20000)) {
-    std::printf("%s does not paint its window\n", program);
-    std::exit(EXIT_FAILURE);
+    throw std::runtime_error(std::string(program) + " does not paint its window");
   }
   measure.ms.push_back(stopwatch.Ms());
-  measure.mib.push_back(child.readAllStandardOutput().trimmed().toDouble() / 1024);
+  measure.mib.push_back(child.readAllStandardOutput().trimmed().toDouble());
   child.waitForFinished();
 }
 
@@ -50,17 +49,11 @@ bool ReportBoth(const Measure& program, const char* other_what, const Measure& o
   return fast && small;
 }
 
-}  // namespace
-
-int main(int argc, char** argv) {
-  if (!qEnvironmentVariableIsSet("QT_QPA_PLATFORM")) qputenv("QT_QPA_PLATFORM", "offscreen");
-  QCoreApplication application(argc, argv);
+bool MeasureAll() {
   const QTemporaryDir folder;  // no port of this machine is looked at
   qputenv("XDG_CONFIG_HOME", folder.path().toUtf8());
 
-  Measure program;
-  Measure empty;
-  Measure plain;
+  Measure program, empty, plain;
   for (int run = 0; run < kRuns + 1; ++run) {
     RunOnce("empty_window", empty);
     RunOnce("plain_window", plain);
@@ -70,5 +63,10 @@ int main(int argc, char** argv) {
   // The first is the target; what Qt itself takes for the controls is beyond it already, so the second decides.
   if (!ReportBoth(program, "empty window", empty))
     std::printf("  the target against an empty window is MISSED\n");
-  return ReportBoth(program, "window of plain controls", plain) ? EXIT_SUCCESS : EXIT_FAILURE;
+  return ReportBoth(program, "window of plain controls", plain);
 }
+
+}  // namespace
+}  // namespace tendril
+
+int main(int argc, char** argv) { return tendril::RunBenchmark(argc, argv, tendril::MeasureAll); }

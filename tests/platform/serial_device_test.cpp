@@ -286,7 +286,7 @@ TEST_F(SerialDeviceTest, Unplugged_IsReportedOnceQuietlyAndThePortOpensAgain) {
 
 TEST_F(SerialDeviceTest, DeviceThatGoesWithoutAWord_IsNoticedWithinASecond) {
   Open();
-  Adapter().gone_without_a_word = true;
+  Adapter().gone_silently = true;
   EXPECT_TRUE(WaitFor([&] { return !events_.empty(); }, 1500));
   EXPECT_THAT(events_, ElementsAre(SerialEvent::kDeviceLost));
 }

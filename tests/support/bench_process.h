@@ -33,7 +33,7 @@ class BenchProcess {
   }
   ~BenchProcess() { Kill(); }
 
-  // Starts the bench and waits until its device is there. `printing`: it says what crosses the line.
+  // Starts the bench and waits until its device is there. `printing`: it prints what crosses the line.
   void Start(const QStringList& options = {}, bool printing = false) {
     process_.setStandardOutputFile(folder_.filePath(QStringLiteral("bench.txt")));
     const QStringList quiet = printing ? QStringList() : QStringList{QStringLiteral("--quiet")};
@@ -45,7 +45,7 @@ class BenchProcess {
       QThread::msleep(2);
     }
   }
-  // Pulls the plug: the device is gone at once.
+  // Unplugs: the device is gone at once.
   void Kill() {
     process_.kill();
     process_.waitForFinished();
@@ -56,8 +56,8 @@ class BenchProcess {
     QFile file(folder_.filePath(QStringLiteral("bench.txt")));
     return file.open(QIODevice::ReadOnly) ? file.readAll().toStdString() : std::string();
   }
-  // Gives this process a registry, as its editor exports it, with a comm listener's TCP port where nobody
-  // listens yet. Returns the port: "--control-panel" takes it.
+  // Gives this process a registry, as its editor exports it, with a comm listener's TCP port where nothing
+  // listens yet. Returns the port, for "--control-panel".
   QString WriteRegistry() {
     QTcpServer finder;
     if (!finder.listen(QHostAddress::LocalHost)) throw std::runtime_error("there is no free TCP port");
@@ -77,7 +77,7 @@ class BenchProcess {
   }
   // Its process, while it runs.
   qint64 ProcessId() const { return process_.processId(); }
-  // Where the link to the device stands.
+  // The path of the link to the device.
   QString Link() const { return folder_.filePath(QStringLiteral("kelvane/ports/com1")); }
 
  private:

@@ -15,7 +15,7 @@
 namespace tendril::test {
 namespace {
 
-int adapter_descriptor = -1;  // which was set up as a serial port last
+int adapter_descriptor = -1;  // that was set up as a serial port last
 std::uint64_t reads = 0;
 
 // Descriptors are used again for other files.
@@ -143,7 +143,7 @@ extern "C" ssize_t write(int descriptor, const void* bytes, std::size_t size) {
 extern "C" int poll(pollfd* states, nfds_t count, int timeout_ms) {
   using namespace tendril::test;
   static auto* const real = Real<int(pollfd*, nfds_t, int)>("poll");
-  if (count == 1 && IsAdapter(states->fd) && Adapter().gone_without_a_word) {
+  if (count == 1 && IsAdapter(states->fd) && Adapter().gone_silently) {
     states->revents = POLLHUP;
     return 1;
   }

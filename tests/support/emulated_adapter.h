@@ -8,7 +8,7 @@
 
 namespace tendril::test {
 
-// A pseudo-terminal has no RTS line and no driver settings, keeps no parity and no character size, and reports its end
+// A pseudo-terminal has no RTS line and no driver settings, keeps no parity and no character size, and reports a hang-up
 // in every way at once. emulated_adapter.cpp, compiled into a test program, takes the calls ioctl, read, write and poll of
 // the whole process and adds what is missing, for the pseudo-terminal that was set up as a serial port last; all other
 // calls pass unchanged. Linux only.
@@ -28,13 +28,13 @@ struct EmulatedAdapter {
   // What the driver does.
   std::function<int(bool asserted)> rts_error;  // the error number of a turn of RTS; 0 or none: it obeys
   std::uint32_t empty_read_every =
-      0;                  // every so many reads find nothing; with the error number of an earlier call
-  int write_error = 0;    // the error number of each write; 0: none
-  int queued_output = 0;  // bytes in the driver, not sent yet
-  bool gone_without_a_word = false;  // only who asks learns that the device has gone
-  std::uint32_t fixed_baud = 0;      // the only speed that it can do; 0: all
+      0;                         // every so many reads find nothing; with the error number of an earlier call
+  int write_error = 0;           // the error number of each write; 0: none
+  int queued_output = 0;         // bytes in the driver, not sent yet
+  bool gone_silently = false;    // poll() reports that the device has gone, and no event does
+  std::uint32_t fixed_baud = 0;  // the only speed that it can do; 0: all
 
-  // What was asked of it.
+  // What the program asked of it.
   std::vector<LineSettings> settings;  // each time
   std::vector<bool> rts;               // each turn that it obeyed
   std::vector<int> flushes;            // TCIFLUSH, TCOFLUSH or TCIOFLUSH
@@ -42,7 +42,7 @@ struct EmulatedAdapter {
   std::uint64_t empty_reads = 0;  // reads that found nothing
 };
 
-// The adapters of this process share it.
+// Shared by the adapters of this process.
 EmulatedAdapter& Adapter();
 
 }  // namespace tendril::test

@@ -1,4 +1,4 @@
-// RecordingDevice: a serial port that notes what is done to it and receives what a test hands it.
+// RecordingDevice: a serial port that records what is done to it and receives what a test hands it.
 #pragma once
 
 #include <functional>
@@ -47,10 +47,10 @@ class RecordingDevice final : public SerialDevice {
   void ClearInput() override { input.clear(); }
   std::size_t PendingOutput() const override { return pending_output; }
 
-  // The line brings `bytes`; with `tell` false nobody is told yet.
-  void Receive(const Bytes& bytes, bool tell = true) {
+  // `bytes` arrive; with `report` false without an event yet.
+  void Receive(const Bytes& bytes, bool report = true) {
     input.insert(input.end(), bytes.begin(), bytes.end());
-    if (tell) handler_(SerialEvent::kDataReceived);
+    if (report) handler_(SerialEvent::kDataReceived);
   }
   void Raise(SerialEvent event) { handler_(event); }
   // Takes what was written since the last call, write by write.

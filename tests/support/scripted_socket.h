@@ -23,7 +23,7 @@ class ScriptedSocket final : public TcpSocket {
  public:
   void SetEvents(TcpEvents events) override { events_ = std::move(events); }
   void Connect(const std::string& host, std::uint16_t port) override {
-    ThrowIfToldTo();
+    ThrowFault();
     attempts.push_back(host + ":" + std::to_string(port));
     used_local_port = local_port_;
     state_ = TcpState::kConnecting;
@@ -36,11 +36,11 @@ class ScriptedSocket final : public TcpSocket {
   void SetLocalPort(std::uint16_t port) override { local_port_ = port; }
   std::uint16_t LocalPort() const override { return state_ == TcpState::kConnected ? 40000 : local_port_; }
   void Send(std::span<const std::uint8_t> bytes) override {
-    ThrowIfToldTo();
+    ThrowFault();
     sent.emplace_back(bytes.begin(), bytes.end());
   }
   Bytes Receive(std::size_t limit) override {
-    ThrowIfToldTo();
+    ThrowFault();
     const auto end = waiting_.begin() + static_cast<std::ptrdiff_t>(std::min(limit, waiting_.size()));
     Bytes taken(waiting_.begin(), end);
     waiting_.erase(waiting_.begin(), end);
@@ -70,7 +70,7 @@ class ScriptedSocket final : public TcpSocket {
   std::optional<RuntimeError> fault;  // what the next call to the network raises
 
  private:
-  void ThrowIfToldTo() {
+  void ThrowFault() {
     if (fault) throw *std::exchange(fault, std::nullopt);
   }
 

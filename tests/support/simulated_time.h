@@ -16,7 +16,7 @@ namespace tendril::test {
 // timers of the same moment in the order in which their periods began.
 class SimulatedTime final : public Clock, public TimerFactory {
  public:
-  // `start_ms` is the first reading of the clock; near 2^32 it tries the wrap.
+  // `start_ms` is the first reading of the clock; near 2^32 it covers the wrap.
   explicit SimulatedTime(std::uint32_t start_ms = 1000) : start_ms_(start_ms) {}
 
   std::uint32_t NowMs() const override { return start_ms_ + static_cast<std::uint32_t>(elapsed_ms_); }
@@ -27,10 +27,10 @@ class SimulatedTime final : public Clock, public TimerFactory {
 
   // Lets `ms` milliseconds pass. May be called from within a tick: a message box that runs the event loop.
   void Advance(std::uint64_t ms);
-  // Advances by single milliseconds until `done` or until `limit_ms` have passed; tells whether `done` held.
+  // Advances by single milliseconds until `done` or until `limit_ms` have passed; returns whether `done` held.
   bool AdvanceUntil(const std::function<bool()>& done, std::uint64_t limit_ms);
 
-  // Who is called after each tick, when all of it is over.
+  // Called after each tick, when all of it is over.
   void SetObserver(std::function<void()> observer) { observer_ = std::move(observer); }
 
   std::uint64_t ElapsedMs() const { return elapsed_ms_; }

@@ -1,4 +1,4 @@
-// SimulatedWorld: everything that the program touches, in the hands of a test.
+// SimulatedWorld: all that the program touches, under the control of a test.
 #pragma once
 
 #include <memory>
