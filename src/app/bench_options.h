@@ -1,4 +1,4 @@
-// What tendril-bench is asked for on its command line.
+// The command line of tendril-bench.
 #pragma once
 
 #include <QCoreApplication>
@@ -34,7 +34,7 @@ struct BenchOptions {
 };
 
 // Reads the command line of `application`. Ends the process for --help, --version and unknown options. Raises
-// std::invalid_argument for values that make no sense.
+// std::invalid_argument for invalid values.
 BenchOptions ParseBenchOptions(const QCoreApplication& application);
 
 }  // namespace tendril

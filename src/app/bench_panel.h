@@ -1,5 +1,5 @@
-// BenchPanel: the Control Panel beside a bench's serial line, which has the line's device open until a program
-// asks for it.
+// BenchPanel: the Control Panel beside a bench's serial line, which holds the line's device until a program asks for
+// it.
 #pragma once
 
 #include <QTimer>
@@ -25,7 +25,7 @@ class BenchPanel {
   BenchPanel(const BenchPanelOptions& options, const PseudoTerminal& terminal, TimerFactory& timers,
              std::function<void(const std::string&)> print);
 
-  // Prints the coming and going of connections and what crosses them, with times from `now_us`.
+  // Prints each connection that begins or ends and what crosses it, with times from `now_us`.
   void ShowConnections(std::function<std::uint64_t()> now_us);
   // The TCP port where it listens.
   std::uint16_t tcp_port() const { return server_.port(); }

@@ -1,4 +1,4 @@
-// Console: what a program prints for a person.
+// Console: what a program prints for the user.
 #pragma once
 
 #include <cstdio>
@@ -6,7 +6,7 @@
 
 namespace tendril {
 
-// Standard output, written when the line has been served, because a slow reader holds a writer up.
+// Standard output, written after the line has been served, because a slow reader delays the writer.
 class Console {
  public:
   void Print(const std::string& text) { waiting_ += text + "\n"; }

@@ -11,7 +11,7 @@
 namespace tendril {
 namespace {
 
-// Bytes that wait in the program at most. When they are not taken, the peer is held back.
+// Received bytes that wait at most. Beyond that, TCP holds the sender back.
 constexpr qint64 kReadBufferBytes = qint64{64} * 1024;
 
 }  // namespace
@@ -25,11 +25,11 @@ ControlPanelServer::ControlPanelServer(VirtualControlPanel& panel, std::uint16_t
   });
   if (!server_.listen(QHostAddress::LocalHost, port)) {
     throw std::runtime_error("TCP port " + std::to_string(port) +
-                             " is not to be had: " + server_.errorString().toStdString() + ".");
+                             " is not available: " + server_.errorString().toStdString() + ".");
   }
 }
 
-// The session goes with its socket, which is never in the middle of a call then.
+// The session ends with its socket, which is in no call at that time.
 void ControlPanelServer::Accept(QTcpSocket* socket) {
   socket->setReadBufferSize(kReadBufferBytes);
   socket->setSocketOption(QAbstractSocket::LowDelayOption, 1);

@@ -14,8 +14,8 @@ namespace tendril {
 
 class ControlPanelServer {
  public:
-  // Listens on 127.0.0.1 at `port`; 0 lets the system choose one. `note` is told in a sentence who comes and goes.
-  // Raises std::runtime_error when the port is not to be had. The panel must outlive the server.
+  // Listens on 127.0.0.1 at `port`; 0 lets the system choose one. `note` gets a sentence for each connection that
+  // begins or ends. Raises std::runtime_error when the port is not available. The panel must outlive the server.
   ControlPanelServer(VirtualControlPanel& panel, std::uint16_t port,
                      std::function<void(const std::string&)> note);
 

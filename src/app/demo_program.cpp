@@ -11,7 +11,7 @@
 namespace tendril {
 namespace {
 
-// Pads enough for the program to release the line in time even when its window has just been painting.
+// Enough pads for the program to release the line in time even when its window has just been painted.
 constexpr ReplyTiming kPatient{.turn_round_us = 2000, .pads = 45};
 
 // The default of the network preferences.

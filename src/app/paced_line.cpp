@@ -8,11 +8,11 @@
 namespace tendril {
 namespace {
 
-// A timer counts whole milliseconds and may be late by one, so that it is of use from two on. Less than that
-// is waited for at the descriptor, which wakes up within a tenth of a millisecond, and at once for new input.
+// A timer counts whole milliseconds and may be late by one, so it is of use from two on. Shorter waits are at the
+// descriptor, which wakes up within a tenth of a millisecond, and at once for new input.
 constexpr std::uint64_t kFineWaitUs = 2000;
 
-// A program that sends faster than the line goes is held up, as by any serial port, when this much waits.
+// A program that sends faster than the line is held up, as by any serial port, when this much waits.
 constexpr std::size_t kQueueLimit = 4096;
 
 }  // namespace
@@ -28,7 +28,7 @@ PacedLine::PacedLine(const PseudoTerminal& terminal, VirtualLine& line, Console&
   line_.SetProgramHandler([this](std::uint8_t byte, std::uint64_t /*at_us*/) {
     if (!program_heard_) return;
     const bool taken = terminal_.Write({&byte, 1});
-    if (!taken && program_reads_) console_.Print("-- The program does not read: bytes to it get lost.");
+    if (!taken && program_reads_) console_.Print("-- The program does not read: bytes to it are lost.");
     program_reads_ = taken;
   });
   timer_.setTimerType(Qt::PreciseTimer);
@@ -48,8 +48,8 @@ std::uint64_t PacedLine::NowUs() const {
   return static_cast<std::uint64_t>(std::chrono::duration_cast<std::chrono::microseconds>(elapsed).count());
 }
 
-// Serves the line once and sees to it that this happens again when it is time. A line that is never silent
-// still leaves the event loop its turn after every byte.
+// Serves the line once and sets the timer for the next time. A line that is never silent still returns to the event
+// loop after every byte.
 void PacedLine::Step() {
   line_.AdvanceTo(NowUs());
   std::optional<std::uint64_t> next_us = line_.NextEventUs();
@@ -97,8 +97,8 @@ void PacedLine::FollowSpeed() {
                  (baud == line_.options().baud ? " baud." : " baud: the units do not understand that."));
 }
 
-// What the program had sent still crosses the line, as it would from any serial port. What comes back has
-// nobody to read it, and is not kept for the next program.
+// What the program had sent still crosses the line, as it would from any serial port. What comes back is
+// dropped: it is not for the next program.
 void PacedLine::OnClosing() {
   TakeInput();
   if (terminal_.ProgramHasGone()) {

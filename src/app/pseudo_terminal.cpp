@@ -40,7 +40,7 @@ bool IsPseudoTerminal(const fs::path& device) {
 }  // namespace
 
 PseudoTerminal::PseudoTerminal() {
-  constexpr char kNone[] = "The system has no pseudo-terminal to give";
+  constexpr char kNone[] = "The system has no pseudo-terminal left";
   try {
     far_end_ = Checked(::posix_openpt(O_RDWR | O_NOCTTY), kNone);
     Checked(::grantpt(far_end_), kNone);

@@ -13,7 +13,7 @@
 
 namespace tendril {
 
-// Programs may open and close the device as often as they like; it lasts until this object goes. Nothing here
+// Programs may open and close the device as often as they like; it lasts as long as this object. Nothing here
 // waits, apart from WaitForInput().
 class PseudoTerminal {
  public:
@@ -27,7 +27,7 @@ class PseudoTerminal {
   const std::string& device() const { return device_; }
   // Readable when the program has sent something.
   int input_descriptor() const { return far_end_; }
-  // Readable when somebody has closed the device; -1 where the system does not tell.
+  // Readable when a program has closed the device; -1 where the system does not report that.
   int closing_descriptor() const { return closings_; }
 
   // Takes what the program has sent.
@@ -41,10 +41,10 @@ class PseudoTerminal {
   std::uint32_t ProgramBaud() const { return LineSpeed(near_end_); }
 
   // To be called when closing_descriptor() is readable. True when no program has the device open any more:
-  // what nobody has read yet, at either end, is dropped then, and the device is as at the beginning.
+  // unread bytes, at either end, are dropped then, and the device is as at the beginning.
   bool ProgramHasGone() const;
-  // Forgets who has closed the device so far. To be called when this process itself has just let go of it: the
-  // next program may be there already.
+  // Drops pending notifications of closing_descriptor(). To be called when this process itself has just closed the
+  // device: the next program may be there already.
   void ForgetClosings() const;
 
  private:
@@ -60,7 +60,7 @@ class PseudoTerminal {
 class DeviceLink {
  public:
   // Makes `link` point to `device`, with the folders that it needs. A link that leads nowhere or to another
-  // pseudo-terminal is replaced. Raises std::runtime_error for anything else that stands in the way.
+  // pseudo-terminal is replaced. Raises std::runtime_error for any other file there.
   DeviceLink(const std::filesystem::path& link, const std::filesystem::path& device);
   // Removes the link if it still points to the device.
   ~DeviceLink();

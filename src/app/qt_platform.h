@@ -1,4 +1,4 @@
-// QtPlatform: what the programs stand on, apart from the serial device.
+// QtPlatform: the Qt adapters of the programs, apart from the serial device.
 #pragma once
 
 #include <string>

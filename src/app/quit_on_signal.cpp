@@ -12,7 +12,7 @@ namespace {
 
 constexpr std::array kSignals{SIGINT, SIGTERM, SIGHUP};
 
-// A signal handler reaches nothing else.
+// A signal handler can reach no member.
 std::array<int, 2> wake_pipe{-1, -1};
 
 int OpenPipe() {

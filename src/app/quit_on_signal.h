@@ -1,4 +1,4 @@
-// QuitOnSignal: the system's request to end the program, as the event loop hears it.
+// QuitOnSignal: the system's request to end the program, delivered by the event loop.
 #pragma once
 
 #ifndef _WIN32  // there the system closes the windows instead
@@ -8,12 +8,11 @@
 
 namespace tendril {
 
-// While it lives, Ctrl+C, a closed terminal and the end of the session quit the application as a person does: its
-// windows are asked to close first. What was set to be ignored stays so. One at a time; make it after the
-// QCoreApplication.
+// While it lives, Ctrl+C, a closed terminal and the end of the session quit the application as a user does: its
+// windows are asked to close first. Ignored signals stay ignored. One at a time; make it after the QCoreApplication.
 class QuitOnSignal {
  public:
-  // Raises std::system_error when the system has no pipe to give.
+  // Raises std::system_error when the system has no pipe left.
   QuitOnSignal();
   ~QuitOnSignal();
   QuitOnSignal(const QuitOnSignal&) = delete;

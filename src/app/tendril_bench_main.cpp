@@ -77,8 +77,8 @@ int Run(QCoreApplication& application, const BenchOptions& options) {
 #ifdef __linux__
   ::prctl(PR_SET_TIMERSLACK, 1'000);  // ns; by default waits are 50 us longer, a tenth of a byte
 #endif
-  const QuitOnSignal quit_on_signal;  // so that everything is put away
-  std::signal(SIGPIPE, SIG_IGN);      // nobody reads what is printed: go on
+  const QuitOnSignal quit_on_signal;  // so that the link is removed
+  std::signal(SIGPIPE, SIG_IGN);      // goes on when the output is not read
   const PseudoTerminal terminal;
   // A pseudo-terminal has no RTS: the adapter at its far end goes by what the program sends.
   VirtualLine line({.echo = options.echo, .driver_follows_rts = false});
@@ -102,7 +102,7 @@ int Run(QCoreApplication& application, const BenchOptions& options) {
     ::prctl(PR_SET_NAME, kControlPanelProgram);
 #endif
   }
-  // Last of all: who finds the link finds everything there.
+  // Last of all: a program that finds the link finds everything ready.
   const DeviceLink link(options.link, terminal.device());
   Introduce(console, options, terminal, link, panel.get());
   return application.exec();

@@ -16,9 +16,9 @@
 
 namespace tendril {
 
-// The parts on this computer's real adapters, handed to each other. A QApplication must exist; the window is not shown
-// yet. For support, QT_LOGGING_RULES=tendril.serial.debug=true prints what the serial link does; what the network
-// preferences could not be read from is a warning of tendril.preferences.
+// The parts of the program on this computer's adapters, handed to each other. A QApplication must exist; the window is not shown
+// yet. For support, QT_LOGGING_RULES=tendril.serial.debug=true prints what the serial link does; network
+// preferences that cannot be read are a warning of tendril.preferences.
 struct UtilityProgram {
   UtilityProgram();
 

@@ -96,9 +96,8 @@ void VirtualControlPanel::SetTap(std::function<void(PanelSide, std::span<const s
 }
 
 // A program that was not answered repeats its request inside another. To a panel that is a payload which
-// begins with, say, 'C', '4': give back port 67, which nobody asked it for. So it says "done" and does
-// nothing. What the program wants from it, it has to ask again in words of its own; what it had asked for was
-// most likely done when it came in the first time.
+// begins with, say, 'C', '4': give back port 67, which no program means. So it says "done" and does nothing. What
+// the program still wants it has to request again; the first request was most likely done when it arrived.
 bool VirtualControlPanel::Obey(const PanelRequest& request) {
   const Bytes& payload = request.payload;
   if (request.nested) return true;
@@ -158,8 +157,8 @@ void PanelSession::Receive(std::span<const std::uint8_t> bytes) {
   }
 }
 
-// One who does not speak in frames cannot be answered in them: the panel hangs up at the first byte that no
-// frame can have there. So nobody makes it keep more than one frame.
+// The panel hangs up at the first byte that no frame can have there. So it never keeps more than one frame of a
+// connection.
 void PanelSession::Take(std::uint8_t byte) {
   const std::size_t at = frame_.size();
   frame_.push_back(byte);

@@ -43,7 +43,7 @@ enum class PanelBehaviour {
   kCloseInMiddle,
 };
 
-// The ways to misbehave by name, as a person asks for them.
+// The ways to misbehave by name, as a user asks for them.
 struct PanelBehaviourKind {
   std::string_view name;
   std::string_view description;  // half a sentence: "never answers"
@@ -54,7 +54,7 @@ std::span<const PanelBehaviourKind> PanelBehaviourKinds();
 // The kind called `name`, or null.
 const PanelBehaviourKind* FindPanelBehaviour(std::string_view name);
 
-// Whether a connection to the panel comes about.
+// What happens to an attempt to connect to the panel.
 enum class PanelListener {
   kOpen,
   kOff,    // the panel does not run: refused
@@ -80,8 +80,8 @@ enum class PanelSide { kProgram, kPanel };
 
 class PanelSession;
 
-// The panel, whoever is connected to it. It must outlive its sessions. A panel takes a port back only when it
-// is told to, not when a connection ends.
+// The panel, for all its connections. It must outlive its sessions. A panel takes a port back only on request, not
+// when a connection ends.
 class VirtualControlPanel {
  public:
   // `timers` let the pieces of a reply come over time; they must outlive the panel.
@@ -99,11 +99,11 @@ class VirtualControlPanel {
   // Makes `port` one of the panel's own, and held. Any other port that it is asked for leaves it as it is.
   void AddPort(std::uint8_t port);
   bool Holds(std::uint8_t port) const { return held_.contains(port); }
-  // Is told when the panel gives up or takes back one of its ports. It must not close a connection.
+  // Called when the panel gives up or takes back one of its ports. It must not close a connection.
   void SetPortHandler(std::function<void(std::uint8_t port, bool held)> handler);
 
-  // Is shown what crosses a connection: each request when it is whole, each piece of a reply, and what made
-  // the panel hang up.
+  // Gets what crosses a connection: each whole request, each piece of a reply, and the bytes that made the panel
+  // hang up.
   void SetTap(std::function<void(PanelSide from, std::span<const std::uint8_t> bytes)> tap);
 
   // The requests since the panel was made, those that were refused too; the last thousand of them.

@@ -94,7 +94,7 @@ std::optional<std::uint64_t> VirtualLine::NextEventUs() const {
 
 void VirtualLine::AdvanceTo(std::uint64_t now_us) {
   while (true) {
-    // At one and the same moment bytes end before others begin: who follows directly does not collide.
+    // At one and the same moment bytes end before others begin: a byte that follows directly does not collide.
     Talker* next = nullptr;
     std::pair<std::uint64_t, bool> next_key;
     for (Talker& talker : talkers_) {

@@ -1,6 +1,6 @@
 // VirtualLine: a half-duplex serial line with units on it, as a model in which time is only a number.
 //
-// A byte takes 10 bits of the line's speed. Whoever listens has it at the end of its last bit. Only one may
+// A byte takes 10 bits of the line's speed. All listeners have it at the end of its last bit. Only one end may
 // talk at a time: bytes that overlap come out garbled, as one byte, which is never 0x00 and never 0xFE.
 #pragma once
 
@@ -17,8 +17,8 @@
 namespace tendril {
 
 // What a unit says: `bytes` one after the other with a silence of `gap_us` before each but the first. Zero
-// bytes before the first other byte are pads, sent to bridge the time in which the program's driver lets go
-// of the line.
+// bytes before the first other byte are pads, sent to bridge the time in which the program's driver releases
+// the line.
 struct Transmission {
   std::uint64_t start_us = 0;  // later when the unit is still talking then
   Bytes bytes = {};
@@ -77,9 +77,9 @@ class VirtualLine {
   void Attach(LineUnit& unit);
   void Detach(LineUnit& unit);
 
-  // Who gets the bytes that arrive at the program.
+  // Gets the bytes that arrive at the program.
   void SetProgramHandler(std::function<void(std::uint8_t byte, std::uint64_t at_us)> handler);
-  // Who is shown every byte on the line, once, whoever hears it.
+  // Gets every byte on the line, once.
   void SetTap(std::function<void(const LineByte&)> tap);
 
   // The speed at which the program's end runs, at first the line's own. At any other speed the two ends hear
@@ -94,7 +94,7 @@ class VirtualLine {
   // The program's line driver, as RTS switches it; off at first.
   void SetDriver(bool on, std::uint64_t now_us);
 
-  // When something happens next if nobody does anything; nothing on a silent line.
+  // The time of the next event, without further calls; nothing on a silent line.
   std::optional<std::uint64_t> NextEventUs() const;
   // Lets everything happen that is due by `now_us`.
   void AdvanceTo(std::uint64_t now_us);

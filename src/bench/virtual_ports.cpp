@@ -99,14 +99,15 @@ class VirtualPorts::Device final : public SerialDevice {
   // The adapter was pulled out.
   void Lose();
   bool HasEvent() const { return DataIsDue() || overflowed_ || lost_; }
-  // Tells the owner of one event. The owner may do anything in it, also destroy this device.
+  // Delivers one event. The owner may do anything in it, also destroy this device.
   void DeliverEvent();
 
  private:
   // The line of the open port; null when the adapter was pulled out.
   VirtualLine* OpenLine() const;
   bool DataIsDue() const {
-    return untold_ && receive_threshold_ > 0 && input_.size() >= static_cast<std::size_t>(receive_threshold_);
+    return unreported_ && receive_threshold_ > 0 &&
+           input_.size() >= static_cast<std::size_t>(receive_threshold_);
   }
   void Arrive(std::uint8_t byte);
   void ForgetInput();
@@ -117,7 +118,7 @@ class VirtualPorts::Device final : public SerialDevice {
   std::int32_t receive_threshold_ = 0;
   Port* port_ = nullptr;     // while open and plugged in
   Bytes input_;              // at most kSerialInputBufferBytes
-  bool untold_ = false;      // kDataReceived is due as soon as enough bytes wait
+  bool unreported_ = false;  // kDataReceived is due as soon as enough bytes wait
   bool overflowed_ = false;  // kReceiveOverflow is due
   bool lost_ = false;        // kDeviceLost is due; port_ is null then
 };
@@ -183,7 +184,7 @@ VirtualLine* VirtualPorts::Device::OpenLine() const {
 void VirtualPorts::Device::SetReceiveThreshold(std::int32_t bytes) {
   if (bytes < 0) throw Fault(kErrInvalidPropertyValue, "A receive threshold must be 0 or more.");
   receive_threshold_ = bytes;
-  untold_ = !input_.empty();  // what waits may be enough for the new threshold
+  unreported_ = !input_.empty();  // what waits may be enough for the new threshold
   if (port_ != nullptr) ports_.Schedule();
 }
 
@@ -198,7 +199,7 @@ void VirtualPorts::Device::Write(std::span<const std::uint8_t> bytes) {
 
 Bytes VirtualPorts::Device::ReadAll() {
   if (VirtualLine* line = OpenLine()) line->AdvanceTo(ports_.NowUs());
-  untold_ = false;
+  unreported_ = false;
   return std::exchange(input_, {});
 }
 
@@ -218,19 +219,19 @@ void VirtualPorts::Device::Arrive(std::uint8_t byte) {
     return;
   }
   input_.push_back(byte);
-  untold_ = true;
+  unreported_ = true;
 }
 
 void VirtualPorts::Device::ForgetInput() {
   input_.clear();
-  untold_ = false;
+  unreported_ = false;
   overflowed_ = false;
 }
 
 void VirtualPorts::Device::DeliverEvent() {
   SerialEvent event = SerialEvent::kDeviceLost;
   if (DataIsDue()) {
-    untold_ = false;
+    unreported_ = false;
     event = SerialEvent::kDataReceived;
   } else if (std::exchange(overflowed_, false)) {
     event = SerialEvent::kReceiveOverflow;

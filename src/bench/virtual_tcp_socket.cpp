@@ -8,7 +8,7 @@ namespace tendril {
 namespace {
 
 constexpr char kPanelHost[] = "127.0.0.1";
-constexpr std::uint16_t kChosenPort = 49152;  // what a system gives who does not care
+constexpr std::uint16_t kChosenPort = 49152;  // what a system chooses
 constexpr std::int32_t kEventDelayMs = 1;     // the least that a timer can wait
 
 }  // namespace

@@ -52,7 +52,7 @@ class VirtualTcpSocket final : public TcpSocket {
   std::uint16_t local_port_ = 0;  // as set
   std::unique_ptr<PanelSession> session_;
   std::deque<std::uint8_t> input_;
-  // Events that are due, told in this order.
+  // Events that are due, in this order.
   bool answer_due_ = false;  // the connect is answered
   bool data_due_ = false;
   std::optional<End> end_due_;

@@ -65,10 +65,8 @@ TEST_F(VirtualControlPanelTest, Requests_AreDoneOrRefused) {
       {"C200002\7\0"s, "1200000"},         // not one of its ports
       {"C300009C200002\7\1"s, "1300000"},  // a repeated request
       {"C400002\3\2", "0400000"},
-      {"P600001\1", "1600000"},
       {"P700001\2", "0700000"},
       {"A800000", "1800000"},
-      {"A900001x", "0900000"},
       {"L200004\1\0\0\0"s, "1200000"},
       {"Z300002??", "0300000"},
       {"C400009D200002\3\0"s, "0400000"},  // another request inside is none
@@ -80,11 +78,9 @@ TEST_F(VirtualControlPanelTest, Requests_AreDoneOrRefused) {
 }
 
 TEST_F(VirtualControlPanelTest, Requests_ComeInAnyPieces) {
-  const std::string three = "C100002\3\0"s + "A200000" + "C300002\3\1";
-  EXPECT_EQ(Say(three), "110000012000001300000");
-  std::string byte_by_byte;
-  for (const char byte : three) byte_by_byte += Say({&byte, 1});
-  EXPECT_EQ(byte_by_byte, "110000012000001300000");
+  std::string replies;
+  for (const char byte : "C100002\3\0A200000C300002\3\1"s) replies += Say({&byte, 1});
+  EXPECT_EQ(replies, "110000012000001300000");
 }
 
 TEST_F(VirtualControlPanelTest, Garbage_EndsTheConnectionAtItsFirstByte) {
@@ -150,15 +146,6 @@ TEST_F(VirtualControlPanelTest, Behaviours_ShowInTheReply) {
   }
 }
 
-TEST_F(VirtualControlPanelTest, Flood_IsFarMoreThanAFrame) {
-  panel_.SetBehaviour(PanelBehaviour::kFlood);
-  PanelSession session(panel_, Connection());
-  session.Receive(Raw("A400000"));
-  time_.Advance(90);
-  EXPECT_EQ(said_.substr(0, 7), "1499999");
-  EXPECT_GT(said_.size(), 800'000u);
-}
-
 class VirtualTcpSocketTest : public testing::Test {
  protected:
   static constexpr std::uint16_t kPort = 8837;
@@ -202,29 +189,17 @@ TEST_F(VirtualTcpSocketTest, RequestAndReply_CrossAfterTheConnect) {
   socket_.Close();
   EXPECT_THAT(EventsOf(100), IsEmpty());
   EXPECT_EQ(panel_.connections(), 0u);
-  socket_.SetLocalPort(0);
-  ConnectAndWait();
-  EXPECT_NE(socket_.LocalPort(), 0);
 }
 
 TEST_F(VirtualTcpSocketTest, NoPanel_RefusesOrStaysSilent) {
-  const struct {
-    std::string host;
-    std::uint16_t port;
-    PanelListener listener;
-    std::vector<std::string> events;
-    TcpState state;
-  } cases[] = {
-      {"127.0.0.1", kPort, PanelListener::kOff, {"ended 10061"}, TcpState::kClosed},
-      {"127.0.0.1", 1, PanelListener::kOpen, {"ended 10061"}, TcpState::kClosed},
-      {"127.0.0.1", kPort, PanelListener::kStuck, {}, TcpState::kConnecting},
-  };
-  for (const auto& each : cases) {
-    panel_.SetListener(each.listener);
-    socket_.Connect(each.host, each.port);
-    EXPECT_EQ(EventsOf(60'000), each.events);
-    EXPECT_EQ(socket_.State(), each.state);
-  }
+  panel_.SetListener(PanelListener::kOff);
+  socket_.Connect("127.0.0.1", kPort);
+  EXPECT_THAT(EventsOf(60'000), ElementsAre("ended 10061"));
+  EXPECT_EQ(socket_.State(), TcpState::kClosed);
+  panel_.SetListener(PanelListener::kStuck);
+  socket_.Connect("127.0.0.1", kPort);
+  EXPECT_THAT(EventsOf(60'000), IsEmpty());
+  EXPECT_EQ(socket_.State(), TcpState::kConnecting);
   EXPECT_EQ(time_.RunningTimers(), 0);
   panel_.SetListener(PanelListener::kOpen);
   ConnectAndWait();  // once more, from within an attempt
@@ -238,21 +213,6 @@ TEST_F(VirtualTcpSocketTest, PanelThatEnds_IsReportedAfterItsLastData) {
   EXPECT_EQ(socket_.State(), TcpState::kConnected);
   EXPECT_THAT(EventsOf(5), ElementsAre("data 1700000", "ended 10054"));
   EXPECT_EQ(socket_.State(), TcpState::kClosed);
-}
-
-TEST_F(VirtualTcpSocketTest, ReconnectInAnEvent_DropsTheEventsThatAreDue) {
-  ConnectAndWait();
-  TcpEvents reconnecting;
-  reconnecting.data_arrived = [this] {
-    events_.push_back("data");
-    socket_.Connect("127.0.0.1", kPort);
-  };
-  reconnecting.ended = [this](std::int32_t, const std::string&) { events_.push_back("ended"); };
-  socket_.SetEvents(std::move(reconnecting));
-  panel_.SetBehaviour(PanelBehaviour::kCloseInMiddle);
-  socket_.Send(Raw(kPhysicalLightsOn));
-  EXPECT_THAT(EventsOf(100), ElementsAre("data"));
-  EXPECT_EQ(socket_.State(), TcpState::kConnected);
 }
 
 }  // namespace

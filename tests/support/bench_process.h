@@ -61,18 +61,13 @@ class BenchProcess {
   QString WriteRegistry() {
     QTcpServer finder;
     if (!finder.listen(QHostAddress::LocalHost)) throw std::runtime_error("there is no free TCP port");
-    const QString text =
-        QStringLiteral(
-            "\ufeffWindows Registry Editor Version 5.00\r\n\r\n"
-            "[HKEY_CURRENT_USER\\Software\\Kelvane\\Shared\\NetVersion]\r\n\"Ver\"=\"2\"\r\n\r\n"
-            "[HKEY_CURRENT_USER\\Software\\Kelvane\\Shared\\Network2]\r\n"
-            "\"DMXListenerPort\"=dword:%1\r\n\r\n")
-            .arg(finder.serverPort(), 8, 16, QLatin1Char('0'));
-    const QByteArray bytes(reinterpret_cast<const char*>(text.utf16()), text.size() * 2);
     QFile file(folder_.filePath(QStringLiteral("kelvane/registry.reg")));
-    if (!file.open(QIODevice::WriteOnly) || file.write(bytes) != bytes.size()) {
-      throw std::runtime_error("the registry cannot be written");
-    }
+    if (!file.open(QIODevice::WriteOnly)) throw std::runtime_error("the registry cannot be written");
+    file.write(
+        "Windows Registry Editor Version 5.00\r\n\r\n"
+        "[HKEY_CURRENT_USER\\Software\\Kelvane\\Shared\\NetVersion]\r\n\"Ver\"=\"2\"\r\n\r\n"
+        "[HKEY_CURRENT_USER\\Software\\Kelvane\\Shared\\Network2]\r\n\"DMXListenerPort\"=dword:" +
+        QByteArray::number(finder.serverPort(), 16).rightJustified(8, '0') + "\r\n");
     return QString::number(finder.serverPort());
   }
   // Its process, while it runs.

@@ -43,7 +43,8 @@ class CountingDevice final : public SerialDevice {
 
   std::size_t sent = 0;
   std::size_t received = 0;
-  std::function<void(std::span<const std::uint8_t>)> on_write;  // called with each packet before it is written
+  std::function<void(std::span<const std::uint8_t>)>
+      on_write;  // called with each packet before it is written
 
  private:
   SerialDevice& device_;

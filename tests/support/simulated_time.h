@@ -1,4 +1,4 @@
-// Simulated time: a clock and timers that move only when a test says so.
+// Simulated time: a clock and timers that move only when a test advances them.
 #pragma once
 
 #include <cstdint>

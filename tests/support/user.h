@@ -24,7 +24,7 @@ inline constexpr char kGet[] = "Command3_1";
 inline constexpr char kChangeId[] = "Command3_2";
 inline constexpr char kSweep[] = "cmdTest_0";
 
-// Answers each message box with Yes or OK until told to rest.
+// Answers each message box with Yes or OK, unless it rests.
 class User {
  public:
   using Box = std::pair<std::string, std::string>;  // title and text
