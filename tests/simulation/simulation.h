@@ -48,7 +48,7 @@ class Simulation {
   // The unit command that runs, or ran last.
   struct Operation {
     std::string what = {};
-    int max_polls = 0;           // of one step
+    int max_polls = 0;  // of one step
     std::int32_t comm_port = 0;
     bool running = false;
     bool swept = false;  // a sweep ran when the command was pressed
