@@ -6,15 +6,12 @@ namespace tendril {
 namespace {
 
 TEST(StringBuilder, Capacity_DoublesWhenItDoesNotSufficeAndShrinksToTheText) {
-  struct Step {
-    std::u16string_view text;
-    std::int32_t capacity, length;
-  };
   StringBuilder builder;
-  for (const Step& step : {Step{u"", 0, 0}, Step{u"ab", 8, 4}, Step{u"cd", 8, 8}, Step{u"e\u4e16", 24, 12}}) {
-    builder.Append(step.text);
-    EXPECT_EQ(builder.capacity(), step.capacity);
-    EXPECT_EQ(builder.length(), step.length);
+  for (const auto& [text, capacity, length] :
+       {std::tuple(u"", 0, 0), {u"ab", 8, 4}, {u"cd", 8, 8}, {u"e\u4e16", 24, 12}}) {
+    builder.Append(text);
+    EXPECT_EQ(builder.capacity(), capacity);
+    EXPECT_EQ(builder.length(), length);
   }
   EXPECT_EQ(builder.ToString(), u"abcde\u4e16");
   EXPECT_EQ(builder.capacity(), 12);
