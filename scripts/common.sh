@@ -34,7 +34,7 @@ require_packages() {
     >/dev/null
 }
 
-# For programs with a window that run without a display. That platform tells of what it cannot do, which nobody needs.
+# For programs with a window that run without a display. That platform warns of what it cannot do.
 without_display() {
   export QT_QPA_PLATFORM="${QT_QPA_PLATFORM:-offscreen}" XDG_RUNTIME_DIR="${XDG_RUNTIME_DIR:-/tmp}"
   export QT_LOGGING_RULES="default.warning=false"
