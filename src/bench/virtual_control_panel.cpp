@@ -7,7 +7,7 @@
 namespace tendril {
 namespace {
 
-constexpr std::size_t kHeader = 7;  // identifier, sequence digit, five digits of the length
+constexpr std::size_t kFrameHeader = 7;  // identifier, sequence digit, five digits of the length
 constexpr std::uint8_t kDone = '1';
 constexpr std::uint8_t kRefused = '0';
 
@@ -46,8 +46,8 @@ std::size_t PayloadSize(std::span<const std::uint8_t> frame) {
 }
 
 bool IsFrame(std::span<const std::uint8_t> bytes) {
-  return bytes.size() >= kHeader && std::all_of(bytes.begin() + 1, bytes.begin() + kHeader, IsDigit) &&
-         bytes.size() == kHeader + PayloadSize(bytes);
+  return bytes.size() >= kFrameHeader && std::all_of(bytes.begin() + 1, bytes.begin() + kFrameHeader, IsDigit) &&
+         bytes.size() == kFrameHeader + PayloadSize(bytes);
 }
 
 bool IsSwitch(std::uint8_t byte) { return byte <= 1; }
@@ -64,7 +64,7 @@ const PanelBehaviourKind* FindPanelBehaviour(std::string_view name) {
 
 std::optional<PanelRequest> ParsePanelFrame(std::span<const std::uint8_t> frame) {
   if (!IsFrame(frame)) return std::nullopt;
-  const auto payload = frame.subspan(kHeader);
+  const auto payload = frame.subspan(kFrameHeader);
   return PanelRequest{.identifier = frame[0],
                       .sequence = frame[1],
                       .payload = Bytes(payload.begin(), payload.end()),
@@ -162,11 +162,11 @@ void PanelSession::Receive(std::span<const std::uint8_t> bytes) {
 void PanelSession::Take(std::uint8_t byte) {
   const std::size_t at = frame_.size();
   frame_.push_back(byte);
-  if (at < kHeader && !(at == 0 ? IsLetter(byte) : IsDigit(byte))) {
+  if (at < kFrameHeader && !(at == 0 ? IsLetter(byte) : IsDigit(byte))) {
     panel_.Show(PanelSide::kProgram, frame_);
     return HangUp();
   }
-  if (frame_.size() >= kHeader && frame_.size() == kHeader + PayloadSize(frame_)) HandleRequest();
+  if (frame_.size() >= kFrameHeader && frame_.size() == kFrameHeader + PayloadSize(frame_)) HandleRequest();
 }
 
 void PanelSession::HandleRequest() {
@@ -217,7 +217,7 @@ void PanelSession::QueueReply(PanelBehaviour behaviour, const Bytes& reply) {
       }
       return;
     case PanelBehaviour::kCloseInMiddle:
-      pieces_.push_back({.bytes = Bytes(reply.begin(), reply.begin() + kHeader / 2), .hang_up = true});
+      pieces_.push_back({.bytes = Bytes(reply.begin(), reply.begin() + kFrameHeader / 2), .hang_up = true});
       return;
   }
   pieces_.push_back({.bytes = altered});

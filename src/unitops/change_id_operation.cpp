@@ -10,13 +10,13 @@ namespace {
 
 constexpr std::uint8_t kFindPoll = '*';
 constexpr std::uint8_t kConfirmPoll = '+';
-constexpr std::int32_t kStepMs = 200;
-constexpr std::int32_t kMaxPolls = 15;
+constexpr std::int32_t kChangeAddrMs = 200;
+constexpr std::int32_t kMaxStagePolls = 15;
 
 }  // namespace
 
 ChangeIdOperation::ChangeIdOperation(CommandContext& context)
-    : UnitOperation(context, "*+", {}), tmrChangeAddr_(MakeTimer(kStepMs, [this] { OnTick(); })) {}
+    : UnitOperation(context, "*+", {}), tmrChangeAddr_(MakeTimer(kChangeAddrMs, [this] { OnTick(); })) {}
 
 void ChangeIdOperation::Begin() {
   const std::uint8_t new_id = UnitId();
@@ -67,6 +67,6 @@ void ChangeIdOperation::OnTick() {
   Fail({"Unknown error has cause failure of Unit ID change.", "Unit ID Change Error", BoxIcon::kExclamation});
 }
 
-bool ChangeIdOperation::MayPollAgain() { return ++attempts_ <= kMaxPolls; }
+bool ChangeIdOperation::MayPollAgain() { return ++attempts_ <= kMaxStagePolls; }
 
 }  // namespace tendril

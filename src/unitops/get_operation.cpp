@@ -12,7 +12,7 @@ namespace tendril {
 namespace {
 
 constexpr std::uint8_t kConfigurationPoll = 'n';
-constexpr std::int16_t kMaxPolls = 33;
+constexpr std::int16_t kMaxGetPolls = 33;
 constexpr std::size_t kReplySize = 1 + kOptionByteCount;  // the port number and its option bytes
 
 }  // namespace
@@ -44,7 +44,7 @@ void GetOperation::OnReply(bool replied, std::uint8_t /*unit*/, const Bytes& dat
     ReplaceWorkingConfiguration();
     return Succeed("SUCCESS: Upload Complete");
   }
-  if (++repeats_ >= kMaxPolls) {
+  if (++repeats_ >= kMaxGetPolls) {
     Fail(SendError("Error:1  Uploading Configuration, Please retry"));
   } else if (!Link().cmdPollStation(UnitId(), kConfigurationPoll)) {
     Fail(SendError("Error:2 Uploading Configuration, Please retry"));

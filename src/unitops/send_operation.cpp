@@ -11,7 +11,7 @@ namespace {
 
 constexpr std::uint8_t kAcknowledgePoll = '0';
 constexpr std::int32_t kNextPortMs = 300;
-constexpr std::int32_t kMaxPolls = 3;
+constexpr std::int32_t kMaxSendPolls = 3;
 // The second byte of a reply that accepts the options.
 constexpr std::uint8_t kAccepted = 10;
 constexpr char kCannotPoll[] = "Error sending configuration, Please retry";
@@ -37,7 +37,7 @@ void SendOperation::OnReply(bool replied, std::uint8_t unit, const Bytes& data) 
     tmrDownload_.SetEnabled(true);
     return;
   }
-  if (!replied && ++unanswered_ < kMaxPolls) {
+  if (!replied && ++unanswered_ < kMaxSendPolls) {
     if (!Link().cmdPollStation(unit, kAcknowledgePoll)) {
       Fail(SendError("Error sending option command to the controller, Please retry"));
     }
