@@ -7,16 +7,16 @@ namespace {
 
 constexpr std::int32_t kShownMs = 1000;
 
-struct Row {
+struct ValueRow {
   const char* caption;
   const char* label;
 };
-constexpr std::array<Row, 6> kRows{{{"Virtual range, low", "lblVirtPulseLeftAct"},
-                                    {"Virtual range, high", "lblVirtPulseRightAct"},
-                                    {"Neutral", "lblNeutralTrimAct"},
-                                    {"Left stop", "lblLeftVirtStopAct"},
-                                    {"Right stop", "lblRightVirtStopAct"},
-                                    {"Default", "lblDefaultPosAct"}}};
+constexpr std::array<ValueRow, 6> kValueRows{{{"Virtual range, low", "lblVirtPulseLeftAct"},
+                                              {"Virtual range, high", "lblVirtPulseRightAct"},
+                                              {"Neutral", "lblNeutralTrimAct"},
+                                              {"Left stop", "lblLeftVirtStopAct"},
+                                              {"Right stop", "lblRightVirtStopAct"},
+                                              {"Default", "lblDefaultPosAct"}}};
 
 }  // namespace
 
@@ -27,10 +27,10 @@ ActualsFrame::ActualsFrame(TimerFactory& timers, QWidget& window)
       })) {
   auto* form = new QFormLayout(this);
   form->addRow(BoldLabel("Physical Values with Trim"));
-  for (std::size_t row = 0; row < kRows.size(); ++row) {
-    values_[row] = Named(new QLabel, kRows[row].label);
+  for (std::size_t row = 0; row < kValueRows.size(); ++row) {
+    values_[row] = Named(new QLabel, kValueRows[row].label);
     values_[row]->setAlignment(Qt::AlignRight);
-    form->addRow(QString::fromUtf8(kRows[row].caption), values_[row]);
+    form->addRow(QString::fromUtf8(kValueRows[row].caption), values_[row]);
   }
   tmrShowActuals_->SetInterval(kShownMs);
   tmrShowActuals_->SetEnabled(true);
