@@ -46,7 +46,8 @@ std::size_t PayloadSize(std::span<const std::uint8_t> frame) {
 }
 
 bool IsFrame(std::span<const std::uint8_t> bytes) {
-  return bytes.size() >= kFrameHeader && std::all_of(bytes.begin() + 1, bytes.begin() + kFrameHeader, IsDigit) &&
+  return bytes.size() >= kFrameHeader &&
+         std::all_of(bytes.begin() + 1, bytes.begin() + kFrameHeader, IsDigit) &&
          bytes.size() == kFrameHeader + PayloadSize(bytes);
 }
 
