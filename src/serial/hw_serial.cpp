@@ -1,10 +1,11 @@
 #include "serial/hw_serial.h"
 
 #include <algorithm>
-#include <utility>
+#include <array>
 
 #include "platform/ansi_text.h"
 #include "platform/runtime_error.h"
+#include "serial/packets.h"
 
 namespace tendril {
 namespace {
@@ -12,19 +13,17 @@ namespace {
 constexpr std::int32_t kHeartbeatPeriodMs = 500;
 
 // The only speeds that give a valid settings text.
-std::string SpeedText(std::int32_t baud) {
-  switch (baud) {
-    case 19200:
-    case 56000:
-    case 115200:
-    case 500000:
-    case 750000:
-    case 1000000:
-      return std::to_string(baud);
-    default:
-      return {};
-  }
-}
+constexpr std::array kSpeeds{19200, 56000, 115200, 500000, 750000, 1000000};
+
+// Kinds of poll whose results are kept here instead of being reported to the host.
+constexpr std::uint8_t kKindDownload = 202;
+constexpr std::uint8_t kKindBootloader = 203;
+// Kinds that report the code of the reply in place of their own.
+constexpr std::uint8_t kKindStatus = 100;
+constexpr std::uint8_t kKindReplyCode = 111;
+// The reply codes that a poll of kind 100 can have.
+constexpr std::uint8_t kFirstStatusCode = 101;
+constexpr std::uint8_t kLastStatusCode = 104;
 
 }  // namespace
 
@@ -32,11 +31,12 @@ HwSerial::HwSerial(SerialDevice& device, TimerFactory& timers, Clock& clock, Com
     : device_(device),
       clock_(clock),
       log_(log),
-      poll_timer_(timers.CreateTimer([this] { OnPollTimer(); })),
-      heartbeat_timer_(timers.CreateTimer([this] { OnHeartbeatTimer(); })),
+      line_(device, timers, clock,
+            [this](HalfDuplexLine::PollResult result) { OnPollEnd(std::move(result)); }),
+      HeartBeatTimer_(timers.CreateTimer([this] { OnHeartbeatTimer(); })),
       timer_period_ms_(clock.RequestFinestTimerPeriod()),
       tick_granularity_ms_(clock.GranularityMs()) {
-  heartbeat_timer_->SetInterval(kHeartbeatPeriodMs);
+  HeartBeatTimer_->SetInterval(kHeartbeatPeriodMs);
   device_.SetEventHandler([this](SerialEvent event) { OnDeviceEvent(event); });
 }
 
@@ -77,20 +77,20 @@ void HwSerial::OpenPort() {
   const std::string port = std::to_string(comm_port_);
   std::string stage = "Setting Baud Rate";
   try {
-    const std::string settings = SpeedText(baud_rate_) + ",N,8,1";
+    const bool valid = std::find(kSpeeds.begin(), kSpeeds.end(), baud_rate_) != kSpeeds.end();
+    const std::string settings = (valid ? std::to_string(baud_rate_) : "") + ",N,8,1";
     opened_speed_ = baud_rate_;
     stage = "Setting(" + settings + ")";
-    if (settings.starts_with(',')) throw RuntimeError(kErrInvalidPropertyValue, "Invalid property value");
+    if (!valid) throw RuntimeError(kErrInvalidPropertyValue, "Invalid property value");
     stage = "Setting Port = " + port;
     if (comm_port_ < 0) throw RuntimeError(kErrInvalidPropertyValue, "Invalid property value");
     opened_port_ = comm_port_;
     stage = "Setting misc Comm Settings";
-    device_.SetReceiveThreshold(kIdleReceiveThreshold);
+    device_.SetReceiveThreshold(HalfDuplexLine::kIdleReceiveThreshold);
     stage = "Executing Port Open Property";
     device_.Open(opened_port_, opened_speed_);
     stage = "Setting RTS on";
-    device_.SetRts(true);
-    line_released_ = false;
+    line_.SetRts(true);
     port_open_ = true;
   } catch (...) {
     const RuntimeError fault = CurrentFault();
@@ -104,16 +104,34 @@ void HwSerial::OpenPort() {
 void HwSerial::ClosePort() noexcept {
   device_.Close();
   const bool was_open = std::exchange(port_open_, false);
-  held_back_.assign(1, 0);
-  if (poll_) poll_->line_closed = true;
+  line_.OnClosed();
   if (was_open && port_closed_) port_closed_();
+}
+
+void HwSerial::OnDeviceEvent(SerialEvent event) {
+  switch (event) {
+    case SerialEvent::kDataReceived:
+      return line_.OnDataReceived();
+    case SerialEvent::kReceiveOverflow:
+      return line_.DiscardInput();
+    case SerialEvent::kDeviceLost:
+      return ClosePort();
+  }
+}
+
+void HwSerial::OnHeartbeatTimer() {
+  if (!port_open_) return;
+  try {
+    XmitData(HeartbeatPacket());
+  } catch (...) {
+    return;  // it shows with the next command
+  }
 }
 
 void HwSerial::SetRTS(bool asserted) {
   Traced("Trace: Let RTS", [&] {
     OpenPort();
-    device_.SetRts(asserted);
-    line_released_ = false;  // the line is as the host wants it
+    line_.SetRts(asserted);
   });
 }
 
@@ -133,6 +151,39 @@ double HwSerial::SentByteCount(bool reset) {
 
 void HwSerial::SetPollPad(std::uint8_t pads) {
   poll_pad_ = std::clamp(pads, std::uint8_t{2}, std::uint8_t{200});
+}
+
+bool HwSerial::cmdPollStation(std::uint8_t unit, std::uint8_t kind) {
+  if (unit == 0 || line_.PollOutstanding()) return false;
+  OpenPort();
+  if (!port_open_) throw RuntimeError(kErrPortNotOpen, "No serial port is open");
+  line_.StartPoll(unit, kind, poll_pad_, opened_speed_);
+  return true;
+}
+
+void HwSerial::OnPollEnd(HalfDuplexLine::PollResult result) {
+  Bytes& data = result.data;
+  bool success = result.replied;
+  std::uint8_t code = result.kind;
+  switch (result.kind) {
+    case kKindDownload:
+      downloads_[result.unit] = {.acknowledgement = success && data.size() > 2 ? data[2] : std::uint8_t{0},
+                                 .timed_out = !success};
+      return;
+    case kKindBootloader:
+      bootloader_ = {.data = success ? data : Bytes{}, .received = success, .timed_out = !success};
+      if (success) line_.Trace([] { return std::string("Poll Data Received"); });
+      return;
+    case kKindStatus:
+      success = success && result.code >= kFirstStatusCode && result.code <= kLastStatusCode;
+      [[fallthrough]];
+    case kKindReplyCode:
+      if (success) code = result.code;
+      break;
+    default:
+      break;
+  }
+  if (poll_reply_) poll_reply_(success, result.unit, code, data);
 }
 
 }  // namespace tendril

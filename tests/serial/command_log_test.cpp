@@ -12,7 +12,7 @@
 namespace tendril {
 namespace {
 
-TEST(FileCommandLog, MakesItsFolderAppendsAndTellsWhenItCannot) {
+TEST(FileCommandLog, MakesItsFolderAppendsAndFailsWhenItCannot) {
   const std::filesystem::path folder =
       std::filesystem::path(testing::TempDir()) /
       ("tendril-log-" + std::to_string(testing::UnitTest::GetInstance()->random_seed()));

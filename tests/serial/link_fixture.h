@@ -31,7 +31,6 @@ class LinkFixture : public testing::Test {
   LinkFixture() {
     link_.SetPollReplyHandler([this](bool success, std::uint8_t unit, std::uint8_t code, Bytes& data) {
       replies_.push_back({success, unit, code, data});
-      if (on_reply_) on_reply_();
     });
     link_.SetTraceSink([this](const std::string& line) { traces_.push_back(line); });
     link_.SetCommPort(3);
@@ -50,12 +49,11 @@ class LinkFixture : public testing::Test {
     return {0, ""};
   }
 
-  SimulatedTime time_;
+  SimulatedTime time_{0xFFFF'FFFF - 40};  // soon wraps
   RecordingDevice device_;
   MemoryLog log_;
   HwSerial link_{device_, time_, time_, log_};
   std::vector<ReportedReply> replies_;
-  std::function<void()> on_reply_;
   std::vector<std::string> traces_;
 };
 

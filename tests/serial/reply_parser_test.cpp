@@ -13,7 +13,7 @@ using Verdict = ReplyParser::Verdict;
 constexpr std::uint8_t kUnit = 5;
 const Bytes kEcho{0, kUnit, 0x88, 0x64, 0x2D, 0};
 
-// Feeds bytes until the reply is complete; tells the last verdict.
+// Feeds bytes until the reply is complete; returns the last verdict.
 Verdict Feed(ReplyParser& parser, const Bytes& bytes) {
   Verdict verdict = Verdict::kNeedMore;
   for (const std::uint8_t byte : bytes) {
