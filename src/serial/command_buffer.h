@@ -28,13 +28,23 @@ class CommandBuffer {
   using Slot = std::map<std::int16_t, BufferedCommand>;   // by circuit
 
   // Replaces what is held for that circuit. Drops `command` when its block has no slot and none is free.
-  void Store(std::uint8_t unit, std::int16_t circuit, BufferedCommand command);
+  void Store(std::uint8_t unit, std::int16_t circuit, BufferedCommand command) {
+    const SlotKey key = KeyOf(unit, circuit);
+    if (slots_.size() < kMaxSlots || slots_.contains(key)) slots_[key][circuit] = std::move(command);
+  }
   // Forgets what is held for that circuit, if anything.
-  void Clear(std::uint8_t unit, std::int16_t circuit);
+  void Clear(std::uint8_t unit, std::int16_t circuit) {
+    const auto slot = slots_.find(KeyOf(unit, circuit));
+    if (slot != slots_.end()) slot->second.erase(circuit);
+  }
   // What is held.
   const std::map<SlotKey, Slot>& Slots() const { return slots_; }
 
  private:
+  static SlotKey KeyOf(std::uint8_t unit, std::int16_t circuit) {
+    return {unit, static_cast<std::int16_t>(circuit / kCircuitsPerBlock)};
+  }
+
   std::map<SlotKey, Slot> slots_;
 };
 

@@ -50,8 +50,6 @@ class HwSerial {
   HwSerial(SerialDevice& device, TimerFactory& timers, Clock& clock, CommandLog& log);
   // Closes the port.
   ~HwSerial();
-  HwSerial(const HwSerial&) = delete;
-  HwSerial& operator=(const HwSerial&) = delete;
 
   // The handler of the poll replies. Returns the one before it, for a caller that listens in and passes them on.
   PollReplyHandler SetPollReplyHandler(PollReplyHandler handler) {

@@ -40,9 +40,8 @@ void HwSerial::cmdFade(std::uint8_t unit, std::int16_t circuit, std::uint8_t tim
     OpenPort();
     const std::uint8_t first = EncodeIntensity(from);
     const std::uint8_t last = EncodeIntensity(to);
-    const FadeRate rate = EncodeFadeRate(first, last, time);
-    SendCommand(unit, circuit, kCodeFade,
-                LightPacket(unit, kCodeFade, {first, last, rate.high, rate.low}, circuit));
+    const auto [high, low] = EncodeFadeRate(first, last, time);
+    SendCommand(unit, circuit, kCodeFade, LightPacket(unit, kCodeFade, {first, last, high, low}, circuit));
   });
 }
 

@@ -24,7 +24,8 @@ std::uint8_t EncodeIntensity(std::uint8_t percent) {
   return static_cast<std::uint8_t>(228 - 2 * percent);
 }
 
-FadeRate EncodeFadeRate(std::uint8_t encoded_from, std::uint8_t encoded_to, std::uint8_t time) {
+std::array<std::uint8_t, 2> EncodeFadeRate(std::uint8_t encoded_from, std::uint8_t encoded_to,
+                                           std::uint8_t time) {
   if (time == 0) throw RuntimeError(kErrDivisionByZero, "Division by zero");
   // At most 254 * 256 / 12: it fits 16 bits with a sign.
   const int rate = RoundHalfToEven(std::abs(encoded_from - encoded_to) * 256.0 / (time * 12.0));

@@ -10,6 +10,7 @@
 // The encodings below never give a zero byte, which would end the packet.
 #pragma once
 
+#include <array>
 #include <cstdint>
 
 #include "platform/bytes.h"
@@ -36,11 +37,8 @@ std::uint8_t EncodeIntensity(std::uint8_t percent);
 
 // The two bytes, high first, of the rate of a fade between two *encoded* intensities over `time`. Raises
 // kErrDivisionByZero for a time of 0.
-struct FadeRate {
-  std::uint8_t high;
-  std::uint8_t low;
-};
-FadeRate EncodeFadeRate(std::uint8_t encoded_from, std::uint8_t encoded_to, std::uint8_t time);
+std::array<std::uint8_t, 2> EncodeFadeRate(std::uint8_t encoded_from, std::uint8_t encoded_to,
+                                           std::uint8_t time);
 
 // The packet of a light command: the circuit follows the body.
 Bytes LightPacket(std::uint8_t unit, std::uint8_t code, Bytes body, std::int16_t circuit);

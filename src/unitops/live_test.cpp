@@ -94,7 +94,7 @@ void LiveTest::Press(int button) {
     sweep_ = button;
     view_.ShowTestRunning(button, true);
     test_position_ = kCentrePulseWidth;
-    direction_ = Direction::kUp;
+    direction_ = 1;
     tmrTest_->SetInterval(kFirstStepMs);
     tmrTest_->SetEnabled(true);
     ShowPosition(kCentrePulseWidth);
@@ -122,25 +122,14 @@ void LiveTest::Step() {
   if (!sweep_) return;
   const ChannelConfig values = choice_.Values();
   const auto [low, high] = SweptRange(values, *sweep_);
-  std::int32_t interval_ms = kStepMs;
-  switch (direction_) {
-    case Direction::kDown:
-      test_position_ -= kSweepStep;
-      if (test_position_ <= low) {
-        test_position_ = low;
-        interval_ms = kRestMs;
-        direction_ = Direction::kUp;
-      }
-      break;
-    case Direction::kUp:
-      test_position_ += kSweepStep;
-      if (test_position_ >= high) {
-        test_position_ = high;
-        interval_ms = kRestMs;
-        direction_ = Direction::kDown;
-      }
-      break;
+  test_position_ += direction_ * kSweepStep;
+  const Microseconds end = direction_ > 0 ? high : low;
+  const bool at_end = direction_ * (test_position_ - end) >= 0;
+  if (at_end) {
+    test_position_ = end;
+    direction_ = -direction_;
   }
+  const std::int32_t interval_ms = at_end ? kRestMs : kStepMs;
   // Setting it anew at every step would add each step's lateness to the next one's.
   if (tmrTest_->Interval() != interval_ms) tmrTest_->SetInterval(interval_ms);
   ShowPosition(test_position_);

@@ -105,7 +105,6 @@ class LiveTest {
   Microseconds ShownPosition() const { return shown_position_; }
 
  private:
-  enum class Direction { kUp, kDown };
   // One position for some ports of a unit.
   struct Command {
     std::uint8_t unit;
@@ -141,7 +140,7 @@ class LiveTest {
 
   std::optional<int> sweep_;  // the button whose sweep runs
   Microseconds test_position_ = kCentrePulseWidth;
-  Direction direction_ = Direction::kUp;
+  int direction_ = 1;  // of the sweep; 1: up, -1: down
   Microseconds shown_position_ = kCentrePulseWidth;
   std::optional<Command> waiting_;  // the slider's newest position, while the one before is on its way
 };

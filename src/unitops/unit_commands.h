@@ -31,8 +31,6 @@ struct UnitCommands {
   UnitCommands(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes, CommandProgressView& progress_view,
                const UnitTarget& target, ChannelTable& working, Events events = {});
   ~UnitCommands();
-  UnitCommands(const UnitCommands&) = delete;
-  UnitCommands& operator=(const UnitCommands&) = delete;
 
   // Stops the running command and shows nothing: the window is closing.
   void Stop();

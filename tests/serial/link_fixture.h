@@ -20,10 +20,6 @@ struct ReportedReply {
   int code;
   Bytes data;
   friend bool operator==(const ReportedReply&, const ReportedReply&) = default;
-  friend void PrintTo(const ReportedReply& reply, std::ostream* out) {
-    *out << "(" << reply.success << ", " << reply.unit << ", " << reply.code << ", "
-         << testing::PrintToString(reply.data) << ")";
-  }
 };
 
 class LinkFixture : public testing::Test {

@@ -3,75 +3,47 @@
 #include <gtest/gtest.h>
 
 #include <string>
-#include <vector>
+#include <utility>
 
 namespace tendril {
 namespace {
 
 using Verdict = ReplyParser::Verdict;
 
-constexpr std::uint8_t kUnit = 5;
-const Bytes kEcho{0, kUnit, 0x88, 0x64, 0x2D, 0};
-
-// Feeds bytes until the reply is complete; returns the last verdict.
-Verdict Feed(ReplyParser& parser, const Bytes& bytes) {
+// The last verdict on `line` after a poll of unit 5, and the data of the reply; nothing follows a complete reply.
+std::pair<Verdict, Bytes> Parse(const Bytes& line) {
+  ReplyParser parser;
+  parser.Start(5);
   Verdict verdict = Verdict::kNeedMore;
-  for (const std::uint8_t byte : bytes) {
+  for (const std::uint8_t byte : line) {
     verdict = parser.Push(byte);
     if (verdict == Verdict::kReplyComplete) break;
   }
-  return verdict;
+  return {verdict, parser.data()};
 }
 
-TEST(ReplyParser, WhatIsNoReply_IsPassedOver) {
-  struct Case {
-    std::string what;
-    Bytes line;
-    Verdict verdict;
-    Bytes data;
-  };
-  for (const Case& c : std::vector<Case>{
-           {"no echo, reply alone", {0, 0xFE, 0x30, 6, 10, 0}, Verdict::kReplyComplete, {6, 10}},
-           {"reply to the unit's own ID after the echo",
-            {0, 5, 0x88, 1, 2, 0, 5, 0x30, 6, 10, 0},
-            Verdict::kNeedMore,
-            {}},
-           {"echo with a foreign ID", {0, 6, 0x88, 1, 2, 0}, Verdict::kNeedMore, {}},
-           {"noise before the echo", {9, 9, 0, 7, 7, 7, 0, 0, 5, 0x88, 1, 2, 0}, Verdict::kEchoSeen, {}},
-           {"noise between echo and reply",
-            {0, 5, 0x88, 1, 2, 0, 7, 8, 9, 0, 0xFE, 0x30, 6, 10, 0},
-            Verdict::kReplyComplete,
-            {6, 10}},
-           {"address in the middle of noise",
-            {0, 5, 0x88, 1, 2, 0, 7, 0xFE, 0x30, 0},
-            Verdict::kNeedMore,
-            {}},
-           {"a reply cut before its code holds nothing of the echo",
-            {0, 5, 0x88, 1, 10, 0, 0xFE, 0},
-            Verdict::kReplyComplete,
-            {}},
-       }) {
-    ReplyParser parser;
-    parser.Start(kUnit);
-    EXPECT_EQ(Feed(parser, c.line), c.verdict) << c.what;
-    EXPECT_EQ(parser.data(), c.data) << c.what;
-  }
+TEST(ReplyParser, WhatIsNoReply_IsSkipped) {
+  const std::pair<Verdict, Bytes> need_more{Verdict::kNeedMore, {}}, echo{Verdict::kEchoSeen, {}},
+      complete{Verdict::kReplyComplete, {6, 10}};
+  EXPECT_EQ(Parse({0, 0xFE, 0x30, 6, 10, 0}), complete) << "no echo";
+  EXPECT_EQ(Parse({0, 5, 0x88, 1, 2, 0, 5, 0x30, 6, 10, 0}), need_more) << "reply with the unit's own ID";
+  EXPECT_EQ(Parse({0, 6, 0x88, 1, 2, 0}), need_more) << "echo with another ID";
+  EXPECT_EQ(Parse({9, 9, 0, 7, 7, 7, 0, 0, 5, 0x88, 1, 2, 0}), echo) << "noise before the echo";
+  EXPECT_EQ(Parse({0, 5, 0x88, 1, 2, 0, 7, 8, 9, 0, 0xFE, 0x30, 6, 10, 0}), complete) << "noise after it";
+  EXPECT_EQ(Parse({0, 5, 0x88, 1, 2, 0, 7, 0xFE, 0x30, 0}), need_more) << "address in the middle of noise";
+  EXPECT_EQ(Parse({0, 5, 0x88, 1, 10, 0, 0xFE, 0}), std::pair(Verdict::kReplyComplete, Bytes{}))
+      << "a reply cut before its code holds nothing of the echo";
 }
 
 TEST(ReplyParser, OversizedReply_IsCutAndTheNextReplyStillDecodes) {
   ReplyParser parser;
-  parser.Start(kUnit);
-  Feed(parser, kEcho);
-  Feed(parser, {0xFE, 0x30});
-  Feed(parser, Bytes(100000, 0x55));
-  EXPECT_EQ(parser.Push(0), Verdict::kReplyComplete);
-  EXPECT_EQ(parser.data().size(), ReplyParser::kMaxData);
-
-  parser.Start(kUnit);
-  EXPECT_EQ(parser.data().size(), 0u);
-  Feed(parser, kEcho);
-  EXPECT_EQ(Feed(parser, {0, 0xFE, 0x30, 6, 10, 0}), Verdict::kReplyComplete);
-  EXPECT_EQ(parser.data(), (Bytes{6, 10}));
+  for (const std::size_t size : {std::size_t{100000}, std::size_t{2}}) {
+    parser.Start(5);
+    for (const std::uint8_t byte : Bytes{0, 5, 0x88, 0x64, 0x2D, 0, 0, 0xFE, 0x30}) parser.Push(byte);
+    for (std::size_t i = 0; i < size; ++i) parser.Push(0x55);
+    EXPECT_EQ(parser.Push(0), Verdict::kReplyComplete);
+    EXPECT_EQ(parser.data().size(), size == 2 ? 2 : ReplyParser::kMaxData);
+  }
 }
 
 }  // namespace
