@@ -50,7 +50,7 @@ class RunningCommand {
   bool Active() const { return operation_ != nullptr; }
   // What runs, for a tool tip ("Sending the configuration to unit 01"); empty when nothing does.
   const std::string& What() const { return what_; }
-  // Where the last command stopped, when it ended without an outcome ("Stopped: channel 3: ActualRange(0) cannot be
+  // Where the last command stopped, when it ended without an outcome ("Stopped: channel 3: 305 to 2695 cannot be
   // sent"); otherwise empty. Meaningful while no command runs.
   const std::string& Stopped() const { return stopped_; }
 

@@ -19,7 +19,7 @@ namespace tendril::test {
 // The text's characters as bytes; zero bytes within a literal count.
 inline Bytes BytesOf(std::string_view text) { return {text.begin(), text.end()}; }
 
-class ScriptedSocket final : public TcpSocket {
+class ScriptedSocket : public TcpSocket {
  public:
   void SetEvents(TcpEvents events) override { events_ = std::move(events); }
   void Connect(const std::string& host, std::uint16_t port) override {

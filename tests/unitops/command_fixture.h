@@ -61,6 +61,10 @@ class CommandTest : public testing::Test {
     constexpr std::uint64_t kLongestMs = 12000;
     ASSERT_TRUE(world_.time.AdvanceUntil([&] { return !commands_.running.Active(); }, kLongestMs));
   }
+  void Run(UnitOperation& operation) {
+    operation.Start();
+    RunToTheEnd();
+  }
   void ExpectFailure(const testing::Matcher<const BoxMessage&>& box) {
     EXPECT_THAT(world_.boxes.Take(), testing::ElementsAre(box));
     EXPECT_TRUE(progress_.shown);

@@ -2,6 +2,7 @@
 
 #include <array>
 #include <optional>
+#include <tuple>
 #include <utility>
 #include <vector>
 
@@ -12,7 +13,6 @@ namespace {
 
 using testing::ElementsAre;
 using testing::IsEmpty;
-using testing::StartsWith;
 
 struct FakeChoice final : public ChannelChoice {
   std::optional<std::size_t> Channel() const override { return channel; }
@@ -93,6 +93,11 @@ class Live : public CommandTest {
     view_.slider = value;
     test_.OnSlider();
   }
+  // 140 goes out, 142 waits.
+  void Drag() {
+    sent_.clear();
+    for (const int value : {400, 410, 420}) MoveSliderTo(value);
+  }
   void SetSliderSends(bool sends) {
     view_.sends = sends;
     test_.OnSliderSends();
@@ -114,21 +119,17 @@ class Live : public CommandTest {
 };
 
 TEST_F(Live, Sweeps_StepAndRestToTheMillisecond) {
-  struct Case {
-    int button;
-    Microseconds low, high;
-  };
   choice_.values.ActualRange = {710, 2290};
   choice_.values.VirtualRange = {1000, 2000};
   choice_.values.VirtualStops = {1430, 1640};
   auto& unit = Attach("", 0x01);
-  for (const Case& c : {Case{0, 1000, 2000}, Case{1, 1430, 1640}, Case{3, 710, 2290}}) {
-    SCOPED_TRACE(c.button);
+  const auto expect_sweep = [&](int button, Microseconds low, Microseconds high) {
+    SCOPED_TRACE(button);
     sent_.clear();
     pictures_.drawn.clear();
     start_ms_ = world_.time.ElapsedMs();
-    test_.OnTestButton(c.button);
-    EXPECT_TRUE(view_.captions[static_cast<std::size_t>(c.button)]);
+    test_.OnTestButton(button);
+    EXPECT_TRUE(view_.captions[static_cast<std::size_t>(button)]);
 
     // Up, down, and up again to the middle; each end is reached exactly, and rested at.
     std::vector<LiveCommand> expected{{0, 1, kChannel3, 150}};
@@ -138,26 +139,27 @@ TEST_F(Live, Sweeps_StepAndRestToTheMillisecond) {
       ms += until_next;
     };
     Microseconds position = 1500;
-    while ((position += 50) < c.high) step_to(position, 100);
-    step_to(c.high, 1000);
-    for (position = c.high - 50; position > c.low; position -= 50) step_to(position, 100);
-    step_to(c.low, 1000);
-    for (position = c.low + 50; position < 1500; position += 50) step_to(position, 100);
+    while ((position += 50) < high) step_to(position, 100);
+    step_to(high, 1000);
+    for (position = high - 50; position > low; position -= 50) step_to(position, 100);
+    step_to(low, 1000);
+    for (position = low + 50; position < 1500; position += 50) step_to(position, 100);
 
     world_.time.Advance(ms + 20);
     ASSERT_GE(sent_.size(), expected.size());
     sent_.resize(expected.size());
     EXPECT_EQ(sent_, expected);
-    EXPECT_EQ(pictures_.drawn[1], std::min(1550, c.high));
+    EXPECT_EQ(pictures_.drawn[1], std::min(1550, high));
 
-    test_.OnTestButton(c.button);
-    Settle();
+    test_.OnTestButton(button);
+    world_.time.Advance(5000);
     EXPECT_EQ(unit.LivePosition(3), 150);
     EXPECT_EQ(test_.ShownPosition(), 1500);
-    EXPECT_FALSE(view_.captions[static_cast<std::size_t>(c.button)]);
-    world_.time.Advance(5000);
-    EXPECT_EQ(test_.ShownPosition(), 1500);
-  }
+    EXPECT_FALSE(view_.captions[static_cast<std::size_t>(button)]);
+  };
+  expect_sweep(0, 1000, 2000);
+  expect_sweep(1, 1430, 1640);
+  expect_sweep(3, 710, 2290);
   EXPECT_EQ(world_.time.RunningTimers(), 0);
   EXPECT_EQ(unit.rejected_commands(), 0u);
 }
@@ -165,8 +167,10 @@ TEST_F(Live, Sweeps_StepAndRestToTheMillisecond) {
 TEST_F(Live, Buttons_SwitchMoveAndReset) {
   choice_.values.DefaultPosition = 1515;
   test_.OnTestButton(0);
-  world_.time.Advance(450);  // 1500 1550 1600 1650
-  test_.OnTestButton(3);     // another sweep begins in the middle again
+  world_.time.Advance(300);
+  choice_.channel = 7;  // the sweep goes on with it
+  world_.time.Advance(150);
+  test_.OnTestButton(3);  // another sweep begins in the middle again
   EXPECT_THAT(view_.captions, ElementsAre(false, false, false, true, false));
   world_.time.Advance(260);
   test_.OnTestButton(2);  // a single move ends a sweep
@@ -175,6 +179,8 @@ TEST_F(Live, Buttons_SwitchMoveAndReset) {
   test_.OnTestButton(4);
   world_.time.Advance(2000);
   EXPECT_THAT(SentPositions(), ElementsAre(150, 155, 160, 165, 150, 155, 152, 150));
+  EXPECT_EQ(sent_[1].mask, 4);
+  EXPECT_EQ(sent_[2].mask, 128);
   EXPECT_THAT(pictures_.drawn, ElementsAre(1500, 1550, 1600, 1650, 1500, 1550, 1515, 1500));
 
   // A sweep that was stopped on its way down begins upwards again.
@@ -186,19 +192,13 @@ TEST_F(Live, Buttons_SwitchMoveAndReset) {
   test_.OnTestButton(1);
   world_.time.Advance(300);
   EXPECT_THAT(SentPositions(), ElementsAre(150, 155, 160, 155, 150, 150, 150, 155));
-  test_.OnTestButton(1);
-  pictures_.drawn.clear();
 
   // No button, or the slider that takes over: everything is reset where it is, nothing is moved or sent.
   for (const bool slider_takes_over : {false, true}) {
-    test_.OnTestButton(1);
+    test_.OnTestButton(0);
     world_.time.Advance(260);
     sent_.clear();
-    if (slider_takes_over) {
-      SetSliderSends(true);
-    } else {
-      test_.OnTestButton(LiveTest::kNoButton);
-    }
+    slider_takes_over ? SetSliderSends(true) : test_.OnTestButton(LiveTest::kNoButton);
     world_.time.Advance(2000);
     EXPECT_THAT(view_.captions, testing::Each(false));
     EXPECT_THAT(sent_, IsEmpty());
@@ -206,131 +206,97 @@ TEST_F(Live, Buttons_SwitchMoveAndReset) {
   }
 }
 
-TEST_F(Live, Sweep_GoesOnWithTheChannelChosenMeanwhile) {
-  choice_.channel = 7;
-  test_.OnTestButton(0);
-  world_.time.Advance(300);
-  choice_.channel = 0;
-  choice_.values.VirtualRange = {1400, 1600};
-  world_.time.Advance(1100);
-  test_.OnTestButton(0);
-  Settle();
-  std::vector<std::pair<int, int>> masks_and_positions;
-  for (const LiveCommand& command : sent_) masks_and_positions.emplace_back(command.mask, command.position);
-  EXPECT_THAT(masks_and_positions, ElementsAre(std::pair(128, 150), std::pair(128, 155), std::pair(1, 160),
-                                               std::pair(1, 155), std::pair(1, 150)));
-}
-
 TEST_F(Live, Slider_SpansTheVirtualRange) {
-  struct Case {
-    PulsePair range;
-    int slider, percent, dmx;
-    Microseconds pulse;
-    int sent;
-  };
-  for (const Case& c : std::vector<Case>{{{1000, 2000}, 0, 0, 0, 1000, 100},
-                                         {{1000, 2000}, 1000, 100, 255, 2000, 200},
-                                         {{1000, 2000}, 500, 50, 128, 1500, 150},  // 127.5
-                                         {{1000, 2000}, 515, 52, 131, 1515, 152},  // 51.5, 131.325, 151.5
-                                         {{1000, 2000}, 525, 52, 134, 1525, 152},  // 52.5, 133.875, 152.5
-                                         {{1000, 1001}, 500, 50, 128, 1000, 100},
-                                         {{1001, 1004}, 500, 50, 128, 1003, 100},  // 1001 + 1.5
-                                         {{2000, 1000}, 250, 25, 64, 1750, 175}}) {
-    SCOPED_TRACE(c.slider);
-    sent_.clear();
-    choice_.values.VirtualRange = c.range;
-    choice_.values.VirtualStops = {10, 2550};
-    SetSliderSends(true);
-    MoveSliderTo(c.slider);
+  SetSliderSends(true);
+  choice_.values.VirtualStops = {10, 2550};
+  const auto expect = [&](PulsePair range, int slider, SliderReadOut read_out, int sent) {
+    SCOPED_TRACE(slider);
+    choice_.values.VirtualRange = range;
+    MoveSliderTo(slider);
     Settle();
-    EXPECT_EQ(view_.read_out.percent, c.percent);
-    EXPECT_EQ(view_.read_out.dmx, c.dmx);
-    EXPECT_EQ(view_.read_out.pulse_width, c.pulse);
-    EXPECT_EQ(pictures_.updated_to, c.pulse);
-    EXPECT_THAT(SentPositions(), ElementsAre(c.sent));
-  }
+    EXPECT_EQ(view_.read_out.percent, read_out.percent);
+    EXPECT_EQ(view_.read_out.dmx, read_out.dmx);
+    EXPECT_EQ(view_.read_out.pulse_width, read_out.pulse_width);
+    EXPECT_EQ(pictures_.updated_to, read_out.pulse_width);
+    EXPECT_EQ(sent_.back().position, sent);
+  };
+  expect({1000, 2000}, 0, {0, 0, 1000}, 100);
+  expect({1000, 2000}, 1000, {100, 255, 2000}, 200);
+  expect({1000, 2000}, 500, {50, 128, 1500}, 150);  // 127.5
+  expect({1000, 2000}, 515, {52, 131, 1515}, 152);  // 51.5, 131.325, 151.5
+  expect({1000, 2000}, 525, {52, 134, 1525}, 152);  // 52.5, 133.875, 152.5
+  expect({1001, 1004}, 500, {50, 128, 1003}, 100);  // 1001 + 1.5
+  expect({2000, 1000}, 250, {25, 64, 1750}, 175);
 }
 
 TEST_F(Live, Slider_IsPushedBackIntoTheStops) {
-  struct Case {
-    PulsePair range, stops;
-    int slider, pushed;
-    std::optional<int> sent;
-  };
   SetSliderSends(true);
-  for (const Case& c : std::vector<Case>{
-           {{1000, 2000}, {1200, 1800}, 100, 200, 120},
-           {{1000, 2000}, {1200, 1800}, 200, 200, 120},
-           {{1000, 2000}, {1200, 1790}, 1000, 790, 179},
-           {{1000, 2000}, {1000, 1000}, 500, 0, 100},
-           // 1205 would go out as 1200, and 1795 as 1800.
-           {{1000, 2000}, {1205, 1795}, 100, 206, 121},
-           {{1000, 2000}, {1205, 1795}, 205, 206, 121},
-           {{1000, 2000}, {1205, 1795}, 1000, 794, 179},
-           {{1000, 2000}, {900, 2100}, 0, 0, 100},
-           {{1000, 1100}, {1050, 1100}, 0, 495, 105},  // 49.5 rounds to 50: several positions have one width
-           // Nowhere to go: the stops lie beyond the range, are crossed over, or between two positions.
-           {{1000, 2000}, {2100, 2200}, 500, 500, {}},
-           {{1000, 2000}, {1600, 1400}, 500, 500, {}},
-           {{500, 2500}, {1501, 1501}, 500, 500, {}},
-           // The range is crossed over: up is away from the stops.
-           {{2000, 1000}, {1200, 1800}, 900, 900, {}},
-           {{2000, 1000}, {1200, 1800}, 700, 700, 130}}) {
-    SCOPED_TRACE(c.slider);
+  const auto expect = [&](PulsePair range, PulsePair stops, int slider, int pushed, std::vector<int> sent) {
+    SCOPED_TRACE(slider);
     sent_.clear();
-    choice_.values.VirtualRange = c.range;
-    choice_.values.VirtualStops = c.stops;
+    choice_.values.VirtualRange = range;
+    choice_.values.VirtualStops = stops;
     const int updates = pictures_.updates;
-    MoveSliderTo(c.slider);
+    MoveSliderTo(slider);
     Settle();
-    EXPECT_EQ(view_.slider, c.pushed);
+    EXPECT_EQ(view_.slider, pushed);
     EXPECT_EQ(pictures_.updates, updates + 1);
-    EXPECT_EQ(SentPositions(), c.sent ? std::vector<int>{*c.sent} : std::vector<int>{});
-  }
+    EXPECT_EQ(SentPositions(), sent);
+  };
+  expect({1000, 2000}, {1200, 1800}, 100, 200, {120});
+  expect({1000, 2000}, {1200, 1800}, 200, 200, {120});
+  expect({1000, 2000}, {1200, 1790}, 1000, 790, {179});
+  // 1205 would go out as 1200, and 1795 as 1800.
+  expect({1000, 2000}, {1205, 1795}, 205, 206, {121});
+  expect({1000, 2000}, {1205, 1795}, 1000, 794, {179});
+  expect({1000, 1100}, {1050, 1100}, 0, 495, {105});  // 49.5 rounds to 50: several positions have one width
+  // Nowhere to go: the stops lie beyond the range, are crossed over, or between two positions.
+  expect({1000, 2000}, {2100, 2200}, 500, 500, {});
+  expect({1000, 2000}, {1600, 1400}, 500, 500, {});
+  expect({500, 2500}, {1501, 1501}, 500, 500, {});
+  // The range is crossed over: up is away from the stops.
+  expect({2000, 1000}, {1200, 1800}, 900, 900, {});
+  expect({2000, 1000}, {1200, 1800}, 700, 700, {130});
 }
 
 TEST_F(Live, WaitingPosition_GoesOutUnlessItsRecordsOrItsPortAreGone) {
-  const auto drag = [&] {
-    sent_.clear();
-    for (const int value : {400, 410, 420}) MoveSliderTo(value);  // 140 goes out, 142 waits
-  };
   SetSliderSends(true);
 
   // Another channel, another unit: their positions take no other servo's place.
-  drag();
+  Drag();
   choice_.channel = 5;
   MoveSliderTo(430);
   target_.unit = 0x0A;
   MoveSliderTo(440);
   Settle();
-  std::vector<std::array<int, 3>> sent;
-  for (const LiveCommand& command : sent_) sent.push_back({command.unit, command.mask, command.position});
-  EXPECT_EQ(sent, (std::vector<std::array<int, 3>>{{1, 4, 140}, {1, 4, 142}, {1, 32, 143}, {10, 32, 144}}));
+  std::vector<std::tuple<int, int, int>> sent;
+  for (const LiveCommand& command : sent_) sent.emplace_back(command.unit, command.mask, command.position);
+  EXPECT_THAT(sent, ElementsAre(std::tuple(1, 4, 140), std::tuple(1, 4, 142), std::tuple(1, 32, 143),
+                                std::tuple(10, 32, 144)));
 
   // A test button, and a unit command.
-  drag();
+  Drag();
   SetSliderSends(false);
   test_.OnTestButton(4);
   Settle();
   EXPECT_THAT(SentPositions(), ElementsAre(140, 142, 150));
   SetSliderSends(true);
-  drag();
+  Drag();
   Attach("", 0x0A);
   const std::size_t logged = world_.log.lines.size();
   commands_.get.Start();
   EXPECT_EQ(world_.log.lines.size(), logged + 1) << "at once, before the command's own";
   RunToTheEnd();
-  ExpectSuccess("SUCCESS: Upload Complete");
   EXPECT_THAT(SentPositions(), ElementsAre(140, 142));
 
   // Other records have other stops.
-  drag();
+  Drag();
   test_.OnRecordsReplaced();
   Settle();
   EXPECT_THAT(SentPositions(), ElementsAre(140));
 
-  // Unless the port has gone: that is not opened for it.
-  drag();
+  // The port is not opened for it.
+  Drag();
   link_.SetPortOpen(false);
   world_.time.Advance(1000);
   EXPECT_FALSE(link_.PortOpen());
@@ -357,56 +323,57 @@ TEST_F(Live, UnitCommand_StopsASweepAndHasTheLineToItself) {
     world_.time.Advance(7);
   }
   ExpectSuccess("SUCCESS: Send Complete!");
-  EXPECT_THAT(SentPositions(), ElementsAre(150));
   EXPECT_EQ(unit.accepted_commands(), 5u + 8u);
   MoveSliderTo(300);
   Settle();
   EXPECT_THAT(SentPositions(), ElementsAre(150, 130));
 }
 
-TEST_F(Live, Faults_StopEverythingAndAreToldOnce) {
-  struct Case {
-    std::string what;
-    std::function<void()> act;
-  };
-  for (const Case& c : std::vector<Case>{{"start of a sweep", [&] { test_.OnTestButton(0); }},
-                                         {"single move", [&] { test_.OnTestButton(4); }},
-                                         {"slider", [&] {
-                                            SetSliderSends(true);
-                                            for (int value = 300; value < 400; ++value) MoveSliderTo(value);
-                                          }}}) {
-    SCOPED_TRACE(c.what);
+TEST_F(Live, Faults_StopEverythingAndAreShownOnce) {
+  // From the start: the port cannot be opened.
+  const auto expect_one_box = [&](const std::function<void()>& act) {
     world_.bench.Unplug(1);
-    c.act();
+    act();
     world_.time.Advance(3000);
-    ASSERT_EQ(world_.boxes.shown.size(), 1u);
-    EXPECT_THAT(world_.boxes.shown[0].text, StartsWith("Open of serial port 1 has failed\r\n"));
-    EXPECT_EQ(world_.boxes.shown[0].title, "Comm Error!");
-    EXPECT_EQ(world_.boxes.Take()[0].icon, BoxIcon::kCritical);
+    EXPECT_THAT(world_.boxes.Take(),
+                ElementsAre(Fault("Comm Error!", "Open of serial port 1 has failed\r\n")));
     EXPECT_THAT(view_.captions, testing::Each(false));
     EXPECT_FALSE(view_.sends);
     world_.bench.Replug(1);
-  }
-
-  // At a step, and at a position that waits: the timers have stopped before the box opens.
-  const auto expect_one_box = [&] {
-    world_.log.broken = true;
-    world_.boxes.while_open = [&] {
-      world_.time.Advance(2000);
-      EXPECT_EQ(world_.time.RunningTimers(), 0);
-    };
-    world_.time.Advance(100);
-    EXPECT_THAT(world_.boxes.Take(), ElementsAre(testing::Field(&BoxMessage::title, "Comm Error!")));
-    EXPECT_THAT(view_.captions, testing::Each(false));
-    world_.log.broken = false;
   };
-  test_.OnTestButton(0);
-  world_.time.Advance(300);
-  expect_one_box();
-  SetSliderSends(true);
-  for (const int value : {400, 410, 420}) MoveSliderTo(value);
-  expect_one_box();
-  world_.boxes.while_open = nullptr;
+  expect_one_box([&] { test_.OnTestButton(0); });
+  expect_one_box([&] { test_.OnTestButton(4); });
+  expect_one_box([&] {
+    SetSliderSends(true);
+    for (int value = 300; value < 400; ++value) MoveSliderTo(value);
+  });
+
+  // At a step, at a position that waits, and when either makes way for a command, which then does not start: the
+  // timers have stopped before the box opens.
+  auto& unit = Attach("", 0x01);
+  world_.boxes.while_open = [&] {
+    world_.time.Advance(2000);
+    EXPECT_EQ(world_.time.RunningTimers(), 0);
+  };
+  for (const bool command : {false, true}) {
+    for (const bool sweep : {false, true}) {
+      if (sweep) {
+        test_.OnTestButton(0);
+        world_.time.Advance(300);
+      } else {
+        SetSliderSends(true);
+        Drag();
+      }
+      world_.log.broken = true;
+      if (command) commands_.get.Start();
+      world_.time.Advance(1000);
+      EXPECT_THAT(world_.boxes.Take(), ElementsAre(testing::Field(&BoxMessage::title, "Comm Error!")));
+      EXPECT_THAT(view_.captions, testing::Each(false));
+      EXPECT_FALSE(commands_.running.Active());
+      world_.log.broken = false;
+    }
+  }
+  EXPECT_EQ(unit.polls_heard(), 0u);
 
   // A position that no unit knows never becomes a byte.
   sent_.clear();
@@ -417,26 +384,6 @@ TEST_F(Live, Faults_StopEverythingAndAreToldOnce) {
   }
   Settle();
   EXPECT_THAT(sent_, IsEmpty());
-}
-
-TEST_F(Live, FaultOfMakingWay_IsToldAndKeepsTheCommandFromStarting) {
-  auto& unit = Attach("", 0x01);
-  const auto expect_not_started = [&] {
-    world_.log.broken = true;
-    commands_.get.Start();
-    world_.time.Advance(1000);
-    EXPECT_THAT(world_.boxes.Take(), ElementsAre(testing::Field(&BoxMessage::title, "Comm Error!")));
-    EXPECT_EQ(unit.polls_heard(), 0u);
-    EXPECT_FALSE(commands_.running.Active());
-    EXPECT_THAT(view_.captions, testing::Each(false));
-    world_.log.broken = false;
-  };
-  test_.OnTestButton(0);
-  world_.time.Advance(300);
-  expect_not_started();
-  SetSliderSends(true);
-  for (const int value : {400, 410, 420}) MoveSliderTo(value);
-  expect_not_started();
 }
 
 }  // namespace
