@@ -52,13 +52,10 @@ struct FakePictures final : public ServoPictures {
 struct LiveCommand {
   std::uint64_t ms;  // when it was written, since the test's start
   int unit, mask, position;
-  friend bool operator==(const LiveCommand&, const LiveCommand&) = default;
 };
 
 class Live : public CommandTest {
  protected:
-  static constexpr std::uint8_t kChannel3 = 4;
-
   Live() {
     on_starting_ = [this] { return test_.MakeWay(); };
     link_.SetPortClosedHandler([this] { test_.OnPortClosed(); });
@@ -80,7 +77,7 @@ class Live : public CommandTest {
     EXPECT_EQ(packet[2], 17);
     EXPECT_EQ(packet[6], 255);
     const std::uint64_t unlock_ms = (unlock_us_ + 500) / 1000;
-    sent_.push_back({unlock_ms - start_ms_, packet[0], packet[4], packet[5]});
+    sent_.push_back({unlock_ms, packet[0], packet[4], packet[5]});
   }
   std::vector<int> SentPositions() {
     std::vector<int> positions;
@@ -109,7 +106,6 @@ class Live : public CommandTest {
   FakeView view_;
   FakePictures pictures_;
   std::vector<LiveCommand> sent_;
-  std::uint64_t start_ms_ = world_.time.ElapsedMs();
   LiveTest test_{link_, world_.time, world_.boxes, commands_.running, target_, choice_, view_, pictures_};
 
  private:
@@ -118,50 +114,41 @@ class Live : public CommandTest {
   std::uint64_t unlock_us_ = 0;
 };
 
-TEST_F(Live, Sweeps_StepAndRestToTheMillisecond) {
-  choice_.values.ActualRange = {710, 2290};
-  choice_.values.VirtualRange = {1000, 2000};
+TEST_F(Live, Sweep_StepsAndRestsToTheMillisecond) {
   choice_.values.VirtualStops = {1430, 1640};
   auto& unit = Attach("", 0x01);
-  const auto expect_sweep = [&](int button, Microseconds low, Microseconds high) {
-    SCOPED_TRACE(button);
-    sent_.clear();
-    pictures_.drawn.clear();
-    start_ms_ = world_.time.ElapsedMs();
-    test_.OnTestButton(button);
-    EXPECT_TRUE(view_.captions[static_cast<std::size_t>(button)]);
+  test_.OnTestButton(1);
+  EXPECT_TRUE(view_.captions[1]);
+  world_.time.Advance(2900);
+  std::vector<std::pair<std::uint64_t, int>> sent;
+  for (const LiveCommand& command : sent_) sent.emplace_back(command.ms, command.position);
+  using At = std::pair<std::uint64_t, int>;
+  // Each end is reached exactly, and rested at.
+  EXPECT_THAT(sent, ElementsAre(At(0, 150), At(250, 155), At(350, 160), At(450, 164), At(1450, 159),
+                                At(1550, 154), At(1650, 149), At(1750, 144), At(1850, 143), At(2850, 148)));
+  EXPECT_EQ(pictures_.drawn[3], 1640);
 
-    // Up, down, and up again to the middle; each end is reached exactly, and rested at.
-    std::vector<LiveCommand> expected{{0, 1, kChannel3, 150}};
-    std::uint64_t ms = 250;
-    const auto step_to = [&](Microseconds position, std::uint64_t until_next) {
-      expected.push_back({ms, 1, kChannel3, position / 10});
-      ms += until_next;
-    };
-    Microseconds position = 1500;
-    while ((position += 50) < high) step_to(position, 100);
-    step_to(high, 1000);
-    for (position = high - 50; position > low; position -= 50) step_to(position, 100);
-    step_to(low, 1000);
-    for (position = low + 50; position < 1500; position += 50) step_to(position, 100);
-
-    world_.time.Advance(ms + 20);
-    ASSERT_GE(sent_.size(), expected.size());
-    sent_.resize(expected.size());
-    EXPECT_EQ(sent_, expected);
-    EXPECT_EQ(pictures_.drawn[1], std::min(1550, high));
-
-    test_.OnTestButton(button);
-    world_.time.Advance(5000);
-    EXPECT_EQ(unit.LivePosition(3), 150);
-    EXPECT_EQ(test_.ShownPosition(), 1500);
-    EXPECT_FALSE(view_.captions[static_cast<std::size_t>(button)]);
-  };
-  expect_sweep(0, 1000, 2000);
-  expect_sweep(1, 1430, 1640);
-  expect_sweep(3, 710, 2290);
+  test_.OnTestButton(1);
+  world_.time.Advance(5000);
+  EXPECT_EQ(unit.LivePosition(3), 150);
+  EXPECT_EQ(test_.ShownPosition(), 1500);
+  EXPECT_FALSE(view_.captions[1]);
   EXPECT_EQ(world_.time.RunningTimers(), 0);
   EXPECT_EQ(unit.rejected_commands(), 0u);
+}
+
+TEST_F(Live, Sweeps_GoThroughTheRangeOfTheirButton) {
+  choice_.values.ActualRange = {710, 2290};
+  choice_.values.VirtualRange = {1000, 2000};
+  for (const auto& [button, ends] : {std::pair(0, std::pair(100, 200)), std::pair(3, std::pair(71, 229))}) {
+    sent_.clear();
+    test_.OnTestButton(button);
+    world_.time.Advance(20000);
+    const std::vector<int> positions = SentPositions();
+    const auto [lowest, highest] = std::minmax_element(positions.begin(), positions.end());
+    EXPECT_EQ(std::pair(*lowest, *highest), ends);
+    test_.OnTestButton(button);
+  }
 }
 
 TEST_F(Live, Buttons_SwitchMoveAndReset) {
@@ -206,32 +193,10 @@ TEST_F(Live, Buttons_SwitchMoveAndReset) {
   }
 }
 
-TEST_F(Live, Slider_SpansTheVirtualRange) {
+TEST_F(Live, Slider_SpansTheVirtualRangeWithinTheStops) {
   SetSliderSends(true);
-  choice_.values.VirtualStops = {10, 2550};
-  const auto expect = [&](PulsePair range, int slider, SliderReadOut read_out, int sent) {
-    SCOPED_TRACE(slider);
-    choice_.values.VirtualRange = range;
-    MoveSliderTo(slider);
-    Settle();
-    EXPECT_EQ(view_.read_out.percent, read_out.percent);
-    EXPECT_EQ(view_.read_out.dmx, read_out.dmx);
-    EXPECT_EQ(view_.read_out.pulse_width, read_out.pulse_width);
-    EXPECT_EQ(pictures_.updated_to, read_out.pulse_width);
-    EXPECT_EQ(sent_.back().position, sent);
-  };
-  expect({1000, 2000}, 0, {0, 0, 1000}, 100);
-  expect({1000, 2000}, 1000, {100, 255, 2000}, 200);
-  expect({1000, 2000}, 500, {50, 128, 1500}, 150);  // 127.5
-  expect({1000, 2000}, 515, {52, 131, 1515}, 152);  // 51.5, 131.325, 151.5
-  expect({1000, 2000}, 525, {52, 134, 1525}, 152);  // 52.5, 133.875, 152.5
-  expect({1001, 1004}, 500, {50, 128, 1003}, 100);  // 1001 + 1.5
-  expect({2000, 1000}, 250, {25, 64, 1750}, 175);
-}
-
-TEST_F(Live, Slider_IsPushedBackIntoTheStops) {
-  SetSliderSends(true);
-  const auto expect = [&](PulsePair range, PulsePair stops, int slider, int pushed, std::vector<int> sent) {
+  const auto expect = [&](PulsePair range, PulsePair stops, int slider, int pushed,
+                          const std::vector<int>& sent) {
     SCOPED_TRACE(slider);
     sent_.clear();
     choice_.values.VirtualRange = range;
@@ -241,8 +206,23 @@ TEST_F(Live, Slider_IsPushedBackIntoTheStops) {
     Settle();
     EXPECT_EQ(view_.slider, pushed);
     EXPECT_EQ(pictures_.updates, updates + 1);
+    EXPECT_EQ(pictures_.updated_to, view_.read_out.pulse_width);
     EXPECT_EQ(SentPositions(), sent);
   };
+  const auto expect_read_out = [&](int percent, int dmx, Microseconds pulse_width) {
+    EXPECT_EQ(view_.read_out.percent, percent);
+    EXPECT_EQ(view_.read_out.dmx, dmx);
+    EXPECT_EQ(view_.read_out.pulse_width, pulse_width);
+  };
+  expect({1000, 2000}, {10, 2550}, 1000, 1000, {200});
+  expect_read_out(100, 255, 2000);
+  expect({1000, 2000}, {10, 2550}, 515, 515, {152});
+  expect_read_out(52, 131, 1515);  // 51.5, 131.325, 151.5
+  expect({1000, 2000}, {10, 2550}, 525, 525, {152});
+  expect_read_out(52, 134, 1525);  // 52.5, 133.875, 152.5
+  expect({1001, 1004}, {10, 2550}, 500, 500, {100});
+  expect_read_out(50, 128, 1003);  // 127.5, 1001 + 1.5
+
   expect({1000, 2000}, {1200, 1800}, 100, 200, {120});
   expect({1000, 2000}, {1200, 1800}, 200, 200, {120});
   expect({1000, 2000}, {1200, 1790}, 1000, 790, {179});

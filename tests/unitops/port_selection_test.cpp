@@ -140,8 +140,11 @@ TEST_F(PortSelectionTest, ListenerPort_IsThatOfThePreferencesAndMayBeNone) {
   network.CreateKey();
   panel_.Take(3);
   network.SetNumber("DMXListenerPort", 0);
-  panel_.control_panel.ReadPreferences();
-  selection_.Choose(3);
+  ControlPanel none(world_.time, world_.boxes, panel_.wsCLI, panel_.registry, panel_.processes);
+  none.ReadPreferences();
+  PortSelection selection(link_, world_.boxes, none);
+  selection.ListCommPorts();
+  selection.Choose(3);
   EXPECT_THAT(world_.boxes.Take(), ElementsAre(InUse(3)));
 
   network.SetNumber("DMXListenerPort", 4321);  // any other one is where the client connects

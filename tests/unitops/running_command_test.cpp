@@ -9,48 +9,38 @@ class Progress : public CommandTest {
  protected:
   void Start() { commands_.running.StartCommandProgress(commands_.send, "Sending"); }
   void End(Outcome outcome) { commands_.running.EndCommandProgress(outcome, "done"); }
-  void Advance(std::uint64_t ms) { world_.time.Advance(ms); }
+  void Expect(std::uint64_t after_ms, bool shown, int bar_width, ProgressColour colour) {
+    world_.time.Advance(after_ms);
+    EXPECT_EQ(progress_.shown, shown);
+    EXPECT_EQ(progress_.bar_width, bar_width);
+    EXPECT_EQ(progress_.colour, colour);
+  }
 };
 
 TEST_F(Progress, Bar_GrowsTenEvery15msUntilTheFrameIsFull) {
   Start();
-  EXPECT_TRUE(progress_.shown);
-  EXPECT_EQ(progress_.bar_width, 10);
-  EXPECT_EQ(progress_.colour, ProgressColour::kBlue);
-  Advance(14);
-  EXPECT_EQ(progress_.bar_width, 10);
-  Advance(1);
-  EXPECT_EQ(progress_.bar_width, 20);
-  Advance(60000);
-  EXPECT_EQ(progress_.bar_width, 400);
+  Expect(14, true, 10, ProgressColour::kBlue);
+  Expect(1, true, 20, ProgressColour::kBlue);
+  Expect(60000, true, 400, ProgressColour::kBlue);
   progress_.frame_width = 421;
-  Advance(60000);
-  EXPECT_EQ(progress_.bar_width, 430) << "a frame made wider is filled as well";
+  Expect(60000, true, 430, ProgressColour::kBlue);
 }
 
 TEST_F(Progress, Outcome_StaysForThreeSecondsUnlessAnotherCommandStarts) {
   Start();
-  Advance(150);
+  world_.time.Advance(150);
   End(Outcome::kFailure);
-  EXPECT_EQ(progress_.colour, ProgressColour::kRed);
+  Expect(2999, true, 110, ProgressColour::kRed);
   EXPECT_EQ(progress_.text, "done");
-  Advance(2999);
-  EXPECT_TRUE(progress_.shown);
-  EXPECT_EQ(progress_.bar_width, 110);
-  Advance(1);
-  EXPECT_FALSE(progress_.shown);
-  EXPECT_EQ(progress_.bar_width, 10);
+  Expect(1, false, 10, ProgressColour::kRed);
   EXPECT_EQ(world_.time.RunningTimers(), 0);
 
   Start();
   End(Outcome::kSuccess);
-  EXPECT_EQ(progress_.colour, ProgressColour::kGreen);
-  Advance(2000);
+  Expect(2000, true, 10, ProgressColour::kGreen);
   Start();
   EXPECT_EQ(progress_.text, "");
-  Advance(5000);
-  EXPECT_TRUE(progress_.shown);
-  EXPECT_EQ(progress_.colour, ProgressColour::kBlue);
+  Expect(5000, true, 400, ProgressColour::kBlue);
 }
 
 }  // namespace
