@@ -69,7 +69,7 @@ bool MeasureAll() {
   user.Rest(true);
   bool within_bounds = Measure("trying to connect where nothing listens", 1);
   bench.Start(panel);
-  const auto connected = [&] { return program.control_panel.Client().TCPState() == TcpState::kConnected; };
+  const auto connected = [&] { return program.wsCLI.State() == TcpState::kConnected; };
   Require(WaitFor(connected), "It had given up connecting");
 
   user.Rest(false);

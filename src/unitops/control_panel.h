@@ -41,9 +41,6 @@ class ControlPanel {
   // Gives that port back. It counts as requested no longer.
   void RelinquishPort();
 
-  // The comm listener client, for who watches its state.
-  const CommListenerInterface& Client() const { return client_; }
-
  private:
   MessageBoxes& boxes_;
   TcpSocket& wsCLI_;

@@ -17,6 +17,13 @@ const BoxMessage kNoResponse{"Unit did not respond to the Option Settings, Retry
 class Send : public CommandTest {
  protected:
   void ExpectSuccess() { CommandTest::ExpectSuccess("SUCCESS: Send Complete!"); }
+  // Lets port `port` be acknowledged.
+  void AcknowledgePort(const VirtualUnit& unit, std::size_t port) {
+    const auto acknowledged = [&] {
+      return unit.polls_heard() == port && !world_.bench.Line(1).NextEventUs();
+    };
+    ASSERT_TRUE(world_.time.AdvanceUntil(acknowledged, 1000));
+  }
   // What the program puts on the line.
   Bytes Sent(const std::function<void()>& action) {
     Bytes bytes;
@@ -51,10 +58,9 @@ TEST_F(Send, Ports_FollowEachOther300msAfterTheAcknowledgement) {
   auto& unit = Attach("", 0x01);
   commands_.send.Start();
   EXPECT_EQ(commands_.running.What(), "Sending the configuration to unit 01");
-  ASSERT_TRUE(
-      world_.time.AdvanceUntil([&] { return unit.polls_heard() == 1 && !link_.PollOutstanding(); }, 200));
+  AcknowledgePort(unit, 1);
   // Nothing until the pause is over.
-  EXPECT_THAT(Sent([&] { world_.time.Advance(299); }), ElementsAre(0, 0));
+  EXPECT_THAT(Sent([&] { world_.time.Advance(298); }), testing::Each(0));
   EXPECT_THAT(Sent([&] { world_.time.Advance(20); }).size(), testing::Gt(10u));
   RunToTheEnd();
   ExpectSuccess();
@@ -169,8 +175,7 @@ TEST_F(Send, InvalidRecord_StopsBeforeItsPort) {
 TEST_F(Send, UnpluggedBetweenTwoPorts_IsADownloadFailure) {
   auto& unit = Attach("", 0x01);
   commands_.send.Start();
-  ASSERT_TRUE(
-      world_.time.AdvanceUntil([&] { return unit.polls_heard() == 2 && !link_.PollOutstanding(); }, 1000));
+  AcknowledgePort(unit, 2);
   world_.bench.Unplug(1);
   RunToTheEnd();
   EXPECT_EQ(world_.boxes.shown.at(0).icon, BoxIcon::kCritical);
