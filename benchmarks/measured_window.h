@@ -16,7 +16,7 @@
 #include "measuring.h"
 #include "platform/paths.h"
 #include "platform/qt/qt_tcp_socket.h"
-#include "platform/qt/system_serial_device.h"
+#include "platform/qt/qt_serial_device.h"
 #include "platform/system_processes.h"
 #include "platform/system_registry.h"
 #include "prefs/registry.h"
@@ -86,7 +86,7 @@ class MeasuredWindow {
 
   StartedBench bench_;
   QtPlatform platform_;
-  const std::unique_ptr<SerialDevice> serial_ = CreateSystemSerialDevice(platform_.on_fault);
+  const std::unique_ptr<SerialDevice> serial_ = std::make_unique<QtSerialDevice>(platform_.on_fault);
 
  public:
   test::CountingDevice device{*serial_};

@@ -21,7 +21,7 @@ void Warn(const std::string& line) { qCWarning(preferences, "%s", line.c_str());
 }  // namespace
 
 UtilityProgram::UtilityProgram()
-    : device(CreateSystemSerialDevice(platform.on_fault, Trace)),
+    : device(std::make_unique<QtSerialDevice>(platform.on_fault, Trace)),
       log(CommandLogPath()),
       Serial1(*device, platform.timers, platform.clock, log),
       wsCLI(platform.on_fault),

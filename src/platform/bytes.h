@@ -1,4 +1,4 @@
-// Bytes: what goes over a line.
+// Bytes: data that is sent or received.
 #pragma once
 
 #include <cstdint>

@@ -1,24 +1,24 @@
-// Clock: the millisecond count that every time-out is measured with.
+// Clock: the millisecond count of every time-out.
 #pragma once
 
 #include <cstdint>
 
 namespace tendril {
 
-// The time, and how finely it is told.
+// A millisecond count and its resolution.
 class Clock {
  public:
   virtual ~Clock() = default;
 
-  // Milliseconds since some moment, as a 32-bit count that wraps about every 49.7 days: subtract unsigned,
-  // never compare two readings.
+  // Milliseconds since an arbitrary moment. The count wraps about every 49.7 days: subtract unsigned, never compare two
+  // readings.
   virtual std::uint32_t NowMs() const = 0;
 
   // The step, in milliseconds, by which NowMs() grows. At least 1.
   virtual std::uint32_t GranularityMs() const = 0;
 
-  // Asks the system for its finest timer resolution and returns the period granted, in milliseconds (at least
-  // 1). Each request is paired with a ReleaseTimerPeriod() of what was granted.
+  // Requests the system's finest timer resolution and returns the granted period, in milliseconds (at least 1). Call
+  // ReleaseTimerPeriod() with it afterwards.
   virtual std::uint32_t RequestFinestTimerPeriod() = 0;
   virtual void ReleaseTimerPeriod(std::uint32_t period_ms) = 0;
 };

@@ -1,4 +1,4 @@
-// MessageBoxes: how the program speaks up.
+// MessageBoxes: modal message boxes.
 #pragma once
 
 #include <string>
@@ -8,7 +8,7 @@ namespace tendril {
 // Title of boxes that have none of their own.
 inline constexpr char kDefaultBoxTitle[] = "Tendril Configuration";
 
-// The picture beside the text.
+// The icon beside the text.
 enum class BoxIcon { kNone, kExclamation, kCritical };
 
 // One message. Texts are plain UTF-8 with CR LF between lines.
@@ -20,15 +20,15 @@ struct BoxMessage {
   friend bool operator==(const BoxMessage&, const BoxMessage&) = default;
 };
 
-// Shows modal boxes, one at a time as they come. Both calls run the event loop until the person answers: have
-// everything settled before you call. When the program is being closed they return at once.
+// Both calls run the event loop until the user answers: settle all state before you call. While the program is being
+// closed they return at once.
 class MessageBoxes {
  public:
   virtual ~MessageBoxes() = default;
 
   // A box with an OK button.
   virtual void Show(const BoxMessage& message) = 0;
-  // A box with Yes and No; true for Yes. No is what Enter gives; closing it by any other way is a No too.
+  // A box with Yes and No; true for Yes. Enter, Escape and closing the box give No.
   virtual bool AskYesNo(const BoxMessage& message) = 0;
 };
 

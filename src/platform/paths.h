@@ -1,4 +1,4 @@
-// Where the program keeps its files. Each system compiles its own implementation: posix/ or windows/.
+// The paths of the program's files. Each system compiles its own implementation: posix/ or windows/.
 #pragma once
 
 #include <filesystem>
@@ -13,7 +13,7 @@ std::filesystem::path ConfigFolder();
 std::filesystem::path StateFolder();
 #endif
 
-// The text file that unit-wide commands are logged to. Neither it nor its folder is created.
+// The log of unit-wide commands, a text file. Neither it nor its folder is created.
 std::filesystem::path CommandLogPath();
 
 }  // namespace tendril

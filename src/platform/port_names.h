@@ -1,5 +1,4 @@
-// Which device stands behind a comm port number. Each system compiles its own implementation: posix/ or
-// windows/.
+// The device of a comm port number. Each system compiles its own implementation: posix/ or windows/.
 //
 //   Windows        COM<n>
 //   Linux, macOS   the link com<n> in the folder `ports` of the configuration folder, if there is one; else
@@ -14,22 +13,21 @@
 
 namespace tendril {
 
-// The device behind port `number` (1 = the first), links resolved; nothing when there is none. A link whose
-// device is gone is no port, and the device it stands in for is not tried instead. Never opens a device:
-// opening one would pull its control lines.
+// The device of port `number` (1 = the first), links resolved; nothing when there is none. A link whose device is gone
+// is no port, and hides the number's own device. Never opens a device: that would change its control lines.
 std::optional<std::filesystem::path> FindSerialDevice(std::int32_t number);
 
 #ifndef _WIN32
-// The device that port `number` has without a link; empty when the number has none. It need not exist.
+// The device of port `number` without a link; empty when the number has none. It need not exist.
 std::filesystem::path DefaultSerialDevice(std::int32_t number);
 
-// False when the driver says that no hardware is behind its device: Linux keeps /dev/ttyS nodes for UARTs
-// that a machine could have. `tty_class` is the folder in which the drivers describe their devices.
+// False when the driver found no hardware for `device`: Linux has /dev/ttyS nodes for UARTs that a machine could have.
+// `tty_class` is the folder in which the drivers describe their devices.
 bool DriverFoundHardware(const std::filesystem::path& device,
                          const std::filesystem::path& tty_class = "/sys/class/tty");
 
-// What the maker of an adapter calls it, who the maker is, and the device's path, as far as they are known: "FT232R USB
-// UART, FTDI, /dev/ttyUSB0". `tty_class` as above.
+// The adapter's product name, its maker and the device's path, as far as they are known: "FT232R USB UART, FTDI,
+// /dev/ttyUSB0". `tty_class` as above.
 std::string DescribeSerialDevice(const std::filesystem::path& device,
                                  const std::filesystem::path& tty_class = "/sys/class/tty");
 #endif

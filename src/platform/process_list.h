@@ -1,4 +1,4 @@
-// ProcessList: what runs on this computer.
+// ProcessList: the programs that run on this computer.
 #pragma once
 
 #include <string_view>

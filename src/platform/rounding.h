@@ -1,4 +1,4 @@
-// Rounding as the show-control software does it.
+// Rounding, as in the show-control software.
 #pragma once
 
 #include <cmath>
@@ -6,9 +6,9 @@
 
 namespace tendril {
 
-// The nearest whole number, of two equally near ones the even one. `value` must fit 32 bits.
+// The nearest whole number; of two equally near ones, the even one. `value` must fit 32 bits.
 inline std::int32_t RoundHalfToEven(double value) {
-  return static_cast<std::int32_t>(std::nearbyint(value));  // as long as nobody changes the rounding mode
+  return static_cast<std::int32_t>(std::nearbyint(value));  // in the default rounding mode
 }
 
 }  // namespace tendril

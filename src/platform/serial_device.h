@@ -11,65 +11,64 @@
 
 namespace tendril {
 
-// What a device reports to its owner.
+// Events for the owner of a device.
 enum class SerialEvent {
-  kDataReceived,     // at least as many bytes wait as the receive threshold says
-  kReceiveOverflow,  // the input buffer is full; what is beyond it is lost
-  kDeviceLost        // the device went away (unplugged): it has closed itself; reported once
+  kDataReceived,     // at least as many bytes wait as the receive threshold asks for
+  kReceiveOverflow,  // the input buffer is full; further bytes are lost
+  kDeviceLost        // the device was unplugged; the port is closed; reported once
 };
 
 // What users call port `number`.
 inline std::string CommName(std::int32_t number) { return "Comm " + std::to_string(number); }
 
-// Received bytes that a device keeps for its owner at most.
+// The size of a device's input buffer.
 inline constexpr std::size_t kSerialInputBufferBytes = 4050;
 
 // One serial port, with 8 data bits, no parity, one stop bit and no handshaking; bytes of all values pass unchanged,
 // zero too. Operations that need an open port raise kErrPortNotOpen (8012) on a closed one. Events are delivered
 // from the event loop, never from inside one of these calls, and none after Close() or destruction. No call waits for
-// the far end; a driver whose adapter has stalled may hold one for seconds all the same.
+// the far end; but the driver of a stalled adapter may delay one for seconds.
 //
-// A device that was lost counts as open until kDeviceLost has been delivered: what is written until then goes
-// nowhere, without a failure, and what had arrived can be read.
+// A lost device counts as open until kDeviceLost is delivered. Until then writes are ignored without a failure, and what
+// had arrived can be read.
 class SerialDevice {
  public:
   virtual ~SerialDevice() = default;
 
-  // Who gets the events; one owner.
+  // Sets the one receiver of the events.
   virtual void SetEventHandler(std::function<void(SerialEvent)> handler) = 0;
 
-  // Whether a device stands behind port `number` (1 = the first). Opens nothing.
+  // Whether port `number` (1 = the first) has a device.
   virtual bool Exists(std::int32_t number) const = 0;
 
-  // Which device stands behind port `number`, for the user: what its maker calls it, as far as that is known,
-  // and its path, as in "FT232R USB UART, FTDI, /dev/ttyUSB0". Empty when there is none.
+  // The device of port `number`, for the user: its product name and maker, as far as they are known, and its path, as
+  // in "FT232R USB UART, FTDI, /dev/ttyUSB0". Empty when there is none.
   virtual std::string Describe(std::int32_t number) const = 0;
 
   // Opens port `number` (1 or more) at `baud` bit/s for this program alone. Raises kErrInvalidPort (no such device),
-  // kErrPortAlreadyOpen (another program, or this one, has it), kErrNotAllowed (with what to do about it) or
+  // kErrPortAlreadyOpen (another program, or this one, has it), kErrNotAllowed (with the remedy) or
   // kErrSettingsRefused (the port cannot do this speed).
   virtual void Open(std::int32_t number, std::int32_t baud) = 0;
-  // Never fails; does nothing on a closed port. What was queued to send or waits to be read is dropped.
+  // Drops what is queued or waits to be read. Does nothing on a closed port.
   virtual void Close() noexcept = 0;
 
-  // Bytes that must wait before kDataReceived comes: 1 reports every byte, 0 none. When enough wait already,
-  // kDataReceived comes for them. Holds across opening and closing. Raises kErrInvalidPropertyValue below 0.
+  // How many bytes must wait before kDataReceived is delivered: 1 reports every byte, 0 none. Also counts bytes that
+  // wait already. Holds across opening and closing. Raises kErrInvalidPropertyValue below 0.
   virtual void SetReceiveThreshold(std::int32_t bytes) = 0;
 
-  // Asserts or clears RTS, which turns the line driver of a half-duplex adapter on or off. A port that has no
-  // RTS line ignores it. Raises kErrDeviceIo, with the system's reason, when the adapter does not obey.
+  // Asserts or clears RTS, which turns the line driver of a half-duplex adapter on or off. A port without RTS ignores
+  // it. Raises kErrDeviceIo, with the system's reason, when the adapter does not obey.
   virtual void SetRts(bool asserted) = 0;
 
-  // Queues all of `bytes` to be sent and starts sending at once; does not wait. Raises kErrDeviceIo, and queues
-  // none of them, when the system refuses them (what waited is dropped too) or the device has not taken what it was
-  // given for too long.
+  // Queues `bytes` and starts sending at once. Raises kErrDeviceIo, with nothing queued, when the system refuses them
+  // (earlier output is dropped too), or when too much earlier output still waits.
   virtual void Write(std::span<const std::uint8_t> bytes) = 0;
-  // Takes all that has arrived up to this moment, also what the event loop has not seen yet; at most as much as
-  // the input buffer holds, the rest stays for the next call.
+  // Takes what has arrived up to now, also what the event loop has not seen yet; at most as much as the input buffer
+  // holds.
   virtual Bytes ReadAll() = 0;
-  // Drops all that has arrived up to this moment.
+  // Drops what has arrived up to now.
   virtual void ClearInput() = 0;
-  // Bytes handed to Write() that have not left for the wire yet, in this program and in the system.
+  // Bytes passed to Write() that are not on the wire yet, in this program and in the system.
   virtual std::size_t PendingOutput() const = 0;
 };
 

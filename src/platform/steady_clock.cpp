@@ -15,7 +15,7 @@ std::uint32_t SteadyClock::NowMs() const {
       std::chrono::duration_cast<std::chrono::milliseconds>(since_start).count());
 }
 
-// The steady clock is finer than a millisecond on every system, so the count grows by ones.
+// The steady clock is finer than a millisecond on every system.
 std::uint32_t SteadyClock::GranularityMs() const { return 1; }
 
 #ifdef _WIN32
@@ -32,7 +32,7 @@ void SteadyClock::ReleaseTimerPeriod(std::uint32_t period_ms) { timeEndPeriod(pe
 
 #else
 
-// Timers are as fine as the clock here, without asking.
+// Timers have the clock's resolution here.
 std::uint32_t SteadyClock::RequestFinestTimerPeriod() { return 1; }
 
 void SteadyClock::ReleaseTimerPeriod(std::uint32_t /*period_ms*/) {}

@@ -1,4 +1,4 @@
-// The programs that run on this system. Each system compiles its own implementation: posix/ or windows/.
+// The ProcessList of this system. Each system compiles its own implementation: posix/ or windows/.
 #pragma once
 
 #include <memory>
@@ -7,9 +7,9 @@
 
 namespace tendril {
 
-// Windows: by the name of a program's file. Linux, macOS: by the name that the system has for the program, or by
-// the first of its arguments or the one behind, without their folders: that is how a program shows which runs in
-// an emulator or an interpreter. A program that has ended does not run, even if nobody has asked for its end yet.
+// Windows: finds a program by the name of its file. Linux, macOS: by the system's name of the program, or by its first
+// or second argument without folders: a program in an emulator or interpreter appears there. A process that has ended
+// does not count, even when its parent has not waited for it yet.
 std::unique_ptr<ProcessList> OpenProcessList();
 
 }  // namespace tendril

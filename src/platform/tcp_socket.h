@@ -22,7 +22,7 @@ struct TcpEvents {
                                                                                       const std::string&) {};
 };
 
-// Why a connection ended, in the numbers of the platform's published list.
+// Reasons why a connection ended, with the numbers of the platform's published list.
 inline constexpr std::int32_t kConnectionReset = 10054;
 inline constexpr std::int32_t kConnectionRefused = 10061;
 

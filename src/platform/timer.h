@@ -7,17 +7,16 @@
 
 namespace tendril {
 
-// Ticks every Interval() milliseconds while it is enabled, on the program's one thread. A fresh timer is
-// disabled with interval 0. While a tick is being handled the same timer does not tick again, even when the
-// handler runs the event loop (a message box); others do.
+// Ticks every Interval() milliseconds while it is enabled, on the program's one thread. A new timer is disabled and has
+// interval 0. While a tick is handled, the same timer does not tick again, even when the handler runs the event loop (a
+// message box); others do.
 class Timer {
  public:
   virtual ~Timer() = default;
 
-  // Interval in milliseconds, at least 0. 0 never ticks. Setting it on an enabled timer starts the period
-  // anew.
+  // Milliseconds, at least 0. 0 never ticks. Setting it on an enabled timer starts a new period.
   virtual void SetInterval(std::int32_t ms) = 0;
-  // The interval that was set last.
+  // The last interval that was set.
   virtual std::int32_t Interval() const = 0;
 
   // Enabling starts a new period, also when the timer was enabled already.
@@ -26,7 +25,7 @@ class Timer {
   virtual bool Enabled() const = 0;
 };
 
-// Makes timers. Who creates a timer owns it, and may destroy it at any time outside of its own tick.
+// Makes timers. The caller owns them, and must not destroy one inside its own tick.
 class TimerFactory {
  public:
   virtual ~TimerFactory() = default;

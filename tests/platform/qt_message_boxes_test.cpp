@@ -10,7 +10,7 @@
 namespace tendril::test {
 namespace {
 
-// Does `act` to the box that opens next, once it is up.
+// Calls `act` with the box that opens next.
 void OnNextBox(const std::function<void(QMessageBox&)>& act) {
   QTimer::singleShot(0, qApp, [act] {
     auto* box = qobject_cast<QMessageBox*>(QApplication::activeModalWidget());
@@ -39,51 +39,31 @@ TEST(QtMessageBoxes, Message_IsShownAsPlainTextOverItsWindow) {
 
 TEST(QtMessageBoxes, Question_IsYesOnlyForYes) {
   auto window = std::make_unique<QWidget>();
-  const struct {
-    const char* how;
-    std::function<void(QMessageBox&)> answer;
-    bool yes;
-  } rows[] = {
-      {"Yes", [](QMessageBox& box) { box.button(QMessageBox::Yes)->click(); }, true},
-      {"No", [](QMessageBox& box) { box.button(QMessageBox::No)->click(); }, false},
-      {"Enter", [](QMessageBox& box) { QTest::keyClick(&box, Qt::Key_Return); }, false},
-      {"Escape", [](QMessageBox& box) { QTest::keyClick(&box, Qt::Key_Escape); }, false},
-      {"its window destroyed", [&](QMessageBox&) { window.reset(); }, false},
-  };
   QtMessageBoxes boxes;
   boxes.SetParent(window.get());
-  for (const auto& row : rows) {
-    OnNextBox(row.answer);
-    EXPECT_EQ(boxes.AskYesNo({"Sure?", "Port In Use"}), row.yes) << row.how;
-  }
+  const auto answer_to = [&](const std::function<void(QMessageBox&)>& act) {
+    OnNextBox(act);
+    return boxes.AskYesNo({"Sure?", "Port In Use"});
+  };
+  EXPECT_TRUE(answer_to([](QMessageBox& box) { box.button(QMessageBox::Yes)->click(); }));
+  EXPECT_FALSE(answer_to([](QMessageBox& box) { box.button(QMessageBox::No)->click(); }));
+  EXPECT_FALSE(answer_to([](QMessageBox& box) { QTest::keyClick(&box, Qt::Key_Return); }));
+  EXPECT_FALSE(answer_to([](QMessageBox& box) { QTest::keyClick(&box, Qt::Key_Escape); }));
+  EXPECT_FALSE(answer_to([&](QMessageBox&) { window.reset(); }));
 }
 
-// Counts the boxes that come up.
-class BoxCounter : public QObject {
- public:
-  BoxCounter() { qApp->installEventFilter(this); }
-  bool eventFilter(QObject* object, QEvent* event) override {
-    if (event->type() == QEvent::Show && qobject_cast<QMessageBox*>(object) != nullptr) ++count;
-    return false;
-  }
-  int count = 0;
-};
-
-// The program ends while a question is open, with another box to come.
+// The program ends while a question is open, and another box is to follow.
 TEST(QtMessageBoxes, ProgramEndsWhileABoxIsOpen_AnswerIsNoAndNoBoxFollows) {
   for (const bool quit : {true, false}) {
     QtMessageBoxes boxes;
-    BoxCounter shown;
     bool yes = true;
     QTimer::singleShot(0, qApp, [&] {
       OnNextBox([&](QMessageBox&) { quit ? QCoreApplication::quit() : boxes.CloseAll(); });
       yes = boxes.AskYesNo({"Sure?", "Port In Use"});
-      boxes.Show({"Never seen", ""});
-      yes = yes || boxes.AskYesNo({"Never seen", ""});
+      boxes.Show({"Never seen", ""});  // would stay open
       QCoreApplication::quit();
     });
     QApplication::exec();
-    EXPECT_EQ(shown.count, 1) << quit;
     EXPECT_FALSE(yes) << quit;
   }
 }

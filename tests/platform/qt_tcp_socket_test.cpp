@@ -9,7 +9,7 @@
 namespace tendril::test {
 namespace {
 
-// A port of this machine that nobody listens on.
+// A port of this machine without a listener.
 std::uint16_t ClosedPort() {
   QTcpServer server;
   server.listen(QHostAddress::LocalHost);
@@ -23,12 +23,13 @@ TEST(QtTcpSocket, RefusedAttempt_EndsOnce) {
     socket.SetEvents({[&] { events.push_back("connected"); }, [&] { events.push_back("data"); },
                       [&](std::int32_t number, const std::string& description) {
                         EXPECT_EQ(socket.State(), TcpState::kClosed);
-                        events.push_back(std::to_string(number) + (description.empty() ? " untold" : ""));
+                        events.push_back(std::to_string(number) +
+                                         (description.empty() ? " without a reason" : ""));
                       }});
     const std::uint16_t port = ClosedPort();
     socket.SetLocalPort(to_itself ? port : 0);
     socket.Connect("127.0.0.1", port);
-    EXPECT_TRUE(events.empty()) << "told from inside a call";
+    EXPECT_TRUE(events.empty()) << "reported from inside a call";
     EXPECT_TRUE(WaitFor([&] { return !events.empty(); })) << to_itself;
     RunFor(50);
     EXPECT_THAT(events, testing::ElementsAre("10061")) << to_itself;

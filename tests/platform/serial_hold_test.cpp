@@ -16,7 +16,7 @@ using testing::AllOf;
 using testing::HasSubstr;
 using testing::Not;
 
-// The number of the failure, of 256, that a claim on `device` in another process ends in; 0 when it succeeds.
+// The number, modulo 256, of the failure of a claim on `device` in another process; 0 when it succeeds.
 int FailureOfAnother(const std::string& device, bool ordinary_user) {
   const pid_t child = ::fork();
   if (child == 0) {

@@ -41,19 +41,17 @@ TEST(PortNames, UartThatTheDriverDidNotFind_IsNoHardware) {
   }
   EXPECT_TRUE(DriverFoundHardware("/dev/ttyS0", tty_class));
   EXPECT_FALSE(DriverFoundHardware("/dev/ttyS1", tty_class));
-  EXPECT_TRUE(DriverFoundHardware("/dev/ttyUSB0", tty_class)) << "a driver that tells no type";
+  EXPECT_TRUE(DriverFoundHardware("/dev/ttyUSB0", tty_class)) << "a driver that gives no type";
 }
 
 TEST(PortNames, Description_IsTheAdaptersOwnAndNotItsHubs) {
   const QTemporaryDir folder;
   const std::filesystem::path usb = folder.path().toStdString();
-  const std::filesystem::path hub = usb / "hub", adapter = hub / "adapter";
-  const std::filesystem::path tty = adapter / "interface" / "ttyUSB0" / "tty" / "ttyUSB0";
+  const std::filesystem::path hub = usb / "hub", adapter = hub / "adapter", tty = adapter / "tty" / "ttyUSB0";
   std::filesystem::create_directories(tty);
   std::filesystem::create_directory_symlink(tty, usb / "ttyUSB0");
   std::ofstream(hub / "idVendor") << "1d6b\n";
   std::ofstream(hub / "product") << "Hub\n";
-  std::ofstream(hub / "manufacturer") << "Hub maker\n";
   std::ofstream(adapter / "idVendor") << "1a86\n";
   EXPECT_EQ(DescribeSerialDevice("/dev/ttyUSB0", usb), "/dev/ttyUSB0");
   std::ofstream(adapter / "product") << "USB Serial\n";

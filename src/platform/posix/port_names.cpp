@@ -15,7 +15,7 @@ namespace {
 
 namespace fs = std::filesystem;
 
-// What the serial drivers of Linux report as a UART's type when they found none.
+// The UART type that the serial drivers of Linux report when they found none.
 constexpr int kNoUart = 0;
 
 std::string FirstLine(const fs::path& file) {
@@ -40,7 +40,7 @@ fs::path DeviceAt(std::int32_t number) {
 
 #else
 
-// A run of port numbers that belong to one driver's devices, counted from 0.
+// Port numbers that stand for one driver's devices, counted from 0.
 struct DriverRange {
   std::int32_t first_number;
   std::int32_t last_number;
@@ -71,7 +71,7 @@ fs::path DefaultSerialDevice(std::int32_t number) { return number >= 1 ? DeviceA
 bool DriverFoundHardware(const fs::path& device, const fs::path& tty_class) {
   std::ifstream file(tty_class / device.filename() / "type");
   int type = kNoUart;
-  return !(file >> type) || type != kNoUart;  // only UART drivers have a type to tell
+  return !(file >> type) || type != kNoUart;  // only UART drivers give a type
 }
 
 std::string DescribeSerialDevice(const fs::path& device, const fs::path& tty_class) {
@@ -79,8 +79,8 @@ std::string DescribeSerialDevice(const fs::path& device, const fs::path& tty_cla
   const auto add = [&description](const std::string& part) {
     if (!part.empty()) description += (description.empty() ? "" : ", ") + part;
   };
-  // A USB adapter is described some folders above its terminal device, in the first that has a vendor's number: the
-  // ones above that describe the hubs on the way.
+  // A USB adapter is described in the first folder above its terminal device that has a vendor's number. Further up are
+  // the hubs.
   std::error_code error;
   for (fs::path folder = fs::canonical(tty_class / device.filename(), error);
        !error && folder.has_relative_path(); folder = folder.parent_path()) {

@@ -70,8 +70,8 @@ int OpenDevice(const fs::path& device) {
 }
 
 #ifdef TIOCGEXCL
-// Only the superuser gets this far on a device in exclusive mode. The mode of a pseudo-terminal outlives a
-// program that was killed, so it says "in use" only while another program has the device open.
+// Only the superuser can open a device in exclusive mode. The mode of a pseudo-terminal outlives a program that was
+// killed, so it means "in use" only while another program has the device open.
 bool HeldExclusively(const fs::path& device, int own) {
   int exclusive = 0;
   return ::ioctl(own, TIOCGEXCL, &exclusive) == 0 && exclusive != 0 && OpenInAnotherProcess(device);
@@ -91,15 +91,13 @@ SerialHold::SerialHold(const fs::path& device) : SerialHold(OpenDevice(device)) 
 SerialHold::~SerialHold() { ::close(descriptor_); }
 
 std::string ExplainNotAllowed(const DeviceAccess& access) {
-  std::string text = "You are not allowed to use " + access.device + ". ";
-  // The superuser's own group opens far more than a serial port: nobody is advised to join it.
-  const bool group_helps = access.group_may_use && access.group != "root" && access.group != "wheel";
-  if (!group_helps) {
-    return text + "It belongs to the group \"" + access.group +
-           "\", and joining that group is not the way: ask the person who looks after this computer for "
-           "access.";
+  const std::string text =
+      "You are not allowed to use " + access.device + ". It belongs to the group \"" + access.group + "\"";
+  // The superuser's own group opens far more than a serial port: never advise to join it.
+  if (!access.group_may_use || access.group == "root" || access.group == "wheel") {
+    return text +
+           ", and joining that group is not advised: ask the administrator of this computer for access.";
   }
-  text += "It belongs to the group \"" + access.group + "\"";
   if (access.user_is_member) {
     return text + ", which you have joined: log out and in again for that to take effect.";
   }

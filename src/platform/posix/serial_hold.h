@@ -1,4 +1,4 @@
-// SerialHold: a serial device kept for this program alone.
+// SerialHold: a serial device, opened for this program alone.
 #pragma once
 
 #include <filesystem>
@@ -8,13 +8,12 @@ namespace tendril {
 
 // Opens a device and claims it for its lifetime.
 //
-// The claim is a lock: the superuser passes the exclusive mode that keeps everybody else out of a device in use. An
-// ordinary user's claim on a device in exclusive mode fails before it touches the line. Opening a device that is
-// not in exclusive mode raises its DTR and RTS, as the system does at every opening, before the lock is looked at.
+// The claim is a lock, because the superuser passes the exclusive mode of a device in use. For other users, opening a
+// device in exclusive mode fails before it touches the line. Any other opening raises DTR and RTS, before the lock is
+// checked.
 class SerialHold {
  public:
-  // Raises kErrInvalidPort (no such device), kErrPortAlreadyOpen (in use) or kErrNotAllowed (with what to do about
-  // it).
+  // Raises kErrInvalidPort (no such device), kErrPortAlreadyOpen (in use) or kErrNotAllowed (with the remedy).
   explicit SerialHold(const std::filesystem::path& device);
   ~SerialHold();
   SerialHold(const SerialHold&) = delete;
@@ -29,16 +28,16 @@ class SerialHold {
   int descriptor_;
 };
 
-// What keeps a user from a device.
+// Who may use a device.
 struct DeviceAccess {
   std::string device;
   std::string group;            // the group that owns the device
-  bool group_may_use = false;   // whether that group may read and write it
-  std::string user;             // who runs the program
-  bool user_is_member = false;  // whether that user belongs to the group by now
+  bool group_may_use = false;   // may read and write the device
+  std::string user;             // that runs the program
+  bool user_is_member = false;  // of the group
 };
 
-// Says in plain words why the device is not available and what to do about it.
+// Why the device is not available, and the remedy, for the user.
 std::string ExplainNotAllowed(const DeviceAccess& access);
 
 }  // namespace tendril

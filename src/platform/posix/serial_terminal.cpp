@@ -22,7 +22,7 @@
 namespace tendril {
 namespace {
 
-// A device whose speed is off by more than this is not understood: the error adds up over a byte's ten bits.
+// A larger error makes bytes unreadable: it adds up over a byte's ten bits.
 constexpr std::int64_t kMaxSpeedErrorPercent = 3;
 
 std::string Reason(int error) { return std::generic_category().message(error); }
@@ -69,8 +69,7 @@ std::uint32_t Speed(const termios2& settings) { return settings.c_ospeed; }
 
 void Flush(int descriptor, int queues) { (void)::ioctl(descriptor, TCFLSH, queues); }
 
-// Some adapters gather received bytes for 16 ms unless they are asked not to. A driver that cannot do otherwise
-// is left as it is.
+// Some adapters gather received bytes for 16 ms by default. A driver that cannot change that is left as it is.
 void AskForLowLatency(int descriptor) {
   serial_struct settings = {};
   if (::ioctl(descriptor, TIOCGSERIAL, &settings) != 0) return;
@@ -98,8 +97,8 @@ SerialTerminal::SerialTerminal(const std::filesystem::path& device, std::int32_t
 }
 
 SerialTerminal::~SerialTerminal() {
-  // Otherwise the system goes on sending what is queued, and keeps the closing waiting for it. (Drivers of USB adapters
-  // have a queue of their own besides, which nothing empties.)
+  // Otherwise closing waits until the system has sent its queue. (Drivers of USB adapters have another queue, which
+  // cannot be emptied.)
   Flush(descriptor(), TCIOFLUSH);
   if (before_) (void)Store(descriptor(), before_->values);
   (void)::ioctl(descriptor(), TIOCNXCL);
@@ -107,7 +106,7 @@ SerialTerminal::~SerialTerminal() {
 
 void SerialTerminal::Configure(std::int32_t baud) {
   const auto refuse = [&](const std::string& reason) {
-    if (HungUp()) {  // it went just now
+    if (HungUp()) {  // it has gone since it was opened
       throw RuntimeError(kErrInvalidPort, "There is no serial device at " + device_.string() + ".");
     }
     throw RuntimeError(kErrSettingsRefused, device_.string() + " cannot be set to " + std::to_string(baud) +
@@ -126,7 +125,7 @@ void SerialTerminal::Configure(std::int32_t baud) {
   raw.c_cc[VTIME] = 0;
   if (!StoreWithSpeed(descriptor(), raw, baud)) refuse(Reason(errno));
 
-  // A driver takes the nearest speed that it can do, and reports that one.
+  // A driver takes the nearest speed that it can do, and reports it.
   if (!Load(descriptor(), raw)) refuse(Reason(errno));
   const std::int64_t speed = Speed(raw);
   if (std::abs(speed - baud) * 100 > baud * kMaxSpeedErrorPercent) {

@@ -8,38 +8,30 @@
 #include <span>
 
 #include "platform/posix/serial_hold.h"
+#include "platform/serial_port.h"
 
 namespace tendril {
 
-// A terminal device for this program alone, set to raw bytes with 8 data bits, no parity, one stop bit and no
-// handshaking. No call waits for the device, also when it takes nothing. A driver may: that of a USB adapter which has
-// stalled holds a turn of RTS, and the closing while output is queued, for seconds.
-class SerialTerminal {
+// A terminal device as a serial port; without the event loop that NotifyWritable() needs. A driver may make a call wait:
+// that of a USB adapter which has stalled delays setting RTS, and closing while output is queued, for seconds.
+class SerialTerminal : public SerialPort {
  public:
   // Opens `device` at `baud` bit/s; what had arrived before is dropped. Raises what SerialHold raises, and
   // kErrSettingsRefused when the device cannot do the speed.
   SerialTerminal(const std::filesystem::path& device, std::int32_t baud);
-  // Drops what waits in either direction, and puts back the line settings that the device had.
-  ~SerialTerminal();
+  // Restores the line settings that the device had.
+  ~SerialTerminal() override;
   SerialTerminal(const SerialTerminal&) = delete;
   SerialTerminal& operator=(const SerialTerminal&) = delete;
 
-  // For the event loop.
   int descriptor() const { return hold_.descriptor(); }
 
-  // Puts what has arrived into `buffer` and returns how many bytes; 0 says no more than that there is nothing, be it
-  // that the device has gone or not.
-  std::size_t Read(std::span<std::uint8_t> buffer);
-  // Hands over as many of `bytes` as the system takes now, and returns how many. Raises kErrDeviceIo.
-  std::size_t Write(std::span<const std::uint8_t> bytes);
-  // Bytes that the system has taken over and not sent yet.
-  std::size_t QueuedOutput() const;
-  // Drops what has arrived and was not read.
-  void ClearInput();
-  // Asserts or clears RTS; false when the device has no such line. Raises kErrDeviceIo when it does not obey.
-  bool SetRts(bool asserted);
-  // Whether the device has gone away.
-  bool HungUp() const;
+  std::size_t Read(std::span<std::uint8_t> buffer) override;
+  std::size_t Write(std::span<const std::uint8_t> bytes) override;
+  std::size_t QueuedOutput() const override;
+  void ClearInput() override;
+  bool SetRts(bool asserted) override;
+  bool HungUp() const override;
 
  private:
   struct Settings;
@@ -49,10 +41,10 @@ class SerialTerminal {
 
   std::filesystem::path device_;
   SerialHold hold_;
-  std::unique_ptr<Settings> before_;  // the settings that the device had; null until they are known
+  std::unique_ptr<Settings> before_;  // the settings that the device had; null before they are read
 };
 
-// The speed that a terminal device is set to, in bit/s; 0 when it does not say.
+// The speed that a terminal device is set to, in bit/s; 0 when it is not known.
 std::uint32_t LineSpeed(int descriptor);
 
 }  // namespace tendril

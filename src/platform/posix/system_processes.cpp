@@ -21,7 +21,7 @@
 namespace tendril {
 namespace {
 
-// What a process shows of itself. Each may be empty.
+// The names of a process. Each may be empty.
 struct ProcessNames {
   std::string program;
   std::string first_argument;
@@ -32,7 +32,7 @@ bool SameName(std::string_view a, std::string_view b) {
   return std::ranges::equal(a, b, {}, AsciiUpper<char>, AsciiUpper<char>);
 }
 
-// The name of a file without its folders, in the notation of any system.
+// A file's name without its folders, which may be in the notation of any system.
 std::string_view WithoutFolders(std::string_view path) { return path.substr(path.find_last_of("/\\") + 1); }
 
 bool IsNamed(const ProcessNames& names, std::string_view program) {
@@ -46,7 +46,7 @@ std::vector<kinfo_proc> AllProcesses() {
   int query[] = {CTL_KERN, KERN_PROC, KERN_PROC_ALL};
   std::size_t size = 0;
   if (::sysctl(query, 3, nullptr, &size, nullptr, 0) != 0) return {};
-  constexpr std::size_t kSpare = 32;  // some may start meanwhile
+  constexpr std::size_t kSpare = 32;  // for processes that start meanwhile
   std::vector<kinfo_proc> processes(size / sizeof(kinfo_proc) + kSpare);
   size = processes.size() * sizeof(kinfo_proc);
   if (::sysctl(query, 3, processes.data(), &size, nullptr, 0) != 0) return {};
@@ -54,7 +54,7 @@ std::vector<kinfo_proc> AllProcesses() {
   return processes;
 }
 
-// The system gives the number of arguments, the program's path, zeros, and the arguments, each with a zero behind it.
+// The system's text: the number of arguments, the program's path, zeros, and the arguments with a zero after each.
 void ReadArguments(pid_t process, ProcessNames& names) {
   int query[] = {CTL_KERN, KERN_PROCARGS2, process};
   std::size_t size = 0;
@@ -95,8 +95,8 @@ ProcessNames NamesOf(const fs::path& process) {
   return names;
 }
 
-// Whether the process has ended and only its entry is left. Its state follows the name, which is in brackets and may
-// have any character in it.
+// Whether the process has ended and only its entry is left. The state follows the name, which is in brackets and may
+// contain any character.
 bool HasEnded(const fs::path& process) {
   std::string about;
   std::getline(std::ifstream(process / "stat"), about, '\0');

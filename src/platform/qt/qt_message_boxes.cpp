@@ -9,7 +9,7 @@ namespace {
 
 constexpr char kBoxName[] = "messageBox";
 
-// How a box's event loop ends when the box is gone; any other way, the program ends.
+// The result of a box's event loop when the box has closed; with any other, the program ends.
 constexpr int kSettled = 0x5E77;
 
 QMessageBox::Icon QtIcon(BoxIcon icon) {
@@ -48,20 +48,20 @@ QMessageBox::StandardButton QtMessageBoxes::Ask(const BoxMessage& message,
                                                 QMessageBox::StandardButtons buttons) {
   if (closing_) return QMessageBox::NoButton;
 
-  // On the heap, because the parent may take the box with it.
+  // On the heap: the parent may destroy the box.
   const QPointer<QMessageBox> box = new QMessageBox(parent_);
   box->setObjectName(QLatin1String(kBoxName));
-  box->setTextFormat(Qt::PlainText);  // otherwise a text with a "<" in it could turn into rich text
+  box->setTextFormat(Qt::PlainText);  // a text with a "<" in it could become rich text
   box->setTextInteractionFlags(Qt::TextSelectableByMouse);
   box->setText(QString::fromStdString(message.text).replace(QLatin1String("\r\n"), QLatin1String("\n")));
   box->setWindowTitle(QString::fromStdString(message.title));
   box->setIcon(QtIcon(message.icon));
   box->setStandardButtons(buttons);
-  // No, where there is one: Yes takes something, and is not to be hit by accident.
+  // No, where there is one: Yes must not be hit by accident.
   box->setDefaultButton(QMessageBox::No);
 
-  // The box's own exec() does not tell an answer from a quit, which closes the box like a person and then
-  // ends every event loop.
+  // The box's own exec() cannot distinguish an answer from a quit, which closes the box as a user does and then ends
+  // every event loop.
   QEventLoop loop;
   const auto settle = [&loop] { loop.exit(kSettled); };
   QObject::connect(box, &QMessageBox::finished, &loop, settle);

@@ -11,31 +11,30 @@
 
 namespace tendril {
 
-// A box is a QMessageBox named "messageBox". The program counts as being closed from CloseAll() on, from the
-// end of the application's event loop on, or when a quit has taken a box away.
+// A box is a QMessageBox named "messageBox". The program counts as being closed after CloseAll(), after the end of the
+// application's event loop, or when a quit has closed a box.
 class QtMessageBoxes final : public MessageBoxes {
  public:
   QtMessageBoxes();
   ~QtMessageBoxes() override;
 
-  // The window that boxes stand before; null for none. When it is destroyed, so is the box that stands before
-  // it, unanswered.
+  // The parent window of the boxes, or null. A box that is open when the window is destroyed ends unanswered.
   void SetParent(QWidget* parent) { parent_ = parent; }
 
-  // Closes what is open, each question answered with No, and lets no box open from now on.
+  // Closes the open boxes, questions with No, and lets no further box open.
   void CloseAll();
 
   void Show(const BoxMessage& message) override;
   bool AskYesNo(const BoxMessage& message) override;
 
  private:
-  // Shows a box with `buttons` until it is answered; the button, or NoButton when the box was taken away.
+  // Shows a box with `buttons`; returns the button, or NoButton when the box was closed without an answer.
   QMessageBox::StandardButton Ask(const BoxMessage& message, QMessageBox::StandardButtons buttons);
 
   QPointer<QWidget> parent_;
-  std::vector<QMessageBox*> open_;  // the last one is in front
+  std::vector<QMessageBox*> open_;  // the last is in front
   bool closing_ = false;
-  QObject context_;  // what is connected ends with this object
+  QObject context_;  // ends the connections
 };
 
 }  // namespace tendril

@@ -10,13 +10,13 @@
 namespace tendril {
 namespace {
 
-// Received bytes that wait in the program at most. When they are not taken, the peer is held back.
+// Size of the receive buffer. While it is full, the peer has to wait.
 constexpr qint64 kReadBufferBytes = qint64{64} * 1024;
 
-// How long a closed connection may go on sending what it was given before.
+// How long a closed connection may go on sending.
 constexpr int kLingerMs = 5000;
 
-// Why else a connection ends, as those in tcp_socket.h.
+// Further reasons why a connection ends, as in tcp_socket.h.
 constexpr std::int32_t kOperationFailed = 10000;
 constexpr std::int32_t kNetworkUnreachable = 10051;
 constexpr std::int32_t kTimedOut = 10060;
@@ -31,15 +31,15 @@ std::int32_t ErrorNumber(QAbstractSocket::SocketError error) {
   return kOperationFailed;
 }
 
-// A socket that connects to a closed port of its own machine may be given that very port as its own, and is
-// then connected to itself.
+// A socket that connects to a closed port of its own machine may get that port as its own, and is then connected to
+// itself.
 bool IsConnectedToItself(const QTcpSocket& socket) {
   return socket.localPort() == socket.peerPort() && socket.localAddress() == socket.peerAddress();
 }
 
-// Closes the connection. What was given to it before still goes out, after this call if need be. Until then
-// what the peer sends is read and dropped: a connection that ends with something unread is cut off, and with
-// it what the peer has yet to read. (Qt's own way of closing stops reading first.)
+// Closes the connection after its output, if need be after this call. Until then, what the peer sends is read and
+// dropped: a connection that is closed with unread input is reset, and the peer loses what it has not read yet. (Qt's own
+// closing stops reading first.)
 void Retire(std::unique_ptr<QTcpSocket> socket) {
   if (!socket || socket->state() != QAbstractSocket::ConnectedState) return;
   socket->readAll();
@@ -69,7 +69,7 @@ void QtTcpSocket::Connect(const std::string& host, std::uint16_t port) {
   Close();
   socket_ = std::make_unique<QTcpSocket>();
   QTcpSocket* const socket = socket_.get();
-  socket->setProxy(QNetworkProxy::NoProxy);  // the connection never leaves for where a proxy would be
+  socket->setProxy(QNetworkProxy::NoProxy);  // the listener is on this computer
   socket->setReadBufferSize(kReadBufferBytes);
   QObject::connect(socket, &QTcpSocket::connected, socket, [this] { OnConnected(); });
   QObject::connect(socket, &QTcpSocket::readyRead, socket, [this] { PostData(); });

@@ -11,8 +11,8 @@
 namespace tendril {
 
 // Failures carry the numbers of the platform's published list of socket errors (10061: connection refused).
-// The events come in the order connected, data_arrived, ended; what the peer sent before it closed can be
-// received until `ended` comes. The socket may be closed, connected again or destroyed inside any of them.
+// What the peer sent before it closed is reported, and can be received, before `ended`. The socket may be closed,
+// connected again or destroyed inside any event.
 class QtTcpSocket final : public TcpSocket {
  public:
   explicit QtTcpSocket(FaultHandler on_fault);

@@ -31,7 +31,7 @@ class QtTimer final : public Timer {
   bool Enabled() const override { return enabled_; }
 
  private:
-  // Outlives the timer when the tick itself leads to the timer's end.
+  // Outlives a timer that its own tick destroys.
   struct Tick {
     std::function<void()> on_tick;
     FaultHandler on_fault;
@@ -47,7 +47,7 @@ class QtTimer final : public Timer {
   }
 
   void OnTimeout() {
-    // Qt keeps a timer from ticking inside its own tick, but forgets it when the tick starts a new period.
+    // Qt does not let a timer tick inside its own tick, unless the tick starts a new period.
     if (tick_->running) return;
 
     const std::shared_ptr<Tick> tick = tick_;

@@ -9,13 +9,13 @@
 
 namespace tendril {
 
-// Its timers never tick early. A tick that fails switches its timer off, because it would most likely fail
-// again at once, before the person has read what is wrong; then it tells `on_fault`.
+// Its timers never tick early. A tick that fails disables its timer, because it would probably fail again before the
+// user has read the message, and is reported to `on_fault`.
 class QtTimerFactory final : public TimerFactory {
  public:
   explicit QtTimerFactory(FaultHandler on_fault) : on_fault_(std::move(on_fault)) {}
 
-  // The timer may be destroyed even while its own tick runs the event loop.
+  // The timer may be destroyed inside its own tick.
   std::unique_ptr<Timer> CreateTimer(std::function<void()> on_tick) override;
 
  private:
