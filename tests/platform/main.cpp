@@ -1,5 +1,5 @@
-// Runs the adapters' tests under a real event loop, with a configuration folder of their own: no test ever
-// touches a device of the machine.
+// Runs the adapters' tests with a real event loop and a configuration folder of their own: no test uses a device of this
+// computer.
 #include <gmock/gmock.h>
 
 #include <QApplication>
@@ -11,6 +11,6 @@ int main(int argc, char** argv) {
   qputenv("XDG_CONFIG_HOME", folder.path().toLocal8Bit());
   if (!qEnvironmentVariableIsSet("QT_QPA_PLATFORM")) qputenv("QT_QPA_PLATFORM", "offscreen");
   const QApplication app(argc, argv);
-  QApplication::setQuitOnLastWindowClosed(false);  // a box is often the only window
+  QApplication::setQuitOnLastWindowClosed(false);  // a box may be the only window
   return RUN_ALL_TESTS();
 }

@@ -1,4 +1,4 @@
-// PseudoTerminal: a serial device made by the kernel, with the test at its far end.
+// PseudoTerminal: a serial device of the kernel; the test is its far end.
 #pragma once
 
 #include <fcntl.h>
@@ -15,7 +15,7 @@
 
 namespace tendril::test {
 
-// Makes `device` comm port `number`, whatever it was before.
+// Makes `device` comm port `number`.
 inline void LinkPort(int number, const std::filesystem::path& device) {
   const std::filesystem::path folder = ConfigFolder() / "ports";
   std::filesystem::create_directories(folder);
@@ -27,7 +27,7 @@ inline void LinkPort(int number, const std::filesystem::path& device) {
 class PseudoTerminal {
  public:
   PseudoTerminal() : far_end_(::posix_openpt(O_RDWR | O_NOCTTY | O_NONBLOCK)) {
-    if (::unlockpt(far_end_) != 0) throw std::runtime_error("no pseudo-terminal to be had");
+    if (::unlockpt(far_end_) != 0) throw std::runtime_error("no pseudo-terminal is available");
     path_ = ::ptsname(far_end_);
     observer_ = OpenAsAnother();
   }
@@ -41,23 +41,23 @@ class PseudoTerminal {
   // Opens the device's own side once more, as another program could.
   int OpenAsAnother() const { return ::open(path_.c_str(), O_RDWR | O_NOCTTY | O_NONBLOCK); }
 
-  // Takes the device away from whoever has it open.
+  // Takes the device away from the programs that have it open.
   void Unplug() {
     if (far_end_ >= 0) ::close(far_end_);
     far_end_ = -1;
   }
 
-  // Sends to the device; how many of `bytes` it took.
+  // Sends to the device; returns how many of `bytes` it took.
   std::size_t Send(const Bytes& bytes) const {
     const ssize_t taken = ::write(far_end_, bytes.data(), bytes.size());
     return taken > 0 ? static_cast<std::size_t>(taken) : 0;
   }
-  // Sends to the open device and waits, without an event loop, until it is there to be read.
+  // Sends to the open device and waits, without an event loop, until the bytes can be read.
   bool SendAndSettle(const Bytes& bytes) const {
     pollfd readable = {observer_, POLLIN, 0};
     return Send(bytes) == bytes.size() && ::poll(&readable, 1, 10'000) == 1;
   }
-  // Takes what the device has sent by now.
+  // Takes what the device has sent so far.
   Bytes Take() const {
     Bytes bytes(65'536);
     const ssize_t got = ::read(far_end_, bytes.data(), bytes.size());
@@ -67,7 +67,7 @@ class PseudoTerminal {
 
  private:
   int far_end_;
-  int observer_ = -1;  // on the device's own side; only watches
+  int observer_ = -1;  // on the device's own side; only polls
   std::string path_;
 };
 

@@ -1,4 +1,4 @@
-// Waiting in tests: the event loop runs until something is so.
+// Waiting in tests, with the event loop running.
 #pragma once
 
 #include <QCoreApplication>
@@ -8,10 +8,10 @@
 
 namespace tendril::test {
 
-// Runs the event loop until `done`; false when that takes longer than `limit_ms`.
+// Runs the event loop until `done` holds; false after `limit_ms`.
 inline bool WaitFor(const std::function<bool()>& done, int limit_ms = 10'000) {
   const QDeadlineTimer deadline(limit_ms);
-  QTimer look_again;  // not everything that is waited for is an event
+  QTimer look_again;  // `done` may depend on more than events
   look_again.start(1);
   while (!done()) {
     if (deadline.hasExpired()) return false;
@@ -21,7 +21,7 @@ inline bool WaitFor(const std::function<bool()>& done, int limit_ms = 10'000) {
   return true;
 }
 
-// Runs the event loop for a while, to see that something does not happen.
+// Runs the event loop for `ms`, to show that nothing happens.
 inline void RunFor(int ms) {
   WaitFor([] { return false; }, ms);
 }

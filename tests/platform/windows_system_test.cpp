@@ -11,7 +11,7 @@
 namespace tendril {
 namespace {
 
-TEST(WindowsSystem, CommandLog_StandsWhereToolsLookForIt) {
+TEST(WindowsSystem, CommandLog_IsAtItsFixedPath) {
   const std::filesystem::path folder = "C:\\NYXDev";
   std::filesystem::remove_all(folder);
   EXPECT_EQ(CommandLogPath().string(), "C:\\\\NYXDev\\HUtest.txt");
@@ -22,7 +22,7 @@ TEST(WindowsSystem, CommandLog_StandsWhereToolsLookForIt) {
   std::filesystem::remove_all(folder);
 }
 
-TEST(WindowsSystem, DevicesAreToldFromNamesWithoutOne) {
+TEST(WindowsSystem, NumbersWithoutADevice_AreNotFound) {
   for (const int number : {-1, 0, 251}) EXPECT_EQ(FindSerialDevice(number), std::nullopt) << number;
 }
 
