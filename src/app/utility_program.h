@@ -5,8 +5,8 @@
 
 #include "app/qt_platform.h"
 #include "platform/process_list.h"
-#include "platform/qt/qt_tcp_socket.h"
 #include "platform/qt/qt_serial_device.h"
+#include "platform/qt/qt_tcp_socket.h"
 #include "platform/registry_store.h"
 #include "prefs/registry.h"
 #include "serial/command_log.h"
