@@ -77,16 +77,15 @@ class WindowsSerialPort final : public SerialPort {
  private:
   [[noreturn]] void RaiseWhyNotOpen() const {
     const std::string name = CommName(number_);
-    switch (port_.error()) {
-      case QSerialPort::DeviceNotFoundError:
-        throw RuntimeError(kErrInvalidPort, "There is no serial device for " + name + ".");
-      case QSerialPort::PermissionError:
-      case QSerialPort::OpenError:
-        throw RuntimeError(kErrPortAlreadyOpen, name + " is in use by another program.");
-      default:
-        throw RuntimeError(kErrSettingsRefused,
-                           name + " cannot be set up: " + port_.errorString().toStdString() + ".");
+    const QSerialPort::SerialPortError error = port_.error();
+    if (error == QSerialPort::DeviceNotFoundError) {
+      throw RuntimeError(kErrInvalidPort, "There is no serial device for " + name + ".");
     }
+    if (error == QSerialPort::PermissionError || error == QSerialPort::OpenError) {
+      throw RuntimeError(kErrPortAlreadyOpen, name + " is in use by another program.");
+    }
+    throw RuntimeError(kErrSettingsRefused,
+                       name + " cannot be set up: " + port_.errorString().toStdString() + ".");
   }
 
   const std::int32_t number_;
