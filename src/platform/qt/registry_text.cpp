@@ -151,8 +151,7 @@ RegistryKeys ReadRegistryText(const QByteArray& bytes, const UnreadLineSink& unr
   const QString text = Decoded(bytes);
   const auto lines = QStringView(text).tokenize(u'\n');
   RegistryKeys keys;
-  RegistryValues* values =
-      nullptr;  // of the key that the lines belong to; none below a key that cannot be read
+  RegistryValues* values = nullptr;  // of the last key line; null if that cannot be read
   std::size_t line_number = 0;
   std::size_t items = 0;
   for (auto next = lines.begin(); next != lines.end();) {
