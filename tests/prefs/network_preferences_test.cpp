@@ -111,6 +111,7 @@ TEST_F(Preferences, SerialPortThatSeveralClaim_IsLeftToTheFirst) {
     SetNumber(network_key, "NetworkX10", ports.x10);
     SetNumber(network_key, "NetworkBrisk", ports.brisk);
     preferences.InitFromRegistry(true);
+    EXPECT_EQ(preferences.NyxNetwork(1).Port, 0) << "only the regular network is in use by default";
     EXPECT_EQ(ports.left, (std::vector<int>{preferences.NyxNetwork(0).Port, preferences.NyxNetwork(3).Port,
                                             preferences.NyxNetwork(15).Port, preferences.X10Port(),
                                             preferences.BriskPort()}));
