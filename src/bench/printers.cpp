@@ -63,15 +63,6 @@ std::string DescribeCommand(const Bytes& packet) {
   if (packet.size() < 2) return "no packet";
   const std::string unit = Unit(packet[0]);
   switch (packet[1]) {
-    case 0x03:
-    case 0x08:
-      return "set intensity of " + unit;
-    case 0x04:
-      return "fade on " + unit;
-    case 0x06:
-      return "twinkle on " + unit;
-    case 0x07:
-      return "shimmer on " + unit;
     case 0x0A:
       return DescribeOption(packet, unit);
     case 0x0F:

@@ -133,13 +133,11 @@ void VirtualLine::StartByte(Talker& talker) {
                   .pad = queued.pad,
                   .last = queued.last};
   talker.talking = true;
-  talker.in_reply = !is_program && !byte.pad;
   if (is_program && FollowsRts() && !driver_on_) {
     byte.fate = Fate::kLost;
     ++counters_.undriven_bytes;
   } else {
     byte.fate = Collide(talker, byte);
-    NoteTalkIntoReply(talker, byte);
     if (!is_program && FollowsRts() && driver_on_) OverrideByDriver(byte);
   }
   talker.sending = byte;
@@ -168,21 +166,6 @@ VirtualLine::Fate VirtualLine::Collide(const Talker& talker, ByteOnWire& startin
   return joins_another ? Fate::kSwallowed : Fate::kGarbled;
 }
 
-// Counts a byte of the program that begins within a reply, and one that a reply begins within.
-void VirtualLine::NoteTalkIntoReply(const Talker& talker, ByteOnWire& starting) {
-  ByteOnWire* of_program = nullptr;
-  if (talker.unit == nullptr) {
-    const bool reply_runs =
-        std::any_of(talkers_.begin(), talkers_.end(), [](const Talker& other) { return other.in_reply; });
-    if (reply_runs) of_program = &starting;
-  } else if (talker.in_reply && Program().sending && Program().sending->fate != Fate::kLost) {
-    of_program = &*Program().sending;
-  }
-  if (of_program == nullptr || of_program->talks_into_reply) return;
-  of_program->talks_into_reply = true;
-  ++counters_.program_talked_into_reply;
-}
-
 // A unit's byte while the program's driver holds the line.
 void VirtualLine::OverrideByDriver(ByteOnWire& byte) {
   if (byte.pad) {
@@ -202,7 +185,7 @@ void VirtualLine::EndByte(Talker& talker) {
   const ByteOnWire byte = *talker.sending;
   talker.sending.reset();
   talker.free_us = byte.end_us;
-  if (talker.unit == nullptr || byte.last) talker.talking = talker.in_reply = false;
+  if (talker.unit == nullptr || byte.last) talker.talking = false;
   if (byte.fate == Fate::kWhole || byte.fate == Fate::kGarbled) Deliver(talker, byte);
 }
 

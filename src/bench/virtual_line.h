@@ -48,9 +48,7 @@ struct VirtualLineOptions {
 
 // What went wrong on a line since it was made.
 struct LineCounters {
-  std::size_t garbled_bytes = 0;  // bytes that did not get through whole, of units and program
-  // Bytes that the program sent between the first byte after the pads and the end of a unit's reply.
-  std::size_t program_talked_into_reply = 0;
+  std::size_t garbled_bytes = 0;   // bytes that did not get through whole, of units and program
   std::size_t undriven_bytes = 0;  // bytes that the program sent while its driver was off
 };
 
@@ -122,15 +120,13 @@ class VirtualLine {
     bool pad = false;
     bool last = false;
     Fate fate = Fate::kWhole;
-    bool talks_into_reply = false;
   };
   struct Talker {
     LineUnit* unit = nullptr;  // null: the program
     std::uint32_t baud = 0;
     std::deque<QueuedByte> queue = {};
     std::optional<ByteOnWire> sending = std::nullopt;
-    bool talking = false;   // from the first byte of a transmission to the end of its last
-    bool in_reply = false;  // the same without its pads; units only
+    bool talking = false;  // from the first byte of a transmission to the end of its last
     // The bytes since run_start_us that followed each other without a gap: times are counted from there, so
     // that a long run does not drift.
     std::uint64_t run_start_us = 0;
@@ -144,7 +140,6 @@ class VirtualLine {
   static std::optional<std::uint64_t> NextEventUs(const Talker& talker);
   void StartByte(Talker& talker);
   Fate Collide(const Talker& talker, ByteOnWire& starting);
-  void NoteTalkIntoReply(const Talker& talker, ByteOnWire& starting);
   void OverrideByDriver(ByteOnWire& byte);
   void Spoil(ByteOnWire& byte);
   void EndByte(Talker& talker);

@@ -59,25 +59,6 @@ TEST_F(VirtualPortsTest, Poll_IsEchoedAndAnsweredInTime) {
   EXPECT_EQ(time.RunningTimers(), 0) << "a silent line runs no timer";
 }
 
-TEST_F(VirtualPortsTest, ReceiveThreshold_DecidesWhenAnEventComes) {
-  const struct {
-    std::int32_t threshold;
-    std::size_t events;
-  } cases[] = {{1, 4}, {6, 1}, {7, 0}, {0, 0}};  // ticks at 1, 2, 3 and 4 ms each bring a byte or two
-  Open();
-  for (const auto& each : cases) {
-    time.Advance(100);
-    device->ClearInput();
-    events.clear();
-    device->SetReceiveThreshold(each.threshold);
-    device->Write(Bytes(6, 0x11));
-    EXPECT_THAT(events, IsEmpty());  // never from inside a call
-    time.Advance(20);
-    EXPECT_THAT(events,
-                testing::AllOf(testing::SizeIs(each.events), testing::Each(SerialEvent::kDataReceived)));
-  }
-}
-
 TEST_F(VirtualPortsTest, FullInputBuffer_DropsTheSurplusAndReportsIt) {
   Open();
   device->SetReceiveThreshold(0);

@@ -51,7 +51,7 @@ TEST_F(Send, EveryPort_GoesOutAsUnlockOptionsAndPoll) {
   }
   EXPECT_EQ(sent, expected);
   EXPECT_EQ(unit.accepted_commands(), 8u);
-  EXPECT_EQ(world_.bench.Line(1).counters().program_talked_into_reply, 0u);
+  EXPECT_EQ(world_.bench.Line(1).counters().garbled_bytes, 0u);
 }
 
 TEST_F(Send, Ports_FollowEachOther300msAfterTheAcknowledgement) {
