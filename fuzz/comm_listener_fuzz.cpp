@@ -37,9 +37,9 @@ class Run {
     client_.Reconnect(false, "Tendril Utility", false, true);
     Accept();
     while (!client_.ReadyToTransmit()) {
+      CheckState();
       Arrive(BuildFrame('1', sequence_, {}));
       Check(client_.IsConnected(), "a proper reply keeps the connection");
-      CheckState();
     }
     Check(time_.RunningTimers() == 0, "no timer runs while the client is idle");
   }

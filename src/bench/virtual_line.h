@@ -25,7 +25,7 @@ struct Transmission {
   std::uint64_t gap_us = 0;
 };
 
-// One listener on the line. While it talks it is deaf.
+// A listener on the line. It hears nothing while it talks.
 class LineUnit {
  public:
   virtual ~LineUnit() = default;

@@ -36,7 +36,7 @@ bool SumsUp(std::span<const std::uint8_t> bytes) {
 }
 
 // The bodies that a packet's bytes after the code can stand for, none if the checksum is wrong. A body that
-// ends in 80 with a checksum of 80 looks just like one without that 80 and with the pair: the caller tells by
+// ends in 80 with a checksum of 80 looks just like one without that 80 and with the pair: the caller decides by
 // length.
 std::vector<Bytes> PossibleBodies(std::span<const std::uint8_t> tail) {
   std::vector<Bytes> bodies;

@@ -42,7 +42,7 @@ struct ReplyTiming {
   std::size_t pads = 3;
 };
 
-// Badly behaved units override the protected steps, each of which does one thing that can go wrong.
+// Badly behaved units override the protected steps, each of which is one thing that can go wrong.
 class VirtualUnit : public LineUnit {
  public:
   // `id` is 0x01 to 0xFF; a unit fresh from the factory has 0xFF.
