@@ -1,405 +1,230 @@
-// The real window on the offscreen platform, in simulated time: what a click or a key does.
-#include <QAbstractButton>
+// The real window: start-up, unit commands, live test, closing, and what every control has.
+#include <QAbstractItemView>
 #include <QAccessible>
-#include <QCheckBox>
 #include <QGroupBox>
-#include <QLineEdit>
 #include <QScrollArea>
 #include <QSet>
 #include <QSlider>
-#include <QSpinBox>
-#include <QWheelEvent>
+#include <vector>
 
 #include "bench/faulty_units.h"
-#include "simulator/servo_simulator.h"
 #include "window_fixture.h"
 
 namespace tendril::test {
 namespace {
 
+using testing::ElementsAre;
+using testing::HasSubstr;
 using testing::IsEmpty;
 
 TEST_F(Window, FreshStart_ShowsTheDefaultConfiguration) {
   EXPECT_EQ(window_->windowTitle().toStdString(), "Kelvane Tendril Utility v3.2.1");
-  EXPECT_EQ(Find<QComboBox>("cmbPresets").currentText().toStdString(), "Medium Range (default)");
-  EXPECT_EQ(Find<QComboBox>("cmbNYX").currentText().toStdString(), "Select");
+  std::string lists;
+  for (const char* list : {"cmbPresets", "cmbNYX", "CmbUnitID_0", "CmbUnitID_1"}) {
+    TurnWheel(Find(list), -120);  // changes no closed list
+    lists += Find<QComboBox>(list).currentText().toStdString() + "|";
+  }
+  EXPECT_EQ(lists, "Medium Range (default)|Select|0|1|");
   EXPECT_EQ(Find<QComboBox>("cmbNYX").count(), 5);
-  EXPECT_EQ(Find<QComboBox>("CmbUnitID_0").itemText(15).toStdString(), "F");
-  EXPECT_EQ(Find<QComboBox>("CmbUnitID_1").currentText().toStdString(), "1");
-  EXPECT_FALSE(Find("cmdWriteConfig").isEnabled());
-  EXPECT_FALSE(Find("cmdReadConfig").isEnabled());
-  EXPECT_TRUE(Find("fraApplyChans").isVisible());
-  EXPECT_FALSE(Find("frmProgress").isVisible());
-  world_.time.Advance(1000);  // the pop-up of physical values hides itself once, shown or not
+  EXPECT_FALSE(Find("cmdWriteConfig").isEnabled() || Find("cmdReadConfig").isEnabled());
+  EXPECT_TRUE(Visible("fraApplyChans") && !Visible("frmProgress"));
+  EXPECT_EQ(Text("lblPositionValue_0", "lblPositionValue_1", "txtPositionValue"), "50 128 1500");
+  EXPECT_EQ(Text("lblActPulseLeft", "lblActPulseRight", "lblVirtPulseRange"), "600 2400 800]");
+  EXPECT_EQ(Text("lblLeftVirtStop", "lblRightVirtStop", "lblNeutralTrim", "lblDefaultPos"), "-750 +750 0 0");
+  std::vector<int> spins;
+  for (const char* name : {"spnActPulseRange", "spnVirtPulseRange", "spnLeftVirtStop", "spnRightVirtStop",
+                           "spnNeutralTrim", "spnDefaultPos"}) {
+    for (const int value : {Spin(name).minimum(), Spin(name).maximum(), Spin(name).value()})
+      spins.push_back(value);
+    EXPECT_EQ(Spin(name).singleStep(), 10);
+  }
+  EXPECT_EQ(spins, (std::vector{0, 1000, 900, 0, 1000, 800, -800, 0, -750, 0, 800, 750, -200, 200, 0, -750,
+                                750, 0}));
+  for (const QSize& size : {window_->size(), QSize(1024, 720)}) {
+    window_->resize(size);
+    QTest::qWait(0);
+    EXPECT_EQ(Arcs("ServoSimulator2_7"), "-90 90 -50 50 -50 50 ");
+    EXPECT_EQ(Arcs("ServoSimulator1"), "-90 90 -80 80 -75 75 ");
+  }
+  const QSize needed = window_->findChild<QScrollArea*>()->widget()->minimumSizeHint();
+  EXPECT_EQ(needed.boundedTo({1024, 720}), needed) << "fits without scrolling";
+  world_.time.Advance(1000);  // the pop-up of physical values hides itself
   EXPECT_EQ(world_.time.RunningTimers(), 0);
   EXPECT_THAT(world_.boxes.shown, IsEmpty());
-  EXPECT_EQ(Text("lblPositionValue_0") + " " + Text("lblPositionValue_1") + " " + Text("txtPositionValue"),
-            "50 128 1500");
-
-  for (int channel = 0; channel < 8; ++channel) {
-    const ChannelConfig& record = window_->WorkingConfiguration().At(static_cast<std::size_t>(channel));
-    EXPECT_EQ(record.PortType, kPortServo);
-    EXPECT_EQ(record.ActualRange, (PulsePair{600, 2400}));
-    EXPECT_EQ(record.VirtualStops, (PulsePair{1000, 2000}));
-    EXPECT_EQ(record.LostCommOption, 4);
-    EXPECT_EQ(record.PowerUPOpt, 3);
-  }
-
-  struct Spin {
-    const char* name;
-    int minimum, maximum, value;
-  };
-  for (const Spin& spin : {Spin{"spnActPulseRange", 0, 1000, 900}, Spin{"spnVirtPulseRange", 0, 1000, 800},
-                           Spin{"spnLeftVirtStop", -800, 0, -750}, Spin{"spnRightVirtStop", 0, 800, 750},
-                           Spin{"spnNeutralTrim", -200, 200, 0}, Spin{"spnDefaultPos", -750, 750, 0}}) {
-    const auto& box = Find<QSpinBox>(spin.name);
-    EXPECT_EQ(box.minimum(), spin.minimum) << spin.name;
-    EXPECT_EQ(box.maximum(), spin.maximum) << spin.name;
-    EXPECT_EQ(box.value(), spin.value) << spin.name;
-    EXPECT_EQ(box.singleStep(), 10) << spin.name;
-  }
-  EXPECT_EQ(Text("lblActPulseLeft") + " " + Text("lblActPulseRight"), "600 2400");
-  EXPECT_EQ(Text("lblVirtPulseRange"), "800]");
-  EXPECT_EQ(Text("lblLeftVirtStop") + " " + Text("lblRightVirtStop"), "-750 +750");
 }
 
-TEST_F(Window, Simulators_ShowTheRecordsAndKeepThemOverAResize) {
-  const auto expect_shown = [&] {
-    for (int channel = 0; channel < 8; ++channel) {
-      const auto& simulator = Find<ServoSimulator>(("ServoSimulator2_" + std::to_string(channel)).c_str());
-      ServoDial wanted;
-      wanted.SetRangeUS(600, 2400);
-      wanted.SetLimitUS(1000, 2000);
-      wanted.SetStopsUS(1000, 2000);
-      EXPECT_EQ(simulator.dial().range().start, wanted.range().start);
-      EXPECT_EQ(Find<ServoSimulator>("ServoSimulator1").dial().range().start, wanted.range().start);
-      EXPECT_EQ(simulator.dial().limit().end, wanted.limit().end);
-      EXPECT_EQ(simulator.dial().stops().start, wanted.stops().start);
-    }
-  };
-  expect_shown();
-  window_->resize(1100, 760);
-  QTest::qWait(0);
-  expect_shown();
-}
-
-TEST_F(Window, Send_ByMouse_EndsGreenAndTheUnitHoldsWhatWasSent) {
-  auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x0A});
+TEST_F(Window, Send_ByMouse_WritesTheRecordsIntoTheUnit) {
+  auto& unit = ConnectUnit(0x0A);
   for (int port = 1; port <= 8; ++port) unit.SetPortOptions(port, {1, 1, 1, 1, 1, 1, 1, 1, 1});
-  ChooseByKeys("cmbNYX", 1);
-  EXPECT_TRUE(link_.PortOpen());
   ChooseByKeys("CmbUnitID_1", 10);
-  const QPoint servo_before = Find("ServoSimulator2_0").mapTo(window_.get(), QPoint());
+  const QPoint servo = PlaceOf("ServoSimulator2_0");
   Click("Command3_0");
   QTest::qWait(0);
 
-  EXPECT_TRUE(Find("frmProgress").isVisible());
-  EXPECT_EQ(Find("ServoSimulator2_0").mapTo(window_.get(), QPoint()), servo_before) << "the window jumps";
-  EXPECT_FALSE(Find("fraApplyChans").isVisible());
+  EXPECT_TRUE(Visible("frmProgress") && !Visible("fraApplyChans"));
+  EXPECT_EQ(PlaceOf("ServoSimulator2_0"), servo) << "the window jumps";
   EXPECT_EQ(Find<QGroupBox>("frmProgress").title().toStdString(), "Sending the configuration to unit 0A");
-  for (const char* busy : {"cmbNYX", "CmbUnitID_0", "CmbUnitID_1", "Command3_0"}) {
+  for (const char* busy : {"cmbNYX", "CmbUnitID_0", "CmbUnitID_1", "Command3_0", "Command3_2", "cmdTest_0",
+                           "HScrollSendServoPosition"}) {
     EXPECT_FALSE(Find(busy).isEnabled()) << busy;
-    EXPECT_EQ(Find(busy).toolTip().toStdString(), "Sending the configuration to unit 0A") << busy;
+    EXPECT_EQ(ToolTip(busy), "Sending the configuration to unit 0A") << busy;
   }
   world_.time.Advance(150);
   EXPECT_GT(Find("ShapeProgress").width(), 50);
 
   RunToTheEnd();
   EXPECT_EQ(Text("lblProgress"), "SUCCESS: Send Complete!");
-  EXPECT_EQ(QAccessible::queryAccessibleInterface(&Find("lblProgress"))->text(QAccessible::Name),
-            QStringLiteral("SUCCESS: Send Complete!"));
   const QColor colour = Find("ShapeProgress").palette().color(QPalette::Window);
   EXPECT_GT(colour.green(), colour.red());
-  EXPECT_TRUE(Find("Command3_0").isEnabled());
-  EXPECT_TRUE(Find("cmbNYX").isEnabled());
-  for (int port = 1; port <= 8; ++port) {
-    EXPECT_EQ(unit.PortOptions(port), (PortOptionBytes{1, 60, 240, 100, 200, 100, 200, 150, 150}));
-  }
+  EXPECT_TRUE(Find("Command3_0").isEnabled() && Find("cmbNYX").isEnabled());
+  for (int port = 1; port <= 8; ++port) EXPECT_EQ(unit.PortOptions(port), kFreshPortOptions);
   world_.time.Advance(3000);
-  EXPECT_TRUE(Find("fraApplyChans").isVisible());
+  EXPECT_TRUE(Visible("fraApplyChans"));
   EXPECT_THAT(world_.boxes.shown, IsEmpty());
 }
 
 TEST_F(Window, Send_ByKeyboardAlone_LeavesTheFocusWhereItWas) {
-  world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
-  window_->activateWindow();
-  ASSERT_TRUE(QTest::qWaitForWindowActive(window_.get()));
-  ChooseByKeys("cmbNYX", 1);
-  // Tab on to the button, through the two digits of the ID.
-  for (int tab = 0; tab < 3; ++tab) QTest::keyClick(QApplication::focusWidget(), Qt::Key_Tab);
-  ASSERT_EQ(QApplication::focusWidget(), &Find("Command3_0"));
-  QTest::keyClick(QApplication::focusWidget(), Qt::Key_Space);
-  EXPECT_EQ(QApplication::focusWidget(), window_.get()) << "on nothing that a key could set off";
+  Activate();
+  ConnectUnit();
+  // To the button, past the two digits of the ID.
+  for (const Qt::Key key : {Qt::Key_Tab, Qt::Key_Tab, Qt::Key_Tab, Qt::Key_Space}) Key(key);
+  EXPECT_EQ(QApplication::focusWidget(), window_.get()) << "on nothing that a key could trigger";
   RunToTheEnd();
   EXPECT_EQ(Text("lblProgress"), "SUCCESS: Send Complete!");
   EXPECT_EQ(QApplication::focusWidget(), &Find("Command3_0"));
 
-  // Moved by the person meanwhile, it stays there.
+  // It stays where the user moves it meanwhile.
   Find<QLabel>("lblProgress").clear();
-  QTest::keyClick(QApplication::focusWidget(), Qt::Key_Space);
+  Key(Qt::Key_Space);
   Find("ServoSimulator2_3").setFocus();
   RunToTheEnd();
   EXPECT_EQ(QApplication::focusWidget(), &Find("ServoSimulator2_3"));
 }
 
-// What the unit called below holds in all of its ports: neither a preset nor symmetrical.
-constexpr PortOptionBytes kOtherOptions = {1, 70, 230, 90, 190, 95, 180, 130, 140};
-
-TEST_F(Window, Get_ShowsTheUnitsPortsAndLoadsTheChosenChannelAgain) {
-  auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
-  for (int port = 1; port <= 8; ++port) unit.SetPortOptions(port, kOtherOptions);
+TEST_F(Window, Get_ShowsThePortsOfTheUnit) {
+  auto& unit = ConnectUnit();
+  // Neither a preset nor symmetrical.
+  for (int port = 1; port <= 8; ++port) unit.SetPortOptions(port, {1, 70, 230, 90, 190, 95, 180, 130, 140});
   Click("ServoSimulator2_2");
-  EXPECT_EQ(Text("lblVirtPulseRange"), "500]");
-  ChooseByKeys("cmbNYX", 1);
-  Find<QCheckBox>("chkSendSlideCommands").setChecked(true);
+  Press("chkSendSlideCommands");
   Click("Command3_1");
-  for (const char* busy : {"Command3_0", "Command3_2", "cmdTest_0", "HScrollSendServoPosition"}) {
-    EXPECT_FALSE(Find(busy).isEnabled()) << busy;
-    EXPECT_EQ(Find(busy).toolTip().toStdString(), "Reading the configuration of unit 01") << busy;
-  }
   RunToTheEnd();
   EXPECT_EQ(Text("lblProgress"), "SUCCESS: Upload Complete");
   EXPECT_FALSE(unit.LivePosition(3).has_value()) << "a get moves no servo";
-
-  ServoDial wanted;
-  wanted.SetNeutralPositionUS(1400);  // all else is measured from it
-  wanted.SetRangeUS(700, 2300);
-  wanted.SetLimitUS(900, 1900);
-  wanted.SetStopsUS(950, 1800);
-  for (const char* name : {"ServoSimulator2_0", "ServoSimulator2_7", "ServoSimulator1"}) {
-    EXPECT_EQ(Find<ServoSimulator>(name).dial().range().end, wanted.range().end) << name;
-    EXPECT_EQ(Find<ServoSimulator>(name).dial().limit().start, wanted.limit().start) << name;
-    EXPECT_EQ(Find<ServoSimulator>(name).dial().stops().start, wanted.stops().start) << name;
-  }
-  EXPECT_EQ(window_->WorkingConfiguration().At(7).NeutralPosition, 1400);
-  EXPECT_EQ(Text("lblVirtPulseRange"), "500]");
-  EXPECT_EQ(Text("lblNeutralTrim") + " " + Text("lblDefaultPos"), "-100 -100");
-  EXPECT_EQ(Text("lblLeftVirtStop") + " " + Text("lblRightVirtStop"), "-450 +400");
-  EXPECT_EQ(Text("txtPositionValue"), "1400");
-
-  // The same button in the summary.
-  Find<QLabel>("lblProgress").clear();
-  unit.SetPortOptions(1, kFreshPortOptions);
-  Find<QAbstractButton>("Command3_4").click();
-  RunToTheEnd();
-  EXPECT_EQ(window_->WorkingConfiguration().At(0).NeutralPosition, 1500);
+  for (const char* servo : {"ServoSimulator2_0", "ServoSimulator2_7", "ServoSimulator1"})
+    EXPECT_EQ(Arcs(servo), "-90 70 -50 50 -40 45 ") << servo;
+  EXPECT_EQ(Record(7).DefaultPosition, 1300);
+  EXPECT_EQ(Text("lblVirtPulseRange", "lblNeutralTrim", "lblDefaultPos"), "500] -100 -100");
+  EXPECT_EQ(Text("lblLeftVirtStop", "lblRightVirtStop", "txtPositionValue"), "-450 +400 1400");
 }
 
 TEST_F(Window, UpdateUnitId_GivesTheFactoryUnitItsIdButNever00) {
-  auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0xFF});
-  ChooseByKeys("cmbNYX", 1);
+  const auto& unit = ConnectUnit(0xFF);
   ChooseByKeys("CmbUnitID_1", 0);
   EXPECT_FALSE(Find("Command3_2").isEnabled());
-  EXPECT_THAT(Find("Command3_2").toolTip().toStdString(), testing::HasSubstr("cannot have the ID 00"));
+  EXPECT_THAT(ToolTip("Command3_2"), HasSubstr("cannot have the ID 00"));
   ChooseByKeys("CmbUnitID_1", 5);
-  EXPECT_TRUE(Find("Command3_2").isEnabled());
   Click("Command3_2");
   RunToTheEnd();
   EXPECT_EQ(Text("lblProgress"), "SUCCESS: UnitID set to '05'");
   EXPECT_EQ(unit.id(), 0x05);
 }
 
-TEST_F(Window, ChoosingAServo_MarksItAndShowsItsRecord) {
-  const auto expect_chosen = [&](int chosen) {
-    for (int channel = 0; channel < 8; ++channel) {
-      const std::string number = std::to_string(channel);
-      EXPECT_EQ(Find<ServoSimulator>(("ServoSimulator2_" + number).c_str()).dial().selected(),
-                channel == chosen);
-      EXPECT_EQ(Find<QCheckBox>(("chkUpdate_" + number).c_str()).isChecked(), channel == chosen);
-    }
-    EXPECT_EQ(Find<ServoSimulator>("ServoSimulator1").dial().caption(), "CHAN " + std::to_string(chosen + 1));
-  };
+TEST_F(Window, SelectedServo_IsMarkedAndFollowsTheSlider) {
+  const auto& unit = ConnectUnit();
+  auto& slider = Find<QSlider>("HScrollSendServoPosition");
+  slider.setValue(600);
+  EXPECT_EQ(Text("txtPositionValue"), "1660") << "of the editor's own values, 700 to 2300";
   Click("ServoSimulator2_6");
-  expect_chosen(6);
-  EXPECT_EQ(Text("lblActPulseLeft") + " " + Text("lblVirtPulseRange") + " " + Text("lblRightVirtStop"),
-            "600 500] +500");
-  const QPoint before = Find("cmdTest_0").mapTo(window_.get(), QPoint());
+  const QPoint test_button = PlaceOf("cmdTest_0");
   QTest::keyClick(&Find("ServoSimulator2_1"), Qt::Key_Space);
   QTest::qWait(0);
-  expect_chosen(1);
-  EXPECT_EQ(Find("cmdTest_0").mapTo(window_.get(), QPoint()), before) << "the window jumps";
-}
-
-TEST_F(Window, ChoosingAServo_PutsItsArmWhereTheSliderStands) {
-  auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
-  unit.SetPortOptions(2, kOtherOptions);
-  ChooseByKeys("cmbNYX", 1);
-  Find<QSlider>("HScrollSendServoPosition").setValue(600);
-  // Without a channel the editor's own values stand in: 700 to 2300.
-  EXPECT_EQ(Text("txtPositionValue"), "1660");
-  EXPECT_EQ(Find<ServoSimulator>("ServoSimulator1").dial().arm_pulse(), 1660);
-  Click("Command3_1");
-  RunToTheEnd();
-  Find<QCheckBox>("chkSendSlideCommands").setChecked(true);
-  Click("ServoSimulator2_1");
+  EXPECT_TRUE(Dial("ServoSimulator2_1").selected() && Checked("chkUpdate_1"));
+  EXPECT_FALSE(Dial("ServoSimulator2_6").selected() || Checked("chkUpdate_6"));
+  EXPECT_EQ(Dial("ServoSimulator1").caption(), "CHAN 2");
+  EXPECT_EQ(PlaceOf("cmdTest_0"), test_button) << "the window jumps";
+  EXPECT_EQ(Dial("ServoSimulator2_1").arm_pulse(), 1600);
+  EXPECT_EQ(Dial("ServoSimulator2_2").arm_pulse(), 1500) << "not ticked";
   world_.time.Advance(50);
-  EXPECT_EQ(Text("txtPositionValue"), "1500");  // 900 to 1900
-  EXPECT_EQ(unit.LivePosition(2), 150);
-  EXPECT_EQ(Find<ServoSimulator>("ServoSimulator2_1").dial().arm_pulse(), 1500);
-  EXPECT_EQ(Find<ServoSimulator>("ServoSimulator2_2").dial().arm_pulse(), 1660) << "not ticked";
+  EXPECT_FALSE(unit.LivePosition(2).has_value()) << "the box is not ticked";
+
+  Press("chkSendSlideCommands");
+  QTest::keyClick(&slider, Qt::Key_PageUp);
+  EXPECT_EQ(slider.value(), 700);
+  TurnWheel(slider, 120);
+  EXPECT_GT(slider.value(), 700);
+  QTest::keyClick(&slider, Qt::Key_Home);
+  const QPoint right(slider.width() - 2, slider.height() / 2);
+  QTest::mousePress(&slider, Qt::LeftButton, {}, {2, slider.height() / 2});
+  QTest::mouseMove(&slider, right);
+  QTest::mouseRelease(&slider, Qt::LeftButton, {}, right);
+  world_.time.Advance(50);
+  EXPECT_EQ(Text("lblPositionValue_0", "lblPositionValue_1", "txtPositionValue"), "100 255 2000");
+  EXPECT_EQ(unit.LivePosition(2), 200);
+  EXPECT_THAT(Accessible("HScrollSendServoPosition").text(QAccessible::Description).toStdString(),
+              HasSubstr("2000 µs"));
 }
 
-TEST_F(Window, TestButtons_SweepTheServoDrawnAndReal) {
-  auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
-  ChooseByKeys("cmbNYX", 1);
+TEST_F(Window, TestButtons_SweepTheDrawnAndTheRealServo) {
   Click("ServoSimulator2_3");
-  const auto& test = Find<QAbstractButton>("cmdTest_1");
+  Click("cmdTest_0");
+  EXPECT_EQ(Text("cmdTest_0"), "Stop");
+  const auto& unit = ConnectUnit();
+  EXPECT_EQ(Text("cmdTest_0"), "Test") << "a sweep of the drawing does not reach a port that is chosen later";
   Click("cmdTest_1");
-  EXPECT_EQ(test.text().toStdString(), "Stop");
   world_.time.Advance(470);
   EXPECT_EQ(unit.LivePosition(4), 165);
-  EXPECT_FALSE(unit.LivePosition(3).has_value());
-  EXPECT_EQ(Find<ServoSimulator>("ServoSimulator1").dial().arm_pulse(), 1650);
-  EXPECT_EQ(Find<ServoSimulator>("ServoSimulator2_3").dial().arm_pulse(), 1650);
-  EXPECT_EQ(Find<ServoSimulator>("ServoSimulator2_4").dial().arm_pulse(), 1500);
   window_->resize(1100, 760);
   QTest::qWait(0);
-  EXPECT_EQ(Find<ServoSimulator>("ServoSimulator2_3").dial().arm_pulse(), 1650) << "after a resize";
+  EXPECT_EQ(Dial("ServoSimulator1").arm_pulse(), 1650);
+  EXPECT_EQ(Dial("ServoSimulator2_3").arm_pulse(), 1650);
+  EXPECT_EQ(Dial("ServoSimulator2_4").arm_pulse(), 1500);
 
-  Find<QCheckBox>("chkSendSlideCommands").click();
-  EXPECT_EQ(test.text().toStdString(), "Test");
-  EXPECT_FALSE(test.isEnabled());
-  EXPECT_THAT(test.toolTip().toStdString(), testing::HasSubstr("Use Slider to Test Intensity Values"));
-  Find<QCheckBox>("chkSendSlideCommands").click();
-  EXPECT_TRUE(test.isEnabled());
-
-  // A unit command ends it.
+  Press("chkSendSlideCommands");
+  EXPECT_EQ(Text("cmdTest_1"), "Test");
+  EXPECT_FALSE(Find("cmdTest_1").isEnabled());
+  EXPECT_THAT(ToolTip("cmdTest_1"), HasSubstr("Use Slider to Test Intensity Values"));
+  Press("chkSendSlideCommands");
   Click("cmdTest_1");
   Click("Command3_1");
-  EXPECT_EQ(test.text().toStdString(), "Test");
+  EXPECT_EQ(Text("cmdTest_1"), "Test") << "a unit command ends it";
   RunToTheEnd();
-
-  // A closing window takes a running sweep with it, also one that moves the drawing only.
-  link_.SetCommPort(0);
-  world_.time.Advance(4000);
-  Click("cmdTest_0");
-  EXPECT_TRUE(window_->close());
-  world_.time.Advance(5000);
-  EXPECT_EQ(world_.time.RunningTimers(), 0);
-  EXPECT_THAT(world_.boxes.shown, IsEmpty());
 }
 
-TEST_F(Window, Slider_MovesTheServoByKeysWheelAndMouseAndCanBeRead) {
-  auto& unit = world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
-  ChooseByKeys("cmbNYX", 1);
-  Click("ServoSimulator2_0");
-  auto& slider = Find<QSlider>("HScrollSendServoPosition");
-  QTest::keyClick(&slider, Qt::Key_Right);
-  world_.time.Advance(50);
-  EXPECT_FALSE(unit.LivePosition(1).has_value()) << "the box is not ticked";
-  Find<QCheckBox>("chkSendSlideCommands").click();
-
-  const auto expect_at = [&](int value, const std::string& read_outs) {
-    world_.time.Advance(50);
-    EXPECT_EQ(slider.value(), value);
-    EXPECT_EQ(Text("lblPositionValue_0") + " " + Text("lblPositionValue_1") + " " + Text("txtPositionValue"),
-              read_outs);
-    EXPECT_EQ(unit.LivePosition(1), (1000 + value) / 10);
-    EXPECT_EQ(Find<ServoSimulator>("ServoSimulator1").dial().arm_pulse(), 1000 + value);
-    const auto* accessible = QAccessible::queryAccessibleInterface(&slider);
-    EXPECT_THAT(accessible->text(QAccessible::Description).toStdString(),
-                testing::HasSubstr(std::to_string(1000 + value) + " µs"));
-  };
-  QTest::keyClick(&slider, Qt::Key_Right);
-  expect_at(520, "52 133 1520");
-  QTest::keyClick(&slider, Qt::Key_PageUp);
-  expect_at(620, "62 158 1620");
-  QTest::keyClick(&slider, Qt::Key_Home);
-  expect_at(0, "0 0 1000");
-  const QPoint middle = slider.rect().center();
-  QWheelEvent wheel(middle, slider.mapToGlobal(middle), {}, {0, 120}, Qt::NoButton, Qt::NoModifier,
-                    Qt::NoScrollPhase, false);
-  QApplication::sendEvent(&slider, &wheel);
-  world_.time.Advance(50);
-  EXPECT_GT(slider.value(), 0);
-  EXPECT_EQ(unit.LivePosition(1), (1000 + slider.value()) / 10);
-  QTest::keyClick(&slider, Qt::Key_Home);
-  QTest::mousePress(&slider, Qt::LeftButton, {}, {2, middle.y()});
-  QTest::mouseMove(&slider, {slider.width() - 2, middle.y()});
-  QTest::mouseRelease(&slider, Qt::LeftButton, {}, {slider.width() - 2, middle.y()});
-  expect_at(1000, "100 255 2000");
-}
-
-TEST_F(Window, Failures_AreToldAndTheButtonsWorkAgain) {
+TEST_F(Window, Failure_IsReportedAndTheButtonsWorkAgain) {
   Click("Command3_0");
-  ASSERT_EQ(world_.boxes.shown.size(), 1u);
-  EXPECT_EQ(world_.boxes.Take()[0].title, "No Port Selected");
-
+  EXPECT_EQ(world_.boxes.Take().at(0).title, "No Port Selected");
   ChooseByKeys("cmbNYX", 4);
-  bool button_works_behind_the_box = false;
-  world_.boxes.while_open = [&] { button_works_behind_the_box = Find("Command3_0").isEnabled(); };
+  bool enabled_behind_the_box = false;
+  world_.boxes.while_open = [&] { enabled_behind_the_box = Find("Command3_0").isEnabled(); };
   Click("Command3_0");
   RunToTheEnd();
   EXPECT_EQ(world_.boxes.Take().at(0).title, "No Repsonse");
-  EXPECT_TRUE(button_works_behind_the_box);
+  EXPECT_TRUE(enabled_behind_the_box);
   EXPECT_EQ(Text("lblProgress"), "COMMAND FAILED!");
   const QColor colour = Find("ShapeProgress").palette().color(QPalette::Window);
   EXPECT_GT(colour.red(), colour.green());
-}
 
-TEST_F(Window, Wheel_ChangesNoClosedList) {
-  for (const char* name : {"cmbNYX", "CmbUnitID_0", "CmbUnitID_1", "cmbPresets"}) {
-    auto& box = Find<QComboBox>(name);
-    const int before = box.currentIndex();
-    const QPoint middle = box.rect().center();
-    for (const int turn : {120, -120}) {
-      QWheelEvent wheel(middle, box.mapToGlobal(middle), {}, {0, turn}, Qt::NoButton, Qt::NoModifier,
-                        Qt::NoScrollPhase, false);
-      QApplication::sendEvent(&box, &wheel);
-      EXPECT_EQ(box.currentIndex(), before) << name;
-    }
-  }
-  EXPECT_FALSE(link_.PortOpen());
-}
-
-TEST_F(Window, ClosedInTheMiddleOfASend_StopsAndReleasesThePort) {
-  world_.bench.Attach<MuteUnit>(1, std::uint8_t{0x01});
-  ChooseByKeys("cmbNYX", 1);
-  Click("Command3_0");
-  world_.time.Advance(50);
-  EXPECT_TRUE(window_->close());
-  EXPECT_FALSE(link_.PortOpen());
-  world_.time.Advance(60000);
-  EXPECT_THAT(world_.boxes.shown, IsEmpty());
-  window_.reset();
-  world_.time.Advance(1000);
-}
-
-TEST_F(Window, SweepOfTheDrawing_DoesNotReachAPortThatIsChosenThen) {
-  world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x01});
-  int bytes = 0;
-  world_.bench.Line(1).SetTap([&bytes](const LineByte&) { ++bytes; });
-  Click("ServoSimulator2_0");
-  Click("cmdTest_0");
-  world_.time.Advance(600);
-  ChooseByKeys("cmbNYX", 1);
-  world_.time.Advance(3000);
-  EXPECT_EQ(bytes, 0);
-}
-
-TEST_F(Window, ClosedWhileABoxIsOpen_EndsQuietly) {
-  ChooseByKeys("cmbNYX", 4);
+  // Closing the window while the box is open ends quietly.
   world_.boxes.while_open = [&] { EXPECT_TRUE(window_->close()); };
+  Find<QLabel>("lblProgress").clear();
   Click("Command3_0");
   RunToTheEnd();
-  EXPECT_EQ(world_.boxes.Take().size(), 1u);
   world_.time.Advance(60000);
-  EXPECT_THAT(world_.boxes.shown, IsEmpty());
+  EXPECT_EQ(world_.boxes.shown.size(), 1u);
 }
 
 TEST_F(Window, EveryControl_HasANameAndSaysWhatItDoes) {
   QSet<QString> names;
   for (QWidget* widget : window_->findChildren<QWidget*>()) {
-    const bool control =
-        qobject_cast<QAbstractButton*>(widget) != nullptr || qobject_cast<QComboBox*>(widget) != nullptr ||
-        qobject_cast<QLineEdit*>(widget) != nullptr || qobject_cast<QAbstractSpinBox*>(widget) != nullptr ||
-        qobject_cast<QAbstractSlider*>(widget) != nullptr;
-    if (!control || widget->objectName().startsWith(QStringLiteral("qt_")) || widget->inherits("QScrollBar"))
-      continue;
+    const bool control = widget->inherits("QAbstractButton") || widget->inherits("QComboBox") ||
+                         widget->inherits("QLineEdit") || widget->inherits("QAbstractSpinBox") ||
+                         widget->inherits("QSlider");
+    if (!control || widget->objectName().startsWith(QStringLiteral("qt_"))) continue;
     const std::string object = widget->objectName().toStdString();
     EXPECT_NE(object, "");
     EXPECT_FALSE(widget->toolTip().isEmpty()) << object;
-    QAccessibleInterface* accessible = QAccessible::queryAccessibleInterface(widget);
+    const QAccessibleInterface* accessible = QAccessible::queryAccessibleInterface(widget);
     EXPECT_NE(accessible->role(), QAccessible::NoRole) << object;
     EXPECT_NE(accessible->role(), QAccessible::Client) << object;
     const QString name = accessible->text(QAccessible::Name);
@@ -410,12 +235,105 @@ TEST_F(Window, EveryControl_HasANameAndSaysWhatItDoes) {
   EXPECT_GT(names.size(), 100);
 }
 
-TEST_F(Window, At1024x720_ShowsEverythingWithoutScrolling) {
-  window_->resize(1024, 720);
-  QTest::qWait(0);
-  const auto& scroll = *window_->findChild<QScrollArea*>();
-  EXPECT_LE(scroll.widget()->minimumSizeHint().width(), 1024);
-  EXPECT_LE(scroll.widget()->minimumSizeHint().height(), 720);
+TEST_F(Window, AccessibleActions_DoWhatClicksDo) {
+  const auto act = [](QAccessibleInterface& control) {
+    control.actionInterface()->doAction(control.actionInterface()->actionNames().first());
+  };
+  act(Accessible("ServoSimulator2_2"));
+  EXPECT_TRUE(Dial("ServoSimulator2_2").selected());
+  QTest::keyClick(&Spin("spnNeutralTrim"), Qt::Key_Up);
+  act(Accessible("chkUpdate_5"));
+  EXPECT_EQ(Record(5).NeutralPosition, 1510);
+  act(Accessible("optLostComm_0"));
+  EXPECT_EQ(Record(5).LostCommOption, kLostCommHold);
+
+  auto& box = Find<QComboBox>("cmbPresets");
+  QAccessibleInterface& list = *Accessible("cmbPresets").child(0);
+  for (int line = 1; line < 3; ++line) {  // line 1 is the current one
+    Accessible("cmbPresets").actionInterface()->doAction(QAccessibleActionInterface::showMenuAction());
+    EXPECT_TRUE(box.view()->isVisible());
+    EXPECT_EQ(list.child(line)->text(QAccessible::Name), box.itemText(line));
+    EXPECT_EQ(list.indexOfChild(list.child(line)), line);
+    act(*list.child(line));
+    EXPECT_FALSE(box.view()->isVisible());
+    EXPECT_EQ(Record(5).VirtualRange, kPresets.at(static_cast<std::size_t>(line)).virtual_range);
+    EXPECT_EQ(Record(5).NeutralPosition, 1500);
+  }
+
+  Press("cmdShowSummary");
+  world_.time.Advance(20);
+  act(Accessible("txtSumStopRange_4"));
+  EXPECT_EQ(Text("lblDisplay"), "Channel 5 Stops");
+  act(Accessible("optSumPUDefault_2"));
+  EXPECT_EQ(Record(2).PowerUPOpt, kPowerUpDefault);
+}
+
+class WindowAndControlPanel : public Window {
+ protected:
+  // Chooses in the opened list, where the current line can be chosen again.
+  void ChooseInOpenedList(int line) {
+    auto& list = Find<QComboBox>("cmbNYX");
+    list.showPopup();
+    list.view()->setCurrentIndex(list.model()->index(line, 0));
+    QTest::keyClick(list.view(), Qt::Key_Return);
+  }
+  // Asks for Comm 3 and opens it.
+  void TakeComm3() {
+    panel_.Take(3);
+    world_.boxes.answer_yes = true;
+    ChooseInOpenedList(3);
+    ASSERT_EQ(world_.boxes.Take().size(), 2u);
+    ASSERT_FALSE(link_.PortOpen());
+    world_.time.Advance(10);
+    ChooseInOpenedList(3);
+    ASSERT_TRUE(link_.PortOpen());
+  }
+};
+
+TEST_F(WindowAndControlPanel, PortThatItHolds_IsTakenAndGivenBackOnClosing) {
+  const Bytes identification = panel_.panel.requests().front().payload;
+  EXPECT_EQ(std::string(identification.begin(), identification.end()), "Tendril Utility");
+  TakeComm3();
+  world_.bench.Attach<MuteUnit>(3, std::uint8_t{0x01});
+  Click("Command3_0");
+  world_.time.Advance(150);
+
+  panel_.panel.SetPortHandler([this](std::uint8_t, bool held) {
+    EXPECT_FALSE(held && link_.PortOpen()) << "given back before it is closed";
+  });
+  EXPECT_FALSE(window_->close());
+  QTest::keyClick(&Find("cmbNYX"), Qt::Key_Up);
+  EXPECT_FALSE(link_.PortOpen());
+  EXPECT_THAT(panel_.PortRequests(), ElementsAre("3:0", "3:1"));
+  EXPECT_TRUE(panel_.panel.Holds(3));
+  world_.time.Advance(99);
+  EXPECT_TRUE(window_->isVisible());
+  world_.time.Advance(1);
+  EXPECT_FALSE(window_->isVisible());
+  world_.time.Advance(60000);
+  EXPECT_THAT(world_.boxes.shown, IsEmpty());
+  EXPECT_EQ(panel_.PortRequests().size(), 2u);
+}
+
+TEST_F(WindowAndControlPanel, SecondCloseRequest_ClosesAtOnce) {
+  TakeComm3();
+  EXPECT_FALSE(window_->close());
+  EXPECT_TRUE(window_->close());
+  EXPECT_EQ(panel_.PortRequests().back(), "3:1");
+}
+
+TEST_F(WindowAndControlPanel, OpenedList_ShowsNewPortsAndTheirDevices) {
+  ChooseByKeys("cmbNYX", 2);
+  world_.bench.AddPort(9);
+  auto& list = Find<QComboBox>("cmbNYX");
+  list.showPopup();
+  EXPECT_EQ(list.count(), 6);
+  EXPECT_EQ(list.currentText().toStdString(), "Comm 2");
+  EXPECT_EQ(list.itemData(5, Qt::ToolTipRole).toString().toStdString(), "Virtual serial line 9");
+  EXPECT_EQ(link_.CommPort(), 2);
+  list.hidePopup();
+  ChooseInOpenedList(5);
+  EXPECT_EQ(link_.CommPort(), 9);
 }
 
 }  // namespace

@@ -9,18 +9,12 @@ namespace {
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-TEST(RecordRemarks, NameWhatCannotBeSentAndWhatLookingChanges) {
+TEST(RecordRemarks, NameWhatCannotBeSentAndWhatShowingChanges) {
   ChannelTable working;
-  for (std::size_t slot = 0; slot < kPortCount; ++slot)
-    SetFromPreset(kPresets[kStartPreset], working.At(slot));
   ChannelEditor editor(working);
   RecordRemarks remarks(working, editor);
+  editor.ApplyPreset(kPresets[kStartPreset]);
   remarks.AcceptRecords();
-  EXPECT_THAT(remarks.Sentences(true), IsEmpty());
-  editor.Change(Parameter::kActualRange, 300);  // of no channel
-  remarks.AcceptEdit();
-  EXPECT_THAT(remarks.Sentences(true), IsEmpty());
-
   working.At(2).ActualRange = {600, 2410};
   working.At(2).DefaultPosition = 2100;
   working.At(4).DefaultPosition = 5;
@@ -31,12 +25,12 @@ TEST(RecordRemarks, NameWhatCannotBeSentAndWhatLookingChanges) {
   const auto changed = ElementsAre("Channel 3: 600 to 2410 is shown as 595 to 2405",
                                    "Channel 3: default position 2100 is shown as 2000");
   editor.SelectChannel(2);
-  EXPECT_THAT(remarks.Sentences(true), changed) << "while it is looked at";
-  EXPECT_THAT(remarks.Sentences(false), IsEmpty()) << "the record is still as it was";
+  EXPECT_THAT(remarks.Sentences(true), changed) << "while it is edited";
+  EXPECT_THAT(remarks.Sentences(false), IsEmpty()) << "the record is unchanged";
   editor.SelectChannel(0);
-  EXPECT_THAT(remarks.Sentences(true), changed) << "when it was left";
+  EXPECT_THAT(remarks.Sentences(true), changed) << "stored";
 
-  // Edits are meant: of the channel and of the ticked ones, as they are shown.
+  // An edit is accepted as shown, in the edited and in the ticked channels.
   editor.SelectChannel(1);
   editor.ClickApplyBox(2, true);
   editor.Change(Parameter::kNeutralTrim, 100);
