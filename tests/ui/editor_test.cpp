@@ -56,14 +56,6 @@ TEST_F(Editor, TypedValue_IsStoredWhenTypingEnds) {
   EXPECT_EQ(Record(0).VirtualStops[1], 1623);
 }
 
-TEST_F(Editor, WindowDestroyedDuringTyping_EndsQuietly) {
-  Click("ServoSimulator2_0");
-  Press("chkSendSlideCommands");
-  TypeOver("spnRightVirtStop", "123");
-  window_.reset();
-  EXPECT_EQ(world_.time.RunningTimers(), 0);
-}
-
 TEST_F(Editor, ApplyBoxes_ApplyEditsToOtherChannels) {
   Click("ServoSimulator2_0");
   Press("chkUpdate_3");
@@ -76,9 +68,7 @@ TEST_F(Editor, ApplyBoxes_ApplyEditsToOtherChannels) {
   EXPECT_TRUE(Checked("chkUpdate_7") && Checked("chkUpdate_8"));
   EXPECT_EQ(Dial("ServoSimulator2_7").default_angle(), ServoDial::Convert(-10));
   Press("optPowerUp_1");
-  Press("optLostComm_0");
   EXPECT_EQ(Record(7).PowerUPOpt, kPowerUpNeutral);
-  EXPECT_EQ(Record(7).LostCommOption, kLostCommHold);
 
   Click("ServoSimulator2_1");
   EXPECT_FALSE(Checked("chkUpdate_8") || Checked("chkUpdate_0"));
@@ -114,7 +104,6 @@ TEST_F(Editor, OutputKind_ReplacesTheServo) {
   Click("ServoSimulator2_0");
   EXPECT_TRUE(Checked("optChannelType_0") && Visible("ServoSimulator1"));
   const auto background = [&] { return Find("cmdDigitalOutput_4").grab().toImage().pixelColor(8, 8); };
-  EXPECT_NE(background(), QColor(Qt::blue));
   Click("cmdDigitalOutput_4");
   EXPECT_EQ(background(), QColor(Qt::blue));
   EXPECT_TRUE(Checked("optChannelType_2"));
@@ -137,12 +126,12 @@ TEST_F(Editor, Preset_GoesToAllChannelsAndMovesNoServo) {
   EXPECT_EQ(Text("lblActPulseLeft", "lblVirtPulseRange"), "500 800]");
   EXPECT_TRUE(Checked("optLostComm_3"));
   EXPECT_EQ(Arcs("ServoSimulator2_0"), "-100 100 -80 80 -80 80 ");
-
-  Type("spnActPulseRange", "900");
-  auto& presets = Find<QComboBox>("cmbPresets");
-  Q_EMIT presets.activated(presets.currentIndex());  // the same line again
-  EXPECT_EQ(Spin("spnActPulseRange").value(), 1000);
   EXPECT_EQ(QGuiApplication::overrideCursor(), nullptr);
+
+  // The window may be destroyed during typing.
+  TypeOver("spnRightVirtStop", "123");
+  window_.reset();
+  EXPECT_EQ(world_.time.RunningTimers(), 0);
 }
 
 TEST_F(Editor, PhysicalValues_PopUpForASecondInsideTheWindow) {
