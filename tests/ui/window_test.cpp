@@ -287,6 +287,8 @@ class WindowAndControlPanel : public Window {
 };
 
 TEST_F(WindowAndControlPanel, PortThatItHolds_IsTakenAndGivenBackOnClosing) {
+  const Bytes identification = panel_.panel.requests().front().payload;
+  EXPECT_EQ(std::string(identification.begin(), identification.end()), "Tendril Utility");
   TakeComm3();
   world_.bench.Attach<MuteUnit>(3, std::uint8_t{0x01});
   Click("Command3_0");
