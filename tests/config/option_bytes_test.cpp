@@ -23,13 +23,13 @@ OptionBytes Encoded(const ChannelConfig& record) {
   return std::holds_alternative<OptionBytes>(result) ? std::get<OptionBytes>(result) : OptionBytes{};
 }
 
-std::string Refusal(const ChannelConfig& record) {
+std::string ErrorOf(const ChannelConfig& record) {
   const auto result = EncodeOptions(record);
   const auto* invalid = std::get_if<InvalidRecord>(&result);
   return invalid != nullptr ? invalid->text : "accepted";
 }
 
-TEST(OptionBytes, Presets_EncodeAsTheUnitTakesThem) {
+TEST(OptionBytes, Presets_EncodeToTheBytesOfTheUnit) {
   const std::vector<OptionBytes> expected{
       {1, 80, 220, 125, 175, 125, 175, 150, 150},
       {1, 60, 240, 100, 200, 100, 200, 150, 150},
@@ -42,7 +42,7 @@ TEST(OptionBytes, Presets_EncodeAsTheUnitTakesThem) {
   }
 }
 
-TEST(OptionBytes, EveryField_HasItsOwnPlaceBothWaysAndLosesItsLastDigit) {
+TEST(OptionBytes, EveryField_HasItsOwnByteAndLosesItsLastDigit) {
   ChannelConfig record;
   record.ActualRange = {10, 2550};
   record.VirtualRange = {209, 1505};
@@ -80,7 +80,7 @@ TEST(OptionBytes, Flags_CombineKindPowerUpAndLostComm) {
 
 TEST(OptionBytes, InvalidField_IsNamedWithItsValue) {
   struct Case {
-    std::function<void(ChannelConfig&)> spoil;
+    std::function<void(ChannelConfig&)> invalidate;
     std::string field_and_value;
   };
   const std::vector<Case> cases{
@@ -97,14 +97,14 @@ TEST(OptionBytes, InvalidField_IsNamedWithItsValue) {
       {[](auto& r) { r.DefaultPosition = 2551; }, "DefaultPosition=2551"},
       {[](auto& r) { r.NeutralPosition = 9; }, "NeutralPosition=9"},
   };
-  ChannelConfig all_spoilt = Medium();
+  ChannelConfig all_invalid = Medium();
   for (auto c = cases.rbegin(); c != cases.rend(); ++c) {
     ChannelConfig record = Medium();
-    c->spoil(record);
-    EXPECT_EQ(Refusal(record), "Internal Error - Invalid " + c->field_and_value);
-    // Spoilt from the last check to the first: the earliest check always speaks.
-    c->spoil(all_spoilt);
-    EXPECT_EQ(Refusal(all_spoilt), "Internal Error - Invalid " + c->field_and_value);
+    c->invalidate(record);
+    EXPECT_EQ(ErrorOf(record), "Internal Error - Invalid " + c->field_and_value);
+    // Invalidated from the last check to the first: the first failed check is reported.
+    c->invalidate(all_invalid);
+    EXPECT_EQ(ErrorOf(all_invalid), "Internal Error - Invalid " + c->field_and_value);
   }
 }
 
@@ -124,7 +124,7 @@ TEST(OptionBytes, EveryFlagByte_DecodesByItsExactPatterns) {
   }
 }
 
-TEST(ChannelTable, SlotBeyondTheNinth_IsABoundsFault) {
+TEST(ChannelTable, SlotBeyondTheNinth_RaisesAnError) {
   ChannelTable table;
   EXPECT_NO_THROW(table.At(8));
   EXPECT_THROW(table.At(9), RuntimeError);
