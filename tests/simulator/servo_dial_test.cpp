@@ -148,19 +148,5 @@ TEST(ServoDial, ServoText_PrintsEachAngleInsteadOfTheCaption) {
   EXPECT_THAT(texts, testing::EndsWith("|Stops −45°|Stops +45°|Arm −12°|Neutral 0°|Default +10°|"));
 }
 
-TEST(ServoDial, Resize_ResetsRangeLimitAndArmOnly) {
-  ServoDial dial;
-  dial.SetNeutralPositionUS(1600);
-  dial.SetRangeUS(600, 2400);
-  dial.SetLimitUS(600, 2400);
-  dial.SetStopsUS(1200, 1800);
-  dial.SetMovingArmPositionUS(2000);
-  dial.ResetAfterResize();
-  EXPECT_EQ(dial.range().start, ServoDial::Convert(95));
-  EXPECT_EQ(dial.limit().end, ServoDial::Convert(-50));
-  EXPECT_EQ(dial.stops().end, ServoDial::Convert(40));
-  EXPECT_EQ(dial.arm_pulse(), 1600);
-}
-
 }  // namespace
 }  // namespace tendril
