@@ -325,9 +325,10 @@ void ServoSimulator::PaintBackground(QPainter& painter) const {
 
 void ServoSimulator::resizeEvent(QResizeEvent* event) {
   QAbstractButton::resizeEvent(event);
+  const auto arm = static_cast<std::int32_t>(dial_.arm_pulse());
   dial_.ResetAfterResize();
   DrawServo();
-  Q_EMIT Resized();
+  Q_EMIT Resized(arm);
   AnnounceArm();  // only now: the receiver may have put the arm back
 }
 

@@ -69,8 +69,8 @@ class ServoSimulator : public QAbstractButton {
   // The user chose this servo.
   void Clicked();
   // The control was resized: range and limit have their initial values again and the arm 0 degrees. What the receiver
-  // sets now is painted; the initial values are never seen.
-  void Resized();
+  // sets now is painted; the initial values are never seen. `arm` is the arm's pulse width so far.
+  void Resized(std::int32_t arm);
   // DisplayServoText was written.
   void DisplayServoTextChanged();
 

@@ -18,7 +18,6 @@ constexpr char kSelectedOutput[] =
 
 ChannelStrip::ChannelStrip(const ChannelTable& working)
     : FrameBox(QStringLiteral("Click to Select Channel")), working_(working) {
-  arms_.fill(kCentrePulseWidth);
   QGridLayout* grid = MakeChannelColumns(this);
   for (std::size_t channel = 0; channel < kPortCount; ++channel) {
     grid->addWidget(MakeCell(channel), 0, static_cast<int>(channel));
@@ -41,8 +40,8 @@ QWidget* ChannelStrip::MakeCell(std::size_t channel) {
   bold.setBold(true);
   output->setFont(bold);
 
-  connect(simulator, &ServoSimulator::Resized, this, [this, simulator, channel] {
-    RefeedResizedSimulator(*simulator, working_.At(channel), arms_[channel]);
+  connect(simulator, &ServoSimulator::Resized, this, [this, simulator, channel](Microseconds arm) {
+    RefeedResizedSimulator(*simulator, working_.At(channel), arm);
   });
   const auto choose = [this, channel] { Q_EMIT ChannelChosen(channel); };
   connect(simulator, &ServoSimulator::Clicked, this, choose);
@@ -82,12 +81,10 @@ void ChannelStrip::ShowKind(std::size_t channel) {
 }
 
 void ChannelStrip::UpdateSimulator(std::size_t channel, Microseconds arm) {
-  arms_[channel] = arm;
   FeedSimulator(*ServoSimulator2_[channel], working_.At(channel), arm);
 }
 
 void ChannelStrip::MoveArm(std::size_t channel, Microseconds arm) {
-  arms_[channel] = arm;
   ServoSimulator2_[channel]->SetMovingArmPositionUS(arm);
 }
 

@@ -37,7 +37,6 @@ class ChannelStrip : public FrameBox {
   void ShowKind(std::size_t channel);
 
   const ChannelTable& working_;
-  std::array<Microseconds, kPortCount> arms_{};  // where each arm was drawn last
   // Each cell shows its servo, or when the port drives none, its button.
   std::array<QStackedWidget*, kPortCount> cells_{};
   std::array<ServoSimulator*, kPortCount> ServoSimulator2_{};

@@ -2,8 +2,6 @@
 
 #include <QVBoxLayout>
 
-#include "ui/simulator_feed.h"
-
 namespace tendril {
 
 ChosenServo::ChosenServo(const ChannelEditor& editor, const ChannelTable& working)
@@ -18,7 +16,7 @@ ChosenServo::ChosenServo(const ChannelEditor& editor, const ChannelTable& workin
   Describe(ServoSimulator1_, "The chosen channel's servo.");
   ServoSimulator1_->DisplaySize(kLargeSimulator);
   connect(ServoSimulator1_, &ServoSimulator::Resized, this,
-          [this] { RefeedResizedSimulator(*ServoSimulator1_, Values(), arm_); });
+          [this](Microseconds arm) { RefeedResizedSimulator(*ServoSimulator1_, Values(), arm); });
 
   SetPaletteColour(lblOutput_, QPalette::Window, QColor(0xC0, 0xC0, 0xC0));
   SetPaletteColour(lblOutput_, QPalette::WindowText, Qt::black);
@@ -43,16 +41,6 @@ void ChosenServo::ShowChannel() {
 
 ChannelConfig ChosenServo::Values() const {
   return editor_.Channel() ? working_.At(*editor_.Channel()) : editor_.WorkingValues();
-}
-
-void ChosenServo::UpdateSimulator(Microseconds arm) {
-  arm_ = arm;
-  FeedSimulator(*ServoSimulator1_, Values(), arm);
-}
-
-void ChosenServo::MoveArm(Microseconds arm) {
-  arm_ = arm;
-  ServoSimulator1_->SetMovingArmPositionUS(arm);
 }
 
 }  // namespace tendril

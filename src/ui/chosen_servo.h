@@ -10,6 +10,7 @@
 #include "simulator/servo_simulator.h"
 #include "ui/controls.h"
 #include "ui/model/channel_editor.h"
+#include "ui/simulator_feed.h"
 #include "unitops/live_test.h"
 
 namespace tendril {
@@ -22,9 +23,9 @@ class ChosenServo : public FrameBox, public ChannelChoice {
   // Shows the edited channel's number, and its servo or what its port drives instead.
   void ShowChannel();
   // Shows Values() on the servo, with the arm at `arm`.
-  void UpdateSimulator(Microseconds arm);
+  void UpdateSimulator(Microseconds arm) { FeedSimulator(*ServoSimulator1_, Values(), arm); }
   // Moves the arm alone.
-  void MoveArm(Microseconds arm);
+  void MoveArm(Microseconds arm) { ServoSimulator1_->SetMovingArmPositionUS(arm); }
 
   std::optional<std::size_t> Channel() const override { return editor_.Channel(); }
   ChannelConfig Values() const override;
@@ -35,7 +36,6 @@ class ChosenServo : public FrameBox, public ChannelChoice {
   QStackedWidget* servo_or_output_;
   ServoSimulator* ServoSimulator1_;
   QLabel* lblOutput_;  // takes the servo's place when the port drives none
-  Microseconds arm_ = kCentrePulseWidth;
 };
 
 }  // namespace tendril

@@ -66,7 +66,6 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
 
 frmNewServoConfig::~frmNewServoConfig() {
   hide();  // typed text takes effect now, while all parts of the window exist
-  commands_.running.SetObserver(nullptr);
   link_.SetPortClosedHandler(nullptr);
 }
 
@@ -143,12 +142,10 @@ void frmNewServoConfig::StartUp(const Version& version) {
   for (std::size_t channel = 0; channel < kPortCount; ++channel)
     SetFromPreset(kPresets[kStartPreset], working_.At(channel));
   remarks_.AcceptRecords();
-  ShowEditor();
   connection_->ListCommPorts();
   control_panel_.ReadPreferences();
   control_panel_.InitializeCommListenerInterface();
-  simulators_.UpdateAll(live_test_.ShownPosition());
-  live_test_.OnRecordsReplaced();
+  ShowRecords();
 }
 
 void frmNewServoConfig::SelectChannel(std::size_t channel) {
@@ -219,7 +216,7 @@ void frmNewServoConfig::OnPresetChosen(std::size_t preset) {
   QGuiApplication::restoreOverrideCursor();
 }
 
-// Shows the records again after they were replaced. Stores nothing.
+// Shows the records after they were replaced. Stores nothing.
 void frmNewServoConfig::ShowRecords() {
   channels_->ShowKinds();
   ShowEditor();
