@@ -13,19 +13,11 @@
 namespace tendril {
 namespace {
 
-// A check box or a radio button.
+// A check box or a radio button, which has an accessible name of its own.
 class ToggleAccessible : public QAccessibleWidget {
  public:
   ToggleAccessible(QAbstractButton* button, QAccessible::Role role)
       : QAccessibleWidget(button, role), button_(*button) {}
-
-  QString text(QAccessible::Text kind) const override {
-    if (kind == QAccessible::Name && button_.accessibleName().isEmpty() && !button_.text().isEmpty())
-      return button_.text().remove(QLatin1Char('&'));
-    if (kind == QAccessible::Accelerator && !button_.shortcut().isEmpty())
-      return button_.shortcut().toString(QKeySequence::NativeText);
-    return QAccessibleWidget::text(kind);
-  }
 
   QAccessible::State state() const override {
     QAccessible::State state = QAccessibleWidget::state();
@@ -107,7 +99,7 @@ class LineAccessible : public QAccessibleInterface, public QAccessibleActionInte
   const int line_;
 };
 
-// A combo box's list. It outlives neither the view nor, as its child, the box.
+// A combo box's list. The view and the box outlive it.
 class ListAccessible : public QAccessibleWidget {
  public:
   ListAccessible(QAbstractItemView* view, CalmComboBox& box)
@@ -139,10 +131,10 @@ class ListAccessible : public QAccessibleWidget {
  private:
   QAbstractItemView& view_;
   CalmComboBox& box_;
-  mutable std::vector<QAccessible::Id> lines_;  // made when they are asked for
+  mutable std::vector<QAccessible::Id> lines_;  // created on request
 };
 
-// A text that can be read by its characters, and pressed.
+// A text that can be read character by character, and pressed.
 class PressableTextAccessible : public QAccessibleWidget, public QAccessibleTextInterface {
  public:
   explicit PressableTextAccessible(PressableText* text)
@@ -187,7 +179,7 @@ class PressableTextAccessible : public QAccessibleWidget, public QAccessibleText
     *end = characterCount();
     return {};
   }
-  // Nothing of it can be selected, and all of it is seen.
+  // Nothing can be selected, and the whole text is visible.
   void selection(int, int* begin, int* end) const override { *begin = *end = 0; }
   int selectionCount() const override { return 0; }
   void addSelection(int, int) override {}
@@ -203,11 +195,11 @@ QAccessibleInterface* Create(const QString&, QObject* object) {
   if (auto* box = qobject_cast<QCheckBox*>(object)) return new ToggleAccessible(box, QAccessible::CheckBox);
   if (auto* option = qobject_cast<QRadioButton*>(object))
     return new ToggleAccessible(option, QAccessible::RadioButton);
-  if (auto* text = dynamic_cast<PressableText*>(object)) return new PressableTextAccessible(text);
+  if (auto* text = qobject_cast<PressableText*>(object)) return new PressableTextAccessible(text);
   auto* view = qobject_cast<QAbstractItemView*>(object);
   if (view == nullptr || view->parent() == nullptr) return nullptr;
-  // The list stands in a frame of the box's. The box itself is not asked: it may be making the list just now.
-  auto* box = dynamic_cast<CalmComboBox*>(view->parent()->parent());
+  // The view's parent is a frame in the box. The box's own view() would create the list again while it is created.
+  auto* box = qobject_cast<CalmComboBox*>(view->parent()->parent());
   return box != nullptr ? new ListAccessible(view, *box) : nullptr;
 }
 

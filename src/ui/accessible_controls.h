@@ -1,11 +1,11 @@
-// What assistive technology sees of the controls whose actions Qt does not carry out as clicks.
+// The accessible interfaces of controls whose actions Qt does not carry out as clicks.
 #pragma once
 
 namespace tendril {
 
-// From now on the actions of check boxes, radio buttons, the lines of CalmComboBox and PressableText do what the mouse
-// does. Qt's own would toggle a button without a click, and select a line without choosing it. To be called before
-// the first of these controls is made; more calls do nothing.
+// Makes the accessible actions of check boxes, radio buttons, CalmComboBox lines and PressableText do what the mouse
+// does. Qt's own actions toggle a button without a click, and select a line without choosing it. Call it before the
+// first of these controls is created; further calls have no effect.
 void InstallAccessibleControls();
 
 }  // namespace tendril

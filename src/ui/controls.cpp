@@ -1,6 +1,7 @@
 #include "ui/controls.h"
 
 #include <QAbstractButton>
+#include <QAccessible>
 #include <QGuiApplication>
 #include <QKeyEvent>
 #include <QPainter>
@@ -178,6 +179,11 @@ void SetPaletteColour(QWidget* widget, QPalette::ColorRole role, const QColor& c
   QPalette palette = widget->palette();
   palette.setColor(role, colour);
   widget->setPalette(palette);
+}
+
+void Announce(QLabel* label) {
+  QAccessibleEvent alert(label, QAccessible::Alert);
+  QAccessible::updateAccessibility(&alert);
 }
 
 QString OutputLabel(std::int16_t port_type) {

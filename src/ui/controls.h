@@ -145,6 +145,9 @@ void ScaleType(QWidget* widget, double factor);
 // Sets one colour of the widget's palette.
 void SetPaletteColour(QWidget* widget, QPalette::ColorRole role, const QColor& colour);
 
+// Has assistive technology read the label out.
+void Announce(QLabel* label);
+
 // The text on two lines for a port that drives no servo; empty for a servo and for an unknown kind.
 QString OutputLabel(std::int16_t port_type);
 

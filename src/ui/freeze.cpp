@@ -21,7 +21,7 @@ bool Freeze::eventFilter(QObject* object, QEvent* event) {
 void Freeze::Unlock() {
   if (window_ != nullptr) {
     window_->removeEventFilter(this);
-    // The window does not ask again by itself: it takes its request for still under way.
+    // The window does not request the update again: it expects the first request to arrive.
     if (held_back_) {
       QCoreApplication::postEvent(window_, new QEvent(QEvent::UpdateRequest), Qt::LowEventPriority);
     }

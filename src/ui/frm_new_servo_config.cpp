@@ -31,17 +31,7 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
       timers_(timers),
       control_panel_(control_panel),
       ports_(link, boxes, control_panel),
-      connection_(new ConnectionArea(ports_)),
-      progress_(new ProgressArea),
-      command_area_(new CommandArea),
-      apply_boxes_(new ApplyBoxes(channel_editor_)),
-      channels_(new ChannelStrip(working_)),
-      servo_(new ChosenServo(channel_editor_, working_)),
-      parameters_(new MotionParameters(channel_editor_)),
-      choices_(new ChannelChoices(channel_editor_, working_)),
-      live_test_area_(new LiveTestArea(*parameters_)),
       actuals_(new ActualsFrame(timers, *this)),
-      views_(new QStackedWidget),
       commands_(link, timers, boxes, *progress_, *connection_, working_,
                 {.starting =
                      [this] {
@@ -53,7 +43,6 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
                        remarks_.AcceptRecords();
                        OnReplaced();
                      }}),
-      simulators_(*channels_, *servo_, channel_editor_),
       live_test_(link, timers, boxes, commands_.running, *connection_, *servo_, *live_test_area_,
                  simulators_),
       tmrSummaryScreen_(timers.CreateTimer([this] { OnSummaryScreen(); })),
@@ -69,8 +58,8 @@ frmNewServoConfig::~frmNewServoConfig() {
   link_.SetPortClosedHandler(nullptr);
 }
 
-// Stacks and scroll areas show a widget, and lay it out, as soon as they get it. So they get it empty, and only once
-// they are in this window: without a parent, what they show would become a window.
+// Stacks and scroll areas show a widget, and lay it out, as soon as they get it. So they get it empty, and only when
+// they are in this window: without a parent, the widget would become a window.
 void frmNewServoConfig::LayOut() {
   setMinimumSize(kSmallestWindow);
   // Leaves room for a frame and a task bar.
@@ -268,9 +257,7 @@ void frmNewServoConfig::ShowConfig() {
   OnReplaced();  // the summary has changed the records
 }
 
-bool frmNewServoConfig::SummaryShown() const {
-  return summary_ != nullptr && views_->currentWidget() == summary_;
-}
+bool frmNewServoConfig::SummaryShown() const { return views_->currentWidget() == summary_; }
 
 void frmNewServoConfig::ShowRunning() {
   const RunningCommand& running = commands_.running;

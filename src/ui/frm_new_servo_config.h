@@ -88,21 +88,21 @@ class frmNewServoConfig : public QWidget {
   PortSelection ports_;
 
   // Owned by the window, as its child widgets.
-  ConnectionArea* connection_;
-  ProgressArea* progress_;
-  CommandArea* command_area_;
-  ApplyBoxes* apply_boxes_;
-  ChannelStrip* channels_;
-  ChosenServo* servo_;
-  MotionParameters* parameters_;
-  ChannelChoices* choices_;
-  LiveTestArea* live_test_area_;
+  ConnectionArea* connection_ = new ConnectionArea(ports_);
+  ProgressArea* progress_ = new ProgressArea;
+  CommandArea* command_area_ = new CommandArea;
+  ApplyBoxes* apply_boxes_ = new ApplyBoxes(channel_editor_);
+  ChannelStrip* channels_ = new ChannelStrip(working_);
+  ChosenServo* servo_ = new ChosenServo(channel_editor_, working_);
+  MotionParameters* parameters_ = new MotionParameters(channel_editor_);
+  ChannelChoices* choices_ = new ChannelChoices(channel_editor_, working_);
+  LiveTestArea* live_test_area_ = new LiveTestArea(*parameters_);
+  QStackedWidget* views_ = new QStackedWidget;
   ActualsFrame* actuals_;
-  QStackedWidget* views_;
   SummaryArea* summary_ = nullptr;  // made after the first paint, or when it is first needed
 
   UnitCommands commands_;
-  Simulators simulators_;
+  Simulators simulators_{*channels_, *servo_, channel_editor_};
   LiveTest live_test_;
   // Where the focus was when the running command began, and where it went when its button was disabled.
   QPointer<QWidget> focus_before_command_;

@@ -33,6 +33,7 @@ LiveTestArea::LiveTestArea(MotionParameters& tests)
       HScrollSendServoPosition_,
       "Moves the chosen channel's drawn servo through its virtual range, 0 to 100 %, and no further than the "
       "virtual stops. Arrow keys move it by 1 %, page keys by 10 %.");
+  chkSendSlideCommands_->setAccessibleName(chkSendSlideCommands_->text());
   HScrollSendServoPosition_->setAccessibleName(QStringLiteral("Servo position"));
   HScrollSendServoPosition_->setRange(0, LiveTest::kSliderMaximum);
   HScrollSendServoPosition_->setSingleStep(LiveTest::kSliderMaximum / 100);

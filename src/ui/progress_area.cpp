@@ -1,6 +1,5 @@
 #include "ui/progress_area.h"
 
-#include <QAccessible>
 #include <QEvent>
 #include <QVBoxLayout>
 
@@ -57,8 +56,6 @@ void ProgressArea::SharePlace(QStackedLayout& place, QWidget* other) {
 
 void ProgressArea::ShowProgress(bool shown) { place_->setCurrentIndex(shown ? 1 : 0); }
 
-int ProgressArea::FrameWidth() const { return pctProgress_->width(); }
-
 void ProgressArea::SetBarWidth(int width) { ShapeProgress_->setGeometry(0, 0, width, kBarHeight); }
 
 void ProgressArea::SetColour(ProgressColour colour) {
@@ -68,9 +65,7 @@ void ProgressArea::SetColour(ProgressColour colour) {
 
 void ProgressArea::SetText(const std::string& text) {
   lblProgress_->setText(QString::fromStdString(text));
-  if (text.empty()) return;
-  QAccessibleEvent alert(lblProgress_, QAccessible::Alert);  // read out by itself
-  QAccessible::updateAccessibility(&alert);
+  if (!text.empty()) Announce(lblProgress_);
 }
 
 void ProgressArea::changeEvent(QEvent* event) {

@@ -1,4 +1,4 @@
-// ProgressArea: the bar that shows that a unit command runs, and how it ended.
+// ProgressArea: the bar that shows a running unit command and how it ended.
 #pragma once
 
 #include <QLabel>
@@ -10,19 +10,20 @@
 
 namespace tendril {
 
-// The frame `frmProgress`. It shares its place with another widget, the frame of the apply boxes: nothing
-// around them moves when one gives way to the other.
+// The frame `frmProgress`. Shares its place with the frame of the apply boxes, so that nothing around them moves when
+// one replaces the other.
 class ProgressArea : public FrameBox, public CommandProgressView {
  public:
   ProgressArea();
 
-  // Puts `other` and this area into `place`. `other` is shown while this is not, and first.
+  // Puts `other` and this area into `place`. `other` is shown first.
   void SharePlace(QStackedLayout& place, QWidget* other);
-  // Names what runs in the frame's title, until the next command; or where it stopped without showing an outcome.
+  // Sets the frame's title to what runs, or to where a command without an outcome stopped. It stays until the next
+  // command.
   void ShowRunning(const RunningCommand& running);
 
   void ShowProgress(bool shown) override;
-  int FrameWidth() const override;
+  int FrameWidth() const override { return pctProgress_->width(); }
   void SetBarWidth(int width) override;
   void SetColour(ProgressColour colour) override;
   void SetText(const std::string& text) override;

@@ -1,12 +1,12 @@
 #include "ui/remarks_label.h"
 
-#include <QAccessible>
+#include "ui/controls.h"
 
 namespace tendril {
 namespace {
 
 constexpr qsizetype kShownRemarks = 2;
-constexpr int kLines = 3;  // and how many more
+constexpr int kLines = 3;  // the last one counts the others
 constexpr char kWhy[] =
     "A unit holds pulse widths of 10 to 2550 µs. Editor and summary show the actual range about 1500 µs, "
     "and all else inside it.\nLeaving a channel, and the summary, store what is shown.";
@@ -20,15 +20,13 @@ void RemarksLabel::ShowRemarks(const std::vector<std::string>& sentences) {
   for (const QString& sentence : all.first(std::min(all.size(), kShownRemarks)))
     lines += QStringLiteral("⚠ ") + sentence;
   if (all.size() > kShownRemarks) lines += QStringLiteral("and %1 more").arg(all.size() - kShownRemarks);
-  if (lines == lines_ && accessibleDescription() == all.join(QLatin1Char('\n'))) return;
+  const QString whole = all.join(QLatin1Char('\n'));
+  if (lines == lines_ && accessibleDescription() == whole) return;
   lines_ = lines;
-  setAccessibleDescription(all.join(QLatin1Char('\n')));
-  setToolTip(all.isEmpty() ? QString()
-                           : accessibleDescription() + QStringLiteral("\n\n") + QString::fromUtf8(kWhy));
+  setAccessibleDescription(whole);
+  setToolTip(all.isEmpty() ? QString() : whole + QStringLiteral("\n\n") + QString::fromUtf8(kWhy));
   ShowLines();
-  if (all.isEmpty()) return;
-  QAccessibleEvent alert(this, QAccessible::Alert);  // read out by itself
-  QAccessible::updateAccessibility(&alert);
+  if (!all.isEmpty()) Announce(this);
 }
 
 QSize RemarksLabel::sizeHint() const { return {0, kLines * fontMetrics().lineSpacing()}; }

@@ -1,4 +1,4 @@
-// RemarksLabel: what the user has to know about the records, in words.
+// RemarksLabel: remarks on the records, in words.
 #pragma once
 
 #include <QLabel>
@@ -9,13 +9,13 @@
 
 namespace tendril {
 
-// Keeps the room of its lines while there is nothing to say, so that nothing around it moves.
+// Keeps the room for its lines while it is empty, so that nothing around it moves.
 class RemarksLabel : public QLabel {
  public:
   RemarksLabel() { setAlignment(Qt::AlignLeft | Qt::AlignTop); }
 
-  // Shows the first two of `sentences`, a line each, and how many more there are. The tool tip and the accessible
-  // description have all of them.
+  // Shows the first two of `sentences`, one to a line, and the number of the others. The tool tip and the accessible
+  // description contain all of them.
   void ShowRemarks(const std::vector<std::string>& sentences);
 
   QSize sizeHint() const override;
