@@ -8,7 +8,6 @@
 #include <QScrollArea>
 #include <QTimer>
 #include <QVBoxLayout>
-#include <optional>
 
 #include "ui/accessible_controls.h"
 #include "ui/freeze.h"
@@ -169,13 +168,10 @@ void frmNewServoConfig::ShowRemarks() {
 void frmNewServoConfig::OnEdited(FollowUp follow_up) {
   remarks_.AcceptEdit();
   ShowEditor();
-  switch (follow_up) {
-    case FollowUp::kUpdateSimulators:
-      simulators_.UpdateSimulators(live_test_.ShownPosition());
-      break;
-    case FollowUp::kRefreshLivePosition:
-      live_test_.OnSlider();
-      break;
+  if (follow_up == FollowUp::kRefreshLivePosition) {
+    live_test_.OnSlider();
+  } else {
+    simulators_.UpdateSimulators(live_test_.ShownPosition());
   }
 }
 
@@ -216,8 +212,7 @@ void frmNewServoConfig::ShowRecords() {
 void frmNewServoConfig::OnReplaced() {
   channel_editor_.ReloadChannel();
   ShowRecords();
-  if (!SummaryShown()) return;
-  summary_->NormaliseAndShowRecords();
+  if (SummaryShown()) summary_->NormaliseAndShowRecords();
   ShowRemarks();
 }
 
@@ -300,11 +295,10 @@ void frmNewServoConfig::MakeSummary() {
   summary_ = new SummaryArea(timers_, working_, views_);
   views_->addWidget(summary_);
   EnableControls();
-  QObject* const c = &connections_;
-  connect(summary_, &SummaryArea::SendPressed, c, [this] { commands_.send.Start(); });
-  connect(summary_, &SummaryArea::GetPressed, c, [this] { commands_.get.Start(); });
-  connect(summary_, &SummaryArea::SimulatorPressed, c, [this] { ShowConfig(); });
-  connect(summary_, &SummaryArea::Edited, c, [this](std::size_t channel) {
+  connect(summary_, &SummaryArea::SendPressed, &connections_, [this] { commands_.send.Start(); });
+  connect(summary_, &SummaryArea::GetPressed, &connections_, [this] { commands_.get.Start(); });
+  connect(summary_, &SummaryArea::SimulatorPressed, &connections_, [this] { ShowConfig(); });
+  connect(summary_, &SummaryArea::Edited, &connections_, [this](std::size_t channel) {
     remarks_.AcceptRecord(channel);
     ShowRemarks();
   });
