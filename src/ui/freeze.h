@@ -7,8 +7,9 @@
 
 namespace tendril {
 
-// Suspends the redraw of a window for its own lifetime. At the end, what has changed is redrawn once. Several objects may
-// freeze the same window and end in any order: the last one resumes the redraw. The window may be destroyed meanwhile.
+// Suspends the redraw of a window for its own lifetime. At the end, what has changed is redrawn once. Several objects
+// may freeze the same window and end in any order: the last one resumes the redraw. The window may be destroyed
+// meanwhile.
 //
 // Holds the window's update requests back. Disabling the window's updates would work too, but enabling them again
 // redraws the whole window, and most of it twice.
