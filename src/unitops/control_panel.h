@@ -16,7 +16,7 @@
 
 namespace tendril {
 
-// Keeps a connection to the Control Panel's comm listener, asks it for a port when the person wants that, and
+// Keeps a connection to the Control Panel's comm listener, asks it for a port when the user wants that, and
 // gives the port back.
 class ControlPanel {
  public:
@@ -32,7 +32,7 @@ class ControlPanel {
 
   // Whether the Control Panel runs on this computer and has a comm listener.
   bool ControlPanelRunning() const;
-  // Asks the person whether the Control Panel is to give up port `port`, 1 to 255, and on Yes asks the Control
+  // Asks the user whether the Control Panel is to give up port `port`, 1 to 255, and on Yes asks the Control
   // Panel, giving another port back first.
   void AskControlPanelForPort(std::uint8_t port);
 

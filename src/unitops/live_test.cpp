@@ -73,7 +73,7 @@ bool LiveTest::Guarded(const std::function<void()>& action) {
   } catch (...) {
     const std::string fault = DescribeCurrentFault();
     StopAll();
-    view_.ClearSliderSends();  // or the next movement would fail, and tell, all over again
+    view_.ClearSliderSends();  // otherwise the next movement would fail and show a box again
     ShowCommError(boxes_, {}, fault);
     return false;
   }
@@ -130,7 +130,7 @@ void LiveTest::Step() {
     direction_ = -direction_;
   }
   const std::int32_t interval_ms = at_end ? kRestMs : kStepMs;
-  // Setting it anew at every step would add each step's lateness to the next one's.
+  // Setting it at every step would add each step's lateness to the next one's.
   if (tmrTest_->Interval() != interval_ms) tmrTest_->SetInterval(interval_ms);
   ShowPosition(test_position_);
   SendNow(test_position_);

@@ -17,7 +17,7 @@
 
 namespace tendril {
 
-// The channel that is moved; asked anew for every step.
+// The channel that is moved; read again for every step.
 class ChannelChoice {
  public:
   virtual ~ChannelChoice() = default;
@@ -33,7 +33,7 @@ class ServoPictures {
   virtual ~ServoPictures() = default;
   // Moves the arm of the large servo, and of the chosen channel's small one.
   virtual void MoveArm(Microseconds position) = 0;
-  // Shows the records anew, with the arms at `arm`.
+  // Draws the records again, with the arms at `arm`.
   virtual void UpdateSimulators(Microseconds arm) = 0;
 };
 
@@ -91,14 +91,14 @@ class LiveTest {
   void OnTestButton(int button);
   // The slider was moved, or the range that it spans has changed by an edit.
   void OnSlider();
-  // The records were replaced: shows the slider anew and sends nothing; a position that still waits is dropped.
+  // The records were replaced: shows the slider again and sends nothing; a position that still waits is dropped.
   void OnRecordsReplaced();
   // "Use Slider to Test Intensity Values" was ticked or cleared.
   void OnSliderSends();
   // The link has closed its port: everything stops where it is, and nothing is left unsent.
   void OnPortClosed() { StopAll(); }
   // A unit command is about to start: a sweep ends as by its button, and nothing is left unsent. False: that failed,
-  // and the person has been told.
+  // and the failure has been shown.
   bool MakeWay();
 
   // Where the arm was drawn last, in microseconds.

@@ -14,7 +14,7 @@
 
 namespace tendril {
 
-// The window's comm port list asks it what to list, and tells it what was chosen.
+// The model of the window's comm port list.
 class PortSelection {
  public:
   // All must outlive it.
@@ -28,7 +28,7 @@ class PortSelection {
   // Which device the port of line `entry` is: what its maker calls it, and its path. Empty for "Select".
   std::string DescribePort(std::size_t entry) const;
 
-  // Who is told when a port is about to be opened.
+  // `handler` is called when a port is about to be opened.
   void SetOpeningHandler(std::function<void()> handler) { opening_ = std::move(handler); }
 
   // Opens the port of line `entry` at once. Line 0, "Select", leaves the port as it is. Shows a failure; a port

@@ -21,7 +21,7 @@ class Shutdown {
   // unload: closes the window, which asks again.
   Shutdown(HwSerial& link, TimerFactory& timers, ControlPanel& control_panel, std::function<void()> unload);
 
-  // A close request of the person or the system: whether it goes ahead now.
+  // A close request of the user or the system: whether it goes ahead now.
   bool MayClose();
 
  private:

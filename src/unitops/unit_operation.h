@@ -24,7 +24,7 @@ struct CommandContext {
   MessageBoxes& boxes;
   RunningCommand& running;
   const UnitTarget& target;
-  // Called before an operation starts and sends anything. False: it must not start; the user has been told why.
+  // Called before an operation starts and sends anything. False: it must not start; the reason has been shown.
   // May be empty; raises nothing.
   std::function<bool()> starting;
 };

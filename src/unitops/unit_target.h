@@ -1,11 +1,11 @@
-// UnitTarget: whom the person has chosen to talk to.
+// UnitTarget: the chosen comm port and unit.
 #pragma once
 
 #include <cstdint>
 
 namespace tendril {
 
-// The connection area of the window; the unit commands ask it anew for every packet that they send.
+// The connection area of the window; the unit commands read it for every packet that they send.
 class UnitTarget {
  public:
   virtual ~UnitTarget() = default;

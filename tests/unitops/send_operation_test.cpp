@@ -121,19 +121,6 @@ TEST_F(Send, IdSetTo00InTheMiddle_IsASendErrorAtTheNextPort) {
   ExpectFailure({"Error sending configuration, Please retry", "Send Error", BoxIcon::kCritical});
 }
 
-TEST_F(Send, PollTakenByAnotherHandler_IsASendErrorOfTheRepeat) {
-  Attach("mute", 0x01);
-  commands_.send.Start();
-  // A handler that hears of the missing reply first polls for something of its own.
-  link_.SetPollReplyHandler([&](bool replied, std::uint8_t unit, std::uint8_t kind, Bytes& data) {
-    link_.cmdPollStation(0x02, 'n');
-    commands_.running.Operation()->OnPollReply(replied, unit, kind, data);
-  });
-  RunToTheEnd();
-  ExpectFailure(
-      {"Error sending option command to the controller, Please retry", "Send Error", BoxIcon::kCritical});
-}
-
 TEST_F(Send, Refusals_AreShownAndStartNothing) {
   target_.port_chosen = false;
   commands_.send.Start();
