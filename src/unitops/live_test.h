@@ -95,7 +95,7 @@ class LiveTest {
   void OnRecordsReplaced();
   // "Use Slider to Test Intensity Values" was ticked or cleared.
   void OnSliderSends();
-  // The link has closed its port: everything stops where it is, and nothing is left unsent.
+  // The link has closed its port: everything stops where it is, and a position that still waits is dropped.
   void OnPortClosed() { StopAll(); }
   // A unit command is about to start: a sweep ends as by its button, and nothing is left unsent. False: that failed,
   // and the failure has been shown.

@@ -7,8 +7,6 @@
 namespace tendril::test {
 namespace {
 
-using testing::IsEmpty;
-
 class ChangeId : public CommandTest {
  protected:
   ChangeId() {

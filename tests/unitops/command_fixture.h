@@ -92,19 +92,10 @@ class CommandTest : public testing::Test {
   bool settled_at_the_box_ = false;
   ChosenTarget target_;
   ChannelTable working_;
-  std::function<bool()> on_starting_;
-  std::function<void()> on_replaced_;
-  UnitCommands commands_{link_,
-                         world_.time,
-                         world_.boxes,
-                         progress_,
-                         target_,
-                         working_,
-                         {.starting = [this] { return !on_starting_ || on_starting_(); },
-                          .replaced =
-                              [this] {
-                                if (on_replaced_) on_replaced_();
-                              }}};
+  std::function<bool()> on_starting_ = [] { return true; };
+  std::function<void()> on_replaced_ = [] {};
+  UnitCommands::Events events_{[this] { return on_starting_(); }, [this] { on_replaced_(); }};
+  UnitCommands commands_{link_, world_.time, world_.boxes, progress_, target_, working_, events_};
 };
 
 }  // namespace tendril::test

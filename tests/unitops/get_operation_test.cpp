@@ -1,7 +1,5 @@
 #include "unitops/get_operation.h"
 
-#include <vector>
-
 #include "command_fixture.h"
 #include "config/option_bytes.h"
 

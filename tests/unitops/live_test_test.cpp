@@ -132,7 +132,6 @@ TEST_F(Live, Sweep_StepsAndRestsToTheMillisecond) {
   world_.time.Advance(5000);
   EXPECT_EQ(unit.LivePosition(3), 150);
   EXPECT_EQ(test_.ShownPosition(), 1500);
-  EXPECT_FALSE(view_.captions[1]);
   EXPECT_EQ(world_.time.RunningTimers(), 0);
   EXPECT_EQ(unit.rejected_commands(), 0u);
 }
@@ -166,7 +165,6 @@ TEST_F(Live, Buttons_SwitchMoveAndReset) {
   test_.OnTestButton(4);
   world_.time.Advance(2000);
   EXPECT_THAT(SentPositions(), ElementsAre(150, 155, 160, 165, 150, 155, 152, 150));
-  EXPECT_EQ(sent_[1].mask, 4);
   EXPECT_EQ(sent_[2].mask, 128);
   EXPECT_THAT(pictures_.drawn, ElementsAre(1500, 1550, 1600, 1650, 1500, 1550, 1515, 1500));
 
@@ -224,7 +222,6 @@ TEST_F(Live, Slider_SpansTheVirtualRangeWithinTheStops) {
   expect_read_out(50, 128, 1003);  // 127.5, 1001 + 1.5
 
   expect({1000, 2000}, {1200, 1800}, 100, 200, {120});
-  expect({1000, 2000}, {1200, 1800}, 200, 200, {120});
   expect({1000, 2000}, {1200, 1790}, 1000, 790, {179});
   // 1205 would go out as 1200, and 1795 as 1800.
   expect({1000, 2000}, {1205, 1795}, 205, 206, {121});

@@ -156,16 +156,14 @@ TEST_F(PortSelectionTest, ListenerPort_IsThatOfThePreferencesAndMayBeNone) {
   EXPECT_EQ(socket.State(), TcpState::kConnected);
 }
 
-TEST(ControlPanelStart, Fault_IsShownAndTheProgramGoesOn) {
+TEST_F(PortSelectionTest, FaultOfTheClientAtTheStart_IsShown) {
   struct BrokenSocket final : public ScriptedSocket {
     void SetLocalPort(std::uint16_t /*port*/) override { throw RuntimeError(10050, "The network is down"); }
   };
-  SimulatedWorld world;
-  SimulatedControlPanel panel(world);
   BrokenSocket broken;
-  ControlPanel control_panel(world.time, world.boxes, broken, panel.registry, panel.processes);
+  ControlPanel control_panel(world_.time, world_.boxes, broken, panel_.registry, panel_.processes);
   control_panel.InitializeCommListenerInterface();
-  EXPECT_THAT(world.boxes.Take(),
+  EXPECT_THAT(world_.boxes.Take(),
               ElementsAre(BoxMessage{"Error in InitializeCommListenerInterface (10050): The network is down",
                                      "Tendril Configuration", BoxIcon::kNone}));
 }
