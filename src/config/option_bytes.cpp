@@ -35,13 +35,15 @@ std::variant<OptionBytes, InvalidRecord> EncodeOptions(const ChannelConfig& reco
     return Invalid("PortType", record.PortType, "output kind " + std::to_string(record.PortType));
   int flags = record.PortType + 1;
 
-  if (record.PowerUPOpt < kPowerUpDefault || record.PowerUPOpt > kPowerUpFirstCommand)
+  if (record.PowerUPOpt < kPowerUpDefault || record.PowerUPOpt > kPowerUpFirstCommand) {
     return Invalid("PowerUPOpt", record.PowerUPOpt, "power-up option " + std::to_string(record.PowerUPOpt));
+  }
   flags |= kPowerUpFlags[static_cast<std::size_t>(record.PowerUPOpt) - 1];
 
-  if (record.LostCommOption < kLostCommHold || record.LostCommOption > kLostCommStopPulse)
+  if (record.LostCommOption < kLostCommHold || record.LostCommOption > kLostCommStopPulse) {
     return Invalid("LostCommOption", record.LostCommOption,
                    "lost communications option " + std::to_string(record.LostCommOption));
+  }
   flags |= kLostCommFlags[static_cast<std::size_t>(record.LostCommOption) - 1];
 
   struct Width {

@@ -14,6 +14,7 @@ constexpr std::uint8_t kZeroChecksumMark = 0x80;
 
 Bytes BuildPacket(std::uint8_t unit, std::uint8_t code, std::span<const std::uint8_t> body) {
   Bytes packet{kFrameByte, unit, code};
+  packet.reserve(packet.size() + body.size() + 1);
   packet.insert(packet.end(), body.begin(), body.end());
   packet.push_back(kFrameByte);
   return packet;

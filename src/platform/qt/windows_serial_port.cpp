@@ -21,7 +21,7 @@ constexpr qint64 kMaxQueuedOutput = qint64{64} * 1024;
 class WindowsSerialPort final : public SerialPort {
  public:
   WindowsSerialPort(std::int32_t number, const std::filesystem::path& device, std::int32_t baud,
-                    const std::function<void()>& on_readable, const std::function<void()>& on_writable)
+                    std::function<void()> on_readable, std::function<void()> on_writable)
       : number_(number) {
     port_.setPortName(QString::fromStdString(device.string()));
     port_.setBaudRate(baud);
@@ -38,10 +38,12 @@ class WindowsSerialPort final : public SerialPort {
       }
     });
     // An error may be a loss, or none: QSerialPort does not distinguish them.
-    QObject::connect(&port_, &QSerialPort::errorOccurred, &port_, on_readable, Qt::QueuedConnection);
-    QObject::connect(&port_, &QSerialPort::bytesWritten, &port_, [this, on_writable] {
-      if (notify_writable_) on_writable();
-    });
+    QObject::connect(&port_, &QSerialPort::errorOccurred, &port_, std::move(on_readable),
+                     Qt::QueuedConnection);
+    QObject::connect(&port_, &QSerialPort::bytesWritten, &port_,
+                     [this, on_writable = std::move(on_writable)] {
+                       if (notify_writable_) on_writable();
+                     });
   }
   ~WindowsSerialPort() override {
     port_.disconnect();
@@ -98,7 +100,8 @@ class WindowsSerialPort final : public SerialPort {
 std::unique_ptr<SerialPort> OpenSerialPort(std::int32_t number, const std::filesystem::path& device,
                                            std::int32_t baud, std::function<void()> on_readable,
                                            std::function<void()> on_writable) {
-  return std::make_unique<WindowsSerialPort>(number, device, baud, on_readable, on_writable);
+  return std::make_unique<WindowsSerialPort>(number, device, baud, std::move(on_readable),
+                                             std::move(on_writable));
 }
 
 std::string DescribeSerialPort(const std::filesystem::path& device) {
