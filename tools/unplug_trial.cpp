@@ -13,11 +13,13 @@
 #include <atomic>
 #include <chrono>
 #include <csignal>
+#include <cstddef>
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
 #include <exception>
 #include <filesystem>
+#include <iterator>
 #include <optional>
 #include <random>
 #include <stdexcept>
@@ -225,6 +227,11 @@ class Trial {
   std::string wrong_;                        // this round
 };
 
+std::ptrdiff_t OpenDescriptors() {
+  return std::distance(std::filesystem::directory_iterator("/proc/self/fd"),
+                       std::filesystem::directory_iterator());
+}
+
 int Run(const QApplication& application) {
   QCommandLineParser parser;
   parser.addHelpOption();
@@ -241,9 +248,16 @@ int Run(const QApplication& application) {
   std::printf("seed %llu\n", static_cast<unsigned long long>(first));
   Trial trial;
   int failures = 0;
+  std::ptrdiff_t descriptors = 0;
   for (int round = 0; round < rounds; ++round) {
     failures += trial.Unplug(first + static_cast<std::uint64_t>(round)) ? 0 : 1;
     std::fflush(stdout);
+    if (round == static_cast<int>(kKinds.size())) descriptors = OpenDescriptors();
+  }
+  if (rounds > static_cast<int>(kKinds.size()) && OpenDescriptors() > descriptors) {
+    ++failures;
+    std::printf("%td file descriptors after each kind was unplugged once, %td at the end\n", descriptors,
+                OpenDescriptors());
   }
   std::printf("%d times unplugged, %d failures\n", rounds, failures);
   return failures == 0 && rounds > 0 ? EXIT_SUCCESS : EXIT_FAILURE;
