@@ -76,8 +76,9 @@ TEST_F(Send, BadlyBehavedUnits_EndWithTheirOutcome) {
     SCOPED_TRACE(fault);
     VirtualUnit& unit = Attach(fault, 0x05);
     Run(commands_.send);
+    const auto heard = unit.polls_heard();
     world_.bench.Detach(1, unit);
-    return unit.polls_heard();
+    return heard;
   };
   for (const char* fault : {"rambling", "slow", "deaf"}) {  // the last one to every second poll
     EXPECT_EQ(polls(fault), 8u);
