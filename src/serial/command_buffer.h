@@ -15,6 +15,8 @@ struct BufferedCommand {
   std::uint8_t code = 0;
   std::uint8_t intensity = 0;  // the command's intensity argument, 255 where it has none
   Bytes packet;
+  bool two_byte_circuit = false;
+  std::uint8_t special = 0;  // marker of the special effects
 };
 
 // Keeps commands by unit and circuit. Circuits are grouped in blocks of 16; each (unit, block) takes one of

@@ -186,9 +186,10 @@ class HwSerial {
   void OnPollEnd(HalfDuplexLine::PollResult result);
 
   // Hands a finished packet on: into the command buffer, or to XmitData. `circuit` is kUnitWide for commands
-  // that concern the whole unit; these are noted in the command log.
-  void SendCommand(std::uint8_t unit, std::int16_t circuit, std::uint8_t code, const Bytes& packet,
-                   std::uint8_t intensity = kNoIntensity);
+  // that concern the whole unit; these are noted in the command log. `intensity`, `two_byte_circuit` and `special`
+  // are kept with a buffered command.
+  void SendCommand(std::uint8_t unit, std::int16_t circuit, std::uint8_t code, std::uint8_t intensity,
+                   const Bytes& packet, bool two_byte_circuit = false, std::uint8_t special = 0);
   void SendLight(std::string_view trace, std::uint8_t unit, std::int16_t circuit, std::uint8_t code,
                  Bytes body, std::uint8_t intensity = kNoIntensity);
   // The one way out for packets: sends or collects.

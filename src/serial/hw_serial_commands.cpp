@@ -24,7 +24,7 @@ constexpr std::uint8_t kPollAfterSetAddress = 2;
 void HwSerial::SendUnlockCmd(std::uint8_t unit) {
   Traced("Trace: SendUnlockCmd", [&] {
     OpenPort();
-    SendCommand(unit, kUnitWide, kCodeUnlock, UnlockPacket(unit));
+    SendCommand(unit, kUnitWide, kCodeUnlock, kNoIntensity, UnlockPacket(unit));
   });
 }
 
@@ -32,7 +32,7 @@ void HwSerial::cmdSetAddress(std::uint8_t unit, std::uint8_t new_id, bool poll_a
   Traced("Trace: SetAddress", [&] {
     OpenPort();
     SendUnlockCmd(unit);
-    SendCommand(unit, kUnitWide, kCodeSetAddress, SetAddressPacket(unit, new_id));
+    SendCommand(unit, kUnitWide, kCodeSetAddress, kNoIntensity, SetAddressPacket(unit, new_id));
     if (poll_after) cmdPollStation(new_id, kPollAfterSetAddress);
   });
 }
@@ -52,12 +52,13 @@ void HwSerial::cmdSetManyOptions(std::uint8_t unit, std::int16_t circuit, std::u
     SendUnlockCmd(unit);
     Bytes body{b1, b2, b3, b4, b5};
     body.insert(body.end(), more.begin(), std::find(more.begin(), more.end(), 0));
-    SendCommand(unit, circuit, kCodeSetOption, BuildChecksummedPacket(unit, kCodeSetOption, body));
+    SendCommand(unit, circuit, kCodeSetOption, kNoIntensity,
+                BuildChecksummedPacket(unit, kCodeSetOption, body));
   });
 }
 
-void HwSerial::SendCommand(std::uint8_t unit, std::int16_t circuit, std::uint8_t code, const Bytes& packet,
-                           std::uint8_t intensity) {
+void HwSerial::SendCommand(std::uint8_t unit, std::int16_t circuit, std::uint8_t code, std::uint8_t intensity,
+                           const Bytes& packet, bool two_byte_circuit, std::uint8_t special) {
   Traced("Trace: SendCommand", [&] {
     if (circuit >= kCircuitLimit) {
       XmitData(packet);
@@ -66,7 +67,7 @@ void HwSerial::SendCommand(std::uint8_t unit, std::int16_t circuit, std::uint8_t
     }
     if (command_buffering_) {
       if (code >= kFirstBufferedCode && code <= kLastBufferedCode) {
-        command_buffer_.Store(unit, circuit, {code, intensity, packet});
+        command_buffer_.Store(unit, circuit, {code, intensity, packet, two_byte_circuit, special});
         return;
       }
       command_buffer_.Clear(unit, circuit);

@@ -12,13 +12,16 @@ namespace {
   throw RuntimeError(kErrUnsupported, std::string(what) + " is not supported");
 }
 
+bool TakesTwoBytes(std::int16_t circuit) { return circuit >= kFirstTwoByteCircuit; }
+
 }  // namespace
 
 void HwSerial::SendLight(std::string_view trace, std::uint8_t unit, std::int16_t circuit, std::uint8_t code,
                          Bytes body, std::uint8_t intensity) {
   Traced(trace, [&] {
     OpenPort();
-    SendCommand(unit, circuit, code, LightPacket(unit, code, std::move(body), circuit), intensity);
+    SendCommand(unit, circuit, code, intensity, LightPacket(unit, code, std::move(body), circuit),
+                TakesTwoBytes(circuit));
   });
 }
 
@@ -41,7 +44,8 @@ void HwSerial::cmdFade(std::uint8_t unit, std::int16_t circuit, std::uint8_t tim
     const std::uint8_t first = EncodeIntensity(from);
     const std::uint8_t last = EncodeIntensity(to);
     const auto [high, low] = EncodeFadeRate(first, last, time);
-    SendCommand(unit, circuit, kCodeFade, LightPacket(unit, kCodeFade, {first, last, high, low}, circuit));
+    SendCommand(unit, circuit, kCodeFade, kNoIntensity,
+                LightPacket(unit, kCodeFade, {first, last, high, low}, circuit), TakesTwoBytes(circuit));
   });
 }
 

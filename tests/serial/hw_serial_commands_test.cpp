@@ -83,6 +83,8 @@ TEST_F(HwSerialCommands, Buffering_KeepsTheNewestLightCommandOfACircuit) {
   EXPECT_EQ(slots.at({5, 1}).at(17).code, 4);
   EXPECT_EQ(slots.at({5, 1}).at(17).intensity, 255);
   EXPECT_EQ(slots.at({5, 6}).at(100).intensity, 25);
+  EXPECT_FALSE(slots.at({5, 1}).at(17).two_byte_circuit);
+  EXPECT_TRUE(slots.at({5, 6}).at(100).two_byte_circuit);
 
   // Another code clears the circuit's entry, if it has one, and goes out.
   for (const int circuit : {-1, 18, 900, 17}) {
