@@ -25,7 +25,7 @@ constexpr std::int32_t kSummaryScreenMs = 20;
 
 frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes,
                                      ControlPanel& control_panel, const Version& version)
-    : QWidget((InstallAccessibleControls(), nullptr)),
+    : QMainWindow((InstallAccessibleControls(), nullptr)),
       link_(link),
       timers_(timers),
       control_panel_(control_panel),
@@ -67,7 +67,8 @@ void frmNewServoConfig::LayOut() {
   scroll->setFrameShape(QFrame::NoFrame);
   scroll->setWidgetResizable(true);
   scroll->setFocusPolicy(Qt::NoFocus);
-  AddLayout<QVBoxLayout>(this, {})->addWidget(scroll);
+  setCentralWidget(scroll);
+  setStatusBar(status_);
 
   auto* content = new QWidget;
   scroll->setWidget(content);
@@ -287,7 +288,7 @@ bool frmNewServoConfig::eventFilter(QObject* object, QEvent* event) {
     object->removeEventFilter(this);
     QTimer::singleShot(0, &connections_, [this] { MakeSummary(); });
   }
-  return QWidget::eventFilter(object, event);
+  return QMainWindow::eventFilter(object, event);
 }
 
 void frmNewServoConfig::MakeSummary() {

@@ -1,10 +1,10 @@
 // frmNewServoConfig: the program's window.
 #pragma once
 
+#include <QMainWindow>
 #include <QObject>
 #include <QPointer>
 #include <QStackedWidget>
-#include <QWidget>
 #include <cstddef>
 #include <cstdint>
 #include <memory>
@@ -26,6 +26,7 @@
 #include "ui/motion_parameters.h"
 #include "ui/progress_area.h"
 #include "ui/simulators.h"
+#include "ui/status_line.h"
 #include "ui/summary_area.h"
 #include "unitops/control_panel.h"
 #include "unitops/live_test.h"
@@ -43,7 +44,7 @@ struct Version {
 };
 
 // Lays out the areas, connects them with the program's operations, and runs start-up and shutdown.
-class frmNewServoConfig : public QWidget {
+class frmNewServoConfig : public QMainWindow {
  public:
   // Everything handed in must outlive the window. `link` and `control_panel` must have no other user.
   frmNewServoConfig(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes, ControlPanel& control_panel,
@@ -98,6 +99,7 @@ class frmNewServoConfig : public QWidget {
   ChannelChoices* choices_ = new ChannelChoices(channel_editor_, working_);
   LiveTestArea* live_test_area_ = new LiveTestArea(*parameters_);
   QStackedWidget* views_ = new QStackedWidget;
+  StatusLine* status_ = new StatusLine;
   ActualsFrame* actuals_;
   SummaryArea* summary_ = nullptr;  // made after the first paint, or when it is first needed
 
