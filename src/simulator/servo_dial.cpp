@@ -13,13 +13,6 @@ namespace {
 
 constexpr double kMicrosecondsPerDegree = 10.0;
 
-constexpr DialColour kArmFill = 0x0000FF;
-constexpr DialColour kRangeFill = 0x80FFFF;
-constexpr DialColour kLimitFill = 0x00C0C0;
-constexpr DialColour kStopsFill = 0xFFC0C0;
-constexpr DialColour kNeutralFill = 0x000000;
-constexpr DialColour kDefaultFill = 0xC0C0FF;
-constexpr DialColour kDefaultOutline = 0xFFFFFF;
 constexpr DialColour kBodyFill = 0xE0E0E0;
 constexpr DialColour kInnerBodyFill = 0xD0D0D0;
 

@@ -19,6 +19,13 @@ inline constexpr double kDialPi = 3.141592653238;
 
 // A colour as 0x00BBGGRR.
 using DialColour = std::uint32_t;
+inline constexpr DialColour kArmFill = 0x0000FF;
+inline constexpr DialColour kRangeFill = 0x80FFFF;
+inline constexpr DialColour kLimitFill = 0x00C0C0;
+inline constexpr DialColour kStopsFill = 0xFFC0C0;
+inline constexpr DialColour kNeutralFill = 0x000000;
+inline constexpr DialColour kDefaultFill = 0xC0C0FF;
+inline constexpr DialColour kDefaultOutline = 0xFFFFFF;
 inline constexpr DialColour kBodyOutline = 0x707070;
 inline constexpr DialColour kSelectedBackground = 0xFF0000;  // blue
 

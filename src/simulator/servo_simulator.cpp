@@ -23,11 +23,6 @@ constexpr double kMinTextPixels = 7;
 constexpr double kPlateRadius = 2;
 constexpr double kPlateOutline = 1;
 
-QColor ToColour(DialColour colour) {
-  return QColor(static_cast<int>(colour & 0xFF), static_cast<int>(colour >> 8 & 0xFF),
-                static_cast<int>(colour >> 16 & 0xFF));
-}
-
 QPointF ToPoint(DialPoint point) { return {point.x, point.y}; }
 
 QSize SquareFor(const DialSizes& sizes, int small, int medium, int normal) {
@@ -201,6 +196,11 @@ class ServoAccessible : public QAccessibleWidget, public QAccessibleValueInterfa
 };
 
 }  // namespace
+
+QColor ToColour(DialColour colour) {
+  return QColor(static_cast<int>(colour & 0xFF), static_cast<int>(colour >> 8 & 0xFF),
+                static_cast<int>(colour >> 16 & 0xFF));
+}
 
 ServoSimulator::ServoSimulator(QWidget* parent)
     : QAbstractButton(parent), announced_pulse_(dial_.arm_pulse()) {

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <QAbstractButton>
+#include <QColor>
 #include <QString>
 #include <cstdint>
 
@@ -10,6 +11,9 @@
 class QPainter;
 
 namespace tendril {
+
+// `colour` as Qt has it.
+QColor ToColour(DialColour colour);
 
 // Shows one servo channel as a picture. The operations below set what it shows, in degrees (0 straight up, positive to
 // the right) or in microseconds (a longer pulse turns the arm left). Operations that convert raise
