@@ -100,7 +100,7 @@ class MeasuredWindow {
   Registry registry_{*registry_store_, {}};
   const std::unique_ptr<ProcessList> processes_ = OpenProcessList();
   ControlPanel control_panel_{platform_.timers, platform_.boxes, wsCLI_, registry_, *processes_};
-  frmNewServoConfig window_{link_, platform_.timers, platform_.boxes, control_panel_, {1, 0, 0}};
+  frmNewServoConfig window_{link_, platform_.timers, platform_.boxes, control_panel_, {{1, 0, 0}, {}, {}}};
 };
 
 }  // namespace tendril

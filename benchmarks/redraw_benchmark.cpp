@@ -89,7 +89,7 @@ class EditedWindow : public QObject {
   test::SimulatedWorld world_;
   HwSerial link_{*world_.device, world_.time, world_.time, world_.log};
   test::SimulatedControlPanel panel_{world_};
-  frmNewServoConfig window_{link_, world_.time, world_.boxes, panel_.control_panel, {1, 0, 0}};
+  frmNewServoConfig window_{link_, world_.time, world_.boxes, panel_.control_panel, {{1, 0, 0}, {}, {}}};
   std::vector<ServoSimulator*> servos_;
   std::set<QObject*> painted_;  // the servos, since the last step began
   bool any_painted_ = false;

@@ -26,6 +26,8 @@ VirtualPorts& AddPorts(VirtualPorts& ports) {
   return ports;
 }
 
+QString DemoLog(const QTemporaryDir& scratch) { return scratch.filePath(QStringLiteral("HUtest.txt")); }
+
 }  // namespace
 
 DemoBench::DemoBench(QtPlatform& platform)
@@ -47,9 +49,10 @@ DemoBench::DemoBench(QtPlatform& platform)
 }
 
 DemoProgram::DemoProgram()
-    : log(std::filesystem::path(scratch.filePath(QStringLiteral("HUtest.txt")).toStdString())),
+    : log(std::filesystem::path(DemoLog(scratch).toStdString())),
       wsCLI(bench.panel, kListenerPort, platform.timers),
-      window(Serial1, platform.timers, platform.boxes, control_panel, kVersion) {
+      window(Serial1, platform.timers, platform.boxes, control_panel,
+             {kVersion, DemoLog(scratch), QStringLiteral("in memory")}) {
   platform.boxes.SetParent(&window);
 }
 

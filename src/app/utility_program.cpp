@@ -1,5 +1,6 @@
 #include "app/utility_program.h"
 
+#include <QFile>
 #include <QLoggingCategory>
 #include <string>
 
@@ -18,6 +19,8 @@ void Trace(const std::string& line) { qCDebug(serial_trace, "%s", line.c_str());
 
 void Warn(const std::string& line) { qCWarning(preferences, "%s", line.c_str()); }
 
+QString PathText(const std::filesystem::path& path) { return QFile(path).fileName(); }
+
 }  // namespace
 
 UtilityProgram::UtilityProgram()
@@ -29,7 +32,8 @@ UtilityProgram::UtilityProgram()
       registry(*registry_store, Warn),
       processes(OpenProcessList()),
       control_panel(platform.timers, platform.boxes, wsCLI, registry, *processes),
-      window(Serial1, platform.timers, platform.boxes, control_panel, kVersion) {
+      window(Serial1, platform.timers, platform.boxes, control_panel,
+             {kVersion, PathText(CommandLogPath()), PathText(RegistryPath())}) {
   Serial1.SetTraceSink(Trace);
   Serial1.SetTraceOutput(serial_trace().isDebugEnabled());
   platform.boxes.SetParent(&window);

@@ -16,4 +16,7 @@ std::filesystem::path StateFolder();
 // The log of unit-wide commands, a text file. Neither it nor its folder is created.
 std::filesystem::path CommandLogPath();
 
+// The registry. Windows: the key of the program's maker. Linux, macOS: a file in the configuration folder, not created.
+std::filesystem::path RegistryPath();
+
 }  // namespace tendril

@@ -24,11 +24,12 @@ constexpr std::int32_t kSummaryScreenMs = 20;
 }  // namespace
 
 frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes,
-                                     ControlPanel& control_panel, const Version& version)
+                                     ControlPanel& control_panel, const ProgramInfo& info)
     : QMainWindow((InstallAccessibleControls(), nullptr)),
       link_(link),
       timers_(timers),
       control_panel_(control_panel),
+      info_(info),
       ports_(link, boxes, control_panel),
       actuals_(new ActualsFrame(timers, *this)),
       commands_(link, timers, boxes, *progress_, *connection_, working_,
@@ -49,7 +50,7 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
   setObjectName("frmNewServoConfig");
   LayOut();
   Connect();
-  StartUp(version);
+  StartUp();
 }
 
 frmNewServoConfig::~frmNewServoConfig() {
@@ -123,11 +124,8 @@ void frmNewServoConfig::Connect() {
   ports_.SetOpeningHandler([this] { live_test_.OnTestButton(LiveTest::kNoButton); });
 }
 
-void frmNewServoConfig::StartUp(const Version& version) {
-  setWindowTitle(QStringLiteral("Kelvane Tendril Utility v%1.%2.%3")
-                     .arg(version.major_number)
-                     .arg(version.minor_number)
-                     .arg(version.revision));
+void frmNewServoConfig::StartUp() {
+  setWindowTitle(QStringLiteral("Kelvane Tendril Utility v") + info_.version.Text());
   for (std::size_t channel = 0; channel < kPortCount; ++channel)
     SetFromPreset(kPresets[kStartPreset], working_.At(channel));
   remarks_.AcceptRecords();

@@ -24,6 +24,7 @@
 #include "ui/model/channel_editor.h"
 #include "ui/model/record_remarks.h"
 #include "ui/motion_parameters.h"
+#include "ui/program_info.h"
 #include "ui/progress_area.h"
 #include "ui/simulators.h"
 #include "ui/status_line.h"
@@ -36,19 +37,12 @@
 
 namespace tendril {
 
-// The program's version, "major.minor.revision".
-struct Version {
-  int major_number;
-  int minor_number;
-  int revision;
-};
-
 // Lays out the areas, connects them with the program's operations, and runs start-up and shutdown.
 class frmNewServoConfig : public QMainWindow {
  public:
   // Everything handed in must outlive the window. `link` and `control_panel` must have no other user.
   frmNewServoConfig(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes, ControlPanel& control_panel,
-                    const Version& version);
+                    const ProgramInfo& info);
   ~frmNewServoConfig() override;
 
   // The records that are edited, sent and shown.
@@ -61,7 +55,7 @@ class frmNewServoConfig : public QMainWindow {
  private:
   void LayOut();
   void Connect();
-  void StartUp(const Version& version);
+  void StartUp();
   void SelectChannel(std::size_t channel);
   void ShowEditor();
   void OnEdited(FollowUp follow_up);
@@ -83,6 +77,7 @@ class frmNewServoConfig : public QMainWindow {
   HwSerial& link_;
   TimerFactory& timers_;
   ControlPanel& control_panel_;
+  const ProgramInfo info_;
   ChannelTable working_;
   ChannelEditor channel_editor_{working_};
   RecordRemarks remarks_{working_, channel_editor_};

@@ -45,7 +45,7 @@ Simulation::Simulation(std::uint64_t seed, bool narrate)
   SetUpWorld();
   device_.on_write = [this](std::span<const std::uint8_t> bytes) { OnWritten(bytes); };
   window_ = std::make_unique<frmNewServoConfig>(link_, world_.time, world_.boxes, panel_.control_panel,
-                                                Version{1, 0, 0});
+                                                ProgramInfo{{1, 0, 0}, {}, {}});
   records_ = window_->WorkingConfiguration();
   auto program = link_.SetPollReplyHandler({});
   link_.SetPollReplyHandler(

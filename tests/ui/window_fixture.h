@@ -107,8 +107,10 @@ class Window : public testing::Test {
   SimulatedWorld world_;
   SimulatedControlPanel panel_{world_};
   HwSerial link_{*world_.device, world_.time, world_.time, world_.log};
-  std::unique_ptr<frmNewServoConfig> window_ = std::make_unique<frmNewServoConfig>(
-      link_, world_.time, world_.boxes, panel_.control_panel, Version{3, 2, 1});
+  const ProgramInfo info_{
+      {3, 2, 1}, QStringLiteral("/log/HUtest.txt"), QStringLiteral("/config/registry.reg")};
+  std::unique_ptr<frmNewServoConfig> window_ =
+      std::make_unique<frmNewServoConfig>(link_, world_.time, world_.boxes, panel_.control_panel, info_);
 };
 
 }  // namespace tendril::test

@@ -32,4 +32,6 @@ fs::path StateFolder() { return BaseFolder("XDG_STATE_HOME", ".local/state") / "
 
 fs::path CommandLogPath() { return StateFolder() / "HUtest.txt"; }
 
+fs::path RegistryPath() { return ConfigFolder() / "registry.reg"; }
+
 }  // namespace tendril

@@ -7,8 +7,7 @@
 namespace tendril {
 
 std::unique_ptr<RegistryStore> OpenSystemRegistry(const WarningSink& warn) {
-  const std::filesystem::path path = ConfigFolder() / "registry.reg";
-  return std::make_unique<RegistryFile>(QFile::decodeName(path.c_str()), warn);
+  return std::make_unique<RegistryFile>(QFile(RegistryPath()).fileName(), warn);
 }
 
 }  // namespace tendril

@@ -1,0 +1,51 @@
+// What the help menu opens: the facts about the program, and the manual.
+#include <QClipboard>
+#include <QDesktopServices>
+#include <QLineEdit>
+#include <QPushButton>
+#include <QTextBrowser>
+
+#include "ui/about_dialog.h"
+#include "ui/manual.h"
+#include "window_fixture.h"
+
+namespace tendril::test {
+namespace {
+
+using testing::HasSubstr;
+
+TEST_F(Window, About_CopiesEveryFactThatItShows) {
+  ShowAbout(*window_, info_);
+  auto& about = Find<QDialog>("aboutDialog");
+  for (auto* button : about.findChildren<QPushButton*>())
+    if (button->toolTip().startsWith(QStringLiteral("Copies"))) button->click();
+  const std::string copied = QGuiApplication::clipboard()->text().toStdString();
+  EXPECT_THAT(copied, HasSubstr("Version: 3.2.1\nQt: " QT_VERSION_STR));
+  EXPECT_THAT(copied, HasSubstr("/log/HUtest.txt\nRegistry: /config/registry.reg"));
+  EXPECT_EQ(about.findChildren<QLineEdit*>().size(), 6);
+  for (auto* fact : about.findChildren<QLineEdit*>()) {
+    const QString name = QAccessible::queryAccessibleInterface(fact)->text(QAccessible::Name);
+    EXPECT_THAT(copied, HasSubstr((name + QStringLiteral(": ") + fact->text() + u'\n').toStdString()));
+    EXPECT_TRUE(fact->isReadOnly() && fact->focusPolicy() == Qt::StrongFocus);
+  }
+  QTest::keyClick(&about, Qt::Key_Escape);
+  EXPECT_FALSE(about.isVisible());
+  ShowAbout(*window_, info_);
+  EXPECT_TRUE(about.isVisible()) << "the same dialog";
+}
+
+TEST_F(Window, Manual_IsOpenedOrTheUserSeesWhereItIs) {
+  QTextBrowser viewer;
+  QDesktopServices::setUrlHandler(QStringLiteral("file"), &viewer, "setSource");
+  OpenManual(world_.boxes);
+  EXPECT_TRUE(world_.boxes.Take().empty());
+  EXPECT_THAT(viewer.toPlainText().toStdString(), HasSubstr("SEND(write) Configuration"));
+
+  QDesktopServices::unsetUrlHandler(QStringLiteral("file"));
+  OpenManual(world_.boxes);  // this platform opens nothing
+  ASSERT_EQ(world_.boxes.shown.size(), 1u);
+  EXPECT_THAT(world_.boxes.shown[0].text, HasSubstr(viewer.source().toLocalFile().toStdString()));
+}
+
+}  // namespace
+}  // namespace tendril::test
