@@ -6,8 +6,8 @@
 namespace tendril {
 namespace {
 
-// Eight of them fit into a window 1024 wide.
-constexpr QSize kSmallestSimulator(96, 96);
+// Eight of them fit into a window 910 wide, and all of a window 700 high.
+constexpr QSize kSmallestSimulator(80, 80);
 
 // The same background as that of a selected servo.
 constexpr char kSelectedOutput[] =

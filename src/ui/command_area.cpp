@@ -5,11 +5,17 @@
 #include "ui/controls.h"
 
 namespace tendril {
+namespace {
+
+constexpr int kApart = 24;  // between the commands that come often and the one that gives a unit another ID
+constexpr double kSmallType = 0.85;
+
+}  // namespace
 
 CommandArea::CommandArea()
     : cmdSend_(Named(new QPushButton(QStringLiteral("&SEND(write) Configuration")), "Command3_0")),
       cmdGet_(Named(new QPushButton(QStringLiteral("&GET(read) Configuration")), "Command3_1")),
-      cmdChangeId_(Named(new QPushButton(QStringLiteral("&UPDATE Unit_ID")), "Command3_2")),
+      cmdChangeId_(Named(new QPushButton(QStringLiteral("UPDATE Unit_ID")), "Command3_2")),
       cmdShowSummary_(Named(new QPushButton(QStringLiteral("Summar&y")), "cmdShowSummary")) {
   Describe(cmdSend_, kSendTip);
   Describe(cmdGet_, kGetTip);
@@ -24,7 +30,9 @@ CommandArea::CommandArea()
 
   auto* frame = Named(new FrameBox(QStringLiteral("Unit")), "frmUpDownLoad");
   auto* commands = AddLayout<QHBoxLayout>(frame, {7, 4, 7, 6}, 5);
-  for (QPushButton* button : {cmdSend_, cmdGet_, cmdChangeId_}) commands->addWidget(button);
+  for (QPushButton* button : {cmdSend_, cmdGet_}) commands->addWidget(button);
+  commands->addSpacing(kApart);
+  commands->addWidget(cmdChangeId_);
 
   // Without function.
   auto* write = Named(new QPushButton(QStringLiteral("Export Config")), "cmdWriteConfig");
@@ -38,8 +46,10 @@ CommandArea::CommandArea()
   row->addWidget(cmdShowSummary_, 0, Qt::AlignVCenter);
   auto* files = new QVBoxLayout;
   files->setSpacing(3);
-  files->addWidget(write);
-  files->addWidget(read);
+  for (QPushButton* file : {write, read}) {
+    ScaleType(file, kSmallType);
+    files->addWidget(file);
+  }
   row->addLayout(files);
 }
 

@@ -8,6 +8,9 @@ namespace tendril {
 namespace {
 
 constexpr int kDigits = 16;
+// Every ID in between can be given to a unit and be polled.
+constexpr int kFirstId = 0x01;
+constexpr int kLastId = 0xFD;
 constexpr int kLongestPortLine = 7;  // "Comm 25"
 
 }  // namespace
@@ -78,6 +81,17 @@ void ConnectionArea::RereadCommPorts() {
     for (const int role : {Qt::ToolTipRole, Qt::AccessibleDescriptionRole})
       cmbNYX_->setItemData(static_cast<int>(entry), device, role);
   }
+}
+
+void ConnectionArea::StepUnitId(int by) {
+  int id = UnitId() + by;
+  if (id < kFirstId || (id > kLastId && by < 0)) {
+    id = kLastId;
+  } else if (id > kLastId) {
+    id = kFirstId;
+  }
+  CmbUnitID_[0]->setCurrentIndex(id / kDigits);
+  CmbUnitID_[1]->setCurrentIndex(id % kDigits);
 }
 
 void ConnectionArea::EnableControls(const QString& running_command) {

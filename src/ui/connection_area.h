@@ -25,6 +25,8 @@ class ConnectionArea : public QWidget, public UnitTarget {
 
   // Fills the list of comm ports and selects "Select", which opens nothing.
   void ListCommPorts();
+  // Chooses the next ID (`by` = 1) or the previous one (-1), from 01 to FD; the last one and the first one are neighbours.
+  void StepUnitId(int by);
   // Enables the controls. `running_command` is what runs; empty when nothing does.
   void EnableControls(const QString& running_command);
 

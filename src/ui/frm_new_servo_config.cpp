@@ -11,6 +11,7 @@
 
 #include "ui/accessible_controls.h"
 #include "ui/freeze.h"
+#include "ui/wrapping_row.h"
 
 namespace tendril {
 namespace {
@@ -74,10 +75,7 @@ void frmNewServoConfig::LayOut() {
   auto* content = new QWidget;
   scroll->setWidget(content);
   auto* column = AddLayout<QVBoxLayout>(content, {8, 4, 8, 8}, 4);
-  auto* top = new QHBoxLayout;
-  top->addWidget(connection_);
-  top->addWidget(command_area_, 1);
-  column->addLayout(top);
+  column->addWidget(new WrappingRow(connection_, command_area_));
   auto* boxes_or_progress = new QStackedLayout;
   column->addLayout(boxes_or_progress);
   progress_->SharePlace(*boxes_or_progress, apply_boxes_);
@@ -95,6 +93,7 @@ void frmNewServoConfig::LayOut() {
   simulator_column->addWidget(channels_, 1);
   simulator_column->addWidget(editor, 3);
   simulator_column->addWidget(live_test_area_);
+  setMenuBar(menu_ = new MainMenu(*this));
 }
 
 void frmNewServoConfig::Connect() {
@@ -119,6 +118,14 @@ void frmNewServoConfig::Connect() {
     EnableControls();
     live_test_.OnSliderSends();
   });
+  connect(live_test_area_, &LiveTestArea::SweepChanged, c, [this] { EnableControls(); });
+  connect(menu_, &MainMenu::ChannelChosen, c, [this](std::size_t channel) {
+    CommitTyping();
+    SelectChannel(channel);
+  });
+  connect(menu_, &MainMenu::IdStepped, c, [this](int by) { connection_->StepUnitId(by); });
+  connect(menu_, &MainMenu::SimulatorChosen, c, [this] { ShowConfig(); });
+  connect(menu_, &MainMenu::KeysChosen, c, [this] { ShowKeys(); });
   commands_.running.SetObserver([this] { ShowRunning(); });
   link_.SetPortClosedHandler([this] { live_test_.OnPortClosed(); });
   ports_.SetOpeningHandler([this] { live_test_.OnTestButton(LiveTest::kNoButton); });
@@ -236,6 +243,7 @@ void frmNewServoConfig::OnSummaryScreen() {
   live_test_.OnRecordsReplaced();  // the records may have changed
   views_->setCurrentWidget(summary_);
   command_area_->ShowSummaryButton(false);
+  menu_->ShowView(true);
   apply_boxes_->ShowEditing(false);
   summary_->TakeFocus();
   ShowRemarks();
@@ -246,6 +254,7 @@ void frmNewServoConfig::ShowConfig() {
   summary_->CloseNumberEntry();
   views_->setCurrentIndex(0);
   command_area_->ShowSummaryButton(true);
+  menu_->ShowView(false);
   apply_boxes_->ShowEditing(true);
   if (focus_before_summary_) focus_before_summary_->setFocus();
   OnReplaced();  // the summary has changed the records
@@ -277,7 +286,14 @@ void frmNewServoConfig::EnableControls() {
   connection_->EnableControls(running_command);
   command_area_->EnableCommands(running_command, connection_->UnitId());
   live_test_area_->EnableControls(running_command);
+  menu_->EnableIdSteps(running_command.isEmpty() && !live_test_area_->Moves());
   if (summary_ != nullptr) summary_->EnableCommands(running_command);
+}
+
+void frmNewServoConfig::ShowKeys() {
+  if (keys_ == nullptr) keys_ = new KeysDialog(*menu_, this);
+  keys_->show();
+  keys_->activateWindow();
 }
 
 // The summary has more controls than everything else. The window is painted first.

@@ -20,7 +20,9 @@
 #include "ui/chosen_servo.h"
 #include "ui/command_area.h"
 #include "ui/connection_area.h"
+#include "ui/keys_dialog.h"
 #include "ui/live_test_area.h"
+#include "ui/main_menu.h"
 #include "ui/model/channel_editor.h"
 #include "ui/model/record_remarks.h"
 #include "ui/motion_parameters.h"
@@ -73,6 +75,7 @@ class frmNewServoConfig : public QMainWindow {
   bool SummaryShown() const;
   void ShowRunning();
   void EnableControls();
+  void ShowKeys();
 
   HwSerial& link_;
   TimerFactory& timers_;
@@ -95,6 +98,8 @@ class frmNewServoConfig : public QMainWindow {
   LiveTestArea* live_test_area_ = new LiveTestArea(*parameters_);
   QStackedWidget* views_ = new QStackedWidget;
   StatusLine* status_ = new StatusLine;
+  MainMenu* menu_ = nullptr;
+  KeysDialog* keys_ = nullptr;  // made when it is first opened
   ActualsFrame* actuals_;
   SummaryArea* summary_ = nullptr;  // made after the first paint, or when it is first needed
 

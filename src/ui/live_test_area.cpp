@@ -69,6 +69,13 @@ void LiveTestArea::EnableControls(const QString& running_command) {
                          : running_command);
 }
 
+void LiveTestArea::ShowTestRunning(int button, bool running) {
+  tests_.ShowTestRunning(button, running);
+  if (running == (running_test_ == button)) return;
+  running_test_ = running ? std::optional(button) : std::nullopt;
+  Q_EMIT SweepChanged();
+}
+
 void LiveTestArea::SetSlider(int value) {
   const QSignalBlocker silent(HScrollSendServoPosition_);
   HScrollSendServoPosition_->setValue(value);

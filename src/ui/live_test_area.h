@@ -6,6 +6,7 @@
 #include <QSlider>
 #include <QString>
 #include <array>
+#include <optional>
 
 #include "ui/controls.h"
 #include "ui/motion_parameters.h"
@@ -24,7 +25,10 @@ class LiveTestArea : public FrameBox, public LiveTestView {
   // Enables slider and test buttons. `running_command` is what runs; empty when nothing does.
   void EnableControls(const QString& running_command);
 
-  void ShowTestRunning(int button, bool running) override { tests_.ShowTestRunning(button, running); }
+  // Whether something moves the servo, or can: a sweep, or the slider while its box is ticked.
+  bool Moves() const { return running_test_ || SliderSends(); }
+
+  void ShowTestRunning(int button, bool running) override;
   int SliderValue() const override { return HScrollSendServoPosition_->value(); }
   void SetSlider(int value) override;
   void ShowReadOut(const SliderReadOut& read_out) override;
@@ -36,6 +40,8 @@ class LiveTestArea : public FrameBox, public LiveTestView {
   void SliderMoved();
   // "Use Slider to Test Intensity Values" was ticked or cleared.
   void SliderSendsChanged();
+  // A sweep has begun or ended.
+  void SweepChanged();
 
  protected:
   void changeEvent(QEvent* event) override;
@@ -44,6 +50,7 @@ class LiveTestArea : public FrameBox, public LiveTestView {
   void ColourWarning();
 
   MotionParameters& tests_;
+  std::optional<int> running_test_;
   QLabel* warning_;
   QSlider* HScrollSendServoPosition_;
   QCheckBox* chkSendSlideCommands_;

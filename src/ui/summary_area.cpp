@@ -17,10 +17,12 @@ constexpr int kValueColumn = 2;
 constexpr int kPowerUpColumn = 7;
 constexpr int kLostCommColumn = 10;
 constexpr int kLastColumn = 14;
-constexpr int kEdgeWidth = 4;
-constexpr int kChannelWidth = 56;
-constexpr int kValueWidth = 70;
-constexpr int kOptionWidth = 74;
+constexpr int kEdgeWidth = 2;
+constexpr int kChannelWidth = 52;
+constexpr int kValueWidth = 73;
+constexpr int kOptionWidth = 59;
+constexpr int kSpacing = 3;
+constexpr double kOptionType = 0.85;  // of the captions' type size
 
 // Lines: two of the header, the channels, the trailer.
 constexpr int kHeaderLines = 2;
@@ -46,11 +48,11 @@ struct Option {
 };
 constexpr std::array<Option, 7> kOptions{{{"Move to\nDefault\nPosition", "optSumPUDefault"},
                                           {"Move to\nNeutral\nPosition", "optSumPUNeutral"},
-                                          {"Start Pulse\non First\nCommand", "optSumPUFirstCmd"},
+                                          {"Start\nPulse on\nFirst\nCommand", "optSumPUFirstCmd"},
                                           {"Hold at\nCurrent\nPosition", "optSumLCcurrent"},
                                           {"Move to\nDefault\nPosition", "optSumLCdefault"},
                                           {"Move to\nNeutral\nPosition", "optSumLCneutral"},
-                                          {"Stop Pulse /\nStart on First\nCommand", "optSumLCfirstcmd"}}};
+                                          {"Stop Pulse\n/ Start on\nFirst\nCommand", "optSumLCfirstcmd"}}};
 
 QString OnOneLine(const char* caption) {
   return QString::fromUtf8(caption).replace(QLatin1Char('\n'), QLatin1Char(' '));
@@ -59,7 +61,7 @@ QString OnOneLine(const char* caption) {
 // Fixed columns, whatever they contain.
 void SetUpColumns(QGridLayout& table) {
   table.setContentsMargins(0, 0, 0, 0);
-  table.setHorizontalSpacing(4);
+  table.setHorizontalSpacing(kSpacing);
   table.setColumnMinimumWidth(0, kEdgeWidth);
   table.setColumnMinimumWidth(kLastColumn, kEdgeWidth);
   table.setColumnMinimumWidth(kChannelColumn, kChannelWidth);
@@ -100,6 +102,20 @@ QLabel* MakeCaption(const char* text) {
   caption->setAlignment(Qt::AlignHCenter | Qt::AlignBottom);
   LeaveWidthToColumn(caption);
   return caption;
+}
+
+// Adds the captions of the options to a line of the table.
+std::array<QLabel*, kOptions.size()> AddOptionCaptions(QGridLayout& table, int line,
+                                                       Qt::Alignment vertically) {
+  std::array<QLabel*, kOptions.size()> captions{};
+  for (std::size_t i = 0; i < kOptions.size(); ++i) {
+    auto* caption = captions[i] = new QLabel(QString::fromUtf8(kOptions[i].caption));
+    caption->setAlignment(Qt::AlignHCenter | vertically);
+    ScaleType(caption, kOptionType);
+    LeaveWidthToColumn(caption);
+    table.addWidget(caption, line, kPowerUpColumn + static_cast<int>(i));
+  }
+  return captions;
 }
 
 }  // namespace
@@ -144,10 +160,11 @@ void SummaryArea::AddHeader(QGridLayout& table) {
   AddFrame(table, Named(new QFrame, "frmSumHeader"), 0, kHeaderLines);
   table.addWidget(MakeCaption("Actual Motion Parameters in µs"), 0, kValueColumn, 1,
                   kPowerUpColumn - kValueColumn);
-  table.addWidget(MakeCaption("Power Up Params"), 0, kPowerUpColumn, 2, kLostCommColumn - kPowerUpColumn);
-  table.addWidget(MakeCaption("Lost Comm Params"), 0, kLostCommColumn, 2, kLastColumn - kLostCommColumn);
+  table.addWidget(MakeCaption("Power Up Params"), 0, kPowerUpColumn, 1, kLostCommColumn - kPowerUpColumn);
+  table.addWidget(MakeCaption("Lost Comm Params"), 0, kLostCommColumn, 1, kLastColumn - kLostCommColumn);
   int column = kValueColumn;
   for (const Value& value : kValues) table.addWidget(MakeCaption(value.caption), 1, column++);
+  AddOptionCaptions(table, 1, Qt::AlignBottom);
 }
 
 void SummaryArea::AddRow(QGridLayout& table, std::size_t channel) {
@@ -268,13 +285,8 @@ void SummaryArea::AddTrailer(QGridLayout& table) {
   AddFrame(table, Named(new QFrame, "frmSumTrailer"), kTrailerLine, 1);
   remarks_ = Named(new RemarksLabel, "lblRemarks", 1);
   table.addWidget(remarks_, kTrailerLine, kChannelColumn, 1, kPowerUpColumn - kChannelColumn, Qt::AlignTop);
-  for (std::size_t i = 0; i < kOptions.size(); ++i) {
-    auto* caption = Named(new QLabel(QString::fromUtf8(kOptions[i].caption)), "lblParameters", i);
-    caption->setAlignment(Qt::AlignHCenter | Qt::AlignTop);
-    ScaleType(caption, 0.9);
-    LeaveWidthToColumn(caption);
-    table.addWidget(caption, kTrailerLine, kPowerUpColumn + static_cast<int>(i));
-  }
+  const auto captions = AddOptionCaptions(table, kTrailerLine, Qt::AlignTop);
+  for (std::size_t i = 0; i < captions.size(); ++i) Named(captions[i], "lblParameters", i);
 }
 
 }  // namespace tendril

@@ -1,0 +1,73 @@
+#include "ui/keys_dialog.h"
+
+#include <QDialogButtonBox>
+#include <QHeaderView>
+#include <QMenu>
+#include <QTreeWidget>
+#include <QVBoxLayout>
+#include <array>
+
+#include "ui/controls.h"
+
+namespace tendril {
+namespace {
+
+struct GeneralKey {
+  const char* key;
+  const char* what;
+};
+constexpr std::array<GeneralKey, 8> kGeneralKeys{
+    {{"Tab, Shift+Tab", "Next and previous control"},
+     {"Alt+underlined letter", "The button or list with that letter, or the menu"},
+     {"Space, Enter",
+      "Chooses the channel of a drawn servo; opens the number entry of a value in the summary"},
+     {"Space", "Presses a button, ticks a box"},
+     {"Up, Down", "A number by 10 µs; the next choice; the next line of a list"},
+     {"Page Up, Page Down", "A number by 100 µs; the slider by 10 %"},
+     {"Enter", "A typed number takes effect"},
+     {"Escape", "Closes the number entry, a list, or this window"}}};
+
+QTreeWidgetItem* AddGroup(QTreeWidget& list, const QString& title) {
+  auto* group = new QTreeWidgetItem(&list, {title});
+  QFont bold = list.font();
+  bold.setBold(true);
+  group->setFont(0, bold);
+  group->setFirstColumnSpanned(true);
+  return group;
+}
+
+void AddKeys(QTreeWidgetItem& group, const QMenu& menu, const QString& before = {}) {
+  for (const QAction* action : menu.actions()) {
+    const QString text = before + action->text().remove(QLatin1Char('&'));
+    if (action->menu() != nullptr) AddKeys(group, *action->menu(), text + QStringLiteral(": "));
+    if (!action->shortcut().isEmpty())
+      new QTreeWidgetItem(&group, {action->shortcut().toString(QKeySequence::NativeText), text});
+  }
+}
+
+}  // namespace
+
+KeysDialog::KeysDialog(const QMenuBar& menus, QWidget* window) : QDialog(window) {
+  setObjectName("KeysDialog");
+  setWindowTitle(QStringLiteral("Keys"));
+  auto* list = Named(new QTreeWidget, "lstKeys");
+  list->setAccessibleName(QStringLiteral("Keys and what they do"));
+  list->setHeaderLabels({QStringLiteral("Key"), QStringLiteral("What it does")});
+  list->setRootIsDecorated(false);
+  list->setAlternatingRowColors(true);
+  for (const QAction* menu : menus.actions())
+    AddKeys(*AddGroup(*list, menu->text().remove(QLatin1Char('&'))), *menu->menu());
+  QTreeWidgetItem* general = AddGroup(*list, QStringLiteral("Everywhere"));
+  for (const GeneralKey& key : kGeneralKeys)
+    new QTreeWidgetItem(general, {QString::fromUtf8(key.key), QString::fromUtf8(key.what)});
+  list->expandAll();
+  list->resizeColumnToContents(0);
+  auto* buttons = new QDialogButtonBox(QDialogButtonBox::Close);
+  connect(buttons, &QDialogButtonBox::rejected, this, &QDialog::close);
+  auto* column = new QVBoxLayout(this);
+  column->addWidget(list);
+  column->addWidget(buttons);
+  resize(640, 560);
+}
+
+}  // namespace tendril

@@ -1,0 +1,16 @@
+// KeysDialog: the list of all keys.
+#pragma once
+
+#include <QDialog>
+#include <QMenuBar>
+
+namespace tendril {
+
+// Stays open beside the window until it is closed.
+class KeysDialog : public QDialog {
+ public:
+  // Lists the keys of `menus`, and what keys do in every control.
+  KeysDialog(const QMenuBar& menus, QWidget* window);
+};
+
+}  // namespace tendril

@@ -1,0 +1,143 @@
+#include "ui/main_menu.h"
+
+#include <QAccessible>
+#include <QApplication>
+#include <QClipboard>
+#include <QLineEdit>
+
+#include "ui/control_action.h"
+
+namespace tendril {
+namespace {
+
+struct ControlItem {
+  const char* text;
+  const char* key;  // empty: none
+  const char* control;
+};
+constexpr std::array<ControlItem, 2> kTargetItems{
+    {{"Comm &Port", "Ctrl+P", "cmbNYX"}, {"Unit &ID", "Ctrl+I", "CmbUnitID_0"}}};
+constexpr std::array<ControlItem, 3> kCommandItems{
+    {{"&SEND(write) Configuration", "Ctrl+Return", "Command3_0"},
+     {"&GET(read) Configuration", "Ctrl+G", "Command3_1"},
+     {"UPDATE Unit_ID", "", "Command3_2"}}};
+constexpr std::array<ControlItem, 2> kFileItems{
+    {{"Export Config", "", "cmdWriteConfig"}, {"Import Config", "", "cmdReadConfig"}}};
+// In the order of the editor. No plain function key: one slip would move a servo.
+constexpr std::array<ControlItem, 5> kTestItems{{{"&Actual Pulse Range", "Ctrl+F5", "cmdTest_3"},
+                                                 {"&Virtual Pulse Range", "Ctrl+F6", "cmdTest_0"},
+                                                 {"&Neutral Trim", "Ctrl+F7", "cmdTest_4"},
+                                                 {"Virtual &Stops", "Ctrl+F8", "cmdTest_1"},
+                                                 {"&Default Position", "Ctrl+F9", "cmdTest_2"}}};
+constexpr ControlItem kSliderItem{"&Use Slider to Test Intensity Values", "Ctrl+L", "chkSendSlideCommands"};
+constexpr ControlItem kPresetsItem{"Standard &Preset Values", "Ctrl+Shift+P", "cmbPresets"};
+constexpr ControlItem kSummaryItem{"Summar&y", "F7", "cmdShowSummary"};
+
+QKeySequence Key(const char* key) { return QKeySequence(QString::fromLatin1(key)); }
+
+QAction* AddItem(QMenu& menu, QWidget& window, const ControlItem& item) {
+  const QString text = QString::fromLatin1(item.text);
+  auto* control = window.findChild<QWidget*>(QString::fromLatin1(item.control));
+  auto* list = qobject_cast<CalmComboBox*>(control);
+  auto* action = list != nullptr ? new ControlAction(text, Key(item.key), *list, &menu)
+                                 : new ControlAction(text, Key(item.key),
+                                                     *qobject_cast<QAbstractButton*>(control), &menu);
+  menu.addAction(action);
+  return action;
+}
+
+QMenu& AddMenu(QMenuBar& bar, const char* title) { return *bar.addMenu(QString::fromLatin1(title)); }
+
+template <typename Receiver, typename Slot>
+QAction* AddItem(QMenu& menu, const char* text, const char* key, Receiver* receiver, Slot slot) {
+  auto* action = menu.addAction(QString::fromLatin1(text));
+  action->setShortcut(Key(key));
+  QObject::connect(action, &QAction::triggered, receiver, slot);
+  return action;
+}
+
+}  // namespace
+
+MainMenu::MainMenu(QWidget& window) {
+  setObjectName("menu");
+  AddUnitMenu(window);
+  AddEditMenu(window);
+  AddViewMenu(window);
+  AddHelpMenu();
+  ShowView(false);
+}
+
+void MainMenu::AddUnitMenu(QWidget& window) {
+  QMenu& menu = AddMenu(*this, "&Unit");
+  for (const ControlItem& item : kTargetItems) AddItem(menu, window, item);
+  id_steps_ = {AddItem(menu, "&Next Unit ID", "Ctrl+PgUp", this, [this] { Q_EMIT IdStepped(1); }),
+               AddItem(menu, "P&revious Unit ID", "Ctrl+PgDown", this, [this] { Q_EMIT IdStepped(-1); })};
+  menu.addSeparator();
+  for (const ControlItem& item : kCommandItems) AddItem(menu, window, item);
+  menu.addSeparator();
+  AddTests(*menu.addMenu(QStringLiteral("&Test")), window);
+  menu.addSeparator();
+  for (const ControlItem& item : kFileItems) AddItem(menu, window, item);
+  menu.addSeparator();
+  AddItem(menu, "&Quit", "Ctrl+Q", &window, &QWidget::close);
+}
+
+void MainMenu::AddTests(QMenu& menu, QWidget& window) {
+  for (const ControlItem& item : kTestItems) AddItem(menu, window, item);
+  menu.addSeparator();
+  AddItem(menu, window, kSliderItem);
+}
+
+void MainMenu::AddEditMenu(QWidget& window) {
+  QMenu& menu = AddMenu(*this, "&Edit");
+  AddItem(menu, "&Copy", "Ctrl+C", this, [] { CopyFocused(); });
+  AddItem(menu, "Copy &Status", "Ctrl+Shift+S", this, &MainMenu::CopyStatusChosen);
+  menu.addSeparator();
+  AddItem(menu, window, kPresetsItem);
+}
+
+void MainMenu::AddViewMenu(QWidget& window) {
+  QMenu& menu = AddMenu(*this, "&View");
+  simulator_ = AddItem(menu, "Si&mulator", "F6", this, &MainMenu::SimulatorChosen);
+  AddItem(menu, window, kSummaryItem);
+  QMenu& channels = *menu.addMenu(QStringLiteral("&Channel"));
+  for (std::size_t channel = 0; channel < channels_.size(); ++channel) {
+    const QByteArray number = QByteArray::number(static_cast<int>(channel) + 1);
+    channels_[channel] = AddItem(channels, "Channel &" + number, "Ctrl+" + number, this,
+                                 [this, channel] { Q_EMIT ChannelChosen(channel); });
+  }
+  menu.addSeparator();
+  AddItem(menu, "&Dark", "Ctrl+Shift+D", this, &MainMenu::DarkChosen)->setCheckable(true);
+}
+
+void MainMenu::AddHelpMenu() {
+  QMenu& menu = AddMenu(*this, "&Help");
+  AddItem(menu, "&Manual", "Ctrl+F1", this, &MainMenu::ManualChosen);
+  AddItem(menu, "&Keys", "F1", this, &MainMenu::KeysChosen);
+  menu.addSeparator();
+  AddItem(menu, "&About", "Ctrl+Shift+F1", this, &MainMenu::AboutChosen);
+}
+
+void MainMenu::ShowView(bool summary) {
+  simulator_->setEnabled(summary);
+  // In the summary a choice would store the editor's older values over an edited row.
+  for (QAction* channel : channels_) channel->setEnabled(!summary);
+}
+
+void MainMenu::EnableIdSteps(bool enabled) {
+  for (QAction* step : id_steps_) step->setEnabled(enabled);
+}
+
+void CopyFocused() {
+  QWidget* const focused = QApplication::focusWidget();
+  if (focused == nullptr) return;
+  if (const auto* field = focused->findChild<QLineEdit*>(); field != nullptr && field->hasSelectedText()) {
+    field->copy();
+    return;
+  }
+  const QAccessibleInterface* accessible = QAccessible::queryAccessibleInterface(focused);
+  const QString value = accessible->text(QAccessible::Value);
+  QGuiApplication::clipboard()->setText(value.isEmpty() ? accessible->text(QAccessible::Name) : value);
+}
+
+}  // namespace tendril

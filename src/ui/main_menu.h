@@ -1,0 +1,56 @@
+// MainMenu: the menu bar, with every command of the window and its key.
+#pragma once
+
+#include <QAction>
+#include <QMenu>
+#include <QMenuBar>
+#include <array>
+#include <cstddef>
+
+#include "config/channel_config.h"
+
+namespace tendril {
+
+// "UPDATE Unit_ID" has no key and no letter: one slip would give a unit another ID.
+class MainMenu : public QMenuBar {
+  Q_OBJECT
+
+ public:
+  // `window` has all controls of the simulator view already; it must outlive the menu.
+  explicit MainMenu(QWidget& window);
+
+  // Enables what only the shown view has.
+  void ShowView(bool summary);
+  // Enables the steps through the unit IDs.
+  void EnableIdSteps(bool enabled);
+
+ Q_SIGNALS:
+  // Choose channel 0 to 7.
+  void ChannelChosen(std::size_t channel);
+  // Choose the next (+1) or the previous (-1) unit ID.
+  void IdStepped(int by);
+  void SimulatorChosen();
+  // Use light text on a dark background, or dark on light.
+  void DarkChosen(bool dark);
+  // Put the status bar's text on the clipboard.
+  void CopyStatusChosen();
+  void ManualChosen();
+  void KeysChosen();
+  void AboutChosen();
+
+ private:
+  void AddUnitMenu(QWidget& window);
+  void AddTests(QMenu& menu, QWidget& window);
+  void AddEditMenu(QWidget& window);
+  void AddViewMenu(QWidget& window);
+  void AddHelpMenu();
+
+  std::array<QAction*, 2> id_steps_{};
+  std::array<QAction*, kPortCount> channels_{};
+  QAction* simulator_ = nullptr;
+};
+
+// Puts the selected text of the focused field on the clipboard; without one the value of the focused control.
+void CopyFocused();
+
+}  // namespace tendril
