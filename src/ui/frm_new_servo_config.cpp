@@ -9,8 +9,11 @@
 #include <QTimer>
 #include <QVBoxLayout>
 
+#include "ui/about_dialog.h"
 #include "ui/accessible_controls.h"
 #include "ui/freeze.h"
+#include "ui/keys_dialog.h"
+#include "ui/manual.h"
 #include "ui/wrapping_row.h"
 
 namespace tendril {
@@ -29,6 +32,7 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
     : QMainWindow((InstallAccessibleControls(), nullptr)),
       link_(link),
       timers_(timers),
+      boxes_(boxes),
       control_panel_(control_panel),
       info_(info),
       ports_(link, boxes, control_panel),
@@ -125,7 +129,9 @@ void frmNewServoConfig::Connect() {
   });
   connect(menu_, &MainMenu::IdStepped, c, [this](int by) { connection_->StepUnitId(by); });
   connect(menu_, &MainMenu::SimulatorChosen, c, [this] { ShowConfig(); });
-  connect(menu_, &MainMenu::KeysChosen, c, [this] { ShowKeys(); });
+  connect(menu_, &MainMenu::KeysChosen, c, [this] { ShowKeys(*this, *menu_); });
+  connect(menu_, &MainMenu::ManualChosen, c, [this] { OpenManual(boxes_); });
+  connect(menu_, &MainMenu::AboutChosen, c, [this] { ShowAbout(*this, info_); });
   commands_.running.SetObserver([this] { ShowRunning(); });
   link_.SetPortClosedHandler([this] { live_test_.OnPortClosed(); });
   ports_.SetOpeningHandler([this] { live_test_.OnTestButton(LiveTest::kNoButton); });
@@ -288,12 +294,6 @@ void frmNewServoConfig::EnableControls() {
   live_test_area_->EnableControls(running_command);
   menu_->EnableIdSteps(running_command.isEmpty() && !live_test_area_->Moves());
   if (summary_ != nullptr) summary_->EnableCommands(running_command);
-}
-
-void frmNewServoConfig::ShowKeys() {
-  if (keys_ == nullptr) keys_ = new KeysDialog(*menu_, this);
-  keys_->show();
-  keys_->activateWindow();
 }
 
 // The summary has more controls than everything else. The window is painted first.

@@ -20,7 +20,6 @@
 #include "ui/chosen_servo.h"
 #include "ui/command_area.h"
 #include "ui/connection_area.h"
-#include "ui/keys_dialog.h"
 #include "ui/live_test_area.h"
 #include "ui/main_menu.h"
 #include "ui/model/channel_editor.h"
@@ -75,10 +74,10 @@ class frmNewServoConfig : public QMainWindow {
   bool SummaryShown() const;
   void ShowRunning();
   void EnableControls();
-  void ShowKeys();
 
   HwSerial& link_;
   TimerFactory& timers_;
+  MessageBoxes& boxes_;
   ControlPanel& control_panel_;
   const ProgramInfo info_;
   ChannelTable working_;
@@ -99,7 +98,6 @@ class frmNewServoConfig : public QMainWindow {
   QStackedWidget* views_ = new QStackedWidget;
   StatusLine* status_ = new StatusLine;
   MainMenu* menu_ = nullptr;
-  KeysDialog* keys_ = nullptr;  // made when it is first opened
   ActualsFrame* actuals_;
   SummaryArea* summary_ = nullptr;  // made after the first paint, or when it is first needed
 

@@ -47,7 +47,7 @@ void AddKeys(QTreeWidgetItem& group, const QMenu& menu, const QString& before = 
 
 }  // namespace
 
-KeysDialog::KeysDialog(const QMenuBar& menus, QWidget* window) : QDialog(window) {
+KeysDialog::KeysDialog(const QMenuBar& menus, QWidget& window) : QDialog(&window) {
   setObjectName("KeysDialog");
   setWindowTitle(QStringLiteral("Keys"));
   auto* list = Named(new QTreeWidget, "lstKeys");
@@ -68,6 +68,14 @@ KeysDialog::KeysDialog(const QMenuBar& menus, QWidget* window) : QDialog(window)
   column->addWidget(list);
   column->addWidget(buttons);
   resize(640, 560);
+}
+
+void ShowKeys(QWidget& window, const QMenuBar& menus) {
+  auto* dialog = window.findChild<QDialog*>(QStringLiteral("KeysDialog"));
+  if (dialog == nullptr) dialog = new KeysDialog(menus, window);
+  dialog->show();
+  dialog->raise();
+  dialog->activateWindow();
 }
 
 }  // namespace tendril

@@ -51,8 +51,8 @@ TEST_F(Menu, NoKeyAndNoLetterTwice) {
     std::map<QString, QString> letters;
     for (const QAction* action : menu->actions()) {
       const QString letter = QKeySequence::mnemonic(action->text()).toString();
-      if (!letter.isEmpty())
-        EXPECT_TRUE(letters.emplace(letter, action->text()).second) << action->text().toStdString();
+      if (letter.isEmpty()) continue;
+      EXPECT_TRUE(letters.emplace(letter, action->text()).second) << action->text().toStdString();
     }
   }
   EXPECT_TRUE(QKeySequence::mnemonic(Find<QAbstractButton>("Command3_2").text()).isEmpty());
