@@ -23,6 +23,7 @@
 #include "platform/hex_text.h"
 #include "platform/wait_for.h"
 #include "support/user.h"
+#include "ui/appearance.h"
 
 namespace tendril::test {
 namespace {
@@ -226,7 +227,7 @@ int main(int argc, char** argv) {
   parser.addPositionalArgument(QStringLiteral("folder"), QStringLiteral("Where to save the pictures."));
   parser.process(application);
   if (parser.positionalArguments().size() != 1) parser.showHelp(EXIT_FAILURE);
-  if (parser.isSet(dark)) tendril::UseDarkPalette();
+  if (parser.isSet(dark)) tendril::SetDarkAppearance(true);
   try {
     tendril::test::Show show(parser.positionalArguments().constFirst());
     parser.isSet(pictures) ? show.TakePictures() : show.Demonstrate();

@@ -1,8 +1,5 @@
 #include "app/demo_program.h"
 
-#include <QApplication>
-#include <QPalette>
-#include <QStyleFactory>
 #include <cstdint>
 #include <filesystem>
 
@@ -54,24 +51,6 @@ DemoProgram::DemoProgram()
       window(Serial1, platform.timers, platform.boxes, control_panel,
              {kVersion, DemoLog(scratch), QStringLiteral("in memory")}) {
   platform.boxes.SetParent(&window);
-}
-
-void UseDarkPalette() {
-  const QColor text(0xE6, 0xE6, 0xE6);
-  QPalette dark(QColor(0x50, 0x53, 0x57), QColor(0x3C, 0x3F, 0x43));
-  dark.setColor(QPalette::Base, QColor(0x1F, 0x21, 0x24));
-  dark.setColor(QPalette::AlternateBase, QColor(0x2B, 0x2D, 0x30));
-  for (const auto role :
-       {QPalette::WindowText, QPalette::Text, QPalette::ButtonText, QPalette::ToolTipText}) {
-    dark.setColor(role, text);
-    dark.setColor(QPalette::Disabled, role, QColor(0x8A, 0x8D, 0x91));
-  }
-  dark.setColor(QPalette::PlaceholderText, QColor(0xA0, 0xA4, 0xA8));
-  dark.setColor(QPalette::ToolTipBase, QColor(0x3C, 0x3F, 0x43));
-  dark.setColor(QPalette::Highlight, QColor(0x2A, 0x82, 0xDA));
-  dark.setColor(QPalette::HighlightedText, Qt::white);
-  QApplication::setStyle(QStyleFactory::create(QStringLiteral("Fusion")));
-  QApplication::setPalette(dark);
 }
 
 }  // namespace tendril

@@ -55,7 +55,4 @@ struct DemoProgram {
   frmNewServoConfig window;
 };
 
-// Light text on a dark background, in all windows.
-void UseDarkPalette();
-
 }  // namespace tendril

@@ -3,6 +3,7 @@
 #include <QCommandLineParser>
 
 #include "app/demo_program.h"
+#include "ui/appearance.h"
 
 int main(int argc, char** argv) {
   QApplication application(argc, argv);
@@ -16,7 +17,7 @@ int main(int argc, char** argv) {
   const QCommandLineOption dark(QStringLiteral("dark"), QStringLiteral("Light text on a dark background."));
   parser.addOption(dark);
   parser.process(application);
-  if (parser.isSet(dark)) tendril::UseDarkPalette();
+  if (parser.isSet(dark)) tendril::SetDarkAppearance(true);
   tendril::DemoProgram program;
   program.window.show();
   return QApplication::exec();

@@ -4,9 +4,7 @@
 #include <QAccessible>
 #include <QGuiApplication>
 #include <QKeyEvent>
-#include <QPainter>
 #include <QSignalBlocker>
-#include <QStyleOptionGroupBox>
 #include <algorithm>
 
 #include "config/channel_config.h"
@@ -107,15 +105,6 @@ void CalmSpinBox::wheelEvent(QWheelEvent* event) {
   }
 }
 
-void FrameBox::paintEvent(QPaintEvent* /*event*/) {
-  QPainter painter(this);
-  // The pixmap's corners fit one pixel to a unit.
-  painter.setRenderHint(QPainter::SmoothPixmapTransform, devicePixelRatioF() != 1);
-  QStyleOptionGroupBox option;
-  initStyleOption(&option);
-  style()->drawComplexControl(QStyle::CC_GroupBox, &option, &painter, this);
-}
-
 PopUp::PopUp(const char* name, QWidget& window) : QFrame(&window) {
   setObjectName(name);
   setFrameStyle(QFrame::Box | QFrame::Plain);
@@ -195,11 +184,6 @@ QString OutputLabel(std::int16_t port_type) {
     default:
       return {};
   }
-}
-
-bool IsDark(const QWidget& widget) {
-  const QPalette& palette = widget.palette();
-  return palette.color(QPalette::Window).lightness() < palette.color(QPalette::WindowText).lightness();
 }
 
 }  // namespace tendril

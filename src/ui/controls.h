@@ -81,15 +81,8 @@ class PressableText : public QLineEdit {
   void keyPressEvent(QKeyEvent* event) override;
 };
 
-// A group box that paints several times as fast. A style may stretch the frame's pixmap over the whole box. Qt's own
-// group box smooths that, in threads that it has to start first; the result looks the same.
-class FrameBox : public QGroupBox {
- public:
-  using QGroupBox::QGroupBox;
-
- protected:
-  void paintEvent(QPaintEvent* event) override;
-};
+// A frame with a title.
+using FrameBox = QGroupBox;
 
 // A frame that floats over the window, hidden until it is opened.
 class PopUp : public QFrame {
@@ -150,8 +143,5 @@ void Announce(QLabel* label);
 
 // The text on two lines for a port that drives no servo; empty for a servo and for an unknown kind.
 QString OutputLabel(std::int16_t port_type);
-
-// Whether the palette has light text on a dark background.
-bool IsDark(const QWidget& widget);
 
 }  // namespace tendril

@@ -11,6 +11,7 @@
 
 #include "ui/about_dialog.h"
 #include "ui/accessible_controls.h"
+#include "ui/appearance.h"
 #include "ui/freeze.h"
 #include "ui/keys_dialog.h"
 #include "ui/manual.h"
@@ -29,7 +30,7 @@ constexpr std::int32_t kSummaryScreenMs = 20;
 
 frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes,
                                      ControlPanel& control_panel, const ProgramInfo& info)
-    : QMainWindow((InstallAccessibleControls(), nullptr)),
+    : QMainWindow((InstallAccessibleControls(), InstallAppearance(), nullptr)),
       link_(link),
       timers_(timers),
       boxes_(boxes),

@@ -4,6 +4,8 @@
 #include <QGridLayout>
 #include <QSignalBlocker>
 
+#include "ui/appearance.h"
+
 namespace tendril {
 namespace {
 
@@ -16,6 +18,8 @@ struct ReadOut {
 constexpr std::array<ReadOut, 3> kReadOuts{{{"Nyx Value", "0%..100%", "lblPositionValue_0"},
                                             {"DMX Value", "0..255", "lblPositionValue_1"},
                                             {"Pulse Width", "1000..2000", "txtPositionValue"}}};
+
+constexpr QColor kWarning(0xA8, 0x00, 0x20);
 
 }  // namespace
 
@@ -95,7 +99,7 @@ void LiveTestArea::changeEvent(QEvent* event) {
 
 void LiveTestArea::ColourWarning() {
   SetPaletteColour(warning_, QPalette::WindowText,
-                   IsDark(*this) ? QColor(0xFF, 0x8A, 0x80) : QColor(0xA8, 0x00, 0x20));
+                   WithContrast(kWarning, palette().color(QPalette::Window), kTextContrast));
 }
 
 }  // namespace tendril

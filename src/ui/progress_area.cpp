@@ -3,6 +3,8 @@
 #include <QEvent>
 #include <QVBoxLayout>
 
+#include "ui/appearance.h"
+
 namespace tendril {
 namespace {
 
@@ -74,7 +76,7 @@ void ProgressArea::changeEvent(QEvent* event) {
 }
 
 void ProgressArea::ApplyColour() {
-  const QColor colour = Shade(colour_, IsDark(*this));
+  const QColor colour = Shade(colour_, IsDark(palette()));
   SetPaletteColour(ShapeProgress_, QPalette::Window, colour);
   SetPaletteColour(lblProgress_, QPalette::WindowText, colour);
 }

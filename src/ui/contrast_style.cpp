@@ -1,0 +1,115 @@
+#include "ui/contrast_style.h"
+
+#include <QPainter>
+#include <QStyleOption>
+#include <algorithm>
+#include <array>
+#include <cmath>
+
+#include "ui/appearance.h"
+
+namespace tendril {
+namespace {
+
+constexpr double kCornerRadius = 2;
+constexpr int kFrameTop = 3;  // of a group box, below its title
+
+// How Fusion makes an outline of the window's colour: this much darker, as QColor::lighter takes it. A circle's line is
+// blurred, and so needs more contrast than others.
+struct Outline {
+  QStyle::PrimitiveElement element;
+  int shade;
+  double contrast = kEdgeContrast;
+};
+constexpr int kShade = 140;
+constexpr std::array<Outline, 4> kOutlines{{{QStyle::PE_PanelButtonCommand, kShade},
+                                            {QStyle::PE_FrameLineEdit, kShade},
+                                            {QStyle::PE_IndicatorCheckBox, 127},
+                                            {QStyle::PE_IndicatorRadioButton, 150, 4.2}}};
+
+// Draws a line of whole device pixels along the inside of `rect`.
+void DrawLine(QPainter& painter, const QRectF& rect, const QColor& colour) {
+  const QTransform device = painter.deviceTransform();
+  const double width = std::max(1.0, std::floor(device.m11()));
+  const QRectF exact = device.mapRect(rect);
+  const QPointF inset(width / 2, width / 2);
+  const QRectF snapped(QPointF(std::ceil(exact.left()), std::ceil(exact.top())) + inset,
+                       QPointF(std::floor(exact.right()), std::floor(exact.bottom())) - inset);
+  painter.save();
+  painter.setRenderHint(QPainter::Antialiasing);
+  painter.setPen(QPen(colour, width / device.m11()));
+  painter.setBrush(Qt::NoBrush);
+  painter.drawRoundedRect(device.inverted().mapRect(snapped), kCornerRadius, kCornerRadius);
+  painter.restore();
+}
+
+QColor FocusColour(const QPalette& palette) {
+  return WithContrast(palette.color(QPalette::Highlight), palette.color(QPalette::Window), kEdgeContrast);
+}
+
+}  // namespace
+
+ContrastStyle::ContrastStyle(QStyle* base, const QString& system_style, std::optional<bool> dark)
+    : QProxyStyle(base),
+      system_style_(system_style),
+      dark_(dark),
+      draws_edges_(base->inherits("QFusionStyle")) {}
+
+void ContrastStyle::polish(QPalette& palette) {
+  QProxyStyle::polish(palette);
+  palette = WithContrast(dark_.value_or(IsDark(palette)) == IsDark(palette) ? palette : ThemePalette(*dark_));
+}
+
+void ContrastStyle::drawPrimitive(PrimitiveElement element, const QStyleOption* option, QPainter* painter,
+                                  const QWidget* widget) const {
+  if (!draws_edges_) return QProxyStyle::drawPrimitive(element, option, painter, widget);
+  if (element == PE_FrameGroupBox) {
+    const int title = std::max(pixelMetric(PM_ExclusiveIndicatorHeight), option->fontMetrics.height());
+    return DrawLine(*painter, option->rect.adjusted(0, title + kFrameTop, 0, 0),
+                    option->palette.color(QPalette::Mid));
+  }
+  if (element == PE_FrameFocusRect) {
+    if (option->state & State_KeyboardFocusChange)
+      DrawLine(*painter, option->rect, FocusColour(option->palette));
+    return;
+  }
+  const auto outline = std::ranges::find(kOutlines, element, &Outline::element);
+  if (outline == kOutlines.end()) return QProxyStyle::drawPrimitive(element, option, painter, widget);
+  const auto draw = [&](auto edged) {
+    edged.palette = WithEdges(edged.palette, outline->shade, outline->contrast);
+    QProxyStyle::drawPrimitive(element, &edged, painter, widget);
+  };
+  if (const auto* button = qstyleoption_cast<const QStyleOptionButton*>(option)) return draw(*button);
+  if (const auto* frame = qstyleoption_cast<const QStyleOptionFrame*>(option)) return draw(*frame);
+  draw(*option);
+}
+
+void ContrastStyle::drawComplexControl(ComplexControl control, const QStyleOptionComplex* option,
+                                       QPainter* painter, const QWidget* widget) const {
+  const auto draw = [&](auto edged) {
+    edged.palette = WithEdges(edged.palette, kShade, kEdgeContrast);
+    QProxyStyle::drawComplexControl(control, &edged, painter, widget);
+  };
+  const auto* spin = qstyleoption_cast<const QStyleOptionSpinBox*>(option);
+  const auto* slider = qstyleoption_cast<const QStyleOptionSlider*>(option);
+  if (draws_edges_ && control == CC_SpinBox && spin != nullptr) return draw(*spin);
+  if (draws_edges_ && control == CC_Slider && slider != nullptr) return draw(*slider);
+  QProxyStyle::drawComplexControl(control, option, painter, widget);
+}
+
+QPalette ContrastStyle::WithEdges(const QPalette& palette, int shade, double contrast) const {
+  QPalette& kept = edged_[{palette.cacheKey(), shade}];
+  if (kept.resolveMask() == 0) {
+    kept = palette;
+    for (const auto group : {QPalette::Active, QPalette::Inactive}) {
+      const QColor edge =
+          WithContrast(palette.color(group, QPalette::Mid), palette.color(group, QPalette::Window), contrast);
+      kept.setColor(group, QPalette::Window, edge.lighter(shade));
+    }
+  }
+  QPalette edged = kept;
+  edged.setCurrentColorGroup(palette.currentColorGroup());  // it is not part of the key
+  return edged;
+}
+
+}  // namespace tendril

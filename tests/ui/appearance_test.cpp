@@ -1,0 +1,149 @@
+#include "ui/appearance.h"
+
+#include <gtest/gtest.h>
+
+#include <QCheckBox>
+#include <QComboBox>
+#include <QGroupBox>
+#include <QGuiApplication>
+#include <QImage>
+#include <QLineEdit>
+#include <QPushButton>
+#include <QRadioButton>
+#include <QSlider>
+#include <QSpinBox>
+#include <QTest>
+#include <QToolTip>
+#include <algorithm>
+#include <vector>
+
+namespace tendril {
+namespace {
+
+TEST(Palette, EveryPair_HasItsContrastAndGoodColoursStay) {
+  using P = QPalette;
+  struct Pair {
+    P::ColorRole colour, background;
+    double ratio = kTextContrast;
+  };
+  const std::vector<Pair> pairs{{P::WindowText, P::Window},
+                                {P::Text, P::Base},
+                                {P::Text, P::AlternateBase},
+                                {P::ButtonText, P::Button},
+                                {P::HighlightedText, P::Highlight},
+                                {P::PlaceholderText, P::Window},
+                                {P::PlaceholderText, P::Base},
+                                {P::ToolTipText, P::ToolTipBase},
+                                {P::Link, P::Window},
+                                {P::Link, P::Base},
+                                {P::LinkVisited, P::Window},
+                                {P::Highlight, P::Window, kEdgeContrast},
+                                {P::Highlight, P::Base, kEdgeContrast},
+                                {P::Mid, P::Window, kEdgeContrast},
+                                {P::Mid, P::Base, kEdgeContrast}};
+  QPalette pale(QColor(0xEEE8D5), QColor(0xFDF6E3));
+  for (const auto role : {P::WindowText, P::Text, P::ButtonText, P::Highlight, P::ToolTipText})
+    pale.setColor(role, QColor(0x93A1A1));
+  for (const QPalette& system : {ThemePalette(false), ThemePalette(true), pale, QPalette(Qt::gray)}) {
+    const QPalette shown = WithContrast(system);
+    for (const auto group : {P::Active, P::Inactive}) {
+      for (const Pair& pair : pairs) {
+        const QColor colour = shown.color(group, pair.colour);
+        EXPECT_GE(ContrastRatio(colour, shown.color(group, pair.background)), pair.ratio)
+            << pair.colour << " on " << pair.background << " in "
+            << system.color(P::Window).name().toStdString();
+      }
+      EXPECT_EQ(shown.color(group, P::Window), system.color(group, P::Window));
+    }
+  }
+  QPalette good = WithContrast(pale);
+  good.setColor(P::WindowText, QColor(0x00, 0x2B, 0x80));
+  EXPECT_EQ(WithContrast(good), good);
+}
+
+class Appearance : public ::testing::TestWithParam<bool> {
+ protected:
+  Appearance() {
+    InstallAppearance();
+    SetDarkAppearance(GetParam());
+  }
+  ~Appearance() override { SetDarkAppearance(false); }
+};
+
+// The best contrast among the first pixels that differ from the background, on the way from `point` into the picture.
+double EdgeOnTheWay(const QImage& image, QPoint point, QPoint step) {
+  constexpr int kPixels = 3;
+  const QColor background = image.pixelColor(0, 0);
+  while (image.rect().contains(point) && image.pixelColor(point) == background) point += step;
+  double best = 1;
+  for (int i = 0; i < kPixels && image.rect().contains(point); ++i, point += step)
+    best = std::max(best, ContrastRatio(image.pixelColor(point), background));
+  return best;
+}
+
+int PixelsWithContrast(const QImage& image, const QImage& before) {
+  int count = 0;
+  for (int y = 0; y < image.height(); ++y) {
+    for (int x = 0; x < image.width(); ++x) {
+      const QColor colour = image.pixelColor(x, y);
+      if (colour != before.pixelColor(x, y) && ContrastRatio(colour, image.pixelColor(0, 0)) >= kEdgeContrast)
+        ++count;
+    }
+  }
+  return count;
+}
+
+TEST_P(Appearance, EveryControl_HasAnEdgeAndShowsTheFocus) {
+  struct Sample {
+    const char* name;
+    QWidget* control;
+    std::vector<int> columns;  // where a line down from the top meets an edge
+    bool takes_focus = true;
+  };
+  const QString text = QStringLiteral("Test");
+  auto* slider = new QSlider(Qt::Horizontal);
+  slider->setValue(50);
+  const std::vector<Sample> samples{{"button", new QPushButton(text), {30}},
+                                    {"check box", new QCheckBox(text), {7}},
+                                    {"radio button", new QRadioButton(text), {7}},
+                                    {"spin box", new QSpinBox, {20}},
+                                    {"combo box", new QComboBox, {30}},
+                                    {"line edit", new QLineEdit, {30}},
+                                    {"slider", slider, {20, 42, 70}},
+                                    {"group box", new QGroupBox(text), {50}, false}};
+  for (const Sample& sample : samples) {
+    QWidget window;
+    QWidget other(&window);
+    other.setFocusPolicy(Qt::StrongFocus);
+    sample.control->setParent(&window);
+    sample.control->setGeometry(QRect({10, 10}, sample.control->sizeHint().expandedTo({84, 15})));
+    window.resize(sample.control->size() + QSize(20, 20));
+    window.show();
+    ASSERT_TRUE(QTest::qWaitForWindowActive(&window));
+    other.setFocus();
+    const QImage image = window.grab().toImage();
+    EXPECT_GE(EdgeOnTheWay(image, {0, image.height() / 2}, {1, 0}), kEdgeContrast) << sample.name;
+    for (const int column : sample.columns)
+      EXPECT_GE(EdgeOnTheWay(image, {10 + column, 0}, {0, 1}), kEdgeContrast) << sample.name << " " << column;
+    QTest::keyClick(&window, Qt::Key_Tab);
+    if (sample.takes_focus) {
+      EXPECT_GE(PixelsWithContrast(window.grab().toImage(), image), 40) << sample.name;
+    }
+  }
+}
+
+TEST_P(Appearance, SwitchingTwice_ComesBackToTheSamePalette) {
+  const QPalette palette = QGuiApplication::palette();
+  EXPECT_EQ(IsDark(palette), GetParam());
+  for (const bool dark : {!GetParam(), GetParam()}) {
+    SetDarkAppearance(dark);
+    EXPECT_EQ(DarkAppearance(), dark);
+    EXPECT_EQ(IsDark(QToolTip::palette()), dark);
+  }
+  EXPECT_EQ(QGuiApplication::palette(), palette);
+}
+
+INSTANTIATE_TEST_SUITE_P(Themes, Appearance, ::testing::Bool());
+
+}  // namespace
+}  // namespace tendril
