@@ -10,6 +10,8 @@ windows_packages=(cmake ninja-build g++-mingw-w64-x86-64-posix googletest wine64
 fuzz_packages=(clang-14 libclang-rt-14-dev llvm-14 cmake ninja-build)
 coverage_packages=(gcovr)
 check_packages=(clang-format-14 clang-tidy-14)
+icon_packages=(librsvg2-bin optipng)
+picture_packages=(imagemagick optipng)
 
 say() { printf '%s\n' "== $*" >&2; }
 

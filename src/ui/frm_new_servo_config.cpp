@@ -15,6 +15,7 @@
 #include "ui/freeze.h"
 #include "ui/keys_dialog.h"
 #include "ui/manual.h"
+#include "ui/program_icon.h"
 #include "ui/wrapping_row.h"
 
 namespace tendril {
@@ -297,11 +298,14 @@ void frmNewServoConfig::EnableControls() {
   if (summary_ != nullptr) summary_->EnableCommands(running_command);
 }
 
-// The summary has more controls than everything else. The window is painted first.
+// The window is painted first: the summary has more controls than everything else, and the icon has to be decoded.
 bool frmNewServoConfig::eventFilter(QObject* object, QEvent* event) {
   if (event->type() == QEvent::Paint) {
     object->removeEventFilter(this);
-    QTimer::singleShot(0, &connections_, [this] { MakeSummary(); });
+    QTimer::singleShot(0, &connections_, [this] {
+      MakeSummary();
+      setWindowIcon(ProgramIcon());
+    });
   }
   return QMainWindow::eventFilter(object, event);
 }

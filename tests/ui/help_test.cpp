@@ -16,6 +16,7 @@ using testing::HasSubstr;
 
 TEST_F(Window, About_CopiesEveryFactThatItShows) {
   ShowAbout(*window_, info_);
+  EXPECT_EQ(window_->windowIcon().availableSizes().size(), 6);
   auto& about = Find<QDialog>("aboutDialog");
   for (auto* button : about.findChildren<QPushButton*>())
     if (button->toolTip().startsWith(QStringLiteral("Copies"))) button->click();
