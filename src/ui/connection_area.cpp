@@ -41,6 +41,7 @@ ConnectionArea::ConnectionArea(PortSelection& ports)
   row->addSpacing(6);
   row->addWidget(id_label);
   for (CalmComboBox* digit : CmbUnitID_) row->addWidget(digit);
+  row->addStretch();
   AddLayout<QHBoxLayout>(this, {})->addWidget(group);
 }
 

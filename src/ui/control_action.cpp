@@ -9,6 +9,9 @@ ControlAction::ControlAction(const QString& text, const QKeySequence& key, QWidg
                              std::function<void()> act, QObject* parent)
     : QAction(text, parent) {
   setShortcut(key);
+  if (!key.isEmpty()) {
+    Describe(&control, QStringLiteral("%1 (%2)").arg(control.toolTip(), key.toString(QKeySequence::NativeText)));
+  }
   setEnabled(control.isEnabled() && control.isVisible());
   control.installEventFilter(this);
   connect(this, &QAction::triggered, &control, std::move(act));

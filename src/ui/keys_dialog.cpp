@@ -36,12 +36,13 @@ QTreeWidgetItem* AddGroup(QTreeWidget& list, const QString& title) {
   return group;
 }
 
-void AddKeys(QTreeWidgetItem& group, const QMenu& menu, const QString& before = {}) {
+void AddKeys(QTreeWidgetItem& group, const QMenu& menu) {
   for (const QAction* action : menu.actions()) {
-    const QString text = before + action->text().remove(QLatin1Char('&'));
-    if (action->menu() != nullptr) AddKeys(group, *action->menu(), text + QStringLiteral(": "));
-    if (!action->shortcut().isEmpty())
-      new QTreeWidgetItem(&group, {action->shortcut().toString(QKeySequence::NativeText), text});
+    if (action->menu() != nullptr) AddKeys(group, *action->menu());
+    if (!action->shortcut().isEmpty()) {
+      new QTreeWidgetItem(&group, {action->shortcut().toString(QKeySequence::NativeText),
+                                   action->text().remove(QLatin1Char('&'))});
+    }
   }
 }
 

@@ -24,11 +24,11 @@ constexpr std::array<ControlItem, 3> kCommandItems{
 constexpr std::array<ControlItem, 2> kFileItems{
     {{"Export Config", "", "cmdWriteConfig"}, {"Import Config", "", "cmdReadConfig"}}};
 // In the order of the editor. No plain function key: one slip would move a servo.
-constexpr std::array<ControlItem, 5> kTestItems{{{"&Actual Pulse Range", "Ctrl+F5", "cmdTest_3"},
-                                                 {"&Virtual Pulse Range", "Ctrl+F6", "cmdTest_0"},
-                                                 {"&Neutral Trim", "Ctrl+F7", "cmdTest_4"},
-                                                 {"Virtual &Stops", "Ctrl+F8", "cmdTest_1"},
-                                                 {"&Default Position", "Ctrl+F9", "cmdTest_2"}}};
+constexpr std::array<ControlItem, 5> kTestItems{{{"Test &Actual Pulse Range", "Ctrl+F5", "cmdTest_3"},
+                                                 {"Test &Virtual Pulse Range", "Ctrl+F6", "cmdTest_0"},
+                                                 {"Test &Neutral Trim", "Ctrl+F7", "cmdTest_4"},
+                                                 {"Test Virtual &Stops", "Ctrl+F8", "cmdTest_1"},
+                                                 {"Test &Default Position", "Ctrl+F9", "cmdTest_2"}}};
 constexpr ControlItem kSliderItem{"&Use Slider to Test Intensity Values", "Ctrl+L", "chkSendSlideCommands"};
 constexpr ControlItem kPresetsItem{"Standard &Preset Values", "Ctrl+Shift+P", "cmbPresets"};
 constexpr ControlItem kSummaryItem{"Summar&y", "F7", "cmdShowSummary"};
