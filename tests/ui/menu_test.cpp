@@ -69,6 +69,8 @@ TEST_F(Menu, Keys_ChooseChannelsInTheSimulatorViewOnly) {
   ASSERT_TRUE(Visible("frmSumHeader"));
   Keys("Ctrl+1");
   EXPECT_TRUE(Dial("ServoSimulator2_7").selected());
+  Keys("Ctrl+F6");
+  EXPECT_EQ(Text("cmdTest_0"), "Test") << "hidden";
   Keys("F6");
   EXPECT_TRUE(Visible("ServoSimulator1"));
 }
