@@ -5,6 +5,7 @@
 #include <QClipboard>
 #include <QLineEdit>
 
+#include "ui/appearance.h"
 #include "ui/control_action.h"
 
 namespace tendril {
@@ -107,7 +108,9 @@ void MainMenu::AddViewMenu(QWidget& window) {
                                  [this, channel] { Q_EMIT ChannelChosen(channel); });
   }
   menu.addSeparator();
-  AddItem(menu, "&Dark", "Ctrl+Shift+D", this, &MainMenu::DarkChosen)->setCheckable(true);
+  QAction* dark = AddItem(menu, "&Dark", "Ctrl+Shift+D", this, [](bool on) { SetDarkAppearance(on); });
+  dark->setCheckable(true);
+  dark->setChecked(DarkAppearance());
 }
 
 void MainMenu::AddHelpMenu() {

@@ -30,8 +30,6 @@ class MainMenu : public QMenuBar {
   // Choose the next (+1) or the previous (-1) unit ID.
   void IdStepped(int by);
   void SimulatorChosen();
-  // Use light text on a dark background, or dark on light.
-  void DarkChosen(bool dark);
   // Put the status bar's text on the clipboard.
   void CopyStatusChosen();
   void ManualChosen();
