@@ -10,7 +10,8 @@ ControlAction::ControlAction(const QString& text, const QKeySequence& key, QWidg
     : QAction(text, parent) {
   setShortcut(key);
   if (!key.isEmpty()) {
-    Describe(&control, QStringLiteral("%1 (%2)").arg(control.toolTip(), key.toString(QKeySequence::NativeText)));
+    Describe(&control,
+             QStringLiteral("%1 (%2)").arg(control.toolTip(), key.toString(QKeySequence::NativeText)));
   }
   setEnabled(control.isEnabled() && control.isVisible());
   control.installEventFilter(this);
