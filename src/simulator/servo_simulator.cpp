@@ -269,9 +269,7 @@ void ServoSimulator::DisplayCaption(const QString& text) {
 void ServoSimulator::SelectServo(bool selected) {
   if (selected == dial_.selected()) return;
   dial_.SelectServo(selected);
-  QAccessible::State changed;
-  changed.selected = true;
-  QAccessibleStateChangeEvent event(this, changed);
+  QAccessibleEvent event(this, selected ? QAccessible::SelectionAdd : QAccessible::SelectionRemove);
   QAccessible::updateAccessibility(&event);
   update();
 }

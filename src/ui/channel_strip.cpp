@@ -33,7 +33,7 @@ QWidget* ChannelStrip::MakeCell(std::size_t channel) {
   Describe(simulator,
            QStringLiteral("Chooses channel %1, to edit it and to move its servo.").arg(channel + 1));
 
-  auto* output = cmdDigitalOutput_[channel] = Named(new QPushButton, "cmdDigitalOutput", channel);
+  auto* output = cmdDigitalOutput_[channel] = Named(new OutputButton, "cmdDigitalOutput", channel);
   output->setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Expanding);
   Describe(output, QStringLiteral("Chooses channel %1, to edit it.").arg(channel + 1));
   QFont bold = output->font();
@@ -56,6 +56,7 @@ QWidget* ChannelStrip::MakeCell(std::size_t channel) {
 void ChannelStrip::ShowSelected(std::size_t channel) {
   for (std::size_t i = 0; i < kPortCount; ++i) {
     ServoSimulator2_[i]->SelectServo(i == channel);
+    cmdDigitalOutput_[i]->Select(i == channel);
     cmdDigitalOutput_[i]->setStyleSheet(i == channel ? QString::fromLatin1(kSelectedOutput) : QString());
   }
 }

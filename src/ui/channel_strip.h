@@ -1,7 +1,6 @@
 // ChannelStrip: the eight servos.
 #pragma once
 
-#include <QPushButton>
 #include <QStackedWidget>
 #include <array>
 #include <cstddef>
@@ -9,6 +8,7 @@
 #include "config/channel_config.h"
 #include "simulator/servo_simulator.h"
 #include "ui/controls.h"
+#include "ui/output_button.h"
 
 namespace tendril {
 
@@ -40,7 +40,7 @@ class ChannelStrip : public FrameBox {
   // Each cell shows its servo, or when the port drives none, its button.
   std::array<QStackedWidget*, kPortCount> cells_{};
   std::array<ServoSimulator*, kPortCount> ServoSimulator2_{};
-  std::array<QPushButton*, kPortCount> cmdDigitalOutput_{};
+  std::array<OutputButton*, kPortCount> cmdDigitalOutput_{};
 };
 
 }  // namespace tendril

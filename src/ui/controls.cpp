@@ -1,7 +1,7 @@
 #include "ui/controls.h"
 
 #include <QAbstractButton>
-#include <QAccessible>
+#include <QClipboard>
 #include <QGuiApplication>
 #include <QKeyEvent>
 #include <QSignalBlocker>
@@ -52,6 +52,8 @@ void PressableText::keyPressEvent(QKeyEvent* event) {
   const int key = event->key();
   if (key == Qt::Key_Return || key == Qt::Key_Enter || key == Qt::Key_Space) {
     Press();
+  } else if (event->matches(QKeySequence::Copy)) {
+    QGuiApplication::clipboard()->setText(text());
   } else {
     QLineEdit::keyPressEvent(event);
   }
@@ -168,11 +170,6 @@ void SetPaletteColour(QWidget* widget, QPalette::ColorRole role, const QColor& c
   QPalette palette = widget->palette();
   palette.setColor(role, colour);
   widget->setPalette(palette);
-}
-
-void Announce(QLabel* label) {
-  QAccessibleEvent alert(label, QAccessible::Alert);
-  QAccessible::updateAccessibility(&alert);
 }
 
 QString OutputLabel(std::int16_t port_type) {

@@ -62,7 +62,8 @@ class CalmSpinBox : public QSpinBox {
   bool pressed_ = false;  // a mouse button went down here; the release may have gone to another widget
 };
 
-// A read-only text that can be pressed: with the left mouse button, Enter or the space bar.
+// A read-only text that can be pressed: with the left mouse button, Enter or the space bar. Ctrl+C copies it; no part of
+// it can be selected.
 class PressableText : public QLineEdit {
   Q_OBJECT
 
@@ -137,9 +138,6 @@ void ScaleType(QWidget* widget, double factor);
 
 // Sets one colour of the widget's palette.
 void SetPaletteColour(QWidget* widget, QPalette::ColorRole role, const QColor& colour);
-
-// Has assistive technology read the label out.
-void Announce(QLabel* label);
 
 // The text on two lines for a port that drives no servo; empty for a servo and for an unknown kind.
 QString OutputLabel(std::int16_t port_type);

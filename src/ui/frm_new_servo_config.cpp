@@ -128,12 +128,14 @@ void frmNewServoConfig::Connect() {
   connect(menu_, &MainMenu::ChannelChosen, c, [this](std::size_t channel) {
     CommitTyping();
     SelectChannel(channel);
+    status_->Say(QStringLiteral("Channel %1 selected").arg(channel + 1));  // the focus may be elsewhere
   });
   connect(menu_, &MainMenu::IdStepped, c, [this](int by) { connection_->StepUnitId(by); });
   connect(menu_, &MainMenu::SimulatorChosen, c, [this] { ShowConfig(); });
   connect(menu_, &MainMenu::KeysChosen, c, [this] { ShowKeys(*this, *menu_); });
   connect(menu_, &MainMenu::ManualChosen, c, [this] { OpenManual(boxes_); });
   connect(menu_, &MainMenu::AboutChosen, c, [this] { ShowAbout(*this, info_); });
+  connect(progress_, &ProgressArea::Said, c, [this](const QString& sentence) { status_->Say(sentence); });
   commands_.running.SetObserver([this] { ShowRunning(); });
   link_.SetPortClosedHandler([this] { live_test_.OnPortClosed(); });
   ports_.SetOpeningHandler([this] { live_test_.OnTestButton(LiveTest::kNoButton); });

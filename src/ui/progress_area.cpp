@@ -47,7 +47,9 @@ ProgressArea::ProgressArea()
 
 void ProgressArea::ShowRunning(const RunningCommand& running) {
   const std::string& title = running.Active() ? running.What() : running.Stopped();
-  if (!title.empty()) setTitle(QString::fromStdString(title));
+  if (title.empty()) return;
+  setTitle(QString::fromStdString(title));
+  Q_EMIT Said(this->title());
 }
 
 void ProgressArea::SharePlace(QStackedLayout& place, QWidget* other) {
@@ -67,7 +69,7 @@ void ProgressArea::SetColour(ProgressColour colour) {
 
 void ProgressArea::SetText(const std::string& text) {
   lblProgress_->setText(QString::fromStdString(text));
-  if (!text.empty()) Announce(lblProgress_);
+  if (!text.empty()) Q_EMIT Said(title() + QStringLiteral(": ") + lblProgress_->text());
 }
 
 void ProgressArea::changeEvent(QEvent* event) {

@@ -13,6 +13,8 @@ namespace tendril {
 // The frame `frmProgress`. Shares its place with the frame of the apply boxes, so that nothing around them moves when
 // one replaces the other.
 class ProgressArea : public FrameBox, public CommandProgressView {
+  Q_OBJECT
+
  public:
   ProgressArea();
 
@@ -27,6 +29,10 @@ class ProgressArea : public FrameBox, public CommandProgressView {
   void SetBarWidth(int width) override;
   void SetColour(ProgressColour colour) override;
   void SetText(const std::string& text) override;
+
+ Q_SIGNALS:
+  // What runs, how it ended, or where it stopped: a sentence to be read out.
+  void Said(const QString& sentence);
 
  protected:
   void changeEvent(QEvent* event) override;

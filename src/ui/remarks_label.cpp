@@ -1,7 +1,5 @@
 #include "ui/remarks_label.h"
 
-#include "ui/controls.h"
-
 namespace tendril {
 namespace {
 
@@ -21,18 +19,17 @@ void RemarksLabel::ShowRemarks(const std::vector<std::string>& sentences) {
     lines += QStringLiteral("⚠ ") + sentence;
   if (all.size() > kShownRemarks) lines += QStringLiteral("and %1 more").arg(all.size() - kShownRemarks);
   const QString whole = all.join(QLatin1Char('\n'));
-  if (lines == lines_ && accessibleDescription() == whole) return;
+  if (lines == lines_ && accessibleName() == whole) return;
   lines_ = lines;
-  setAccessibleDescription(whole);
   setToolTip(all.isEmpty() ? QString() : whole + QStringLiteral("\n\n") + QString::fromUtf8(kWhy));
   ShowLines();
-  if (!all.isEmpty()) Announce(this);
+  Announce(whole);
 }
 
 QSize RemarksLabel::sizeHint() const { return {0, kLines * fontMetrics().lineSpacing()}; }
 
 void RemarksLabel::resizeEvent(QResizeEvent* event) {
-  QLabel::resizeEvent(event);
+  Announcement::resizeEvent(event);
   ShowLines();
 }
 

@@ -1,11 +1,23 @@
 #include "ui/status_line.h"
 
+#include <QClipboard>
+#include <QGuiApplication>
+
 #include "ui/controls.h"
 
 namespace tendril {
 
-StatusLine::StatusLine() : lblStatus_(Named(new QLabel, "lblStatus")) { addWidget(lblStatus_, 1); }
+StatusLine::StatusLine() : lblStatus_(Named(new Announcement, "lblStatus")) {
+  lblStatus_->setTextFormat(Qt::PlainText);
+  lblStatus_->setTextInteractionFlags(Qt::TextSelectableByMouse);
+  addWidget(lblStatus_, 1);
+}
 
-void StatusLine::Say(const QString& sentence) { lblStatus_->setText(sentence); }
+void StatusLine::Say(const QString& sentence) {
+  lblStatus_->setText(sentence);
+  lblStatus_->Announce(sentence);
+}
+
+void StatusLine::Copy() const { QGuiApplication::clipboard()->setText(lblStatus_->text()); }
 
 }  // namespace tendril

@@ -3,6 +3,8 @@
 #include <gmock/gmock.h>
 
 #include <QApplication>
+#include <QClipboard>
+#include <QLabel>
 #include <QPushButton>
 #include <QTest>
 #include <QTimer>
@@ -31,6 +33,14 @@ TEST(QtMessageBoxes, Message_IsShownAsPlainTextOverItsWindow) {
     EXPECT_EQ(box.windowTitle(), QStringLiteral("Comm Error!"));
     EXPECT_EQ(box.icon(), QMessageBox::Critical);
     EXPECT_EQ(box.parentWidget(), &window);
+    QWidget* text = box.findChild<QLabel*>(QStringLiteral("qt_msgbox_label"));
+    for (QWidget* focused : {box.focusWidget(), text}) {
+      QGuiApplication::clipboard()->clear();
+      QTest::keyClick(focused, Qt::Key_C, Qt::ControlModifier);
+      EXPECT_EQ(QGuiApplication::clipboard()->text(),
+                box.windowTitle() + QStringLiteral("\n\n") + box.text());
+    }
+    EXPECT_EQ(box.focusWidget(), box.button(QMessageBox::Ok));
     box.button(QMessageBox::Ok)->click();
   });
   boxes.Show({"<b>low</b> > high\r\n\r\n1500 \u00b5s", "Comm Error!", BoxIcon::kCritical});

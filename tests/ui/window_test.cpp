@@ -227,6 +227,10 @@ TEST_F(Window, EveryControl_HasANameAndSaysWhatItDoes) {
     EXPECT_NE(accessible->role(), QAccessible::Client) << object;
     const QString name = accessible->text(QAccessible::Name);
     EXPECT_FALSE(name.isEmpty()) << object;
+    if (const auto* box = qobject_cast<QComboBox*>(widget)) {
+      EXPECT_EQ(name, box->accessibleName()) << object;
+      EXPECT_EQ(accessible->text(QAccessible::Value), box->currentText()) << object;
+    }
     EXPECT_FALSE(names.contains(name)) << object << " shares the name " << name.toStdString();
     names.insert(name);
   }

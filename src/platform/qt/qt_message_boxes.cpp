@@ -1,7 +1,11 @@
 #include "platform/qt/qt_message_boxes.h"
 
+#include <QAbstractButton>
 #include <QApplication>
+#include <QClipboard>
 #include <QEventLoop>
+#include <QKeyEvent>
+#include <QLabel>
 #include <QString>
 
 namespace tendril {
@@ -23,6 +27,41 @@ QMessageBox::Icon QtIcon(BoxIcon icon) {
   }
   return QMessageBox::NoIcon;
 }
+
+// Ctrl+C copies its title and text, unless a part of the text is selected: then that. Qt's own copies on Windows alone.
+class CopyableBox : public QMessageBox {
+ public:
+  explicit CopyableBox(QWidget* parent) : QMessageBox(parent) {}
+
+  // The text takes part in the focus chain, so that the keyboard can select in it.
+  void MakeTextSelectable() {
+    setTextInteractionFlags(Qt::TextSelectableByMouse | Qt::TextSelectableByKeyboard);
+    text_ = findChild<QLabel*>(QStringLiteral("qt_msgbox_label"));
+    text_->setFocusPolicy(Qt::StrongFocus);
+    text_->installEventFilter(this);
+  }
+
+ protected:
+  void keyPressEvent(QKeyEvent* event) override {
+    if (!CopyAll(*event)) QMessageBox::keyPressEvent(event);
+  }
+  bool eventFilter(QObject* object, QEvent* event) override {
+    if (object == text_ && event->type() == QEvent::KeyPress && !text_->hasSelectedText() &&
+        CopyAll(static_cast<QKeyEvent&>(*event))) {
+      return true;
+    }
+    return QMessageBox::eventFilter(object, event);
+  }
+
+ private:
+  bool CopyAll(const QKeyEvent& event) const {
+    if (!event.matches(QKeySequence::Copy)) return false;
+    QGuiApplication::clipboard()->setText(windowTitle() + QStringLiteral("\n\n") + text());
+    return true;
+  }
+
+  QLabel* text_ = nullptr;
+};
 
 }  // namespace
 
@@ -49,16 +88,18 @@ QMessageBox::StandardButton QtMessageBoxes::Ask(const BoxMessage& message,
   if (closing_) return QMessageBox::NoButton;
 
   // On the heap: the parent may destroy the box.
-  const QPointer<QMessageBox> box = new QMessageBox(parent_);
+  const QPointer<CopyableBox> box = new CopyableBox(parent_);
   box->setObjectName(QLatin1String(kBoxName));
   box->setTextFormat(Qt::PlainText);  // a text with a "<" in it could become rich text
-  box->setTextInteractionFlags(Qt::TextSelectableByMouse);
   box->setText(QString::fromStdString(message.text).replace(QLatin1String("\r\n"), QLatin1String("\n")));
   box->setWindowTitle(QString::fromStdString(message.title));
   box->setIcon(QtIcon(message.icon));
   box->setStandardButtons(buttons);
   // No, where there is one: Yes must not be hit by accident.
   box->setDefaultButton(QMessageBox::No);
+  box->MakeTextSelectable();
+  // Not the text, which comes first in the focus chain.
+  box->button(buttons.testFlag(QMessageBox::No) ? QMessageBox::No : QMessageBox::Ok)->setFocus();
 
   // The box's own exec() cannot distinguish an answer from a quit, which closes the box as a user does and then ends
   // every event loop.

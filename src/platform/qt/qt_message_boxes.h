@@ -11,7 +11,7 @@
 
 namespace tendril {
 
-// A box is a QMessageBox named "messageBox". The program counts as being closed after CloseAll(), after the end of the
+// A box is a QMessageBox named "messageBox". Ctrl+C copies its title and text. The program counts as being closed after CloseAll(), after the end of the
 // application's event loop, or when a quit has closed a box.
 class QtMessageBoxes final : public MessageBoxes {
  public:

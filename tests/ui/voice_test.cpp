@@ -1,0 +1,45 @@
+// What the window says to users who cannot see it, and what they can copy. The events are tested with a real reader's
+// bus: this platform has none.
+#include <QClipboard>
+#include <QGuiApplication>
+#include <QShortcut>
+
+#include "ui/status_line.h"
+#include "window_fixture.h"
+
+namespace tendril::test {
+namespace {
+
+std::string Copied() { return QGuiApplication::clipboard()->text().toStdString(); }
+
+TEST_F(Window, StatusLine_SaysTheOutcomeAndCanBeCopied) {
+  ConnectUnit();
+  Click("Command3_0");
+  EXPECT_EQ(Text("lblStatus"), "Sending the configuration to unit 01");
+  RunToTheEnd();
+  window_->findChild<StatusLine*>()->Copy();
+  EXPECT_EQ(Copied(), "Sending the configuration to unit 01: SUCCESS: Send Complete!");
+  EXPECT_EQ(Accessible("lblStatus").text(QAccessible::Name).toStdString(), Copied());
+  EXPECT_EQ(Accessible("lblStatus").role(), QAccessible::Notification);
+}
+
+TEST_F(Window, OutputButton_IsSelectedAsAServoIs) {
+  Click("ServoSimulator2_2");
+  Press("optChannelType_2");
+  EXPECT_TRUE(Accessible("cmdDigitalOutput_2").state().selected);
+  Click("ServoSimulator2_3");
+  EXPECT_FALSE(Accessible("cmdDigitalOutput_2").state().selected);
+  EXPECT_TRUE(Accessible("ServoSimulator2_3").state().selected);
+}
+
+TEST_F(Window, CellOfTheSummary_CopiesItsText) {
+  Activate();
+  Press("cmdShowSummary");
+  world_.time.Advance(20);
+  const QShortcut of_a_menu(QKeySequence::Copy, window_.get());
+  QTest::keyClick(&Find("txtSumStopRange_4"), Qt::Key_C, Qt::ControlModifier);
+  EXPECT_EQ(Copied(), Text("txtSumStopRange_4"));
+}
+
+}  // namespace
+}  // namespace tendril::test
