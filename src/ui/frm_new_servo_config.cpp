@@ -130,6 +130,7 @@ void frmNewServoConfig::Connect() {
     SelectChannel(channel);
     status_->Say(QStringLiteral("Channel %1 selected").arg(channel + 1));  // the focus may be elsewhere
   });
+  connect(menu_, &MainMenu::CopyStatusChosen, c, [this] { status_->Copy(); });
   connect(menu_, &MainMenu::IdStepped, c, [this](int by) { connection_->StepUnitId(by); });
   connect(menu_, &MainMenu::SimulatorChosen, c, [this] { ShowConfig(); });
   connect(menu_, &MainMenu::KeysChosen, c, [this] { ShowKeys(*this, *menu_); });
