@@ -14,7 +14,6 @@ namespace {
 constexpr double kMicrosecondsPerDegree = 10.0;
 
 constexpr DialColour kBodyFill = 0xE0E0E0;
-constexpr DialColour kInnerBodyFill = 0xD0D0D0;
 
 // Proportions of the picture.
 constexpr double kBodyLeft = 1.0 / 3.0;

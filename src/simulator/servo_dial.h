@@ -26,6 +26,7 @@ inline constexpr DialColour kStopsFill = 0xFFC0C0;
 inline constexpr DialColour kNeutralFill = 0x000000;
 inline constexpr DialColour kDefaultFill = 0xC0C0FF;
 inline constexpr DialColour kDefaultOutline = 0xFFFFFF;
+inline constexpr DialColour kInnerBodyFill = 0xD0D0D0;
 inline constexpr DialColour kBodyOutline = 0x707070;
 inline constexpr DialColour kSelectedBackground = 0xFF0000;  // blue
 

@@ -3,6 +3,12 @@
 #include <QVBoxLayout>
 
 namespace tendril {
+namespace {
+
+// Smaller than the simulator asks for: in a low window the servo gives way.
+constexpr QSize kSmallestServo(120, 120);
+
+}  // namespace
 
 ChosenServo::ChosenServo(const ChannelEditor& editor, const ChannelTable& working)
     : FrameBox(QStringLiteral("Channel")),
@@ -11,10 +17,12 @@ ChosenServo::ChosenServo(const ChannelEditor& editor, const ChannelTable& workin
       servo_or_output_(new QStackedWidget),
       ServoSimulator1_(Named(new ServoSimulator, "ServoSimulator1")),
       lblOutput_(Named(BoldLabel(), "lblOutput")) {
+  setObjectName("fraChosenServo");
   ServoSimulator1_->setEnabled(false);
   ServoSimulator1_->setAccessibleName(QStringLiteral("Chosen channel"));
   Describe(ServoSimulator1_, "The chosen channel's servo.");
   ServoSimulator1_->DisplaySize(kLargeSimulator);
+  ServoSimulator1_->setMinimumSize(kSmallestServo);
   connect(ServoSimulator1_, &ServoSimulator::Resized, this,
           [this](Microseconds arm) { RefeedResizedSimulator(*ServoSimulator1_, Values(), arm); });
 
@@ -26,13 +34,16 @@ ChosenServo::ChosenServo(const ChannelEditor& editor, const ChannelTable& workin
 
   servo_or_output_->addWidget(ServoSimulator1_);
   servo_or_output_->addWidget(lblOutput_);
-  AddLayout<QVBoxLayout>(this, {4, 4, 4, 4})->addWidget(servo_or_output_);
+  auto* column = AddLayout<QVBoxLayout>(this, {4, 4, 4, 4}, 4);
+  column->addWidget(servo_or_output_, 1);
+  column->addWidget(new ServoLegend);
 }
 
 void ChosenServo::ShowChannel() {
   const auto channel = editor_.Channel();
   if (!channel) return;
   const QString caption = QStringLiteral("CHAN %1").arg(*channel + 1);
+  setTitle(caption);
   ServoSimulator1_->DisplayCaption(caption);
   const QString kind = OutputLabel(working_.At(*channel).PortType);
   lblOutput_->setText(caption + QStringLiteral("\n\n") + kind);

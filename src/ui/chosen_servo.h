@@ -1,4 +1,4 @@
-// ChosenServo: the large servo of the chosen channel.
+// ChosenServo: the large servo of the chosen channel, with a legend.
 #pragma once
 
 #include <QLabel>
@@ -10,6 +10,7 @@
 #include "simulator/servo_simulator.h"
 #include "ui/controls.h"
 #include "ui/model/channel_editor.h"
+#include "ui/servo_legend.h"
 #include "ui/simulator_feed.h"
 #include "unitops/live_test.h"
 

@@ -102,7 +102,7 @@ class frmNewServoConfig : public QMainWindow {
   SummaryArea* summary_ = nullptr;  // made after the first paint, or when it is first needed
 
   UnitCommands commands_;
-  Simulators simulators_{*channels_, *servo_, channel_editor_};
+  Simulators simulators_{*channels_, *servo_, parameters_->Scale(), channel_editor_};
   LiveTest live_test_;
   // Where the focus was when the running command began, and where it went when its button was disabled.
   QPointer<QWidget> focus_before_command_;

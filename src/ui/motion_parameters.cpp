@@ -1,11 +1,15 @@
 #include "ui/motion_parameters.h"
 
 #include <QEvent>
+#include <QStyle>
+#include <algorithm>
+
+#include "ui/test_icons.h"
 
 namespace tendril {
 namespace {
 
-enum Column { kName, kLeftValue, kRightValue, kSpin, kTest };
+enum Column { kName, kGap1, kLeftValue, kRightValue, kGap2, kSpin, kGap3, kPulseWidth, kGap4, kTest, kRest };
 
 struct Row {
   int row;
@@ -29,27 +33,38 @@ constexpr std::array<Row, kParameterCount> kRows{
      {6, "Default Position", "spnDefaultPos", "lblDefaultPos",
       "Where the servo rests, relative to the neutral position"}}};
 constexpr int kHeadingRow = 3;  // of those that are measured from the neutral position
-constexpr int kRemarksRow = 7;
+constexpr int kGapRow = 7;
+constexpr int kScaleRow = 8;
+constexpr int kRemarksRow = 9;
+constexpr int kRestRow = 10;
+constexpr int kGap = 12;  // between two columns
+constexpr int kMinGap = 4;
+constexpr int kCaptionGap = 2;
+constexpr int kIconGap = 4;  // between icon and text of a button
 
 // Each test stands beside the parameter that it tries; that of the stops beside both.
 struct Test {
   const char* what;
   const char* tip;
+  TestIcon icon;
   int row, rows;
   Parameter after;  // the spin button before it in the tab order
 };
 constexpr std::array<Test, LiveTest::kTestButtons> kTests{
     {{"virtual pulse range",
-      "Moves the servo to and fro through its virtual range, until the button is pressed again.", 1, 1,
-      Parameter::kVirtualRange},
+      "Moves the servo to and fro through its virtual range, until the button is pressed again.",
+      TestIcon::kSweep, 1, 1, Parameter::kVirtualRange},
      {"virtual stops",
-      "Moves the servo to and fro between its virtual stops, until the button is pressed again.", 4, 2,
-      Parameter::kRightStop},
-     {"default position", "Moves the servo to its default position.", 6, 1, Parameter::kDefaultPosition},
+      "Moves the servo to and fro between its virtual stops, until the button is pressed again.",
+      TestIcon::kSweep, 4, 2, Parameter::kRightStop},
+     {"default position", "Moves the servo to its default position.", TestIcon::kStep, 6, 1,
+      Parameter::kDefaultPosition},
      {"actual pulse range",
-      "Moves the servo to and fro through its whole actual range, until the button is pressed again.", 0, 1,
-      Parameter::kActualRange},
-     {"centre", "Moves the servo to the centre, 1500 µs.", 2, 1, Parameter::kNeutralTrim}}};
+      "Warning: goes beyond the virtual stops, to the servo's physical ends. Moves the servo to and fro "
+      "through its "
+      "whole actual range, until the button is pressed again.",
+      TestIcon::kDangerSweep, 0, 1, Parameter::kActualRange},
+     {"centre", "Moves the servo to the centre, 1500 µs.", TestIcon::kStep, 2, 1, Parameter::kNeutralTrim}}};
 
 QString WithSign(int value) { return (value < 1 ? QString() : QStringLiteral("+")) + QString::number(value); }
 
@@ -70,27 +85,30 @@ QString CaptionOf(Parameter parameter, int value) {
   return WithSign(value);
 }
 
-// The pulse widths that result from the parameter.
-QString PhysicalValue(Parameter parameter, const ChannelConfig& values) {
-  const auto range = [](const PulsePair& pair) {
-    return QStringLiteral("%1 to %2 µs").arg(pair[0]).arg(pair[1]);
-  };
-  const auto one = [](Microseconds value) { return QStringLiteral("%1 µs").arg(value); };
+// Shows the pulse widths that result from the parameter.
+void ShowPhysicalValue(Parameter parameter, const ChannelConfig& values, PulseWidthLabel& label) {
   switch (parameter) {
     case Parameter::kActualRange:
-      return range(values.ActualRange);
+      return label.ShowRange(values.ActualRange);
     case Parameter::kVirtualRange:
-      return range(values.VirtualRange);
+      return label.ShowRange(values.VirtualRange);
     case Parameter::kNeutralTrim:
-      return one(values.NeutralPosition);
+      return label.ShowPosition(values.NeutralPosition);
     case Parameter::kLeftStop:
-      return one(values.VirtualStops[0]);
+      return label.ShowPosition(values.VirtualStops[0]);
     case Parameter::kRightStop:
-      return one(values.VirtualStops[1]);
+      return label.ShowPosition(values.VirtualStops[1]);
     case Parameter::kDefaultPosition:
       break;
   }
-  return one(values.DefaultPosition);
+  label.ShowPosition(values.DefaultPosition);
+}
+
+// A caption beside a spin button, less prominent than the pulse widths.
+QLabel* CaptionLabel(QAnyStringView text = {}) {
+  auto* label = DimLabel(text);
+  label->setAlignment(Qt::AlignRight | Qt::AlignVCenter);
+  return label;
 }
 
 }  // namespace
@@ -98,16 +116,26 @@ QString PhysicalValue(Parameter parameter, const ChannelConfig& values) {
 MotionParameters::MotionParameters(ChannelEditor& editor)
     : FrameBox(QStringLiteral("Motion Parameters")),
       editor_(editor),
-      lblActPulseLeft_(Named(BoldLabel(), "lblActPulseLeft")),
-      remarks_(Named(new RemarksLabel, "lblRemarks", 0)) {
-  auto* grid = AddLayout<QGridLayout>(this, {12, 8, 12, 8});
-  grid->setHorizontalSpacing(10);
+      lblActPulseLeft_(Named(CaptionLabel(), "lblActPulseLeft")),
+      remarks_(Named(new RemarksLabel, "lblRemarks", 0)),
+      scale_(Named(new PulseScale, "PulseScale")),
+      hint_(Named(new QLabel(QStringLiteral("Choose a channel: click a servo, or Ctrl+1")), "lblNoChannel")) {
+  auto* grid = AddLayout<QGridLayout>(this, {6, 2, 6, 2});
+  grid->setHorizontalSpacing(0);  // the gaps are columns, which a narrow window shrinks
+  grid->setVerticalSpacing(1);
   AddParameters(*grid);
   AddTests(*grid);
-  grid->setColumnStretch(kName, 2);
-  grid->setColumnStretch(kRightValue, 1);
-  grid->addWidget(remarks_, kRemarksRow, kName, 1, kTest - kName + 1, Qt::AlignTop);
-  grid->setRowStretch(kRemarksRow, 1);
+  AddSpacing(*grid);
+  for (std::size_t button = 0; button < kTests.size(); ++button)
+    ShowTestRunning(static_cast<int>(button), false);
+  const int columns = kRest - kName + 1;
+  grid->addWidget(scale_, kScaleRow, kName, 1, columns);
+  grid->addWidget(hint_, kScaleRow, kName, 1, columns, Qt::AlignCenter);
+  grid->addWidget(remarks_, kRemarksRow, kName, 1, columns);
+  for (const Row& row : kRows) grid->setRowStretch(row.row, 1);
+  grid->setRowStretch(kGapRow, 1);
+  grid->setRowStretch(kRestRow, 10);
+  hint_->hide();
 }
 
 void MotionParameters::AddParameters(QGridLayout& grid) {
@@ -115,20 +143,24 @@ void MotionParameters::AddParameters(QGridLayout& grid) {
     const Row& row = kRows[i];
     const auto parameter = static_cast<Parameter>(i);
     auto* spin = spins_[i] = Named(new CalmSpinBox, row.spin);
-    auto* name = new QLabel(QString::fromUtf8(row.name));
+    auto* name = names_[i] = new QLabel(QString::fromUtf8(row.name));
     name->setBuddy(spin);
     spin->setAccessibleName(name->text());
-    captions_[i] = Named(BoldLabel(), row.caption);
+    captions_[i] = Named(CaptionLabel(), row.caption);
+    pulse_widths_[i] = new PulseWidthLabel;
+    // Only the first two rows have a caption on the left, too.
+    const int first = row.row <= 1 ? kRightValue : kLeftValue;
     grid.addWidget(name, row.row, kName);
-    grid.addWidget(captions_[i], row.row, kRightValue);
+    grid.addWidget(captions_[i], row.row, first, 1, kRightValue - first + 1);
     grid.addWidget(spin, row.row, kSpin);
+    grid.addWidget(pulse_widths_[i], row.row, kPulseWidth);
     connect(spin, &QSpinBox::valueChanged, this,
             [this, parameter](int value) { Q_EMIT Edited(editor_.Change(parameter, value)); });
   }
-  auto* bracket = Named(BoldLabel("[ +/-"), "Label13");
-  grid.addWidget(lblActPulseLeft_, 0, kLeftValue, Qt::AlignRight | Qt::AlignVCenter);
-  grid.addWidget(bracket, 1, kLeftValue, Qt::AlignRight | Qt::AlignVCenter);
-  grid.addWidget(DimLabel("Relative to Neutral"), kHeadingRow, kName, 1, 3, Qt::AlignBottom);
+  auto* bracket = Named(CaptionLabel("[ +/-"), "Label13");
+  grid.addWidget(lblActPulseLeft_, 0, kLeftValue);
+  grid.addWidget(bracket, 1, kLeftValue);
+  grid.addWidget(DimLabel("Relative to Neutral"), kHeadingRow, kName, 1, kSpin, Qt::AlignBottom);
   MakePressable(bracket);
   for (const Parameter parameter :
        {Parameter::kVirtualRange, Parameter::kLeftStop, Parameter::kRightStop, Parameter::kDefaultPosition}) {
@@ -141,12 +173,34 @@ void MotionParameters::AddTests(QGridLayout& grid) {
     const Test& test = kTests[i];
     const int button = static_cast<int>(i);
     cmdTest_[i] = Named(new QPushButton, "cmdTest", i);
+    cmdTest_[i]->setIcon(MakeTestIcon(test.icon, *cmdTest_[i]));
+    cmdTest_[i]->setIconSize(kTestIconSize);
     Describe(cmdTest_[i], test.tip);
-    ShowTestRunning(button, false);
     grid.addWidget(cmdTest_[i], test.row, kTest, test.rows, 1);
     setTabOrder(spins_[static_cast<std::size_t>(test.after)], cmdTest_[i]);
     connect(cmdTest_[i], &QAbstractButton::clicked, this, [this, button] { Q_EMIT TestPressed(button); });
   }
+}
+
+// What is left of the width goes to the right of the test buttons. No text that changes moves anything.
+void MotionParameters::AddSpacing(QGridLayout& grid) {
+  for (const int gap : {kGap1, kGap2, kGap3, kGap4}) {
+    grid.addItem(new QSpacerItem(kGap, 0, QSizePolicy::Preferred), 0, gap);
+    grid.setColumnMinimumWidth(gap, kMinGap);
+  }
+  const QFontMetrics metrics = fontMetrics();
+  grid.setColumnMinimumWidth(kLeftValue, metrics.horizontalAdvance(QStringLiteral("[ +/-")) + kCaptionGap);
+  grid.setColumnMinimumWidth(kRightValue, metrics.horizontalAdvance(QStringLiteral("-0000]")) + 1);
+
+  QPushButton& widest = *cmdTest_[0];
+  widest.setText(QStringLiteral("Stop"));
+  grid.addItem(new QSpacerItem(widest.sizeHint().width(), 0, QSizePolicy::Preferred), kHeadingRow, kTest);
+  // Styles ask for more room than a button needs.
+  const int needed = kTestIconSize.width() + kIconGap + metrics.horizontalAdvance(widest.text()) +
+                     style()->pixelMetric(QStyle::PM_ButtonMargin) +
+                     2 * style()->pixelMetric(QStyle::PM_DefaultFrameWidth);
+  for (QPushButton* test : cmdTest_) test->setMinimumWidth(needed);
+  grid.setColumnStretch(kRest, 1);
 }
 
 void MotionParameters::MakePressable(QLabel* label) {
@@ -172,18 +226,34 @@ void MotionParameters::EnableTests(const QString& why_not) {
   for (QPushButton* test : cmdTest_) EnableUnless(why_not, test);
 }
 
+// Dimmed, not disabled: the spin buttons work without a channel, too.
+void MotionParameters::ShowHasChannel() {
+  const bool has_channel = editor_.Channel().has_value();
+  if (hint_->isHidden() == has_channel) return;
+  hint_->setVisible(!has_channel);
+  const auto role = has_channel ? QPalette::WindowText : QPalette::PlaceholderText;
+  for (QLabel* name : names_) name->setForegroundRole(role);
+  for (QLabel* pulse_width : pulse_widths_) pulse_width->setForegroundRole(role);
+}
+
 void MotionParameters::ShowValues() {
+  ShowHasChannel();
+  const ChannelConfig values = editor_.WorkingValues();
+  scale_->ShowValues(editor_.Channel() ? std::optional(values) : std::nullopt);
   lblActPulseLeft_->setNum(kCentrePulseWidth - editor_.Spin(Parameter::kActualRange).Value());
   for (std::size_t i = 0; i < kRows.size(); ++i) {
     const auto parameter = static_cast<Parameter>(i);
     const BoundedValue& value = editor_.Spin(parameter);
     spins_[i]->Show(value);
     captions_[i]->setText(CaptionOf(parameter, value.Value()));
+    ShowPhysicalValue(parameter, values, *pulse_widths_[i]);
+    pulse_widths_[i]->setAccessibleName(names_[i]->text() + QStringLiteral(": ") +
+                                        pulse_widths_[i]->InFull());
     Describe(spins_[i], QStringLiteral("%1. From %2 to %3 µs; now %4.")
                             .arg(QString::fromUtf8(kRows[i].what))
                             .arg(value.Minimum())
                             .arg(value.Maximum())
-                            .arg(PhysicalValue(parameter, editor_.WorkingValues())));
+                            .arg(pulse_widths_[i]->InFull()));
   }
 }
 

@@ -1,4 +1,5 @@
-// MotionParameters: the six parameters that spin buttons set, each with its test beside it.
+// MotionParameters: the six parameters that spin buttons set, each with its pulse widths and its test beside it, and all
+// of them on a scale.
 #pragma once
 
 #include <QGridLayout>
@@ -10,6 +11,8 @@
 
 #include "ui/controls.h"
 #include "ui/model/channel_editor.h"
+#include "ui/pulse_scale.h"
+#include "ui/pulse_width_label.h"
 #include "ui/remarks_label.h"
 #include "unitops/live_test.h"
 
@@ -23,12 +26,14 @@ class MotionParameters : public FrameBox {
   // `editor` must outlive the area.
   explicit MotionParameters(ChannelEditor& editor);
 
-  // Shows values, limits and captions. Emits no signal.
+  // Shows values, limits and captions, and whether there is a channel to edit. Emits no signal.
   void ShowValues();
   // Shows remarks on the records.
   void ShowRemarks(const std::vector<std::string>& sentences) { remarks_->ShowRemarks(sentences); }
   // Captions test button `button`, 0 to 4: "Stop" while its sweep runs, else "Test".
   void ShowTestRunning(int button, bool running);
+  // The scale, for its arm.
+  PulseScale& Scale() { return *scale_; }
   // Enables the test buttons unless there is a reason not to.
   void EnableTests(const QString& why_not);
 
@@ -46,14 +51,20 @@ class MotionParameters : public FrameBox {
  private:
   void AddParameters(QGridLayout& grid);
   void AddTests(QGridLayout& grid);
+  void AddSpacing(QGridLayout& grid);
   void MakePressable(QLabel* label);
+  void ShowHasChannel();
 
   ChannelEditor& editor_;
   std::array<CalmSpinBox*, kParameterCount> spins_{};
+  std::array<QLabel*, kParameterCount> names_{};
   std::array<QLabel*, kParameterCount> captions_{};
+  std::array<PulseWidthLabel*, kParameterCount> pulse_widths_{};
   std::array<QPushButton*, LiveTest::kTestButtons> cmdTest_{};
   QLabel* lblActPulseLeft_;
   RemarksLabel* remarks_;
+  PulseScale* scale_;
+  QLabel* hint_;  // that no channel is chosen; lies on the scale
 };
 
 }  // namespace tendril

@@ -1,4 +1,5 @@
 // The editor in the real window: what clicks and keys do to records, captions and servos.
+#include <QAbstractSlider>
 #include <tuple>
 
 #include "window_fixture.h"
@@ -95,6 +96,32 @@ TEST_F(Editor, WithoutAChannel_StoresNothing) {
   Press("chkUpdate_8");
   EXPECT_TRUE(Checked("chkUpdate_5"));
   EXPECT_TRUE(window_->WorkingConfiguration() == before);
+}
+
+TEST_F(Editor, PulseScale_ShowsTheEditedValuesAndTheArm) {
+  const auto words = [&] { return Accessible("PulseScale").text(QAccessible::Description).toStdString(); };
+  const auto title = [&] { return Find("fraChosenServo").property("title").toString().toStdString(); };
+  EXPECT_EQ(title(), "Channel");
+  EXPECT_EQ(Text("lblNoChannel"), "Choose a channel: click a servo, or Ctrl+1");
+  EXPECT_TRUE(Visible("lblNoChannel"));
+  EXPECT_EQ(words(), "No channel is chosen.");
+
+  Click("ServoSimulator2_2");
+  EXPECT_EQ(title(), "CHAN 3");
+  EXPECT_FALSE(Visible("lblNoChannel"));
+  const QImage before = Find("PulseScale").grab().toImage();
+  Type("spnNeutralTrim", "100");
+  Press("cmdTest_2");  // to the record's default position, which only leaving the channel changes
+  EXPECT_THAT(words(),
+              testing::HasSubstr("virtual range 1100 to 2100 µs, stop range 1100 to 2100 µs, "
+                                 "default position 1600 µs, neutral position 1600 µs, arm at 1500 µs"));
+  Find<QAbstractSlider>("HScrollSendServoPosition").setValue(600);
+  EXPECT_THAT(words(), testing::HasSubstr("arm at 1600 µs"));
+  EXPECT_NE(Find("PulseScale").grab().toImage(), before);
+
+  // In the smallest window nothing of the editor is cut off.
+  const QSize needed = Spin("spnNeutralTrim").parentWidget()->minimumSizeHint();
+  EXPECT_EQ(needed.boundedTo({440, 330}), needed);
 }
 
 TEST_F(Editor, OutputKind_ReplacesTheServo) {

@@ -1,0 +1,119 @@
+#include "ui/pulse_scale.h"
+
+#include <QAccessible>
+#include <QAccessibleWidget>
+#include <QFontMetricsF>
+#include <QPainter>
+#include <cmath>
+
+#include "ui/controls.h"
+#include "ui/servo_parts.h"
+
+namespace tendril {
+namespace {
+
+// The accessible interface: a picture, described in words.
+class ScaleAccessible : public QAccessibleWidget {
+ public:
+  explicit ScaleAccessible(PulseScale* scale)
+      : QAccessibleWidget(scale, QAccessible::Graphic), scale_(*scale) {}
+
+  static QAccessibleInterface* Create(const QString&, QObject* object) {
+    auto* scale = qobject_cast<PulseScale*>(object);
+    return scale != nullptr ? new ScaleAccessible(scale) : nullptr;
+  }
+
+  QString text(QAccessible::Text kind) const override {
+    return kind == QAccessible::Description ? scale_.InWords() : QAccessibleWidget::text(kind);
+  }
+
+ private:
+  const PulseScale& scale_;
+};
+
+}  // namespace
+
+PulseScale::PulseScale() {
+  [[maybe_unused]] static const bool installed =
+      (QAccessible::installFactory(&ScaleAccessible::Create), true);
+  setAccessibleName(QStringLiteral("Pulse scale"));
+  Describe(this,
+           "What the editor shows, as pulse widths. A longer pulse turns the servo to the left: so the left "
+           "stop, the "
+           "shorter pulse, is the right edge in the picture of the servo.");
+  setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Maximum);
+}
+
+void PulseScale::ShowValues(const std::optional<ChannelConfig>& shown) {
+  if (shown == shown_) return;
+  shown_ = shown;
+  update();
+  if (!QAccessible::isActive()) return;
+  QAccessibleEvent event(this, QAccessible::DescriptionChanged);
+  QAccessible::updateAccessibility(&event);
+}
+
+// Only the servo reports the arm to assistive technology.
+void PulseScale::MoveArm(Microseconds arm) {
+  if (arm == arm_) return;
+  arm_ = arm;
+  if (shown_) update();
+}
+
+QString PulseScale::InWords() const {
+  if (!shown_) return QStringLiteral("No channel is chosen.");
+  QString words = QStringLiteral("Actual range ");
+  for (const PulseFieldText& field : PulseFieldTexts(*shown_))
+    words += QString::fromStdString(field.InWords()) + QStringLiteral(" µs, ");
+  return words + QStringLiteral("arm at %1 µs. A longer pulse turns the servo to the left.").arg(arm_);
+}
+
+ScaleRoom PulseScale::Room() const {
+  const QFontMetricsF metrics(font());
+  return {
+      static_cast<double>(width()), static_cast<double>(height()), metrics.height(),
+      [metrics](const std::string& text) { return metrics.horizontalAdvance(QString::fromStdString(text)); }};
+}
+
+QSize PulseScale::sizeHint() const {
+  return {minimumSizeHint().width(), static_cast<int>(MaximumScaleHeight(Room().line_height))};
+}
+
+QSize PulseScale::minimumSizeHint() const {
+  const ScaleRoom room = Room();
+  return {static_cast<int>(std::ceil(MinimumScaleWidth(room))),
+          static_cast<int>(std::ceil(MinimumScaleHeight(room.line_height)))};
+}
+
+void PulseScale::paintEvent(QPaintEvent*) {
+  QPainter painter(this);
+  std::optional<ScaleValues> values;
+  if (shown_) values = {*shown_, arm_};
+  for (const ScaleElement& element : LayOutPulseScale(values, Room())) Paint(painter, element);
+}
+
+void PulseScale::Paint(QPainter& painter, const ScaleElement& element) const {
+  const QRectF box(element.x, element.y, element.width, element.height);
+  const QColor text = palette().color(shown_ ? QPalette::WindowText : QPalette::PlaceholderText);
+  switch (element.shape) {
+    case ScaleShape::kBar:
+      PaintBar(painter, element.part, box);
+      return;
+    case ScaleShape::kLine:
+      if (element.part == ScalePart::kAxis) {
+        painter.fillRect(box, text);
+      } else {
+        PaintLine(painter, element.part, box);
+      }
+      return;
+    case ScaleShape::kNumber:
+      painter.setPen(Qt::black);
+      break;
+    case ScaleShape::kText:
+      painter.setPen(text);
+      break;
+  }
+  painter.drawText(box, Qt::AlignCenter | Qt::TextSingleLine, QString::fromStdString(element.text));
+}
+
+}  // namespace tendril

@@ -1,0 +1,54 @@
+#include "ui/pulse_width_label.h"
+
+#include <QResizeEvent>
+
+namespace tendril {
+namespace {
+
+QString InWords(int first, int second) { return QStringLiteral("%1 to %2 µs").arg(first).arg(second); }
+QString InBrief(int first, int second) { return QStringLiteral("%1–%2").arg(first).arg(second); }
+
+}  // namespace
+
+PulseWidthLabel::PulseWidthLabel() {
+  QFont bold = font();
+  bold.setBold(true);
+  setFont(bold);
+  setSizePolicy(QSizePolicy::Preferred, QSizePolicy::Preferred);
+}
+
+void PulseWidthLabel::ShowRange(const PulsePair& ends) {
+  Show(InWords(ends[0], ends[1]), InBrief(ends[0], ends[1]));
+}
+
+void PulseWidthLabel::ShowPosition(Microseconds position) {
+  const QString text = QStringLiteral("%1 µs").arg(position);
+  Show(text, text);
+}
+
+void PulseWidthLabel::Show(const QString& full, const QString& brief) {
+  full_ = full;
+  brief_ = brief;
+  Fit();
+}
+
+// All digits are equally wide, and no pulse width has more of them.
+QSize PulseWidthLabel::sizeHint() const {
+  return {fontMetrics().horizontalAdvance(InWords(kMaxPulseWidth, kMaxPulseWidth)) + 1,
+          fontMetrics().height()};
+}
+
+QSize PulseWidthLabel::minimumSizeHint() const {
+  return {fontMetrics().horizontalAdvance(InBrief(kMaxPulseWidth, kMaxPulseWidth)) + 1,
+          fontMetrics().height()};
+}
+
+void PulseWidthLabel::resizeEvent(QResizeEvent* event) {
+  QLabel::resizeEvent(event);
+  Fit();
+}
+
+// All ranges change their form at the same width.
+void PulseWidthLabel::Fit() { setText(width() < sizeHint().width() ? brief_ : full_); }
+
+}  // namespace tendril

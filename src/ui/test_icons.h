@@ -1,0 +1,21 @@
+// The icons of the test buttons.
+#pragma once
+
+#include <QAbstractButton>
+#include <QIcon>
+#include <QSize>
+
+namespace tendril {
+
+enum class TestIcon {
+  kStep,         // the servo moves once
+  kSweep,        // it moves to and fro
+  kDangerSweep,  // it moves to and fro as far as it can
+};
+
+inline constexpr QSize kTestIconSize(26, 14);
+
+// An icon in the colour that the text of `button` has at each time. For `button` alone: no copy may outlive it.
+QIcon MakeTestIcon(TestIcon kind, const QAbstractButton& button);
+
+}  // namespace tendril
