@@ -1,9 +1,11 @@
 // tendril-demo-show: works the demonstration's window by itself, on a machine without a display.
+#include <QAction>
 #include <QApplication>
 #include <QCommandLineParser>
 #include <QDir>
 #include <QElapsedTimer>
 #include <QPixmap>
+#include <QSize>
 #include <QSpinBox>
 #include <QTest>
 #include <QTimer>
@@ -29,7 +31,6 @@ namespace tendril::test {
 namespace {
 
 constexpr int kMaxStepMs = 30'000;
-constexpr QSize kPictureSize(1280, 800);
 
 void Print(const std::string& line) {
   std::puts(line.c_str());
@@ -43,10 +44,10 @@ void Require(bool met, const std::string& otherwise) {
 // Each step raises std::runtime_error when it does not succeed.
 class Show {
  public:
-  // Saves pictures in `folder`, which is created.
-  explicit Show(const QString& folder) : folder_(folder) {
+  // Saves pictures of a window of this size in `folder`, which is created.
+  Show(const QString& folder, const QSize& size) : folder_(folder) {
     QDir().mkpath(folder);
-    program_.window.resize(kPictureSize);
+    program_.window.resize(size);
     program_.window.show();
     user_.SetWindow(program_.window);
     QApplication::processEvents();
@@ -55,14 +56,14 @@ class Show {
   // Sends the configuration to unit 01, reads that of unit 0A, which is another, and reads unit 01 back. Then takes Comm
   // 3 from the Control Panel and gives it back. Prints what crosses the line and the connection to the panel.
   void Demonstrate() {
-    SavePicture("window-start.png");
+    SavePicture("start.png");
     line_.SetTap([this](const LineByte& byte) { printer_.Note(byte); });
     user_.ChoosePort(1);
     Print("Chosen: Comm 1, unit 01. Sending the configuration of eight ports ...");
     Send();
     const ChannelTable sent = program_.window.WorkingConfiguration();
     Read(10, program_.bench.unit_0a);
-    SavePicture("window-read.png");
+    SavePicture("read.png");
     Read(1, program_.bench.unit_01);
     line_.SetTap(nullptr);
     Require(program_.window.WorkingConfiguration() == sent, "What was read back is not what was sent.");
@@ -70,29 +71,36 @@ class Show {
     PassPortBackAndForth();
   }
 
-  // Pictures of the editor with a servo, a digital and a PWM channel, of the summary, of a number entry open in it, and
-  // of the question for a port.
+  // Pictures of the window at the start, of the editor with a servo, a digital and a PWM channel, of a send, of the
+  // summary, of a number entry open in it, of the question for a port, and of what the help menu shows.
   void TakePictures() {
+    SavePicture("start.png");
+    user_.ChoosePort(1);
     Press("ServoSimulator2_2");
     Press("chkUpdate_6");
     Step("spnNeutralTrim", 10);
     Step("spnLeftVirtStop", 15);
     Step("spnDefaultPos", -20);
-    SavePicture("window-servo.png");
+    SavePicture("servo.png");
     Press("ServoSimulator2_4");
     Press("optChannelType_1");
-    SavePicture("window-digital.png");
+    SavePicture("digital.png");
     Press("ServoSimulator2_5");
     Press("optChannelType_2");
-    SavePicture("window-pwm.png");
+    SavePicture("pwm.png");
 
     Press("cmdShowSummary");
     auto& text = user_.Find("txtSumStopRange_3");
     Await([&text] { return text.isVisible(); }, "the summary");
-    SavePicture("window-summary.png");
+    SavePicture("summary.png");
     QTest::mouseClick(&text, Qt::LeftButton);
-    SavePicture("window-number-entry.png");
+    SavePicture("number-entry.png");
+    Press("cmdShowConfig");
+    Press("ServoSimulator2_2");
+    Send();
     SavePictureOfQuestion();
+    SavePictureOfDialog("&About", "AboutDialog", "about.png");
+    SavePictureOfDialog("&Keys", "KeysDialog", "keys.png");
   }
 
  private:
@@ -123,12 +131,22 @@ class Show {
     QTimer::singleShot(0, qApp, [&] {
       QWidget* const box = QApplication::activeModalWidget();
       if (box == nullptr) return;
-      SavePicture(*box, "window-port-in-use.png");
+      SavePicture(*box, "port-in-use.png");
       saved = true;
       box->close();
     });
     user_.ChoosePort(kDemoPanelPort);
     Require(saved, "No question for Comm 3");
+  }
+
+  void SavePictureOfDialog(const char* menu_item, const char* dialog, const char* name) const {
+    for (auto* action : program_.window.findChildren<QAction*>()) {
+      if (action->text() == QString::fromUtf8(menu_item)) action->trigger();
+    }
+    auto& shown = user_.Find(dialog);
+    QApplication::processEvents();
+    SavePicture(shown, name);
+    shown.close();
   }
 
   void AwaitOutcome(const char* success) {
@@ -149,10 +167,10 @@ class Show {
     // In the pause between two ports: a picture takes longer than a unit waits for the line.
     Await([&] { return user_.CommandOver() || (unit.accepted_commands() >= 4 && !line_.NextEventUs()); },
           "the fourth port of a send");
-    SavePicture("window-sending.png");
+    SavePicture("sending.png");
     AwaitOutcome("SUCCESS: Send Complete!");
     Compare(unit);
-    SavePicture("window-sent.png");
+    SavePicture("sent.png");
   }
 
   // Reads the configuration of unit 0`digit`.
@@ -221,19 +239,23 @@ int main(int argc, char** argv) {
   parser.addHelpOption();
   const QCommandLineOption pictures(
       QStringLiteral("pictures"),
-      QStringLiteral("Only save pictures of the editor, of the summary and of the question for a port."));
+      QStringLiteral("Only save pictures: of every view of the window, and of its dialogs."));
   const QCommandLineOption dark(QStringLiteral("dark"), QStringLiteral("Light text on a dark background."));
-  parser.addOptions({pictures, dark});
+  const QCommandLineOption size(QStringLiteral("size"), QStringLiteral("The size of the window."),
+                                QStringLiteral("width>x<height"), QStringLiteral("1280x800"));
+  parser.addOptions({pictures, dark, size});
   parser.addPositionalArgument(QStringLiteral("folder"), QStringLiteral("Where to save the pictures."));
   parser.process(application);
   if (parser.positionalArguments().size() != 1) parser.showHelp(EXIT_FAILURE);
   if (parser.isSet(dark)) tendril::SetDarkAppearance(true);
   try {
-    tendril::test::Show show(parser.positionalArguments().constFirst());
+    const QStringList sides = parser.value(size).split(QLatin1Char('x'));
+    tendril::test::Require(sides.size() == 2, "The size needs a width and a height.");
+    tendril::test::Show show(parser.positionalArguments().constFirst(), {sides[0].toInt(), sides[1].toInt()});
     parser.isSet(pictures) ? show.TakePictures() : show.Demonstrate();
     return EXIT_SUCCESS;
   } catch (const std::exception& fault) {
-    tendril::test::Print(fault.what());
+    std::fprintf(stderr, "%s\n", fault.what());
     return EXIT_FAILURE;
   }
 }

@@ -42,7 +42,7 @@ QLineEdit* FactField(const QString& value) {
 
 AboutDialog::AboutDialog(const ProgramInfo& info, QWidget& window)
     : QDialog(&window), text_(QStringLiteral("Tendril Configuration Utility\n")) {
-  setObjectName(QStringLiteral("aboutDialog"));
+  setObjectName(QStringLiteral("AboutDialog"));
   setWindowTitle(QStringLiteral("About Tendril Configuration Utility"));
   facts_->setVerticalSpacing(4);
   auto* heading = new QHBoxLayout;

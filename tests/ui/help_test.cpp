@@ -17,7 +17,7 @@ using testing::HasSubstr;
 TEST_F(Window, About_CopiesEveryFactThatItShows) {
   ShowAbout(*window_, info_);
   EXPECT_EQ(window_->windowIcon().availableSizes().size(), 6);
-  auto& about = Find<QDialog>("aboutDialog");
+  auto& about = Find<QDialog>("AboutDialog");
   for (auto* button : about.findChildren<QPushButton*>())
     if (button->toolTip().startsWith(QStringLiteral("Copies"))) button->click();
   const std::string copied = QGuiApplication::clipboard()->text().toStdString();
