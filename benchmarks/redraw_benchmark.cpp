@@ -183,11 +183,15 @@ class BareStrokes {
 
   void AddLine(const DialElement& line) {
     const Qt::PenCapStyle cap = line.part == DialPart::kArm ? Qt::RoundCap : Qt::FlatCap;
-    const QPen pen(ToColour(line.fill), line.line_width, Qt::SolidLine, cap);
-    strokes_.push_back([axis = QLineF(ToPoint(line.from), ToPoint(line.to)), pen](QPainter& painter) {
-      painter.setPen(pen);
-      painter.drawLine(axis);
-    });
+    const QLineF axis(ToPoint(line.from), ToPoint(line.to));
+    const auto add = [&](DialColour colour, double width) {
+      strokes_.push_back([axis, pen = QPen(ToColour(colour), width, Qt::SolidLine, cap)](QPainter& painter) {
+        painter.setPen(pen);
+        painter.drawLine(axis);
+      });
+    };
+    if (line.outline_width > 0) add(line.outline, line.line_width + 2 * line.outline_width);
+    add(line.fill, line.line_width);
   }
 
   void AddLineOutline(const DialElement& line) {

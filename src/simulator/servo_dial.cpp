@@ -25,6 +25,9 @@ constexpr double kTextTop = 0.62;  // of the first row of angle texts
 constexpr double kTextRow = 0.11;  // from row to row
 constexpr double kInnerBodyInset = 2;
 constexpr double kBaseLineWidth = 1;
+// Separates arm and default marker from all arcs and from a light window.
+constexpr DialColour kPointerOutline = 0x404040;
+constexpr double kPointerOutlineWidth = 0.75;
 // A picture whose aspect ratio is larger is drawn in its middle part only, so that the servo is not distorted.
 constexpr double kMaxAspect = 2;
 
@@ -111,13 +114,17 @@ class ServoDial::Picture {
     const DialPoint centre = Centre();
     const double drawn = Drawable(angle);
     const bool outline = part == DialPart::kDefaultMarkerOutline;
+    const double dark_outline = part == DialPart::kArm             ? kPointerOutlineWidth
+                                : part == DialPart::kDefaultMarker ? kBaseLineWidth + kPointerOutlineWidth
+                                                                   : 0;
     elements_.push_back({.part = part,
                          .shape = outline ? DialShape::kLineOutline : DialShape::kLine,
                          .from = centre,
                          .to = {centre.x + length * std::cos(drawn), centre.y - length * std::sin(drawn)},
                          .fill = fill,
+                         .outline = kPointerOutline,
                          .line_width = width,
-                         .outline_width = outline ? kBaseLineWidth : 0});
+                         .outline_width = outline ? kBaseLineWidth : dark_outline});
   }
 
   void AddText(DialPart part, DialPoint middle_top, double room, DialColour plate, std::string_view text) {

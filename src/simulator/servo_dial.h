@@ -81,9 +81,9 @@ struct DialElement {
   double start_angle = 0;    // pie: radians; the pie lies counterclockwise from here
   double sweep_angle = 0;    // pie: radians, 0 or more
   DialColour fill = 0;       // box and pie: the area; lines: the stroke; text: the plate
-  DialColour outline = 0;    // box and pie
+  DialColour outline = 0;    // box, pie and line
   double line_width = 0;     // lines: of the line; box and pie: of the outline centred on the edge
-  double outline_width = 0;  // box and line outline: of the outline outside the edge
+  double outline_width = 0;  // box, line and line outline: of the outline outside the edge
   double room = 0;           // text: the width that it should not exceed while it stays readable
   std::string text{};        // UTF-8
 };

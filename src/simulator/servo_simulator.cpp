@@ -17,6 +17,10 @@ constexpr int kMargin = 5;  // around the picture
 constexpr double kCornerRadius = 4;
 constexpr int kPressedShade = 112;  // percent, as QColor::darker takes it
 constexpr double kFocusRingWidth = 1.5;
+constexpr int kLeastLightness = 152;  // of a window to which the blue of the selection has a contrast of 3
+constexpr double kSelectionOutline = 1;
+constexpr double kMarkSize = 12;  // of the check mark of the selection
+constexpr double kMarkLine = 1.6;
 constexpr double kAngleTextScale = 0.75;  // of the control's font
 constexpr double kMinTextScale = 0.8;     // of a text's full size
 constexpr double kMinTextPixels = 7;
@@ -28,6 +32,13 @@ QPointF ToPoint(DialPoint point) { return {point.x, point.y}; }
 QSize SquareFor(const DialSizes& sizes, int small, int medium, int normal) {
   const int side = sizes == kSmallSizes ? small : sizes == kMediumSizes ? medium : normal;
   return {side, side};
+}
+
+void PaintFocus(QPainter& painter, const QRectF& rect, const QColor& colour) {
+  const double middle = kMargin / 2.0;
+  painter.setPen(QPen(colour, kFocusRingWidth));
+  painter.setBrush(Qt::NoBrush);
+  painter.drawRoundedRect(rect.adjusted(middle, middle, -middle, -middle), kCornerRadius, kCornerRadius);
 }
 
 // Draws the elements of a dial. The top left corner of the picture is the origin of the painter.
@@ -86,8 +97,12 @@ class DialPainter {
 
   void Line(const DialElement& line) {
     const Qt::PenCapStyle cap = line.part == DialPart::kArm ? Qt::RoundCap : Qt::FlatCap;
-    painter_.setPen(QPen(ToColour(line.fill), line.line_width, Qt::SolidLine, cap));
-    painter_.drawLine(ToPoint(line.from), ToPoint(line.to));
+    const auto draw = [&](DialColour colour, double width) {
+      painter_.setPen(QPen(ToColour(colour), width, Qt::SolidLine, cap));
+      painter_.drawLine(ToPoint(line.from), ToPoint(line.to));
+    };
+    if (line.outline_width > 0) draw(line.outline, line.line_width + 2 * line.outline_width);
+    draw(line.fill, line.line_width);
   }
 
   void LineOutline(const DialElement& line) {
@@ -202,6 +217,29 @@ QColor ToColour(DialColour colour) {
                 static_cast<int>(colour >> 16 & 0xFF));
 }
 
+void PaintSelection(QPainter& painter, const QRectF& rect, const QPalette& palette, const QColor& inside,
+                    bool focus) {
+  const QColor blue = ToColour(kSelectedBackground);
+  const auto paint_all = [&](const QColor& colour, double inset) {
+    painter.setBrush(colour);
+    painter.drawRoundedRect(rect.adjusted(inset, inset, -inset, -inset), kCornerRadius, kCornerRadius);
+  };
+  const bool too_dark = palette.color(QPalette::Window).lightness() < kLeastLightness;
+  painter.setRenderHint(QPainter::Antialiasing);
+  painter.setPen(Qt::NoPen);
+  if (too_dark) paint_all(palette.color(QPalette::WindowText), 0);
+  paint_all(blue, too_dark ? kSelectionOutline : 0);
+  painter.fillRect(rect.adjusted(kMargin, kMargin, -kMargin, -kMargin), inside);
+
+  const QRectF corner(rect.right() - kMargin - kMarkSize, rect.top() + kMargin, kMarkSize, kMarkSize);
+  painter.fillRect(corner, blue);
+  painter.setPen(QPen(Qt::white, kMarkLine, Qt::SolidLine, Qt::RoundCap, Qt::RoundJoin));
+  std::array<QPointF, 3> mark{{{0.2, 0.45}, {0.45, 0.7}, {0.85, 0.15}}};
+  for (QPointF& point : mark) point = corner.topLeft() + point * kMarkSize;
+  painter.drawPolyline(mark.data(), static_cast<int>(mark.size()));
+  if (focus) PaintFocus(painter, rect, Qt::white);
+}
+
 ServoSimulator::ServoSimulator(QWidget* parent)
     : QAbstractButton(parent), announced_pulse_(dial_.arm_pulse()) {
   [[maybe_unused]] static const bool installed =
@@ -304,20 +342,12 @@ void ServoSimulator::PaintBackground(QPainter& painter) const {
   const QColor face = palette().color(QPalette::Button);
   const QColor button = isDown() ? face.darker(kPressedShade) : face;
   const QRectF whole = rect();
-  painter.setPen(Qt::NoPen);
   painter.fillRect(whole, button);
   painter.setRenderHint(QPainter::Antialiasing);
   if (dial_.selected()) {
-    painter.setBrush(ToColour(kSelectedBackground));
-    painter.drawRoundedRect(whole, kCornerRadius, kCornerRadius);
-    painter.fillRect(whole.adjusted(kMargin, kMargin, -kMargin, -kMargin), button);
-  }
-  if (hasFocus()) {
-    const double middle = kMargin / 2.0;
-    painter.setPen(
-        QPen(dial_.selected() ? QColor(Qt::white) : palette().color(QPalette::WindowText), kFocusRingWidth));
-    painter.setBrush(Qt::NoBrush);
-    painter.drawRoundedRect(whole.adjusted(middle, middle, -middle, -middle), kCornerRadius, kCornerRadius);
+    PaintSelection(painter, whole, palette(), button, hasFocus());
+  } else if (hasFocus()) {
+    PaintFocus(painter, whole, palette().color(QPalette::WindowText));
   }
 }
 

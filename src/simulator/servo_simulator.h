@@ -3,6 +3,8 @@
 
 #include <QAbstractButton>
 #include <QColor>
+#include <QPalette>
+#include <QRectF>
 #include <QString>
 #include <cstdint>
 
@@ -14,6 +16,11 @@ namespace tendril {
 
 // `colour` as Qt has it.
 QColor ToColour(DialColour colour);
+
+// Paints the background of a selected servo into `rect`: blue, with an outline where the window is too dark for it, a
+// check mark in the corner, and `inside` where the picture lies. Adds the line that shows the focus.
+void PaintSelection(QPainter& painter, const QRectF& rect, const QPalette& palette, const QColor& inside,
+                    bool focus);
 
 // Shows one servo channel as a picture. The operations below set what it shows, in degrees (0 straight up, positive to
 // the right) or in microseconds (a longer pulse turns the arm left). Operations that convert raise

@@ -25,14 +25,6 @@ double Luminance(const QColor& colour) {
   return 0.2126 * Linear(colour.red()) + 0.7152 * Linear(colour.green()) + 0.0722 * Linear(colour.blue());
 }
 
-QColor Blended(const QColor& colour, const QColor& background) {
-  const auto mix = [part = colour.alpha() / kOpaque](int over, int under) {
-    return static_cast<int>(std::lround(over * part + under * (1 - part)));
-  };
-  return {mix(colour.red(), background.red()), mix(colour.green(), background.green()),
-          mix(colour.blue(), background.blue())};
-}
-
 // The first colour on the way from `colour` to white or to black that has the contrast; nothing when none has.
 std::optional<QColor> Towards(bool white, const QColor& colour, const QColor& background, double ratio) {
   const auto at = [&](int steps) {
@@ -87,13 +79,22 @@ void SetTheme(const QString& system_style, std::optional<bool> dark) {
 
 }  // namespace
 
+QColor OnBackground(const QColor& colour, const QColor& background) {
+  const auto mix = [part = colour.alpha() / kOpaque](int over, int under) {
+    return static_cast<int>(std::lround(over * part + under * (1 - part)));
+  };
+  return {mix(colour.red(), background.red()), mix(colour.green(), background.green()),
+          mix(colour.blue(), background.blue())};
+}
+
 double ContrastRatio(const QColor& colour, const QColor& background) {
-  const auto [dark, light] = std::minmax({Luminance(Blended(colour, background)), Luminance(background)});
+  const auto [dark, light] =
+      std::minmax({Luminance(OnBackground(colour, background)), Luminance(background)});
   return (light + 0.05) / (dark + 0.05);
 }
 
 QColor WithContrast(const QColor& colour, const QColor& background, double ratio) {
-  const QColor opaque = Blended(colour, background);
+  const QColor opaque = OnBackground(colour, background);
   if (ContrastRatio(opaque, background) >= ratio) return colour;
   const bool lighter = Luminance(opaque) > Luminance(background);
   for (const bool white : {lighter, !lighter}) {

@@ -10,6 +10,9 @@ namespace tendril {
 inline constexpr double kTextContrast = 4.5;
 inline constexpr double kEdgeContrast = 3;
 
+// The opaque colour that a translucent one shows on `background`.
+QColor OnBackground(const QColor& colour, const QColor& background);
+
 // The contrast ratio of WCAG 2.1, 1 to 21. A translucent `colour` lies on `background`.
 double ContrastRatio(const QColor& colour, const QColor& background);
 

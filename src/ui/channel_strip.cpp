@@ -9,11 +9,6 @@ namespace {
 // Eight of them fit into a window 910 wide, and all of a window 700 high.
 constexpr QSize kSmallestSimulator(80, 80);
 
-// The same background as that of a selected servo.
-constexpr char kSelectedOutput[] =
-    "QPushButton { background-color: #0000ff; color: white; border: 2px solid #0000ff; }"
-    "QPushButton:focus { border-color: white; }";
-
 }  // namespace
 
 ChannelStrip::ChannelStrip(const ChannelTable& working)
@@ -34,11 +29,7 @@ QWidget* ChannelStrip::MakeCell(std::size_t channel) {
            QStringLiteral("Chooses channel %1, to edit it and to move its servo.").arg(channel + 1));
 
   auto* output = cmdDigitalOutput_[channel] = Named(new OutputButton, "cmdDigitalOutput", channel);
-  output->setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Expanding);
   Describe(output, QStringLiteral("Chooses channel %1, to edit it.").arg(channel + 1));
-  QFont bold = output->font();
-  bold.setBold(true);
-  output->setFont(bold);
 
   connect(simulator, &ServoSimulator::Resized, this, [this, simulator, channel](Microseconds arm) {
     RefeedResizedSimulator(*simulator, working_.At(channel), arm);
@@ -57,7 +48,6 @@ void ChannelStrip::ShowSelected(std::size_t channel) {
   for (std::size_t i = 0; i < kPortCount; ++i) {
     ServoSimulator2_[i]->SelectServo(i == channel);
     cmdDigitalOutput_[i]->Select(i == channel);
-    cmdDigitalOutput_[i]->setStyleSheet(i == channel ? QString::fromLatin1(kSelectedOutput) : QString());
   }
 }
 
@@ -67,7 +57,7 @@ void ChannelStrip::ShowKinds() {
 
 void ChannelStrip::ShowKind(std::size_t channel) {
   const QString label = OutputLabel(working_.At(channel).PortType);
-  QPushButton& output = *cmdDigitalOutput_[channel];
+  OutputButton& output = *cmdDigitalOutput_[channel];
   output.setText(label.isEmpty() ? OutputLabel(kPortDigital) : label);
   output.setAccessibleName(QStringLiteral("Channel %1, %2")
                                .arg(channel + 1)

@@ -12,25 +12,31 @@ namespace tendril {
 namespace {
 
 constexpr double kCornerRadius = 2;
-constexpr int kFrameTop = 3;  // of a group box, below its title
+constexpr int kFocusWidth = 2;
+constexpr int kSpinBoxTop = 1;  // of a spin box's outline
+constexpr int kFrameTop = 3;    // of a group box, below its title
 
-// How Fusion makes an outline of the window's colour: this much darker, as QColor::lighter takes it. A circle's line is
-// blurred, and so needs more contrast than others.
+// Lines that are drawn translucent or blurred need more contrast than others.
+constexpr double kFaintLineContrast = 4.5;
+
+// How Fusion makes an outline of the window's colour: this much darker, as QColor::lighter takes it.
 struct Outline {
   QStyle::PrimitiveElement element;
   int shade;
+  bool surrounds;  // the whole control
   double contrast = kEdgeContrast;
 };
 constexpr int kShade = 140;
-constexpr std::array<Outline, 4> kOutlines{{{QStyle::PE_PanelButtonCommand, kShade},
-                                            {QStyle::PE_FrameLineEdit, kShade},
-                                            {QStyle::PE_IndicatorCheckBox, 127},
-                                            {QStyle::PE_IndicatorRadioButton, 150, 4.2}}};
+constexpr std::array<Outline, 4> kOutlines{
+    {{QStyle::PE_PanelButtonCommand, kShade, true},
+     {QStyle::PE_FrameLineEdit, kShade, true},
+     {QStyle::PE_IndicatorCheckBox, 127, false},
+     {QStyle::PE_IndicatorRadioButton, 150, false, kFaintLineContrast}}};
 
 // Draws a line of whole device pixels along the inside of `rect`.
-void DrawLine(QPainter& painter, const QRectF& rect, const QColor& colour) {
+void DrawLine(QPainter& painter, const QRectF& rect, const QColor& colour, int thickness = 1) {
   const QTransform device = painter.deviceTransform();
-  const double width = std::max(1.0, std::floor(device.m11()));
+  const double width = std::max(1.0, std::floor(thickness * device.m11()));
   const QRectF exact = device.mapRect(rect);
   const QPointF inset(width / 2, width / 2);
   const QRectF snapped(QPointF(std::ceil(exact.left()), std::ceil(exact.top())) + inset,
@@ -45,6 +51,14 @@ void DrawLine(QPainter& painter, const QRectF& rect, const QColor& colour) {
 
 QColor FocusColour(const QPalette& palette) {
   return WithContrast(palette.color(QPalette::Highlight), palette.color(QPalette::Window), kEdgeContrast);
+}
+
+// The outline of what has the focus. Buttons show it only to users who move it by keys.
+void DrawFocus(QPainter& painter, const QStyleOption& option, const QRect& outline, bool button) {
+  const auto shown = button
+                         ? QStyle::State_HasFocus | QStyle::State_KeyboardFocusChange | QStyle::State_Enabled
+                         : QStyle::State_HasFocus | QStyle::State_Enabled;
+  if ((option.state & shown) == shown) DrawLine(painter, outline, FocusColour(option.palette), kFocusWidth);
 }
 
 }  // namespace
@@ -79,22 +93,32 @@ void ContrastStyle::drawPrimitive(PrimitiveElement element, const QStyleOption* 
     edged.palette = WithEdges(edged.palette, outline->shade, outline->contrast);
     QProxyStyle::drawPrimitive(element, &edged, painter, widget);
   };
-  if (const auto* button = qstyleoption_cast<const QStyleOptionButton*>(option)) return draw(*button);
-  if (const auto* frame = qstyleoption_cast<const QStyleOptionFrame*>(option)) return draw(*frame);
-  draw(*option);
+  if (const auto* button = qstyleoption_cast<const QStyleOptionButton*>(option)) {
+    draw(*button);
+  } else if (const auto* frame = qstyleoption_cast<const QStyleOptionFrame*>(option)) {
+    draw(*frame);
+  } else {
+    draw(*option);
+  }
+  if (outline->surrounds) DrawFocus(*painter, *option, option->rect, element == PE_PanelButtonCommand);
 }
 
 void ContrastStyle::drawComplexControl(ComplexControl control, const QStyleOptionComplex* option,
                                        QPainter* painter, const QWidget* widget) const {
-  const auto draw = [&](auto edged) {
-    edged.palette = WithEdges(edged.palette, kShade, kEdgeContrast);
+  const auto draw = [&](auto edged, double contrast) {
+    edged.palette = WithEdges(edged.palette, kShade, contrast);
     QProxyStyle::drawComplexControl(control, &edged, painter, widget);
   };
   const auto* spin = qstyleoption_cast<const QStyleOptionSpinBox*>(option);
-  const auto* slider = qstyleoption_cast<const QStyleOptionSlider*>(option);
-  if (draws_edges_ && control == CC_SpinBox && spin != nullptr) return draw(*spin);
-  if (draws_edges_ && control == CC_Slider && slider != nullptr) return draw(*slider);
-  QProxyStyle::drawComplexControl(control, option, painter, widget);
+  const auto* slider = qstyleoption_cast<const QStyleOptionSlider*>(option);  // of a scroll bar too
+  if (draws_edges_ && spin != nullptr) {
+    draw(*spin, kEdgeContrast);
+    DrawFocus(*painter, *option, option->rect.adjusted(0, kSpinBoxTop, 0, 0), false);
+  } else if (draws_edges_ && slider != nullptr) {
+    draw(*slider, control == CC_ScrollBar ? kFaintLineContrast : kEdgeContrast);
+  } else {
+    QProxyStyle::drawComplexControl(control, option, painter, widget);
+  }
 }
 
 QPalette ContrastStyle::WithEdges(const QPalette& palette, int shade, double contrast) const {

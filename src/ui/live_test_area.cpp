@@ -2,9 +2,11 @@
 
 #include <QEvent>
 #include <QGridLayout>
+#include <QHBoxLayout>
 #include <QSignalBlocker>
 
 #include "ui/appearance.h"
+#include "ui/sign.h"
 
 namespace tendril {
 namespace {
@@ -26,7 +28,7 @@ constexpr QColor kWarning(0xA8, 0x00, 0x20);
 LiveTestArea::LiveTestArea(MotionParameters& tests)
     : FrameBox(QStringLiteral("Live Test")),
       tests_(tests),
-      warning_(BoldLabel("WARNING: Possible Servo Damage: Limits present in the controller are bypassed.")),
+      warning_(new QWidget),
       HScrollSendServoPosition_(Named(new QSlider(Qt::Horizontal), "HScrollSendServoPosition")),
       chkSendSlideCommands_(Named(new QCheckBox(QStringLiteral("Use Slider to Test Intensity Values")),
                                   "chkSendSlideCommands")) {
@@ -46,6 +48,10 @@ LiveTestArea::LiveTestArea(MotionParameters& tests)
   connect(HScrollSendServoPosition_, &QAbstractSlider::valueChanged, this, &LiveTestArea::SliderMoved);
   connect(chkSendSlideCommands_, &QAbstractButton::toggled, this, &LiveTestArea::SliderSendsChanged);
 
+  auto* warning = AddLayout<QHBoxLayout>(warning_, {});
+  warning->addWidget(new Sign(SignKind::kWarning));
+  warning->addWidget(
+      BoldLabel("WARNING: Possible Servo Damage: Limits present in the controller are bypassed."), 1);
   auto* grid = AddLayout<QGridLayout>(this, {9, 3, 9, 6});
   grid->setVerticalSpacing(1);
   grid->setHorizontalSpacing(16);

@@ -51,7 +51,7 @@ class LiveTestArea : public FrameBox, public LiveTestView {
 
   MotionParameters& tests_;
   std::optional<int> running_test_;
-  QLabel* warning_;
+  QWidget* warning_;  // with its sign
   QSlider* HScrollSendServoPosition_;
   QCheckBox* chkSendSlideCommands_;
   std::array<QLabel*, 3> read_outs_{};

@@ -5,16 +5,19 @@
 
 namespace tendril {
 
-// A button that is selected or not, as a servo is. Its owner draws the difference.
+// A button that is selected or not, and then looks like a servo that is.
 class OutputButton : public QPushButton {
   Q_OBJECT
 
  public:
-  using QPushButton::QPushButton;
+  OutputButton();
 
   bool Selected() const { return selected_; }
   // Assistive technology is notified of a change.
   void Select(bool selected);
+
+ protected:
+  void paintEvent(QPaintEvent* event) override;
 
  private:
   bool selected_ = false;

@@ -1,6 +1,7 @@
 #include "ui/progress_area.h"
 
 #include <QEvent>
+#include <QHBoxLayout>
 #include <QVBoxLayout>
 
 #include "ui/appearance.h"
@@ -10,16 +11,28 @@ namespace {
 
 constexpr int kBarHeight = 10;
 
-QColor Shade(ProgressColour colour, bool dark) {
+constexpr float kTint = 0.3F;  // of the field behind the outcome
+
+struct Look {
+  QColor colour;
+  SignKind sign;
+};
+
+Look LookOf(ProgressColour colour) {
   switch (colour) {
     case ProgressColour::kBlue:
-      return dark ? QColor(0x64, 0xB5, 0xF6) : QColor(0x15, 0x65, 0xC0);
+      return {QColor(0x1E, 0x7F, 0xDB), SignKind::kRunning};
     case ProgressColour::kGreen:
-      return dark ? QColor(0x66, 0xBB, 0x6A) : QColor(0x1B, 0x7A, 0x2B);
+      return {QColor(0x2A, 0x94, 0x3E), SignKind::kSuccess};
     case ProgressColour::kRed:
-      return dark ? QColor(0xEF, 0x73, 0x70) : QColor(0xC6, 0x28, 0x28);
+      return {QColor(0xDB, 0x3A, 0x3A), SignKind::kFailure};
   }
   return {};
+}
+
+QColor Tinted(const QColor& ground, QColor tint) {
+  tint.setAlphaF(kTint);
+  return OnBackground(tint, ground);
 }
 
 }  // namespace
@@ -29,6 +42,8 @@ ProgressArea::ProgressArea()
     : FrameBox(QStringLiteral("Progress")),
       pctProgress_(Named(new QWidget(this), "pctProgress")),
       ShapeProgress_(Named(new QWidget(pctProgress_), "ShapeProgress")),
+      field_(new QWidget),
+      sign_(new Sign(SignKind::kRunning)),
       lblProgress_(Named(BoldLabel(), "lblProgress")) {
   setObjectName("frmProgress");
   pctProgress_->setFixedHeight(kBarHeight);
@@ -37,10 +52,13 @@ ProgressArea::ProgressArea()
   pctProgress_->setAccessibleName(QStringLiteral("Command progress"));
   ShapeProgress_->setAutoFillBackground(true);
   ShapeProgress_->setBackgroundRole(QPalette::Window);  // otherwise inherited from the trough
-  lblProgress_->setAlignment(Qt::AlignCenter);
+  field_->setAutoFillBackground(true);
+  auto* outcome = AddLayout<QHBoxLayout>(field_, {4, 0, 4, 0});
+  outcome->addWidget(sign_);
+  outcome->addWidget(lblProgress_, 1);
 
   auto* column = AddLayout<QVBoxLayout>(this, {9, 0, 9, 3}, 2);
-  column->addWidget(lblProgress_);
+  column->addWidget(field_);
   column->addWidget(pctProgress_);
   ApplyColour();
 }
@@ -77,10 +95,19 @@ void ProgressArea::changeEvent(QEvent* event) {
   if (event->type() == QEvent::PaletteChange) ApplyColour();
 }
 
+// The outcome stands in the text's colour on a field in the outcome's colour.
 void ProgressArea::ApplyColour() {
-  const QColor colour = Shade(colour_, IsDark(palette()));
-  SetPaletteColour(ShapeProgress_, QPalette::Window, colour);
-  SetPaletteColour(lblProgress_, QPalette::WindowText, colour);
+  const auto [colour, sign] = LookOf(colour_);
+  const QColor window = palette().color(QPalette::Window);
+  const QColor field = colour_ == ProgressColour::kBlue ? window : Tinted(window, colour);
+  QPalette colours = palette();
+  colours.setColor(QPalette::Window, field);
+  colours.setColor(QPalette::WindowText,
+                   WithContrast(colours.color(QPalette::WindowText), field, kTextContrast));
+  field_->setPalette(colours);
+  sign_->SetKind(sign);
+  SetPaletteColour(ShapeProgress_, QPalette::Window,
+                   WithContrast(colour, palette().color(QPalette::Base), kEdgeContrast));
 }
 
 }  // namespace tendril

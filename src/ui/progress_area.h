@@ -6,6 +6,7 @@
 #include <QWidget>
 
 #include "ui/controls.h"
+#include "ui/sign.h"
 #include "unitops/running_command.h"
 
 namespace tendril {
@@ -43,6 +44,8 @@ class ProgressArea : public FrameBox, public CommandProgressView {
   QStackedLayout* place_ = nullptr;
   QWidget* pctProgress_;    // the bar's trough
   QWidget* ShapeProgress_;  // the bar
+  QWidget* field_;          // the outcome, with its sign
+  Sign* sign_;
   QLabel* lblProgress_;
   ProgressColour colour_ = ProgressColour::kBlue;
 };

@@ -65,7 +65,8 @@ TEST(ServoSimulator, SelectionAndFocus_AreVisibleAroundThePicture) {
     servo.clearFocus();
     servo.SelectServo(selected);
     const QImage image = Painted(servo);
-    for (const QPoint& point : {QPoint(0, 55), QPoint(4, 55), QPoint(55, 4), QPoint(109, 55)})
+    EXPECT_EQ(image.pixel(0, 55), selected ? QColor(Qt::white).rgb() : face.rgb()) << "outline on dark";
+    for (const QPoint& point : {QPoint(2, 55), QPoint(4, 55), QPoint(55, 4), QPoint(107, 55)})
       EXPECT_EQ(image.pixel(point), selected ? qRgb(0, 0, 255) : face.rgb())
           << point.x() << ", " << point.y();
     EXPECT_EQ(image.pixel(5, 55 + 40), face.rgb());
