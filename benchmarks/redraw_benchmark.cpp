@@ -98,7 +98,7 @@ class EditedWindow : public QObject {
 // One edit changes eight records and redraws nine servos.
 bool MeasureEdit(EditedWindow& window) {
   constexpr int kEdits = 101;
-  constexpr double kMaxMs = 8;
+  constexpr double kMaxMs = 3;
 
   auto& trim = window.Child<QSpinBox>("spnNeutralTrim");
   trim.setFocus();

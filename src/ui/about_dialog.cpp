@@ -73,11 +73,13 @@ void AboutDialog::AddFact(const QString& what, const QString& value) {
 void AboutDialog::AddButtons() {
   auto* buttons = new QDialogButtonBox(QDialogButtonBox::Close);
   auto* copy = buttons->addButton(QStringLiteral("Cop&y"), QDialogButtonBox::ActionRole);
-  Describe(copy, "Copies all of this as text, for a message to support");
+  Describe(copy, "Copies all of this as text, for a message to support.");
   connect(copy, &QPushButton::clicked, this, [this] { QGuiApplication::clipboard()->setText(text_); });
   connect(buttons, &QDialogButtonBox::rejected, this, &QDialog::reject);
   layout()->addWidget(buttons);
-  buttons->button(QDialogButtonBox::Close)->setFocus();
+  auto* close = buttons->button(QDialogButtonBox::Close);
+  close->setDefault(true);
+  close->setFocus();
 }
 
 void ShowAbout(QWidget& window, const ProgramInfo& info) {
