@@ -111,12 +111,12 @@ TEST_F(Editor, PulseScale_ShowsTheEditedValuesAndTheArm) {
   EXPECT_FALSE(Visible("lblNoChannel"));
   const QImage before = Find("PulseScale").grab().toImage();
   Type("spnNeutralTrim", "100");
-  Press("cmdTest_2");  // to the record's default position, which only leaving the channel changes
+  Find<QAbstractSlider>("HScrollSendServoPosition").setValue(600);
   EXPECT_THAT(words(),
               testing::HasSubstr("virtual range 1100 to 2100 µs, stop range 1100 to 2100 µs, "
-                                 "default position 1600 µs, neutral position 1600 µs, arm at 1500 µs"));
-  Find<QAbstractSlider>("HScrollSendServoPosition").setValue(600);
-  EXPECT_THAT(words(), testing::HasSubstr("arm at 1600 µs"));
+                                 "default position 1600 µs, neutral position 1600 µs, arm at 1600 µs"));
+  Press("cmdTest_2");  // to the record's default position, which only leaving the channel changes
+  EXPECT_THAT(words(), testing::HasSubstr("arm at 1500 µs"));
   EXPECT_NE(Find("PulseScale").grab().toImage(), before);
 
   // In the smallest window nothing of the editor is cut off.
