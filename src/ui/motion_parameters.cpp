@@ -174,7 +174,7 @@ void MotionParameters::AddTests(QGridLayout& grid) {
     const int button = static_cast<int>(i);
     cmdTest_[i] = Named(new QPushButton, "cmdTest", i);
     cmdTest_[i]->setIcon(MakeTestIcon(test.icon, *cmdTest_[i]));
-    cmdTest_[i]->setIconSize(kTestIconSize);
+    cmdTest_[i]->setIconSize(TestIconSize(*cmdTest_[i]));
     Describe(cmdTest_[i], test.tip);
     grid.addWidget(cmdTest_[i], test.row, kTest, test.rows, 1);
     setTabOrder(spins_[static_cast<std::size_t>(test.after)], cmdTest_[i]);
@@ -196,7 +196,7 @@ void MotionParameters::AddSpacing(QGridLayout& grid) {
   widest.setText(QStringLiteral("Stop"));
   grid.addItem(new QSpacerItem(widest.sizeHint().width(), 0, QSizePolicy::Preferred), kHeadingRow, kTest);
   // Styles ask for more room than a button needs.
-  const int needed = kTestIconSize.width() + kIconGap + metrics.horizontalAdvance(widest.text()) +
+  const int needed = widest.iconSize().width() + kIconGap + metrics.horizontalAdvance(widest.text()) +
                      style()->pixelMetric(QStyle::PM_ButtonMargin) +
                      2 * style()->pixelMetric(QStyle::PM_DefaultFrameWidth);
   for (QPushButton* test : cmdTest_) test->setMinimumWidth(needed);

@@ -11,7 +11,6 @@
 namespace tendril {
 namespace {
 
-constexpr int kSwatch = 12;
 constexpr int kSwatchGap = 4;
 constexpr int kEntryGap = 10;
 
@@ -24,8 +23,11 @@ constexpr std::array<LegendEntry, 3> kRangeEntries{
 constexpr std::array<LegendEntry, 2> kLineEntries{
     {{ScalePart::kNeutral, "neutral"}, {ScalePart::kDefault, "default"}}};
 
+// An even number, so that a line stands in the middle.
+int SwatchSize(const QFontMetrics& metrics) { return (metrics.ascent() + 1) / 2 * 2; }
+
 int LegendWidth(const LegendEntry& entry, const QFontMetrics& metrics) {
-  return kSwatch + kSwatchGap + metrics.horizontalAdvance(QLatin1String(entry.name));
+  return SwatchSize(metrics) + kSwatchGap + metrics.horizontalAdvance(QLatin1String(entry.name));
 }
 
 int LegendWidth(std::span<const LegendEntry> entries, const QFontMetrics& metrics) {
@@ -37,16 +39,17 @@ int LegendWidth(std::span<const LegendEntry> entries, const QFontMetrics& metric
 // Paints `entries` on the line that begins at `place`.
 void PaintEntries(QPainter& painter, std::span<const LegendEntry> entries, QPoint place) {
   const QFontMetrics metrics = painter.fontMetrics();
+  const int size = SwatchSize(metrics);
   for (const LegendEntry& entry : entries) {
-    const QRectF swatch(place.x(), place.y() + (metrics.height() - kSwatch) / 2, kSwatch, kSwatch);
+    const QRectF swatch(place.x(), place.y() + (metrics.height() - size) / 2, size, size);
     if (entry.part == ScalePart::kNeutral || entry.part == ScalePart::kDefault) {
-      const double beside = (kSwatch - kMarkerLine) / 2;
+      const double beside = (size - kMarkerLine) / 2;
       PaintPlate(painter, swatch);
       PaintLine(painter, entry.part, swatch.adjusted(beside, 1, -beside, -1));
     } else {
       PaintBar(painter, entry.part, swatch);
     }
-    painter.drawText(place + QPoint(kSwatch + kSwatchGap, metrics.ascent()), QLatin1String(entry.name));
+    painter.drawText(place + QPoint(size + kSwatchGap, metrics.ascent()), QLatin1String(entry.name));
     place.rx() += LegendWidth(entry, metrics) + kEntryGap;
   }
 }

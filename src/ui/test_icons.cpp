@@ -6,6 +6,9 @@
 namespace tendril {
 namespace {
 
+// The drawing's own units.
+constexpr int kIconWidth = 26;
+constexpr int kIconHeight = 14;
 constexpr double kStroke = 1.5;
 
 // Draws itself anew for each paint: so it is crisp at every scale, and follows the palette.
@@ -19,8 +22,8 @@ class TestIconEngine : public QIconEngine {
     const auto group = mode == QIcon::Disabled ? QPalette::Disabled : QPalette::Active;
     painter->setRenderHint(QPainter::Antialiasing);
     painter->translate(rect.topLeft());
-    painter->scale(rect.width() / static_cast<double>(kTestIconSize.width()),
-                   rect.height() / static_cast<double>(kTestIconSize.height()));
+    painter->scale(rect.width() / static_cast<double>(kIconWidth),
+                   rect.height() / static_cast<double>(kIconHeight));
     painter->setPen(QPen(button_.palette().color(group, QPalette::ButtonText), kStroke, Qt::SolidLine,
                          Qt::FlatCap, Qt::MiterJoin));
     if (kind_ == TestIcon::kDangerSweep) PaintWarning(*painter);
@@ -57,6 +60,11 @@ class TestIconEngine : public QIconEngine {
 };
 
 }  // namespace
+
+QSize TestIconSize(const QAbstractButton& button) {
+  const int height = button.fontMetrics().height();
+  return {height * kIconWidth / kIconHeight, height};
+}
 
 QIcon MakeTestIcon(TestIcon kind, const QAbstractButton& button) {
   return QIcon(new TestIconEngine(kind, button));

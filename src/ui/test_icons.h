@@ -13,7 +13,8 @@ enum class TestIcon {
   kDangerSweep,  // it moves to and fro as far as it can
 };
 
-inline constexpr QSize kTestIconSize(26, 14);
+// The size of the icons beside text in the font of `button`.
+QSize TestIconSize(const QAbstractButton& button);
 
 // An icon in the colour that the text of `button` has at each time. For `button` alone: no copy may outlive it.
 QIcon MakeTestIcon(TestIcon kind, const QAbstractButton& button);
