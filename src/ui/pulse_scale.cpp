@@ -12,6 +12,19 @@
 namespace tendril {
 namespace {
 
+// A half circle with its head at the right end for a `side` of 1, at the left end for -1.
+void PaintTurn(QPainter& painter, const QRectF& box, int side) {
+  const double unit = box.height() / 14;
+  const QPointF middle = box.center();
+  const QPointF tip = middle + QPointF(4 * side, 3) * unit;
+  const QPointF head[] = {tip + QPointF(-2.5, -2.5) * unit, tip, tip + QPointF(2.5, -2.5) * unit};
+  painter.setRenderHint(QPainter::Antialiasing);
+  painter.setPen(QPen(painter.pen().color(), 1.2 * unit));
+  painter.drawArc(QRectF(middle - QPointF(4, 3) * unit, QSizeF(8, 8) * unit), 0, 180 * 16);
+  painter.drawPolyline(head, 3);
+  painter.setRenderHint(QPainter::Antialiasing, false);
+}
+
 // The accessible interface: a picture, described in words.
 class ScaleAccessible : public QAccessibleWidget {
  public:
@@ -95,25 +108,29 @@ void PulseScale::paintEvent(QPaintEvent*) {
 void PulseScale::Paint(QPainter& painter, const ScaleElement& element) const {
   const QRectF box(element.x, element.y, element.width, element.height);
   const QColor text = palette().color(shown_ ? QPalette::WindowText : QPalette::PlaceholderText);
+  painter.setPen(element.shape == ScaleShape::kNumber ? Qt::black : text);
   switch (element.shape) {
     case ScaleShape::kBar:
       PaintBar(painter, element.part, box);
-      return;
+      break;
     case ScaleShape::kLine:
       if (element.part == ScalePart::kAxis) {
         painter.fillRect(box, text);
       } else {
         PaintLine(painter, element.part, box);
       }
-      return;
-    case ScaleShape::kNumber:
-      painter.setPen(Qt::black);
       break;
+    case ScaleShape::kTurnRight:
+      PaintTurn(painter, box, 1);
+      break;
+    case ScaleShape::kTurnLeft:
+      PaintTurn(painter, box, -1);
+      break;
+    case ScaleShape::kNumber:
     case ScaleShape::kText:
-      painter.setPen(text);
+      painter.drawText(box, Qt::AlignCenter | Qt::TextSingleLine, QString::fromStdString(element.text));
       break;
   }
-  painter.drawText(box, Qt::AlignCenter | Qt::TextSingleLine, QString::fromStdString(element.text));
 }
 
 }  // namespace tendril

@@ -15,6 +15,7 @@ constexpr int kTickStep = 100;
 
 constexpr double kTextGap = 6;      // between two texts side by side
 constexpr double kNumberInset = 4;  // from the end of a bar to its number
+constexpr double kArrowGap = 4;     // from an arrow to its text
 constexpr double kMinBar = 3;
 constexpr double kTick = 3;
 constexpr double kLongTick = 5;
@@ -22,8 +23,8 @@ constexpr double kSpace = 2;        // below the words, and between the bars and
 constexpr double kMinRowSlack = 1;  // of a bar's row, above the height of its text
 constexpr double kMaxRowSlack = 10;
 
-constexpr char kShorter[] = "\u21B7 shorter pulse: turns right";
-constexpr char kLonger[] = "longer pulse: turns left \u21B6";
+constexpr char kShorter[] = "shorter pulse: turns right";
+constexpr char kLonger[] = "longer pulse: turns left";
 constexpr char kUnit[] = "µs";
 
 struct Row {
@@ -105,9 +106,17 @@ class Layout {
     }
     const double before = left_ - Width(std::to_string(first_)) / 2 - kTextGap - Width(kUnit);
     if (before >= 0) AddText(ScalePart::kAxis, ScaleShape::kText, before, below, kUnit);
-    const double directions = below + room_.line_height;
-    AddText(ScalePart::kAxis, ScaleShape::kText, 0, directions, kShorter);
-    AddText(ScalePart::kAxis, ScaleShape::kText, room_.width - Width(kLonger), directions, kLonger);
+    AddDirections(below + room_.line_height);
+  }
+
+  // Which way the servo turns, at both ends. The arrows are squares.
+  void AddDirections(double y) {
+    const double arrow = room_.line_height;
+    const double text = arrow + kArrowGap;
+    Add(ScalePart::kAxis, ScaleShape::kTurnRight, 0, y, arrow, arrow);
+    AddText(ScalePart::kAxis, ScaleShape::kText, text, y, kShorter);
+    AddText(ScalePart::kAxis, ScaleShape::kText, room_.width - text - Width(kLonger), y, kLonger);
+    Add(ScalePart::kAxis, ScaleShape::kTurnLeft, room_.width - arrow, y, arrow, arrow);
   }
 
   double TopOf(std::size_t row) const { return top_ + static_cast<double>(row) * row_height_; }
@@ -199,7 +208,7 @@ double MinimumScaleHeight(double line_height) { return HeightWith(kMinRowSlack, 
 double MaximumScaleHeight(double line_height) { return HeightWith(kMaxRowSlack, line_height); }
 
 double MinimumScaleWidth(const ScaleRoom& room) {
-  return room.text_width(kShorter) + 2 * kTextGap + room.text_width(kLonger);
+  return room.text_width(kShorter) + 2 * (room.line_height + kArrowGap + kTextGap) + room.text_width(kLonger);
 }
 
 std::vector<ScaleElement> LayOutPulseScale(const std::optional<ScaleValues>& values, const ScaleRoom& room) {

@@ -23,10 +23,12 @@ enum class ScalePart { kAxis, kActual, kVirtual, kStops, kDefault, kNeutral, kAr
 
 // How an element is drawn.
 enum class ScaleShape {
-  kBar,     // filled, with an outline inside its edge
-  kLine,    // filled
-  kNumber,  // text on the bar of its part
-  kText,    // text beside the bars
+  kBar,        // filled, with an outline inside its edge
+  kLine,       // filled
+  kNumber,     // text on the bar of its part
+  kText,       // text beside the bars
+  kTurnRight,  // an arrow that turns to the right
+  kTurnLeft,
 };
 
 // One element. Positions are device-independent units from the top left corner of the scale.
