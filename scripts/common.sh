@@ -5,6 +5,8 @@ cd "$(dirname "${BASH_SOURCE[0]}")/.."
 # What building, running and testing needs on Debian 12 and its relatives.
 build_packages=(g++ cmake ninja-build qt6-base-dev qt6-serialport-dev libgl-dev libgtest-dev libgmock-dev
                 fonts-dejavu-core)
+# What one test needs besides: a display and an accessibility bus for the program.
+test_packages=(xvfb dbus at-spi2-core xdotool)
 # What building and testing for Windows needs; GoogleTest is compiled along.
 windows_packages=(cmake ninja-build g++-mingw-w64-x86-64-posix googletest wine64)
 fuzz_packages=(clang-14 libclang-rt-14-dev llvm-14 cmake ninja-build)
