@@ -173,6 +173,7 @@ class ServoAccessible : public QAccessibleWidget, public QAccessibleValueInterfa
 
   QString text(QAccessible::Text kind) const override {
     if (kind == QAccessible::Value) return QStringLiteral("%1 µs").arg(servo_.dial().arm_pulse());
+    if (kind == QAccessible::Description && servo_.dial().selected()) return QStringLiteral("Selected");
     if (kind == QAccessible::Name && servo_.accessibleName().isEmpty()) {
       QString name = QString::fromStdString(servo_.dial().caption());
       const QLatin1String abbreviation("CHAN ");

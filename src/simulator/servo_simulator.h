@@ -30,7 +30,8 @@ void PaintSelection(QPainter& painter, const QRectF& rect, const QPalette& palet
 // units inside the control. The background around it shows whether the channel is selected.
 //
 // To assistive technology it is a button with a value. Its name is accessibleName() or else its caption ("CHAN 3" is
-// spoken "Channel 3"), its value is the pulse width of the arm ("1500 µs").
+// spoken "Channel 3"), its value is the pulse width of the arm ("1500 µs"). While it is selected its description says
+// so: most readers do not read that state of a button.
 class ServoSimulator : public QAbstractButton {
   Q_OBJECT
 

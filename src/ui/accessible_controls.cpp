@@ -21,6 +21,16 @@ class ButtonAccessible : public QAccessibleWidget {
   ButtonAccessible(QAbstractButton* button, QAccessible::Role role, const QString& action)
       : QAccessibleWidget(button, role), button_(*button), action_(action) {}
 
+  QString text(QAccessible::Text kind) const override {
+    if (kind == QAccessible::Description && state().selected) return QStringLiteral("Selected");
+    return QAccessibleWidget::text(kind);
+  }
+  // The name is complete: a label beside the button would be read in its place.
+  QVector<QPair<QAccessibleInterface*, QAccessible::Relation>> relations(
+      QAccessible::Relation) const override {
+    return {};
+  }
+
   QAccessible::State state() const override {
     QAccessible::State state = QAccessibleWidget::state();
     state.checkable = button_.isCheckable();
