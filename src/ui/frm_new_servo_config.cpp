@@ -124,7 +124,11 @@ void frmNewServoConfig::Connect() {
     EnableControls();
     live_test_.OnSliderSends();
   });
-  connect(live_test_area_, &LiveTestArea::SweepChanged, c, [this] { EnableControls(); });
+  connect(live_test_area_, &LiveTestArea::SweepChanged, c, [this] {
+    EnableControls();
+    status_->Say(live_test_area_->Sweeps() ? QStringLiteral("Servo test running")
+                                           : QStringLiteral("Servo test stopped"));
+  });
   connect(menu_, &MainMenu::ChannelChosen, c, [this](std::size_t channel) {
     CommitTyping();
     SelectChannel(channel);
@@ -257,6 +261,7 @@ void frmNewServoConfig::OnSummaryScreen() {
   menu_->ShowView(true);
   apply_boxes_->ShowEditing(false);
   summary_->TakeFocus();
+  status_->Say(QStringLiteral("Summary of all eight channels"));
   ShowRemarks();
 }
 
@@ -268,6 +273,7 @@ void frmNewServoConfig::ShowConfig() {
   menu_->ShowView(false);
   apply_boxes_->ShowEditing(true);
   if (focus_before_summary_) focus_before_summary_->setFocus();
+  status_->Say(QStringLiteral("Simulator"));
   OnReplaced();  // the summary has changed the records
 }
 

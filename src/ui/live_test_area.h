@@ -25,8 +25,10 @@ class LiveTestArea : public FrameBox, public LiveTestView {
   // Enables slider and test buttons. `running_command` is what runs; empty when nothing does.
   void EnableControls(const QString& running_command);
 
+  // Whether a sweep runs.
+  bool Sweeps() const { return running_test_.has_value(); }
   // Whether something moves the servo, or can: a sweep, or the slider while its box is ticked.
-  bool Moves() const { return running_test_ || SliderSends(); }
+  bool Moves() const { return Sweeps() || SliderSends(); }
 
   void ShowTestRunning(int button, bool running) override;
   int SliderValue() const override { return HScrollSendServoPosition_->value(); }

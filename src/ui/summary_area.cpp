@@ -173,8 +173,9 @@ void SummaryArea::AddRow(QGridLayout& table, std::size_t channel) {
   auto* frame = Named(new Outline, "frmSumTable", channel);
   frame->setSizePolicy(QSizePolicy::Preferred, QSizePolicy::Expanding);
   AddFrame(table, frame, line, 1);
-  const QString name = QStringLiteral("CHAN %1").arg(channel + 1);
-  table.addWidget(Named(BoldLabel(name), "lblSumChannel", channel), line, kChannelColumn);
+  const QString name = QStringLiteral("Channel %1").arg(channel + 1);
+  table.addWidget(Named(BoldLabel(QStringLiteral("CHAN %1").arg(channel + 1)), "lblSumChannel", channel),
+                  line, kChannelColumn);
   for (std::size_t value = 0; value < kValues.size(); ++value) {
     const QString caption = OnOneLine(kValues[value].caption);
     auto* text = row.texts[value] = Named(new PressableText, kValues[value].name, channel);
