@@ -130,10 +130,6 @@ class BareStrokes {
   static constexpr int kInset = 5;  // of the picture in the control
 
  private:
-  static QColor ToColour(DialColour colour) {
-    return QColor(static_cast<int>(colour & 0xFF), static_cast<int>(colour >> 8 & 0xFF),
-                  static_cast<int>(colour >> 16 & 0xFF));
-  }
   static QPointF ToPoint(DialPoint point) { return QPointF(point.x, point.y) + QPointF(kInset, kInset); }
 
   void Add(const DialElement& element) {
@@ -249,6 +245,7 @@ class BareStrokes {
 struct Canvas {
   explicit Canvas(ServoSimulator& of)
       : servo(of), strokes(of), painted(of.size(), QImage::Format_RGB32), bare(painted) {
+    servo.SelectServo(false);  // the mark of the selection is no part of the dial
     painted.fill(servo.palette().color(QPalette::Button));
     bare = painted.copy();
   }
