@@ -40,8 +40,9 @@ int LegendWidth(std::span<const LegendEntry> entries, const QFontMetrics& metric
 void PaintEntries(QPainter& painter, std::span<const LegendEntry> entries, QPoint place) {
   const QFontMetrics metrics = painter.fontMetrics();
   const int size = SwatchSize(metrics);
+  const int top = place.y() + (metrics.height() - size) / 2;
   for (const LegendEntry& entry : entries) {
-    const QRectF swatch(place.x(), place.y() + (metrics.height() - size) / 2, size, size);
+    const QRectF swatch(place.x(), top, size, size);
     if (entry.part == ScalePart::kNeutral || entry.part == ScalePart::kDefault) {
       const double beside = (size - kMarkerLine) / 2;
       PaintPlate(painter, swatch);
