@@ -27,10 +27,11 @@ struct Outline {
   double contrast = kEdgeContrast;
 };
 constexpr int kShade = 140;
-constexpr std::array<Outline, 6> kOutlines{
+constexpr std::array<Outline, 7> kOutlines{
     {{QStyle::PE_PanelButtonCommand, kShade, true},
      {QStyle::PE_FrameLineEdit, kShade, true},
      {QStyle::PE_FrameMenu, kShade, false},
+     {QStyle::PE_PanelMenu, 160, false},
      {QStyle::PE_Frame, kShade, false},
      {QStyle::PE_IndicatorCheckBox, 127, false},
      {QStyle::PE_IndicatorRadioButton, 150, false, kFaintLineContrast}}};

@@ -9,9 +9,12 @@ enum class SignKind { kRunning, kSuccess, kFailure, kWarning };
 
 // Shows in its form what a colour shows. It is as high as the type, and has the text's colour.
 class Sign : public QWidget {
+  Q_OBJECT
+
  public:
   explicit Sign(SignKind kind);
 
+  SignKind Kind() const { return kind_; }
   void SetKind(SignKind kind);
 
   QSize sizeHint() const override;

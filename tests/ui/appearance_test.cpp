@@ -17,7 +17,9 @@
 #include <algorithm>
 #include <vector>
 
-namespace tendril {
+#include "window_fixture.h"
+
+namespace tendril::test {
 namespace {
 
 TEST(Palette, EveryPair_HasItsContrastAndGoodColoursStay) {
@@ -143,7 +145,28 @@ TEST_P(Appearance, SwitchingTwice_ComesBackToTheSamePalette) {
   EXPECT_EQ(QGuiApplication::palette(), palette);
 }
 
+// The colour that fills the widget's place: its own, or that of what lies behind it.
+QColor ColourBehind(const QWidget* widget) {
+  while (!widget->isWindow() && !widget->autoFillBackground()) widget = widget->parentWidget();
+  return widget->palette().color(widget->backgroundRole());
+}
+
+TEST_F(Window, EveryLabel_CanBeReadWhenTheThemeChanges) {
+  ConnectUnit();
+  Click("Command3_0");
+  RunToTheEnd();
+  for (const bool dark : {true, false}) {
+    SetDarkAppearance(dark);
+    for (const QLabel* label : window_->findChildren<QLabel*>()) {
+      if (!label->isEnabled()) continue;
+      EXPECT_GE(ContrastRatio(label->palette().color(label->foregroundRole()), ColourBehind(label)),
+                kTextContrast)
+          << label->text().toStdString();
+    }
+  }
+}
+
 INSTANTIATE_TEST_SUITE_P(Themes, Appearance, ::testing::Bool());
 
 }  // namespace
-}  // namespace tendril
+}  // namespace tendril::test

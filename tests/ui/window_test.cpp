@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "bench/faulty_units.h"
+#include "ui/sign.h"
 #include "window_fixture.h"
 
 namespace tendril::test {
@@ -74,6 +75,7 @@ TEST_F(Window, Send_ByMouse_WritesTheRecordsIntoTheUnit) {
 
   RunToTheEnd();
   EXPECT_EQ(Text("lblProgress"), "SUCCESS: Send Complete!");
+  EXPECT_EQ(Find("frmProgress").findChild<Sign*>()->Kind(), SignKind::kSuccess);
   const QColor colour = Find("ShapeProgress").palette().color(QPalette::Window);
   EXPECT_GT(colour.green(), colour.red());
   EXPECT_TRUE(Find("Command3_0").isEnabled() && Find("cmbNYX").isEnabled());
@@ -200,6 +202,7 @@ TEST_F(Window, Failure_IsReportedAndTheButtonsWorkAgain) {
   EXPECT_EQ(world_.boxes.Take().at(0).title, "No Repsonse");
   EXPECT_TRUE(enabled_behind_the_box);
   EXPECT_EQ(Text("lblProgress"), "COMMAND FAILED!");
+  EXPECT_EQ(Find("frmProgress").findChild<Sign*>()->Kind(), SignKind::kFailure);
   const QColor colour = Find("ShapeProgress").palette().color(QPalette::Window);
   EXPECT_GT(colour.red(), colour.green());
 
