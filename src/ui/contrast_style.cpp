@@ -74,7 +74,7 @@ ContrastStyle::ContrastStyle(QStyle* base, const QString& system_style, std::opt
 
 void ContrastStyle::polish(QPalette& palette) {
   QProxyStyle::polish(palette);
-  palette = WithContrast(dark_.value_or(IsDark(palette)) == IsDark(palette) ? palette : ThemePalette(*dark_));
+  palette = WithContrast(dark_ ? ThemePalette(*dark_) : palette);
 }
 
 void ContrastStyle::drawPrimitive(PrimitiveElement element, const QStyleOption* option, QPainter* painter,

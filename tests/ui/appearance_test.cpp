@@ -2,16 +2,17 @@
 
 #include <gtest/gtest.h>
 
+#include <QApplication>
 #include <QCheckBox>
 #include <QComboBox>
 #include <QGroupBox>
-#include <QGuiApplication>
 #include <QImage>
 #include <QLineEdit>
 #include <QPushButton>
 #include <QRadioButton>
 #include <QSlider>
 #include <QSpinBox>
+#include <QStyle>
 #include <QTest>
 #include <QToolTip>
 #include <algorithm>
@@ -143,6 +144,9 @@ TEST_P(Appearance, SwitchingTwice_ComesBackToTheSamePalette) {
     EXPECT_EQ(IsDark(QToolTip::palette()), dark);
   }
   EXPECT_EQ(QGuiApplication::palette(), palette);
+  SetDarkAppearance(false);
+  EXPECT_EQ(QGuiApplication::palette(), WithContrast(QApplication::style()->standardPalette()))
+      << "the system's, not that of the other theme";
 }
 
 // The colour that fills the widget's place: its own, or that of what lies behind it.
