@@ -245,7 +245,9 @@ class BareStrokes {
 struct Canvas {
   explicit Canvas(ServoSimulator& of)
       : servo(of), strokes(of), painted(of.size(), QImage::Format_RGB32), bare(painted) {
-    servo.SelectServo(false);  // the mark of the selection is no part of the dial
+    // Neither is part of the dial.
+    servo.SelectServo(false);
+    servo.setAttribute(Qt::WA_UnderMouse, false);
     painted.fill(servo.palette().color(QPalette::Button));
     bare = painted.copy();
   }

@@ -16,6 +16,7 @@ namespace {
 constexpr int kMargin = 5;  // around the picture
 constexpr double kCornerRadius = 4;
 constexpr int kPressedShade = 112;  // percent, as QColor::darker takes it
+constexpr int kHoverShade = 106;
 constexpr double kFocusRingWidth = 1.5;
 constexpr int kLeastLightness = 152;  // of a window to which the blue of the selection has a contrast of 3
 constexpr double kSelectionOutline = 1;
@@ -245,6 +246,7 @@ ServoSimulator::ServoSimulator(QWidget* parent)
     : QAbstractButton(parent), announced_pulse_(dial_.arm_pulse()) {
   [[maybe_unused]] static const bool installed =
       (QAccessible::installFactory(&ServoAccessible::Create), true);
+  setAttribute(Qt::WA_Hover);
   setFocusPolicy(Qt::StrongFocus);
   setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Expanding);
   connect(this, &QAbstractButton::clicked, this, &ServoSimulator::Clicked);
@@ -341,7 +343,9 @@ void ServoSimulator::paintEvent(QPaintEvent*) {
 
 void ServoSimulator::PaintBackground(QPainter& painter) const {
   const QColor face = palette().color(QPalette::Button);
-  const QColor button = isDown() ? face.darker(kPressedShade) : face;
+  const QColor button = isDown()                      ? face.darker(kPressedShade)
+                        : isEnabled() && underMouse() ? face.lighter(kHoverShade)
+                                                      : face;
   const QRectF whole = rect();
   painter.fillRect(whole, button);
   painter.setRenderHint(QPainter::Antialiasing);

@@ -70,7 +70,7 @@ ContrastStyle::ContrastStyle(QStyle* base, const QString& system_style, std::opt
     : QProxyStyle(base),
       system_style_(system_style),
       dark_(dark),
-      draws_edges_(base->inherits("QFusionStyle")) {}
+      draws_edges_(baseStyle()->inherits("QFusionStyle")) {}
 
 void ContrastStyle::polish(QPalette& palette) {
   QProxyStyle::polish(palette);

@@ -61,6 +61,7 @@ TEST(ServoSimulator, SelectionAndFocus_AreVisibleAroundThePicture) {
   const QColor face(40, 40, 40);
   servo.setPalette(QPalette(face));
   Show(servo);
+  servo.setAttribute(Qt::WA_UnderMouse, false);
   for (const bool selected : {false, true, false}) {
     servo.clearFocus();
     servo.SelectServo(selected);
