@@ -3,6 +3,7 @@
 #include <QAccessible>
 #include <QAccessibleWidget>
 #include <QCheckBox>
+#include <QFrame>
 #include <QRadioButton>
 #include <QStackedWidget>
 
@@ -22,8 +23,10 @@ class ButtonAccessible : public QAccessibleWidget {
       : QAccessibleWidget(button, role), button_(*button), action_(action) {}
 
   QString text(QAccessible::Text kind) const override {
-    if (kind == QAccessible::Description && state().selected) return QStringLiteral("Selected");
-    return QAccessibleWidget::text(kind);
+    const QString text = QAccessibleWidget::text(kind);
+    if (kind != QAccessible::Description) return text;
+    if (state().selected) return QStringLiteral("Selected");
+    return text == QAccessibleWidget::text(QAccessible::Name) ? QString() : text;  // read once
   }
   // The name is complete: a label beside the button would be read in its place.
   QVector<QPair<QAccessibleInterface*, QAccessible::Relation>> relations(
@@ -122,6 +125,9 @@ QAccessibleInterface* Create(const QString&, QObject* object) {
     return new PlainAccessible(label, QAccessible::Notification);
   if (auto* stack = qobject_cast<QStackedWidget*>(object))
     return new PlainAccessible(stack, QAccessible::Client);
+  // Linux calls a window a frame, too.
+  if (object->metaObject() == &QFrame::staticMetaObject || dynamic_cast<PopUp*>(object) != nullptr)
+    return new PlainAccessible(static_cast<QFrame*>(object), QAccessible::Grouping);
   return CreateComboBoxInterface(object);
 }
 

@@ -3,10 +3,10 @@
 
 namespace tendril {
 
-// Gives check boxes, radio buttons, OutputButton, CalmComboBox with its lines, PressableText and Announcement accessible
-// interfaces whose actions do what the mouse does. Qt's own toggle a button without a click, select a line without
-// choosing it, and call a combo box by its current line. Call it before the first of these controls is created; further
-// calls have no effect.
+// Gives check boxes, radio buttons, OutputButton, CalmComboBox with its lines, PressableText, Announcement, stacks and
+// plain frames accessible interfaces of their own. Qt's toggle a button without a click, select a line without choosing
+// it, call a combo box by its current line, and a frame a window. Call it before the first of these controls is created;
+// further calls have no effect.
 void InstallAccessibleControls();
 
 }  // namespace tendril
