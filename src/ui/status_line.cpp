@@ -10,6 +10,7 @@ namespace tendril {
 StatusLine::StatusLine() : lblStatus_(Named(new Announcement, "lblStatus")) {
   lblStatus_->setTextFormat(Qt::PlainText);
   lblStatus_->setTextInteractionFlags(Qt::TextSelectableByMouse);
+  lblStatus_->setContentsMargins(6, 0, 0, 0);  // below the areas of the window
   addWidget(lblStatus_, 1);
 }
 
