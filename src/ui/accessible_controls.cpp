@@ -23,7 +23,7 @@ class ButtonAccessible : public QAccessibleWidget {
       : QAccessibleWidget(button, role), button_(*button), action_(action) {}
 
   QString text(QAccessible::Text kind) const override {
-    const QString text = QAccessibleWidget::text(kind);
+    QString text = QAccessibleWidget::text(kind);
     if (kind != QAccessible::Description) return text;
     if (state().selected) return QStringLiteral("Selected");
     return text == QAccessibleWidget::text(QAccessible::Name) ? QString() : text;  // read once
