@@ -50,7 +50,7 @@ QWidget* ChannelChoices::MakePresets() {
            "what happens at power-up and when communication is lost.");
   for (const Preset& preset : kPresets) presets->addItem(QAnyStringView(preset.name).toString());
   presets->setCurrentIndex(static_cast<int>(kStartPreset));
-  AddLayout<QVBoxLayout>(frame, {9, 2, 9, 4})->addWidget(presets);
+  AddLayout<QVBoxLayout>(frame, {5, 2, 5, 4})->addWidget(presets);
   // The user's own choice, also of the current line.
   connect(presets, &QComboBox::activated, this,
           [this](int index) { Q_EMIT PresetChosen(static_cast<std::size_t>(index)); });
@@ -62,7 +62,7 @@ QButtonGroup* ChannelChoices::AddOptions(const QString& title, const char* array
                                          const std::vector<Choice>& choices,
                                          QBoxLayout::Direction direction) {
   auto* frame = new FrameBox(title);
-  auto* box = AddLayout<QVBoxLayout>(frame, {9, 2, 9, 4}, 2);
+  auto* box = AddLayout<QVBoxLayout>(frame, {5, 2, 5, 4}, 2);
   box->setDirection(direction);
   auto* group = new QButtonGroup(this);
   for (std::size_t i = 0; i < choices.size(); ++i) {

@@ -80,7 +80,7 @@ void frmNewServoConfig::LayOut() {
 
   auto* content = new QWidget;
   scroll->setWidget(content);
-  auto* column = AddLayout<QVBoxLayout>(content, {8, 4, 8, 8}, 4);
+  auto* column = AddLayout<QVBoxLayout>(content, {5, 4, 5, 6}, 4);
   column->addWidget(new WrappingRow(connection_, command_area_));
   auto* boxes_or_progress = new QStackedLayout;
   column->addLayout(boxes_or_progress);
@@ -92,7 +92,7 @@ void frmNewServoConfig::LayOut() {
   views_->addWidget(simulator_view);
   auto* simulator_column = AddLayout<QVBoxLayout>(simulator_view, {}, 4);
   auto* editor = new QWidget;
-  auto* editor_row = AddLayout<QHBoxLayout>(editor, {});
+  auto* editor_row = AddLayout<QHBoxLayout>(editor, {}, 4);
   editor_row->addWidget(servo_, 3);
   editor_row->addWidget(parameters_, 5);
   editor_row->addWidget(choices_, 2);

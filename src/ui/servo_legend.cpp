@@ -12,7 +12,7 @@ namespace tendril {
 namespace {
 
 constexpr int kSwatchGap = 4;
-constexpr int kEntryGap = 10;
+constexpr int kEntryGap = 5;
 
 struct LegendEntry {
   ScalePart part;
