@@ -7,7 +7,7 @@
 namespace tendril {
 
 ApplyBoxes::ApplyBoxes(ChannelEditor& editor)
-    : FrameBox(QStringLiteral("Channels to Apply Changes")), editor_(editor) {
+    : QGroupBox(QStringLiteral("Channels to Apply Changes")), editor_(editor) {
   setObjectName("fraApplyChans");
   QGridLayout* grid = MakeChannelColumns(this);
   for (std::size_t i = 0; i < chkUpdate_.size(); ++i) {

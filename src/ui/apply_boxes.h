@@ -2,6 +2,7 @@
 #pragma once
 
 #include <QCheckBox>
+#include <QGroupBox>
 #include <QLabel>
 #include <array>
 #include <cstddef>
@@ -13,7 +14,7 @@
 namespace tendril {
 
 // The frame `fraApplyChans`: a box for each channel, and "ALL".
-class ApplyBoxes : public FrameBox {
+class ApplyBoxes : public QGroupBox {
   Q_OBJECT
 
  public:

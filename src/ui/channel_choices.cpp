@@ -1,5 +1,6 @@
 #include "ui/channel_choices.h"
 
+#include <QGroupBox>
 #include <QRadioButton>
 
 namespace tendril {
@@ -42,7 +43,7 @@ std::vector<ChannelChoices::Choice> ChannelChoices::Choices(std::initializer_lis
 }
 
 QWidget* ChannelChoices::MakePresets() {
-  auto* frame = new FrameBox(QStringLiteral("Standard Preset Values"));
+  auto* frame = new QGroupBox(QStringLiteral("Standard Preset Values"));
   auto* presets = Named(new CalmComboBox, "cmbPresets");
   presets->setAccessibleName(frame->title());
   Describe(presets,
@@ -61,7 +62,7 @@ QWidget* ChannelChoices::MakePresets() {
 QButtonGroup* ChannelChoices::AddOptions(const QString& title, const char* array,
                                          const std::vector<Choice>& choices,
                                          QBoxLayout::Direction direction) {
-  auto* frame = new FrameBox(title);
+  auto* frame = new QGroupBox(title);
   auto* box = AddLayout<QVBoxLayout>(frame, {5, 2, 5, 4}, 2);
   box->setDirection(direction);
   auto* group = new QButtonGroup(this);

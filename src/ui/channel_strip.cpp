@@ -12,7 +12,7 @@ constexpr QSize kSmallestSimulator(80, 80);
 }  // namespace
 
 ChannelStrip::ChannelStrip(const ChannelTable& working)
-    : FrameBox(QStringLiteral("Click to Select Channel")), working_(working) {
+    : QGroupBox(QStringLiteral("Click to Select Channel")), working_(working) {
   QGridLayout* grid = MakeChannelColumns(this);
   for (std::size_t channel = 0; channel < kPortCount; ++channel) {
     grid->addWidget(MakeCell(channel), 0, static_cast<int>(channel));

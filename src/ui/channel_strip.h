@@ -1,6 +1,7 @@
 // ChannelStrip: the eight servos.
 #pragma once
 
+#include <QGroupBox>
 #include <QStackedWidget>
 #include <array>
 #include <cstddef>
@@ -12,7 +13,7 @@
 
 namespace tendril {
 
-class ChannelStrip : public FrameBox {
+class ChannelStrip : public QGroupBox {
   Q_OBJECT
 
  public:

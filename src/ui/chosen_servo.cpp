@@ -11,7 +11,7 @@ constexpr QSize kSmallestServo(120, 120);
 }  // namespace
 
 ChosenServo::ChosenServo(const ChannelEditor& editor, const ChannelTable& working)
-    : FrameBox(QStringLiteral("Channel")),
+    : QGroupBox(QStringLiteral("Channel")),
       editor_(editor),
       working_(working),
       servo_or_output_(new QStackedWidget),

@@ -1,6 +1,7 @@
 // ChosenServo: the large servo of the chosen channel, with a legend.
 #pragma once
 
+#include <QGroupBox>
 #include <QLabel>
 #include <QStackedWidget>
 #include <cstddef>
@@ -16,7 +17,7 @@
 
 namespace tendril {
 
-class ChosenServo : public FrameBox, public ChannelChoice {
+class ChosenServo : public QGroupBox, public ChannelChoice {
  public:
   // `editor` and `working`, its records, must outlive the area.
   ChosenServo(const ChannelEditor& editor, const ChannelTable& working);

@@ -1,5 +1,6 @@
 #include "ui/command_area.h"
 
+#include <QGroupBox>
 #include <QVBoxLayout>
 
 #include "ui/controls.h"
@@ -28,7 +29,7 @@ CommandArea::CommandArea()
   connect(cmdChangeId_, &QAbstractButton::clicked, this, &CommandArea::ChangeIdPressed);
   connect(cmdShowSummary_, &QAbstractButton::clicked, this, &CommandArea::SummaryPressed);
 
-  auto* frame = Named(new FrameBox(QStringLiteral("Unit")), "frmUpDownLoad");
+  auto* frame = Named(new QGroupBox(QStringLiteral("Unit")), "frmUpDownLoad");
   auto* commands = AddLayout<QHBoxLayout>(frame, {7, 4, 7, 6}, 5);
   for (QPushButton* button : {cmdSend_, cmdGet_}) commands->addWidget(button);
   commands->addSpacing(kApart);

@@ -1,5 +1,6 @@
 #include "ui/connection_area.h"
 
+#include <QGroupBox>
 #include <QHBoxLayout>
 #include <QLabel>
 #include <QSignalBlocker>
@@ -34,7 +35,7 @@ ConnectionArea::ConnectionArea(PortSelection& ports)
   auto* id_label = new QLabel(QStringLiteral("Select Unit &ID"));
   id_label->setBuddy(CmbUnitID_[0]);
 
-  auto* group = new FrameBox(QStringLiteral("Connection"));
+  auto* group = new QGroupBox(QStringLiteral("Connection"));
   auto* row = AddLayout<QHBoxLayout>(group, {7, 4, 7, 6}, 5);
   row->addWidget(port_label);
   row->addWidget(cmbNYX_);

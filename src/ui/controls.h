@@ -5,7 +5,6 @@
 #include <QButtonGroup>
 #include <QComboBox>
 #include <QFrame>
-#include <QGroupBox>
 #include <QLabel>
 #include <QLineEdit>
 #include <QMargins>
@@ -81,9 +80,6 @@ class PressableText : public QLineEdit {
   void mouseDoubleClickEvent(QMouseEvent* event) override { mousePressEvent(event); }
   void keyPressEvent(QKeyEvent* event) override;
 };
-
-// A frame with a title.
-using FrameBox = QGroupBox;
 
 // A frame that floats over the window, hidden until it is opened.
 class PopUp : public QFrame {

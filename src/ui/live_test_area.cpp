@@ -26,7 +26,7 @@ constexpr QColor kWarning(0xA8, 0x00, 0x20);
 }  // namespace
 
 LiveTestArea::LiveTestArea(MotionParameters& tests)
-    : FrameBox(QStringLiteral("Live Test")),
+    : QGroupBox(QStringLiteral("Live Test")),
       tests_(tests),
       warning_(new QWidget),
       HScrollSendServoPosition_(Named(new QSlider(Qt::Horizontal), "HScrollSendServoPosition")),
@@ -99,7 +99,7 @@ void LiveTestArea::ShowReadOut(const SliderReadOut& read_out) {
 }
 
 void LiveTestArea::changeEvent(QEvent* event) {
-  FrameBox::changeEvent(event);
+  QGroupBox::changeEvent(event);
   if (event->type() == QEvent::PaletteChange) ColourWarning();
 }
 

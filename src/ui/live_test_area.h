@@ -2,6 +2,7 @@
 #pragma once
 
 #include <QCheckBox>
+#include <QGroupBox>
 #include <QLabel>
 #include <QSlider>
 #include <QString>
@@ -15,7 +16,7 @@
 namespace tendril {
 
 // The slider, its read-outs and its box. The test buttons are part of MotionParameters.
-class LiveTestArea : public FrameBox, public LiveTestView {
+class LiveTestArea : public QGroupBox, public LiveTestView {
   Q_OBJECT
 
  public:

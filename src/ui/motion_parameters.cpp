@@ -114,7 +114,7 @@ QLabel* CaptionLabel(QAnyStringView text = {}) {
 }  // namespace
 
 MotionParameters::MotionParameters(ChannelEditor& editor)
-    : FrameBox(QStringLiteral("Motion Parameters")),
+    : QGroupBox(QStringLiteral("Motion Parameters")),
       editor_(editor),
       lblActPulseLeft_(Named(CaptionLabel(), "lblActPulseLeft")),
       remarks_(Named(new RemarksLabel, "lblRemarks", 0)),
@@ -211,7 +211,7 @@ void MotionParameters::MakePressable(QLabel* label) {
 
 bool MotionParameters::eventFilter(QObject* object, QEvent* event) {
   if (event->type() == QEvent::MouseButtonPress) Q_EMIT LabelPressed(static_cast<QWidget*>(object));
-  return FrameBox::eventFilter(object, event);
+  return QGroupBox::eventFilter(object, event);
 }
 
 void MotionParameters::ShowTestRunning(int button, bool running) {

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <QGridLayout>
+#include <QGroupBox>
 #include <QLabel>
 #include <QPushButton>
 #include <array>
@@ -19,7 +20,7 @@
 namespace tendril {
 
 // Shows what ChannelEditor holds, and passes it what the user sets.
-class MotionParameters : public FrameBox {
+class MotionParameters : public QGroupBox {
   Q_OBJECT
 
  public:

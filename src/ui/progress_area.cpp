@@ -39,7 +39,7 @@ QColor Tinted(const QColor& ground, QColor tint) {
 
 ProgressArea::ProgressArea()
     // The title keeps room for those of the commands.
-    : FrameBox(QStringLiteral("Progress")),
+    : QGroupBox(QStringLiteral("Progress")),
       pctProgress_(Named(new QWidget(this), "pctProgress")),
       ShapeProgress_(Named(new QWidget(pctProgress_), "ShapeProgress")),
       field_(new QWidget),
@@ -91,7 +91,7 @@ void ProgressArea::SetText(const std::string& text) {
 }
 
 void ProgressArea::changeEvent(QEvent* event) {
-  FrameBox::changeEvent(event);
+  QGroupBox::changeEvent(event);
   if (event->type() == QEvent::PaletteChange) ApplyColour();
 }
 

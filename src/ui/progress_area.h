@@ -1,6 +1,7 @@
 // ProgressArea: the bar that shows a running unit command and how it ended.
 #pragma once
 
+#include <QGroupBox>
 #include <QLabel>
 #include <QStackedLayout>
 #include <QWidget>
@@ -13,7 +14,7 @@ namespace tendril {
 
 // The frame `frmProgress`. Shares its place with the frame of the apply boxes, so that nothing around them moves when
 // one replaces the other.
-class ProgressArea : public FrameBox, public CommandProgressView {
+class ProgressArea : public QGroupBox, public CommandProgressView {
   Q_OBJECT
 
  public:
