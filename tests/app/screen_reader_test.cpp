@@ -7,11 +7,14 @@
 namespace tendril::test {
 namespace {
 
-TEST(ScreenReader, Configuration_IsSentByActionsAlone) {
+constexpr char kTitle[] = "Kelvane Tendril Utility v" TENDRIL_VERSION;
+constexpr char kSending[] = "notification Sending the configuration to unit 01";
+const std::string kSent = std::string(kSending) + ": SUCCESS: Send Complete!";
+
+// From the start to the outcome of a send. Returns what was heard from the send on.
+std::vector<std::string> Send() {
   ScreenReader reader(QStringLiteral(TENDRIL_DEMO_PROGRAM));
-  const ScreenReader::Object window = reader.Window();
-  EXPECT_EQ(reader.Role(window), "frame");
-  EXPECT_EQ(reader.Name(window).substr(0, 23), "Kelvane Tendril Utility");
+  const ScreenReader::Object window = reader.Find(reader.Program(), "frame", kTitle);
 
   const ScreenReader::Object ports = reader.Find(window, "combo box", "Comm Port");
   reader.Act(ports);
@@ -25,15 +28,20 @@ TEST(ScreenReader, Configuration_IsSentByActionsAlone) {
 
   const ScreenReader::Object send = reader.Find(window, "push button", "SEND(write) Configuration");
   reader.Act(send, 1);
-  ASSERT_TRUE(reader.Hears("focused SEND(write) Configuration"));
+  EXPECT_TRUE(reader.Hears("focused SEND(write) Configuration"));
   reader.heard.clear();
   reader.Act(send);
-  const std::string sending = "notification Sending the configuration to unit 01";
-  EXPECT_TRUE(reader.Hears(sending + ": SUCCESS: Send Complete!"));
+  EXPECT_TRUE(reader.Hears(std::string(kSending) + ": "));
+  return reader.heard;
+}
+
+TEST(ScreenReader, Configuration_IsSentByActionsAlone) {
+  std::vector<std::string> heard = Send();
+  // Units and window share a thread: on a slow computer the line may be released too late for a reply.
+  for (int again = 0; again < 6 && !HasFailure() && heard.back() != kSent; ++again) heard = Send();
   // The focus rests on the window meanwhile.
-  EXPECT_THAT(reader.heard, testing::ElementsAre("focused " + reader.Name(window), sending,
-                                                 "focused SEND(write) Configuration",
-                                                 sending + ": SUCCESS: Send Complete!"));
+  EXPECT_THAT(heard, testing::ElementsAre(std::string("focused ") + kTitle, kSending,
+                                          "focused SEND(write) Configuration", kSent));
 }
 
 }  // namespace

@@ -116,21 +116,15 @@ std::vector<ScreenReader::Object> ScreenReader::Children(const Object& object) {
     list.endStructure();
     children.back().path = path.path();
   }
+  list.endArray();
   return children;
 }
 
-ScreenReader::Object ScreenReader::Window() {
-  Object window;
-  const bool found = QTest::qWaitFor(
-      [&] {
-        for (const Object& program : Children(kDesktop)) {
-          for (const Object& child : Children(program)) window = child;
-        }
-        return !window.path.isEmpty();
-      },
-      kMaxWaitMs);
-  if (!found) throw std::runtime_error("There is no window");
-  return window;
+ScreenReader::Object ScreenReader::Program() {
+  std::vector<Object> programs;
+  if (!QTest::qWaitFor([&] { return !(programs = Children(kDesktop)).empty(); }, kMaxWaitMs))
+    throw std::runtime_error("The program is not on the bus");
+  return programs.front();
 }
 
 bool ScreenReader::Search(const Object& object, const std::string& role, const std::string& name,
@@ -153,8 +147,10 @@ ScreenReader::Object ScreenReader::Find(const Object& object, const std::string&
 }
 
 bool ScreenReader::Hears(const std::string& what) {
-  return QTest::qWaitFor([&] { return std::find(heard.begin(), heard.end(), what) != heard.end(); },
-                         kMaxWaitMs);
+  const auto contains = [&what](const std::string& sentence) {
+    return sentence.find(what) != std::string::npos;
+  };
+  return QTest::qWaitFor([&] { return std::any_of(heard.begin(), heard.end(), contains); }, kMaxWaitMs);
 }
 
 void ScreenReader::OnStateChanged(const QDBusMessage& event) {

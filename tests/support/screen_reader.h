@@ -27,8 +27,8 @@ class ScreenReader : public QObject {
   explicit ScreenReader(const QString& program);
   ~ScreenReader() override;
 
-  // The program's window.
-  Object Window();
+  // What all windows of the program are inside of.
+  Object Program();
   // What `object` has inside, at any depth, with this role and name. Waits for it; raises std::runtime_error when it
   // does not appear.
   Object Find(const Object& object, const std::string& role, const std::string& name);
@@ -38,7 +38,7 @@ class ScreenReader : public QObject {
   // Carries out action `index` of the object; 0 presses it.
   void Act(const Object& object, int index = 0);
 
-  // Whether this was heard, now or soon.
+  // Whether something that contains this was heard, now or soon.
   bool Hears(const std::string& what);
   // What a reader reads out, in order: "focused NAME", "selected NAME", "notification NAME".
   std::vector<std::string> heard;
