@@ -24,11 +24,12 @@ QWidget* ChannelStrip::MakeCell(std::size_t channel) {
   auto* simulator = ServoSimulator2_[channel] = Named(new ServoSimulator, "ServoSimulator2", channel);
   simulator->setMinimumSize(kSmallestSimulator);
   simulator->DisplaySize(kSmallSimulator);
-  simulator->DisplayCaption(QStringLiteral("CHAN %1").arg(channel + 1));
+  const QString caption = QStringLiteral("CHAN %1").arg(channel + 1);
+  simulator->DisplayCaption(caption);
   Describe(simulator,
            QStringLiteral("Chooses channel %1, to edit it and to move its servo.").arg(channel + 1));
 
-  auto* output = cmdDigitalOutput_[channel] = Named(new OutputButton, "cmdDigitalOutput", channel);
+  auto* output = cmdDigitalOutput_[channel] = Named(new OutputButton(caption), "cmdDigitalOutput", channel);
   Describe(output, QStringLiteral("Chooses channel %1, to edit it.").arg(channel + 1));
 
   connect(simulator, &ServoSimulator::Resized, this, [this, simulator, channel](Microseconds arm) {

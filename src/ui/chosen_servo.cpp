@@ -36,7 +36,7 @@ ChosenServo::ChosenServo(const ChannelEditor& editor, const ChannelTable& workin
   servo_or_output_->addWidget(lblOutput_);
   auto* column = AddLayout<QVBoxLayout>(this, {4, 4, 4, 4}, 4);
   column->addWidget(servo_or_output_, 1);
-  column->addWidget(new ServoLegend);
+  column->addWidget(legend_);
 }
 
 void ChosenServo::ShowChannel() {
@@ -48,6 +48,7 @@ void ChosenServo::ShowChannel() {
   const QString kind = OutputLabel(working_.At(*channel).PortType);
   lblOutput_->setText(caption + QStringLiteral("\n\n") + kind);
   servo_or_output_->setCurrentIndex(kind.isEmpty() ? 0 : 1);
+  legend_->setVisible(kind.isEmpty());
 }
 
 ChannelConfig ChosenServo::Values() const {

@@ -37,6 +37,7 @@ class ChosenServo : public QGroupBox, public ChannelChoice {
   const ChannelTable& working_;
   QStackedWidget* servo_or_output_;
   ServoSimulator* ServoSimulator1_;
+  ServoLegend* legend_ = new ServoLegend;
   QLabel* lblOutput_;  // takes the servo's place when the port drives none
 };
 

@@ -3,6 +3,7 @@
 #include <QAccessible>
 #include <QApplication>
 #include <QClipboard>
+#include <QEvent>
 #include <QLineEdit>
 
 #include "ui/appearance.h"
@@ -108,9 +109,9 @@ void MainMenu::AddViewMenu(QWidget& window) {
                                  [this, channel] { Q_EMIT ChannelChosen(channel); });
   }
   menu.addSeparator();
-  QAction* dark = AddItem(menu, "&Dark", "Ctrl+Shift+D", this, [](bool on) { SetDarkAppearance(on); });
-  dark->setCheckable(true);
-  dark->setChecked(DarkAppearance());
+  dark_ = AddItem(menu, "&Dark", "Ctrl+Shift+D", this, [](bool on) { SetDarkAppearance(on); });
+  dark_->setCheckable(true);
+  dark_->setChecked(DarkAppearance());
 }
 
 void MainMenu::AddHelpMenu() {
@@ -119,6 +120,12 @@ void MainMenu::AddHelpMenu() {
   AddItem(menu, "&Keys", "F1", this, &MainMenu::KeysChosen);
   menu.addSeparator();
   AddItem(menu, "&About", "Ctrl+Shift+F1", this, &MainMenu::AboutChosen);
+}
+
+// The system can change its theme, too.
+void MainMenu::changeEvent(QEvent* event) {
+  QMenuBar::changeEvent(event);
+  if (event->type() == QEvent::PaletteChange && dark_ != nullptr) dark_->setChecked(DarkAppearance());
 }
 
 void MainMenu::ShowView(bool summary) {

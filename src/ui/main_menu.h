@@ -36,6 +36,9 @@ class MainMenu : public QMenuBar {
   void KeysChosen();
   void AboutChosen();
 
+ protected:
+  void changeEvent(QEvent* event) override;
+
  private:
   void AddUnitMenu(QWidget& window);
   void AddTests(QMenu& menu, QWidget& window);
@@ -46,6 +49,7 @@ class MainMenu : public QMenuBar {
   std::array<QAction*, 2> id_steps_{};
   std::array<QAction*, kPortCount> channels_{};
   QAction* simulator_ = nullptr;
+  QAction* dark_ = nullptr;
 };
 
 // Puts the selected text of the focused field on the clipboard; without one the value of the focused control.

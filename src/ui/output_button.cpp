@@ -6,8 +6,13 @@
 #include "simulator/servo_simulator.h"
 
 namespace tendril {
+namespace {
 
-OutputButton::OutputButton() {
+constexpr int kCaptionMargin = 8;  // below it
+
+}  // namespace
+
+OutputButton::OutputButton(const QString& caption) : caption_(caption) {
   setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Expanding);
   QFont bold = font();
   bold.setBold(true);
@@ -23,11 +28,17 @@ void OutputButton::Select(bool selected) {
 }
 
 void OutputButton::paintEvent(QPaintEvent* event) {
-  if (!selected_) return QPushButton::paintEvent(event);
+  if (!selected_) QPushButton::paintEvent(event);
   QPainter painter(this);
-  PaintSelection(painter, rect(), palette(), ToColour(kSelectedBackground), hasFocus());
-  painter.setPen(Qt::white);
-  painter.drawText(rect(), Qt::AlignCenter, text());
+  painter.setPen(selected_ ? QColor(Qt::white) : palette().color(QPalette::ButtonText));
+  if (selected_) {
+    PaintSelection(painter, rect(), palette(), ToColour(kSelectedBackground), hasFocus());
+    painter.drawText(rect(), Qt::AlignCenter, text());
+  }
+  QFont regular = font();
+  regular.setBold(false);
+  painter.setFont(regular);
+  painter.drawText(rect().adjusted(0, 0, 0, -kCaptionMargin), Qt::AlignHCenter | Qt::AlignBottom, caption_);
 }
 
 }  // namespace tendril

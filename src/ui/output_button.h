@@ -2,6 +2,7 @@
 #pragma once
 
 #include <QPushButton>
+#include <QString>
 
 namespace tendril {
 
@@ -10,7 +11,8 @@ class OutputButton : public QPushButton {
   Q_OBJECT
 
  public:
-  OutputButton();
+  // `caption` names the channel, below the text.
+  explicit OutputButton(const QString& caption);
 
   bool Selected() const { return selected_; }
   // Assistive technology is notified of a change.
@@ -20,6 +22,7 @@ class OutputButton : public QPushButton {
   void paintEvent(QPaintEvent* event) override;
 
  private:
+  const QString caption_;
   bool selected_ = false;
 };
 
