@@ -45,6 +45,7 @@ void ChosenServo::ShowChannel() {
   const QString caption = QStringLiteral("CHAN %1").arg(*channel + 1);
   setTitle(caption);
   ServoSimulator1_->DisplayCaption(caption);
+  ServoSimulator1_->setAccessibleName(QStringLiteral("Chosen channel, %1").arg(*channel + 1));
   const QString kind = OutputLabel(working_.At(*channel).PortType);
   lblOutput_->setText(caption + QStringLiteral("\n\n") + kind);
   servo_or_output_->setCurrentIndex(kind.isEmpty() ? 0 : 1);

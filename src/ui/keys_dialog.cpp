@@ -62,6 +62,7 @@ KeysDialog::KeysDialog(const QMenuBar& menus, QWidget& window) : QDialog(&window
   for (const GeneralKey& key : kGeneralKeys)
     new QTreeWidgetItem(general, {QString::fromUtf8(key.key), QString::fromUtf8(key.what)});
   list->expandAll();
+  list->setCurrentItem(list->topLevelItem(0));  // the first thing that is read out
   list->resizeColumnToContents(0);
   auto* buttons = new QDialogButtonBox(QDialogButtonBox::Close);
   connect(buttons, &QDialogButtonBox::rejected, this, &QDialog::close);
