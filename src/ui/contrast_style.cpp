@@ -16,6 +16,9 @@ constexpr int kFocusWidth = 2;
 constexpr int kSpinBoxTop = 1;  // of a spin box's outline
 constexpr int kFrameTop = 3;    // of a group box, below its title
 
+// Far more than the controls of a window have.
+constexpr std::size_t kMaxKeptPalettes = 500;
+
 // Lines that are drawn translucent or blurred need more contrast than others.
 constexpr double kFaintLineContrast = 4.5;
 
@@ -125,6 +128,7 @@ void ContrastStyle::drawComplexControl(ComplexControl control, const QStyleOptio
 }
 
 QPalette ContrastStyle::WithEdges(const QPalette& palette, int shade, double contrast) const {
+  if (edged_.size() > kMaxKeptPalettes) edged_.clear();
   QPalette& kept = edged_[{palette.cacheKey(), shade}];
   if (kept.resolveMask() == 0) {
     kept = palette;
