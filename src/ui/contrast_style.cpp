@@ -17,7 +17,7 @@ constexpr int kSpinBoxTop = 1;  // of a spin box's outline
 constexpr int kFrameTop = 3;    // of a group box, below its title
 
 // Far more than the controls of a window have.
-constexpr std::size_t kMaxKeptPalettes = 500;
+constexpr qsizetype kMaxKeptPalettes = 500;
 
 // Lines that are drawn translucent or blurred need more contrast than others.
 constexpr double kFaintLineContrast = 4.5;
