@@ -11,9 +11,11 @@ namespace tendril {
 
 // Every fact can be selected and copied; "Copy" copies all of them. Not modal: a command goes on meanwhile.
 class AboutDialog : public QDialog {
- public:
-  // `window` owns it.
-  AboutDialog(const ProgramInfo& info, QWidget& window);
+  Q_OBJECT  // found by its type
+
+      public :
+      // `window` owns it.
+      AboutDialog(const ProgramInfo& info, QWidget& window);
 
  private:
   void AddFact(const QString& what, const QString& value);

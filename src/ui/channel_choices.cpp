@@ -83,7 +83,8 @@ void ChannelChoices::ShowChoices() {
   CheckOnly(*optChannelType_, record.PortType + 1);
   CheckOnly(*optPowerUp_, record.PowerUPOpt);
   CheckOnly(*optLostComm_, record.LostCommOption);
-  const QString why_not = channel ? QString() : QStringLiteral("Click a servo first, to choose its channel.");
+  const QString why_not =
+      channel ? QString() : QStringLiteral("Choose a channel first: click a servo, or Ctrl+1.");
   for (const QButtonGroup* group : {optChannelType_, optPowerUp_, optLostComm_}) {
     for (QAbstractButton* option : group->buttons()) EnableUnless(why_not, option);
   }

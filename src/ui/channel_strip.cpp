@@ -26,11 +26,12 @@ QWidget* ChannelStrip::MakeCell(std::size_t channel) {
   simulator->DisplaySize(kSmallSimulator);
   const QString caption = QStringLiteral("CHAN %1").arg(channel + 1);
   simulator->DisplayCaption(caption);
-  Describe(simulator,
-           QStringLiteral("Chooses channel %1, to edit it and to move its servo.").arg(channel + 1));
+  Describe(
+      simulator,
+      QStringLiteral("Chooses channel %1, to edit it and to move its servo (Ctrl+%1).").arg(channel + 1));
 
   auto* output = cmdDigitalOutput_[channel] = Named(new OutputButton(caption), "cmdDigitalOutput", channel);
-  Describe(output, QStringLiteral("Chooses channel %1, to edit it.").arg(channel + 1));
+  Describe(output, QStringLiteral("Chooses channel %1, to edit it (Ctrl+%1).").arg(channel + 1));
 
   connect(simulator, &ServoSimulator::Resized, this, [this, simulator, channel](Microseconds arm) {
     RefeedResizedSimulator(*simulator, working_.At(channel), arm);
@@ -50,6 +51,7 @@ void ChannelStrip::ShowSelected(std::size_t channel) {
     ServoSimulator2_[i]->SelectServo(i == channel);
     cmdDigitalOutput_[i]->Select(i == channel);
   }
+  Reveal(*cells_[channel]);  // a key may have chosen it
 }
 
 void ChannelStrip::ShowKinds() {

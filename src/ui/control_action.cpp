@@ -33,6 +33,7 @@ ControlAction::ControlAction(const QString& text, const QKeySequence& key, CalmC
           text, key, list,
           [&list] {
             list.setFocus();
+            Reveal(list);
             list.showPopup();
           },
           parent) {}

@@ -4,6 +4,7 @@
 #include <QClipboard>
 #include <QGuiApplication>
 #include <QKeyEvent>
+#include <QScrollArea>
 #include <QSignalBlocker>
 #include <algorithm>
 
@@ -73,6 +74,16 @@ void CalmSpinBox::Show(const BoundedValue& value) {
   shown_ = value;
   if (!ArrowHeld()) ApplyLimits();
   setValue(value.Value());
+}
+
+// Ctrl+C without a selection is left to the window, which copies the value.
+bool CalmSpinBox::event(QEvent* event) {
+  if (event->type() == QEvent::ShortcutOverride && !lineEdit()->hasSelectedText() &&
+      static_cast<QKeyEvent*>(event)->matches(QKeySequence::Copy)) {
+    event->ignore();
+    return false;
+  }
+  return QSpinBox::event(event);
 }
 
 // New limits would stop a held arrow from repeating. The release does not arrive here when a message box has opened
@@ -158,6 +169,12 @@ QLabel* BoldLabel(QAnyStringView text) {
   font.setBold(true);
   label->setFont(font);
   return label;
+}
+
+void Reveal(QWidget& widget) {
+  for (QWidget* outer = widget.parentWidget(); outer != nullptr; outer = outer->parentWidget()) {
+    if (auto* area = qobject_cast<QScrollArea*>(outer)) area->ensureWidgetVisible(&widget);
+  }
 }
 
 void ScaleType(QWidget* widget, double factor) {

@@ -48,6 +48,8 @@ class CalmSpinBox : public QSpinBox {
   // Shows a value and its limits. Emits no signal.
   void Show(const BoundedValue& value);
 
+  bool event(QEvent* event) override;
+
  protected:
   void wheelEvent(QWheelEvent* event) override;
   void mousePressEvent(QMouseEvent* event) override;
@@ -128,6 +130,9 @@ void CheckOnly(QButtonGroup& group, int id);
 // Labels in the theme's less prominent text colour, and in bold type.
 QLabel* DimLabel(QAnyStringView text);
 QLabel* BoldLabel(QAnyStringView text = {});
+
+// Scrolls what contains `widget`, if that scrolls, until it is visible.
+void Reveal(QWidget& widget);
 
 // Multiplies the type size of `widget`.
 void ScaleType(QWidget* widget, double factor);

@@ -9,6 +9,7 @@
 #include <QTimer>
 #include <QVBoxLayout>
 
+#include "platform/hex_text.h"
 #include "ui/about_dialog.h"
 #include "ui/accessible_controls.h"
 #include "ui/appearance.h"
@@ -111,12 +112,14 @@ void frmNewServoConfig::Connect() {
   connect(command_area_, &CommandArea::SummaryPressed, c, [this] { ShowSummary(); });
   connect(apply_boxes_, &ApplyBoxes::Applied, c, [this] { OnApplied(); });
   connect(channels_, &ChannelStrip::ChannelChosen, c,
-          [this](std::size_t channel) { SelectChannel(channel); });
+          [this](std::size_t channel) { ChooseChannel(channel); });
   connect(parameters_, &MotionParameters::Edited, c, [this](FollowUp follow_up) { OnEdited(follow_up); });
   connect(parameters_, &MotionParameters::LabelPressed, c,
           [this](const QWidget* label) { actuals_->ShowActuals(*label); });
-  connect(parameters_, &MotionParameters::TestPressed, c,
-          [this](int button) { live_test_.OnTestButton(button); });
+  connect(parameters_, &MotionParameters::TestPressed, c, [this](int button) {
+    CommitTyping();
+    live_test_.OnTestButton(button);
+  });
   connect(choices_, &ChannelChoices::KindChosen, c, [this](std::int16_t kind) { OnKindChosen(kind); });
   connect(choices_, &ChannelChoices::PresetChosen, c, [this](std::size_t preset) { OnPresetChosen(preset); });
   connect(live_test_area_, &LiveTestArea::SliderMoved, c, [this] { live_test_.OnSlider(); });
@@ -129,16 +132,18 @@ void frmNewServoConfig::Connect() {
     status_->Say(live_test_area_->Sweeps() ? QStringLiteral("Servo test running")
                                            : QStringLiteral("Servo test stopped"));
   });
-  connect(menu_, &MainMenu::ChannelChosen, c, [this](std::size_t channel) {
-    CommitTyping();
-    SelectChannel(channel);
-    status_->Say(QStringLiteral("Channel %1 selected").arg(channel + 1));  // the focus may be elsewhere
-  });
+  connect(menu_, &MainMenu::ChannelChosen, c, [this](std::size_t channel) { ChooseChannel(channel); });
   connect(menu_, &MainMenu::CopyStatusChosen, c, [this] { status_->Copy(); });
-  connect(menu_, &MainMenu::IdStepped, c, [this](int by) { connection_->StepUnitId(by); });
+  connect(menu_, &MainMenu::IdStepped, c, [this](int by) {
+    connection_->StepUnitId(by);
+    status_->Say(QStringLiteral("Unit ID ") + QString::fromStdString(HexByte(connection_->UnitId())));
+  });
   connect(menu_, &MainMenu::SimulatorChosen, c, [this] { ShowConfig(); });
   connect(menu_, &MainMenu::KeysChosen, c, [this] { ShowKeys(*this, *menu_); });
-  connect(menu_, &MainMenu::ManualChosen, c, [this] { OpenManual(boxes_); });
+  connect(menu_, &MainMenu::ManualChosen, c, [this] {
+    live_test_.OnTestButton(LiveTest::kNoButton);  // no servo moves while the user looks elsewhere
+    OpenManual(boxes_);
+  });
   connect(menu_, &MainMenu::AboutChosen, c, [this] { ShowAbout(*this, info_); });
   connect(progress_, &ProgressArea::Said, c, [this](const QString& sentence) { status_->Say(sentence); });
   commands_.running.SetObserver([this] { ShowRunning(); });
@@ -155,6 +160,14 @@ void frmNewServoConfig::StartUp() {
   control_panel_.ReadPreferences();
   control_panel_.InitializeCommListenerInterface();
   ShowRecords();
+}
+
+// By a click, a key or an action of assistive technology: the focus may be elsewhere.
+void frmNewServoConfig::ChooseChannel(std::size_t channel) {
+  CommitTyping();
+  SelectChannel(channel);
+  status_->Say(QStringLiteral("Channel %1 selected").arg(channel + 1) +
+               (live_test_area_->Sweeps() ? QStringLiteral("; the test goes on there") : QString()));
 }
 
 void frmNewServoConfig::SelectChannel(std::size_t channel) {
@@ -252,7 +265,8 @@ void frmNewServoConfig::ShowSummary() {
 
 void frmNewServoConfig::OnSummaryScreen() {
   tmrSummaryScreen_->SetEnabled(false);
-  focus_before_summary_ = focusWidget();
+  // While a command runs the focus rests on the window.
+  focus_before_summary_ = focusWidget() == this ? focus_before_command_.data() : focusWidget();
   actuals_->hide();
   summary_->NormaliseAndShowRecords();
   live_test_.OnRecordsReplaced();  // the records may have changed

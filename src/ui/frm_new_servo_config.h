@@ -57,6 +57,7 @@ class frmNewServoConfig : public QMainWindow {
   void LayOut();
   void Connect();
   void StartUp();
+  void ChooseChannel(std::size_t channel);
   void SelectChannel(std::size_t channel);
   void ShowEditor();
   void OnEdited(FollowUp follow_up);

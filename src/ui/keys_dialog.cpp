@@ -3,6 +3,7 @@
 #include <QDialogButtonBox>
 #include <QHeaderView>
 #include <QMenu>
+#include <QScreen>
 #include <QTreeWidget>
 #include <QVBoxLayout>
 #include <array>
@@ -16,7 +17,10 @@ struct GeneralKey {
   const char* key;
   const char* what;
 };
-constexpr std::array<GeneralKey, 8> kGeneralKeys{
+// Of a window, and of the screen's bars.
+constexpr QSize kRoomForFrames(16, 60);
+
+constexpr std::array<GeneralKey, 9> kGeneralKeys{
     {{"Tab, Shift+Tab", "Next and previous control"},
      {"Alt+underlined letter", "The button or list with that letter, or the menu"},
      {"Space, Enter",
@@ -24,6 +28,7 @@ constexpr std::array<GeneralKey, 8> kGeneralKeys{
      {"Space", "Presses a button, ticks a box"},
      {"Up, Down", "A number by 10 µs; the next choice; the next line of a list"},
      {"Page Up, Page Down", "A number by 100 µs; the slider by 10 %"},
+     {"F4, Alt+Down", "Opens a list"},
      {"Enter", "A typed number takes effect"},
      {"Escape", "Closes the number entry, a list, or this window"}}};
 
@@ -69,7 +74,7 @@ KeysDialog::KeysDialog(const QMenuBar& menus, QWidget& window) : QDialog(&window
   auto* column = new QVBoxLayout(this);
   column->addWidget(list);
   column->addWidget(buttons);
-  resize(640, 560);
+  resize(QSize(640, 560).boundedTo(window.screen()->availableSize() - kRoomForFrames));
 }
 
 void ShowKeys(QWidget& window, const QMenuBar& menus) {

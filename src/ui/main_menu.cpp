@@ -4,7 +4,9 @@
 #include <QApplication>
 #include <QClipboard>
 #include <QEvent>
+#include <QLabel>
 #include <QLineEdit>
+#include <QSlider>
 
 #include "ui/appearance.h"
 #include "ui/control_action.h"
@@ -19,10 +21,10 @@ struct ControlItem {
 };
 constexpr std::array<ControlItem, 2> kTargetItems{
     {{"Comm &Port", "Ctrl+P", "cmbNYX"}, {"Unit &ID", "Ctrl+I", "CmbUnitID_0"}}};
-constexpr std::array<ControlItem, 3> kCommandItems{
+constexpr std::array<ControlItem, 2> kCommandItems{
     {{"&SEND(write) Configuration", "Ctrl+Return", "Command3_0"},
-     {"&GET(read) Configuration", "Ctrl+G", "Command3_1"},
-     {"UPDATE Unit_ID", "", "Command3_2"}}};
+     {"&GET(read) Configuration", "Ctrl+G", "Command3_1"}}};
+constexpr ControlItem kChangeIdItem{"UPDATE Unit_ID", "", "Command3_2"};
 constexpr std::array<ControlItem, 2> kFileItems{
     {{"Export Config", "", "cmdWriteConfig"}, {"Import Config", "", "cmdReadConfig"}}};
 // In the order of the editor. No plain function key: one slip would move a servo.
@@ -78,6 +80,8 @@ void MainMenu::AddUnitMenu(QWidget& window) {
   for (const ControlItem& item : kCommandItems) AddItem(menu, window, item);
   menu.addSeparator();
   AddTests(*menu.addMenu(QStringLiteral("&Test")), window);
+  menu.addSeparator();
+  AddItem(menu, window, kChangeIdItem);
   menu.addSeparator();
   for (const ControlItem& item : kFileItems) AddItem(menu, window, item);
   menu.addSeparator();
@@ -141,13 +145,12 @@ void MainMenu::EnableIdSteps(bool enabled) {
 void CopyFocused() {
   QWidget* const focused = QApplication::focusWidget();
   if (focused == nullptr) return;
-  if (const auto* field = focused->findChild<QLineEdit*>(); field != nullptr && field->hasSelectedText()) {
-    field->copy();
-    return;
-  }
-  const QAccessibleInterface* accessible = QAccessible::queryAccessibleInterface(focused);
-  const QString value = accessible->text(QAccessible::Value);
-  QGuiApplication::clipboard()->setText(value.isEmpty() ? accessible->text(QAccessible::Name) : value);
+  QString text = QAccessible::queryAccessibleInterface(focused)->text(QAccessible::Value);
+  if (const auto* label = qobject_cast<QLabel*>(focused)) text = label->selectedText();
+  if (qobject_cast<QSlider*>(focused) != nullptr) text = focused->accessibleDescription();
+  if (const auto* field = focused->findChild<QLineEdit*>(); field != nullptr && field->hasSelectedText())
+    text = field->selectedText();
+  if (!text.isEmpty()) QGuiApplication::clipboard()->setText(text);
 }
 
 }  // namespace tendril

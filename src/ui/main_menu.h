@@ -52,7 +52,7 @@ class MainMenu : public QMenuBar {
   QAction* dark_ = nullptr;
 };
 
-// Puts the selected text of the focused field on the clipboard; without one the value of the focused control.
+// Puts the selected text of the focused control on the clipboard, or else its value. Does nothing when it has neither.
 void CopyFocused();
 
 }  // namespace tendril

@@ -18,10 +18,13 @@ struct LegendEntry {
   ScalePart part;
   const char* name;
 };
-constexpr std::array<LegendEntry, 3> kRangeEntries{
-    {{ScalePart::kActual, "actual"}, {ScalePart::kVirtual, "virtual"}, {ScalePart::kStops, "stops"}}};
-constexpr std::array<LegendEntry, 2> kLineEntries{
-    {{ScalePart::kNeutral, "neutral"}, {ScalePart::kDefault, "default"}}};
+constexpr std::array<LegendEntry, 6> kEntries{{{ScalePart::kActual, "actual"},
+                                               {ScalePart::kVirtual, "virtual"},
+                                               {ScalePart::kStops, "stops"},
+                                               {ScalePart::kNeutral, "neutral"},
+                                               {ScalePart::kDefault, "default"},
+                                               {ScalePart::kArm, "arm"}}};
+constexpr std::size_t kInNarrowLine = 2;
 
 // An even number, so that a line stands in the middle.
 int SwatchSize(const QFontMetrics& metrics) { return (metrics.ascent() + 1) / 2 * 2; }
@@ -43,7 +46,8 @@ void PaintEntries(QPainter& painter, std::span<const LegendEntry> entries, QPoin
   const int top = place.y() + (metrics.height() - size) / 2;
   for (const LegendEntry& entry : entries) {
     const QRectF swatch(place.x(), top, size, size);
-    if (entry.part == ScalePart::kNeutral || entry.part == ScalePart::kDefault) {
+    if (entry.part == ScalePart::kNeutral || entry.part == ScalePart::kDefault ||
+        entry.part == ScalePart::kArm) {
       const double beside = (size - kMarkerLine) / 2;
       PaintPlate(painter, swatch);
       PaintLine(painter, entry.part, swatch.adjusted(beside, 1, -beside, -1));
@@ -65,35 +69,41 @@ ServoLegend::ServoLegend() {
       "position. Pink line: default position. Red: the arm."));
 }
 
+// Whole lines of equally many entries, as few lines as the width allows.
+std::size_t ServoLegend::EntriesInLine() const {
+  const QFontMetrics metrics = fontMetrics();
+  for (const std::size_t count : {kEntries.size(), kEntries.size() / 2}) {
+    int widest = 0;
+    for (std::size_t first = 0; first < kEntries.size(); first += count)
+      widest = std::max(widest, LegendWidth(std::span(kEntries).subspan(first, count), metrics));
+    if (widest <= width()) return count;
+  }
+  return kInNarrowLine;
+}
+
 QSize ServoLegend::minimumSizeHint() const {
   const QFontMetrics metrics = fontMetrics();
-  return {std::max(LegendWidth(kRangeEntries, metrics), LegendWidth(kLineEntries, metrics)),
-          metrics.height() * (two_lines_ ? 2 : 1)};
+  int widest = 0;
+  for (std::size_t first = 0; first < kEntries.size(); first += kInNarrowLine)
+    widest = std::max(widest, LegendWidth(std::span(kEntries).subspan(first, kInNarrowLine), metrics));
+  return {widest, metrics.height() * static_cast<int>(kEntries.size() / in_line_)};
 }
 
 void ServoLegend::resizeEvent(QResizeEvent* event) {
   QWidget::resizeEvent(event);
-  const QFontMetrics metrics = fontMetrics();
-  const bool two_lines =
-      LegendWidth(kRangeEntries, metrics) + kEntryGap + LegendWidth(kLineEntries, metrics) > width();
-  if (two_lines == two_lines_) return;
-  two_lines_ = two_lines;
+  if (in_line_ == EntriesInLine()) return;
+  in_line_ = EntriesInLine();
   updateGeometry();
 }
 
 void ServoLegend::paintEvent(QPaintEvent*) {
   QPainter painter(this);
   const QFontMetrics metrics = fontMetrics();
-  const int ranges = LegendWidth(kRangeEntries, metrics);
-  const int lines = LegendWidth(kLineEntries, metrics);
-  if (two_lines_) {
-    const int left = (width() - ranges) / 2;
-    PaintEntries(painter, kRangeEntries, {left, 0});
-    PaintEntries(painter, kLineEntries, {left, metrics.height()});
-  } else {
-    const int left = (width() - ranges - kEntryGap - lines) / 2;
-    PaintEntries(painter, kRangeEntries, {left, 0});
-    PaintEntries(painter, kLineEntries, {left + ranges + kEntryGap, 0});
+  const auto first_line = std::span(kEntries).first(in_line_);
+  const int left = std::max(0, (width() - LegendWidth(first_line, metrics)) / 2);
+  for (std::size_t first = 0; first < kEntries.size(); first += in_line_) {
+    const int top = static_cast<int>(first / in_line_) * metrics.height();
+    PaintEntries(painter, std::span(kEntries).subspan(first, in_line_), {left, top});
   }
 }
 

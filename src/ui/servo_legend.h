@@ -2,10 +2,11 @@
 #pragma once
 
 #include <QWidget>
+#include <cstddef>
 
 namespace tendril {
 
-// Ranges and lines stand on one line, or on one line each where that is too wide.
+// Stands on one line, or on two or three where that is too wide.
 class ServoLegend : public QWidget {
  public:
   ServoLegend();
@@ -18,7 +19,9 @@ class ServoLegend : public QWidget {
   void resizeEvent(QResizeEvent* event) override;
 
  private:
-  bool two_lines_ = false;
+  std::size_t EntriesInLine() const;
+
+  std::size_t in_line_ = 6;
 };
 
 }  // namespace tendril

@@ -20,7 +20,7 @@ constexpr int kLastColumn = 14;
 constexpr int kEdgeWidth = 2;
 constexpr int kChannelWidth = 52;
 constexpr int kValueWidth = 73;
-constexpr int kOptionWidth = 59;
+constexpr int kOptionWidth = 56;
 constexpr int kSpacing = 3;
 constexpr double kOptionType = 0.85;  // of the captions' type size
 
@@ -144,9 +144,9 @@ QLayout* SummaryArea::MakeButtons() {
   cmdSend_ = Named(new QPushButton(QStringLiteral("Send to Tendril")), "Command3_3");
   cmdGet_ = Named(new QPushButton(QStringLiteral("Get from Tendril")), "Command3_4");
   auto* simulator = Named(new QPushButton(QStringLiteral("Si&mulator")), "cmdShowConfig");
-  Describe(cmdSend_, kSendTip);
-  Describe(cmdGet_, kGetTip);
-  Describe(simulator, "Shows the servos and the editor again.");
+  Describe(cmdSend_, QString::fromUtf8(kSendTip) + QStringLiteral(" (Ctrl+Return)"));
+  Describe(cmdGet_, QString::fromUtf8(kGetTip) + QStringLiteral(" (Ctrl+G)"));
+  Describe(simulator, "Shows the servos and the editor again. (F6)");
   connect(cmdSend_, &QAbstractButton::clicked, this, &SummaryArea::SendPressed);
   connect(cmdGet_, &QAbstractButton::clicked, this, &SummaryArea::GetPressed);
   connect(simulator, &QAbstractButton::clicked, this, &SummaryArea::SimulatorPressed);

@@ -1,5 +1,7 @@
 // The menu bar in the real window: keys, letters, and what they reach.
 #include <QAbstractItemView>
+#include <QClipboard>
+#include <QGuiApplication>
 #include <QLabel>
 #include <QMenuBar>
 #include <map>
@@ -118,6 +120,11 @@ TEST_F(Menu, EveryCommand_ByKeyboardAlone) {
     ASSERT_TRUE(tab_to(control)) << control;
     Key(Qt::Key_Up);
   }
+  TypeOver("spnDefaultPos", "-120");
+  Keys("Ctrl+F9");
+  EXPECT_EQ(Dial("ServoSimulator1").arm_pulse(), 1390) << "typed before the key";
+  Keys("Ctrl+C");
+  EXPECT_EQ(QGuiApplication::clipboard()->text().toStdString(), "-120 µs") << "nothing is selected";
   Keys("Ctrl+F6");
   EXPECT_EQ(Text("cmdTest_0"), "Stop");
   Keys("Ctrl+F6");
@@ -128,6 +135,9 @@ TEST_F(Menu, EveryCommand_ByKeyboardAlone) {
   Keys("F1");
   EXPECT_TRUE(Visible("KeysDialog"));
   Find("KeysDialog").close();
+  Keys("Ctrl+Shift+F1");
+  EXPECT_TRUE(Visible("AboutDialog") && !Visible("KeysDialog"));
+  Find("AboutDialog").close();
   Keys("Ctrl+Return");
   RunToTheEnd();
   EXPECT_EQ(Text("lblProgress"), "SUCCESS: Send Complete!");

@@ -13,10 +13,10 @@ constexpr Microseconds kLast = 2500;
 constexpr int kNumberStep = 500;
 constexpr int kTickStep = 100;
 
-constexpr double kTextGap = 6;      // between two texts side by side
-constexpr double kNumberInset = 4;  // from the end of a bar to its number
-constexpr double kArrowGap = 4;     // from an arrow to its text
-constexpr double kMinBar = 3;
+constexpr double kTextGap = 6;            // between two texts side by side
+constexpr double kNumberInset = 4;        // from the end of a bar to its number
+constexpr double kArrowGap = 4;           // from an arrow to its text
+constexpr double kMinBar = kArmLine + 4;  // to be seen beside the lines that cross it
 constexpr double kTick = 3;
 constexpr double kLongTick = 5;
 constexpr double kSpace = 2;        // below the words, and between the bars and the axis

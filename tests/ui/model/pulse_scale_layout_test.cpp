@@ -87,8 +87,9 @@ TEST(PulseScaleLayout, BarsAndLinesAreWhereTheNumbersOfTheAxisSay) {
           {ScalePart::kNeutral, shown.NeutralPosition, shown.NeutralPosition},
           {ScalePart::kDefault, shown.DefaultPosition, shown.DefaultPosition},
           {ScalePart::kArm, values.arm, values.arm}}) {
-      EXPECT_NEAR(ends.at(part).first, place(std::min(one, two)), kArmLine / 2) << static_cast<int>(part);
-      EXPECT_NEAR(ends.at(part).second, place(std::max(one, two)), kArmLine / 2) << static_cast<int>(part);
+      EXPECT_NEAR(ends.at(part).first, place(std::min(one, two)), kArmLine / 2 + 2) << static_cast<int>(part);
+      EXPECT_NEAR(ends.at(part).second, place(std::max(one, two)), kArmLine / 2 + 2)
+          << static_cast<int>(part);
     }
   }
 }
