@@ -16,7 +16,7 @@ constexpr const char* kManualPlaces[] = {TENDRIL_INSTALLED_MANUAL, TENDRIL_SOURC
 QString ManualPath() {
   const QDir program(QCoreApplication::applicationDirPath());
   for (const char* place : kManualPlaces) {
-    const QString path = QDir::cleanPath(program.filePath(QString::fromUtf8(place)));
+    QString path = QDir::cleanPath(program.filePath(QString::fromUtf8(place)));
     if (QFile::exists(path)) return path;
   }
   return QDir::cleanPath(program.filePath(QString::fromUtf8(kManualPlaces[0])));
