@@ -104,8 +104,6 @@ std::int32_t MemoryRegistry::Reach(RegistryHandle handle, std::uint32_t access, 
 
 std::int32_t MemoryRegistry::OpenKey(RootKey root, const std::string& path, std::uint32_t access,
                                      RegistryHandle& key) {
-  if (keys_.empty())
-    return kRegNotFound;  // most often so, and the preferences ask for a thousand keys at the start
   const std::u16string whole = Joined(RootName(root), path);
   RegistryValues* values = Find(whole);
   if (values == nullptr) return kRegNotFound;
