@@ -61,6 +61,10 @@ TEST_F(RegistryFiles, MissingFile_HasNoKeysAndIsCreatedByTheFirstChange) {
   for (int time = 0; time < 3; ++time) EXPECT_EQ(program.company.GetNumber("Port", 7), 7);
   EXPECT_THAT(warnings, ElementsAre(HasSubstr("registry.reg is not there")));
   EXPECT_FALSE(parent.exists());
+  RegistryHandle root = 0;
+  EXPECT_EQ(program.file.OpenKey(RootKey::kCurrentUser, "", kKeyAllAccess, root), kRegSuccess)
+      << "is always there";
+  program.file.CloseKey(root);
 
   program.company.CreateKey();
   program.company.SetNumber("Port", 3);
