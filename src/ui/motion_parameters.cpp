@@ -61,8 +61,7 @@ constexpr std::array<Test, LiveTest::kTestButtons> kTests{
       Parameter::kDefaultPosition},
      {"actual pulse range",
       "Warning: goes beyond the virtual stops, to the servo's physical ends. Moves the servo to and fro "
-      "through its "
-      "whole actual range, until the button is pressed again.",
+      "through its whole actual range, until the button is pressed again.",
       TestIcon::kDangerSweep, 0, 1, Parameter::kActualRange},
      {"centre", "Moves the servo to the centre, 1500 µs.", TestIcon::kStep, 2, 1, Parameter::kNeutralTrim}}};
 
