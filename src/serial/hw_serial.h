@@ -123,6 +123,8 @@ class HwSerial {
   // 202 and 203). False: nothing was sent, because the unit ID is 0 or an earlier poll is outstanding. Raises
   // kErrPortNotOpen when no port is chosen.
   bool cmdPollStation(std::uint8_t unit, std::uint8_t kind);
+  // Whether the reply to a poll, or its absence, is still to come.
+  bool PollOutstanding() const { return line_.PollOutstanding(); }
 
   // Results of the polls of kind 202, by unit, and of kind 203.
   const DownloadResult& Download(std::uint8_t unit) const { return downloads_[unit]; }

@@ -302,7 +302,6 @@ void frmNewServoConfig::ShowRunning() {
     setFocus();
   }
   EnableControls();
-  progress_->ShowRunning(running);
   if (!focus_before_command_) return;
   if (running.Active()) {
     if (focus_before_command_->isEnabled()) focus_before_command_->setFocus();

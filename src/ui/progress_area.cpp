@@ -63,9 +63,7 @@ ProgressArea::ProgressArea()
   ApplyColour();
 }
 
-void ProgressArea::ShowRunning(const RunningCommand& running) {
-  const std::string& title = running.Active() ? running.What() : running.Stopped();
-  if (title.empty()) return;
+void ProgressArea::SetTitle(const std::string& title) {
   setTitle(QString::fromStdString(title));
   Q_EMIT Said(this->title());
 }

@@ -22,13 +22,12 @@ class ProgressArea : public QGroupBox, public CommandProgressView {
 
   // Puts `other` and this area into `place`. `other` is shown first.
   void SharePlace(QStackedLayout& place, QWidget* other);
-  // Sets the frame's title to what runs, or to where a command without an outcome stopped. It stays until the next
-  // command.
-  void ShowRunning(const RunningCommand& running);
-
   void ShowProgress(bool shown) override;
   int FrameWidth() const override { return pctProgress_->width(); }
   void SetBarWidth(int width) override;
+  // The title stays until the next command.
+  void SetTitle(const std::string& title) override;
+  void ShowStep(const std::string& step) override { setTitle(QString::fromStdString(step)); }
   void SetColour(ProgressColour colour) override;
   void SetText(const std::string& text) override;
 

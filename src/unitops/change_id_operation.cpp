@@ -22,6 +22,7 @@ void ChangeIdOperation::Begin() {
   const std::uint8_t new_id = UnitId();
   StartChangeAddress(kAllUnits, new_id);
   Run("Giving the unit the ID " + HexByte(new_id));
+  ShowStep("Giving the unit the ID " + HexByte(new_id) + ": looking for it");
 }
 
 void ChangeIdOperation::StartChangeAddress(std::uint8_t old_id, std::uint8_t new_id) {
@@ -46,6 +47,7 @@ void ChangeIdOperation::OnTick() {
         attempts_ = 0;
         reply_seen_ = false;
         Link().cmdSetAddress(old_id_, new_id_, false);
+        ShowStep("Giving the unit the ID " + HexByte(new_id_) + ": asking whether it has it");
       } else if (MayPollAgain()) {
         Link().cmdPollStation(old_id_, kFindPoll);
       } else {
@@ -65,6 +67,12 @@ void ChangeIdOperation::OnTick() {
   }
   // A stage that does not exist.
   Fail({"Unknown error has cause failure of Unit ID change.", "Unit ID Change Error", BoxIcon::kExclamation});
+}
+
+std::string ChangeIdOperation::Aftermath() const {
+  if (stage_ == Stage::kFinding) return "No ID has changed.";
+  const std::string id = HexByte(new_id_);
+  return reply_seen_ ? "The unit answers at " + id + "." : "The unit may be at " + id + " already.";
 }
 
 bool ChangeIdOperation::MayPollAgain() { return ++attempts_ <= kMaxStagePolls; }

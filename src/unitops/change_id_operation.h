@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstdint>
+#include <string>
 
 #include "unitops/unit_operation.h"
 
@@ -26,6 +27,8 @@ class ChangeIdOperation final : public UnitOperation {
  protected:
   void Begin() override;
   void OnReply(bool replied, std::uint8_t unit, const Bytes& data) override;
+  void OnLastReply(bool replied, const Bytes& data) override { OnReply(replied, new_id_, data); }
+  std::string Aftermath() const override;
 
  private:
   enum class Stage { kFinding, kConfirming };

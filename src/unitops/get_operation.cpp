@@ -28,9 +28,15 @@ void GetOperation::Begin() {
     return Show(SendError("Error Uploading Configuration, Please retry"));
   }
   Run("Reading the configuration of unit " + HexByte(unit));
+  ShowProgress(unit);
 }
 
-void GetOperation::OnReply(bool replied, std::uint8_t /*unit*/, const Bytes& data) {
+void GetOperation::ShowProgress(std::uint8_t unit) {
+  ShowStep("Reading unit " + HexByte(unit) + ": " + std::to_string(ReceivedPorts()) + " of " +
+           std::to_string(kPortCount) + " ports");
+}
+
+void GetOperation::OnReply(bool replied, std::uint8_t unit, const Bytes& data) {
   if (replied && data.size() >= kReplySize) {
     const int slot = data[0] - 1;
     if (slot < 0 || slot >= static_cast<int>(kPortCount)) {
@@ -39,8 +45,9 @@ void GetOperation::OnReply(bool replied, std::uint8_t /*unit*/, const Bytes& dat
     }
     read_back_.At(static_cast<std::size_t>(slot)) =
         DecodeOptions(std::span(data).subspan<1, kOptionByteCount>());
+    ShowProgress(unit);
   }
-  if (HasAllPorts()) {
+  if (ReceivedPorts() == kPortCount) {
     ReplaceWorkingConfiguration();
     return Succeed("SUCCESS: Upload Complete");
   }
@@ -51,11 +58,14 @@ void GetOperation::OnReply(bool replied, std::uint8_t /*unit*/, const Bytes& dat
   }
 }
 
-bool GetOperation::HasAllPorts() const {
-  for (std::size_t slot = 0; slot < kPortCount; ++slot) {
-    if (!read_back_.At(slot).Received) return false;
-  }
-  return true;
+std::size_t GetOperation::ReceivedPorts() const {
+  std::size_t count = 0;
+  for (std::size_t slot = 0; slot < kPortCount; ++slot) count += read_back_.At(slot).Received ? 1 : 0;
+  return count;
+}
+
+std::string GetOperation::Aftermath() const {
+  return "Nothing has changed: the configuration shown here is the one from before.";
 }
 
 void GetOperation::ReplaceWorkingConfiguration() {

@@ -1,8 +1,10 @@
 // GetOperation: reads the configuration of all eight ports out of a unit.
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 #include <functional>
+#include <string>
 
 #include "config/channel_config.h"
 #include "unitops/unit_operation.h"
@@ -29,9 +31,11 @@ class GetOperation final : public UnitOperation {
  protected:
   void Begin() override;
   void OnReply(bool replied, std::uint8_t unit, const Bytes& data) override;
+  std::string Aftermath() const override;
 
  private:
-  bool HasAllPorts() const;
+  std::size_t ReceivedPorts() const;
+  void ShowProgress(std::uint8_t unit);
   void ReplaceWorkingConfiguration();
 
   ChannelTable& working_;

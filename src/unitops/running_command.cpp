@@ -15,9 +15,11 @@ RunningCommand::RunningCommand(TimerFactory& timers, CommandProgressView& view)
 void RunningCommand::StartCommandProgress(UnitOperation& operation, std::string what) {
   operation_ = &operation;
   what_ = std::move(what);
+  aftermath_.clear();
   value_ = kStep;
   if (observer_) observer_();
   view_.SetText("");
+  view_.SetTitle(what_);
   view_.SetColour(ProgressColour::kBlue);
   view_.SetBarWidth(kStep);
   view_.ShowProgress(true);
@@ -34,11 +36,11 @@ void RunningCommand::EndCommandProgress(Outcome outcome, const std::string& text
   tmrProgress_->SetEnabled(true);
 }
 
-void RunningCommand::Stop(std::string where) {
+void RunningCommand::Stop(const std::string& where) {
   if (!Active()) return;
   operation_ = nullptr;
   what_.clear();
-  stopped_ = std::move(where);
+  if (!where.empty()) view_.SetTitle(where);
   if (observer_) observer_();
 }
 

@@ -28,6 +28,9 @@ class CommandProgressView {
   virtual int FrameWidth() const = 0;
   // Draws the bar `width` wide, which may be a little more than the frame.
   virtual void SetBarWidth(int width) = 0;
+  // Sets the frame's title: what runs, or where it stopped. ShowStep() replaces it by how far it is.
+  virtual void SetTitle(const std::string& title) = 0;
+  virtual void ShowStep(const std::string& step) = 0;
   // Colours bar and label.
   virtual void SetColour(ProgressColour colour) = 0;
   // Sets the label; empty for none.
@@ -50,16 +53,21 @@ class RunningCommand {
   bool Active() const { return operation_ != nullptr; }
   // What runs, for a tool tip ("Sending the configuration to unit 01"); empty when nothing does.
   const std::string& What() const { return what_; }
-  // Where the last command stopped, when it ended without an outcome ("Stopped: channel 3: 305 to 2695 cannot be
-  // sent"); otherwise empty. Meaningful while no command runs.
-  const std::string& Stopped() const { return stopped_; }
+  // How the last command left the unit or the configuration when it did not succeed ("Unit 01: port 1 is written, 2
+  // perhaps, 3 to 8 are not."); otherwise empty. Meaningful while no command runs.
+  const std::string& Aftermath() const { return aftermath_; }
 
   // `operation` runs from now on: shows the empty bar and lets it grow. `what` as above.
   void StartCommandProgress(UnitOperation& operation, std::string what);
+  // Says how far the command is ("Sending to unit 01: port 3 of 8").
+  void ShowStep(const std::string& step) { view_.ShowStep(step); }
+  // To be called before the command ends.
+  void SetAftermath(std::string sentence) { aftermath_ = std::move(sentence); }
   // Ends the command and shows `text` in green or red for three seconds.
   void EndCommandProgress(Outcome outcome, const std::string& text);
-  // Ends the command, if one runs, and leaves the display as it is. `where`: see Stopped().
-  void Stop(std::string where = {});
+  // Ends the command, if one runs, and leaves the display as it is. `where` becomes its title ("Stopped: channel 3:
+  // 305 to 2695 cannot be sent"), if it is not empty.
+  void Stop(const std::string& where = {});
 
  private:
   void OnTick();
@@ -69,7 +77,7 @@ class RunningCommand {
   std::function<void()> observer_;
   UnitOperation* operation_ = nullptr;
   std::string what_;
-  std::string stopped_;
+  std::string aftermath_;
   std::int32_t value_ = kEnded;  // the bar's width; kEnded while an outcome is shown, or nothing
 
   static constexpr std::int32_t kEnded = -1;

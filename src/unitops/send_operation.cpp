@@ -26,14 +26,24 @@ SendOperation::SendOperation(CommandContext& context, const ChannelTable& workin
 void SendOperation::Begin() {
   port_index_ = 0;
   unanswered_ = 0;
+  written_ = 0;
+  perhaps_written_ = false;
+  unit_ = UnitId();
   if (!EncodeAndSendPort(port_index_)) return;
-  const std::uint8_t unit = UnitId();
-  if (!Link().cmdPollStation(unit, kAcknowledgePoll)) return Show(SendError(kCannotPoll));
-  Run("Sending the configuration to unit " + HexByte(unit));
+  perhaps_written_ = true;
+  if (!Link().cmdPollStation(unit_, kAcknowledgePoll)) return Show(SendError(kCannotPoll));
+  Run("Sending the configuration to unit " + HexByte(unit_));
+  ShowPort();
+}
+
+void SendOperation::ShowPort() {
+  ShowStep("Sending to unit " + HexByte(unit_) + ": port " + std::to_string(port_index_ + 1) + " of " +
+           std::to_string(kPortCount));
 }
 
 void SendOperation::OnReply(bool replied, std::uint8_t unit, const Bytes& data) {
-  if (replied && data.size() >= 2 && data[1] == kAccepted) {
+  OnLastReply(replied, data);
+  if (!perhaps_written_) {
     tmrDownload_.SetEnabled(true);
     return;
   }
@@ -46,12 +56,20 @@ void SendOperation::OnReply(bool replied, std::uint8_t unit, const Bytes& data) 
   Fail({"Unit did not respond to the Option Settings, Retry Command", "No Repsonse", BoxIcon::kCritical});
 }
 
+void SendOperation::OnLastReply(bool replied, const Bytes& data) {
+  if (!replied || data.size() < 2 || data[1] != kAccepted) return;
+  ++written_;
+  perhaps_written_ = false;
+}
+
 void SendOperation::OnNextPort() {
   tmrDownload_.SetEnabled(false);
   unanswered_ = 0;
   ++port_index_;
   if (port_index_ >= kPortCount) return Succeed("SUCCESS: Send Complete!");
   if (!EncodeAndSendPort(port_index_)) return;
+  perhaps_written_ = true;
+  ShowPort();
   if (!Link().cmdPollStation(UnitId(), kAcknowledgePoll)) Fail(SendError(kCannotPoll));
 }
 
@@ -66,6 +84,24 @@ bool SendOperation::EncodeAndSendPort(std::uint8_t port_index) {
   Link().cmdSetManyOptions(UnitId(), 0, kOptionServoPort, static_cast<std::uint8_t>(port_index + 1),
                            options[0], options[1], options[2], std::span(options).subspan(3));
   return true;
+}
+
+std::string SendOperation::Aftermath() const {
+  const auto ports = [](std::int32_t first, std::int32_t last) {
+    return first == last ? std::to_string(first) : std::to_string(first) + " to " + std::to_string(last);
+  };
+  const std::int32_t count = static_cast<std::int32_t>(kPortCount);
+  const std::int32_t untouched = written_ + (perhaps_written_ ? 2 : 1);  // the first one
+  std::string text = "Unit " + HexByte(unit_) + ": ";
+  if (written_ == 0 && !perhaps_written_) return text + "nothing is written.";
+  if (written_ > 0)
+    text += std::string(written_ == 1 ? "port " : "ports ") + ports(1, written_) +
+            (written_ == 1 ? " is" : " are") + " written";
+  if (perhaps_written_)
+    text += written_ == 0 ? "port 1 is perhaps written" : ", " + std::to_string(written_ + 1) + " perhaps";
+  if (untouched <= count)
+    text += ", " + ports(untouched, count) + (untouched == count ? " is" : " are") + " not";
+  return text + ".";
 }
 
 }  // namespace tendril

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstdint>
+#include <string>
 
 #include "config/channel_config.h"
 #include "unitops/unit_operation.h"
@@ -30,14 +31,20 @@ class SendOperation final : public UnitOperation {
  protected:
   void Begin() override;
   void OnReply(bool replied, std::uint8_t unit, const Bytes& data) override;
+  void OnLastReply(bool replied, const Bytes& data) override;
+  std::string Aftermath() const override;
 
  private:
   void OnNextPort();
+  void ShowPort();
 
   const ChannelTable& working_;
   Timer& tmrDownload_;  // enabled in the pause between two ports
+  std::uint8_t unit_ = 0;
   std::uint8_t port_index_ = 0;
-  std::int32_t unanswered_ = 0;  // polls of the current port without a reply
+  std::int32_t written_ = 0;      // ports whose options the unit has accepted
+  bool perhaps_written_ = false;  // the next port's options went out
+  std::int32_t unanswered_ = 0;   // polls of the current port without a reply
 };
 
 }  // namespace tendril

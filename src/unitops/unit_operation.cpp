@@ -34,6 +34,10 @@ bool UnitOperation::MayStart() const {
 void UnitOperation::OnPollReply(bool replied, std::uint8_t unit, std::uint8_t kind, const Bytes& data) {
   if (poll_kinds_.find(static_cast<char>(kind)) == std::string_view::npos) return;
   try {
+    if (cancelled_) {
+      OnLastReply(replied, data);
+      return Abort();
+    }
     OnReply(replied, unit, data);
   } catch (...) {
     Fail({"Serial Event Error (Poll Type " + std::to_string(kind) + ")\r\n\r\n" + DescribeCurrentFault(),
@@ -44,7 +48,11 @@ void UnitOperation::OnPollReply(bool replied, std::uint8_t unit, std::uint8_t ki
 Timer& UnitOperation::MakeTimer(std::int32_t interval_ms, std::function<void()> on_tick) {
   timer_ = context_.timers.CreateTimer([this, on_tick = std::move(on_tick)] {
     try {
-      on_tick();
+      if (!cancelled_) {
+        on_tick();
+      } else if (!Link().PollOutstanding()) {
+        Abort();
+      }
     } catch (...) {
       const std::string fault = DescribeCurrentFault();
       Abort();
@@ -55,7 +63,15 @@ Timer& UnitOperation::MakeTimer(std::int32_t interval_ms, std::function<void()> 
   return *timer_;
 }
 
-void UnitOperation::Run(std::string what) { context_.running.StartCommandProgress(*this, std::move(what)); }
+void UnitOperation::Run(std::string what) {
+  cancelled_ = false;
+  context_.running.StartCommandProgress(*this, std::move(what));
+}
+
+void UnitOperation::Cancel() {
+  cancelled_ = true;
+  if (!Link().PollOutstanding()) Abort();
+}
 
 void UnitOperation::Succeed(const std::string& text) {
   StopTimer();
@@ -67,13 +83,15 @@ void UnitOperation::Fail(const BoxMessage& box) {
   Show(box);
 }
 
-void UnitOperation::StopAt(std::string where) {
+void UnitOperation::StopAt(const std::string& where) {
   StopTimer();
-  context_.running.Stop(std::move(where));
+  context_.running.SetAftermath(Aftermath());
+  context_.running.Stop(where);
 }
 
 void UnitOperation::Abort() {
   StopTimer();
+  context_.running.SetAftermath(Aftermath());
   context_.running.EndCommandProgress(Outcome::kFailure, "COMMAND FAILED!");
 }
 

@@ -37,6 +37,8 @@ void ShowCommError(MessageBoxes& boxes, const std::string& failure, const std::s
 //
 //   Idle --Start: Begin() calls Run()--> Running
 //   Running --Succeed, Fail, StopAt, Stop, or a fault in a reply or a tick--> Idle
+//   Running --Cancel--> Idle, or, while a poll is outstanding, Cancelled
+//   Cancelled --the poll has ended, or a tick--> Idle
 class UnitOperation {
  public:
   virtual ~UnitOperation() = default;
@@ -46,6 +48,8 @@ class UnitOperation {
   void Start();
   // Ends the operation where it is and shows nothing: the window is closing.
   void Stop() { StopAt({}); }
+  // Ends the operation at the user's wish, as failed and without a box: at once, or when the outstanding poll has ended.
+  void Cancel();
 
   // The reply, or its absence, to a poll. Polls of other kinds belong to an operation that has ended: they are ignored.
   // Shows every failure; raises none.
@@ -61,17 +65,24 @@ class UnitOperation {
   // The reply to a poll of the operation's own kinds. May raise.
   virtual void OnReply(bool replied, std::uint8_t unit, const Bytes& data) = 0;
 
+  // The reply to the poll that was outstanding at Cancel(). Nothing follows it.
+  virtual void OnLastReply(bool /*replied*/, const Bytes& /*data*/) {}
+  // How the unit or the configuration is left when the operation ends now without success: a sentence.
+  virtual std::string Aftermath() const = 0;
+
   // The operation's timer, at most one: disabled, and disabled again when the operation ends. `on_tick` may raise.
   Timer& MakeTimer(std::int32_t interval_ms, std::function<void()> on_tick);
 
   // The operation runs from now on. `what`: see RunningCommand::What().
   void Run(std::string what);
+  // See RunningCommand::ShowStep().
+  void ShowStep(const std::string& step) { context_.running.ShowStep(step); }
   // Ends the operation and shows `text` in the progress display.
   void Succeed(const std::string& text);
   // Ends the operation as failed and shows `box`.
   void Fail(const BoxMessage& box);
-  // Ends the operation without an outcome. `where`: see RunningCommand::Stopped().
-  void StopAt(std::string where);
+  // Ends the operation without an outcome. `where`: see RunningCommand::Stop().
+  void StopAt(const std::string& where);
 
   HwSerial& Link() const { return context_.link; }
   // The unit ID that is chosen now.
@@ -91,6 +102,7 @@ class UnitOperation {
   CommandContext& context_;
   std::string_view poll_kinds_;
   std::string fault_text_;
+  bool cancelled_ = false;
   std::unique_ptr<Timer> timer_;  // nullptr when the operation has none
 };
 

@@ -80,7 +80,7 @@ TEST_F(Window, Send_ByMouse_WritesTheRecordsIntoTheUnit) {
 
   EXPECT_TRUE(Visible("frmProgress") && !Visible("fraApplyChans"));
   EXPECT_EQ(PlaceOf("ServoSimulator2_0"), servo) << "the window jumps";
-  EXPECT_EQ(Find<QGroupBox>("frmProgress").title().toStdString(), "Sending the configuration to unit 0A");
+  EXPECT_EQ(Find<QGroupBox>("frmProgress").title().toStdString(), "Sending to unit 0A: port 1 of 8");
   for (const char* busy : {"cmbNYX", "CmbUnitID_0", "CmbUnitID_1", "Command3_0", "Command3_2", "cmdTest_0",
                            "HScrollSendServoPosition"}) {
     EXPECT_FALSE(Find(busy).isEnabled()) << busy;
