@@ -1,0 +1,41 @@
+// Provenance: where the working configuration comes from, and what has changed since.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <string>
+#include <vector>
+
+#include "config/channel_config.h"
+
+namespace tendril {
+
+// "channel 2", "channels 2 and 5", "channels 1, 2 and 5": channels 0 to 7 in words.
+std::string ChannelsInWords(const std::vector<std::size_t>& channels);
+
+// Keeps the records as they were when a preset, a unit or a send last gave or took all of them.
+class Provenance {
+ public:
+  // `working` are the records; they must outlive this object.
+  explicit Provenance(const ChannelTable& working) : working_(&working) {}
+
+  // The records are those of the preset called `name`.
+  void FromPreset(const std::string& name) { Begin("Preset " + name); }
+  // They were read from `unit`, or sent to it, at `time` ("14:02").
+  void ReadFrom(std::uint8_t unit, const std::string& time);
+  void SentTo(std::uint8_t unit, const std::string& time);
+
+  // The channels whose records have changed since, in order.
+  std::vector<std::size_t> ChangedChannels() const;
+  // "Read from 0A at 14:02; channels 2 and 5 changed since".
+  std::string Sentence() const;
+
+ private:
+  void Begin(std::string origin);
+
+  const ChannelTable* working_;
+  std::string origin_;
+  ChannelTable records_;
+};
+
+}  // namespace tendril

@@ -1,0 +1,19 @@
+// What the editor says about a number that was typed and cannot be taken.
+#pragma once
+
+#include <optional>
+#include <string>
+
+#include "ui/model/bounded_value.h"
+
+namespace tendril {
+
+// What the number of a spin button means: half a width about an origin, or a distance from it.
+enum class NumberMeaning { kHalfWidth, kDistance };
+
+// Limits, and what to type if `typed` (nothing for a text that is no whole number) was meant as a pulse width: "0 to
+// 1000. This is half the width: for 600 to 2400 type 900". `origin` is the pulse width that the number is relative to.
+std::string TypedNumberHint(std::optional<long long> typed, const BoundedValue& limits, NumberMeaning meaning,
+                            int origin);
+
+}  // namespace tendril
