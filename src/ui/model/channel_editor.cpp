@@ -97,46 +97,46 @@ FollowUp ChannelEditor::Change(Parameter parameter, int value) {
 
 template <typename Store>
 void ChannelEditor::ForEachTarget(Store&& store) {
-  if (!channel_) return;
+  if (!state_.channel) return;
   for (std::size_t channel = 0; channel < kPortCount; ++channel) {
-    if (channel == channel_ || ticked_[channel]) store(working_.At(channel));
+    if (channel == state_.channel || state_.ticked[channel]) store(working_.At(channel));
   }
 }
 
 void ChannelEditor::ClickApplyBox(std::size_t channel, bool ticked) {
-  ticked_.at(channel) = ticked;
+  state_.ticked.at(channel) = ticked;
   StoreInTicked();
 }
 
 void ChannelEditor::ClickAllBox(bool ticked) {
-  all_ticked_ = ticked;
-  ticked_.fill(ticked);
+  state_.all_ticked = ticked;
+  state_.ticked.fill(ticked);
   StoreInTicked();
 }
 
 void ChannelEditor::StoreInTicked() {
-  if (!channel_) return;
-  ticked_[*channel_] = true;
+  if (!state_.channel) return;
+  state_.ticked[*state_.channel] = true;
   const ChannelConfig values = WorkingValues();
   ForEachTarget([&](ChannelConfig& record) { CopyPulseFields(values, record); });
 }
 
 void ChannelEditor::SelectChannel(std::size_t channel) {
-  if (channel_) CopyPulseFields(WorkingValues(), working_.At(*channel_));
-  all_ticked_ = false;
-  ticked_.fill(false);
-  channel_ = channel;
-  ticked_.at(channel) = true;
+  if (state_.channel) CopyPulseFields(WorkingValues(), working_.At(*state_.channel));
+  state_.all_ticked = false;
+  state_.ticked.fill(false);
+  state_.channel = channel;
+  state_.ticked.at(channel) = true;
   ReloadChannel();
 }
 
 void ChannelEditor::ReloadChannel() {
-  if (channel_) Load(working_.At(*channel_));
+  if (state_.channel) Load(working_.At(*state_.channel));
 }
 
 void ChannelEditor::Load(const ChannelConfig& record) {
   const Motion motion = MotionOf(record);
-  spins_.fill({});
+  state_.spins.fill({});
   // Whatever the record holds: this limit and those that follow from it keep the working values sendable.
   SpinOf(Parameter::kActualRange).SetLimits(0, kMaxHalfWidth);
   SpinOf(Parameter::kActualRange).SetValue(motion.actual_half_width);
@@ -156,7 +156,7 @@ void ChannelEditor::Load(const ChannelConfig& record) {
 }
 
 void ChannelEditor::SetPortType(std::int16_t kind) {
-  if (channel_) working_.At(*channel_).PortType = kind;
+  if (state_.channel) working_.At(*state_.channel).PortType = kind;
 }
 
 void ChannelEditor::SetPowerUpOption(std::int32_t option) {
@@ -169,7 +169,7 @@ void ChannelEditor::SetLostCommOption(std::int32_t option) {
 
 void ChannelEditor::ApplyPreset(const Preset& preset) {
   for (std::size_t channel = 0; channel < kPortCount; ++channel) SetFromPreset(preset, working_.At(channel));
-  Load(working_.At(channel_.value_or(0)));
+  Load(working_.At(state_.channel.value_or(0)));
 }
 
 }  // namespace tendril

@@ -28,19 +28,33 @@ enum class FollowUp { kUpdateSimulators, kRefreshLivePosition };
 // is selected or an apply box is clicked. Until the first SelectChannel() no channel is edited, and nothing is stored.
 class ChannelEditor {
  public:
+  // All that the editor holds beside the records.
+  struct State {
+    std::array<BoundedValue, kParameterCount> spins;
+    std::optional<std::size_t> channel;
+    std::array<bool, kPortCount> ticked{};
+    bool all_ticked = false;
+  };
+
   // `working` are the records; they must outlive the editor. The spin buttons have their start-up values.
   explicit ChannelEditor(ChannelTable& working);
 
+  const State& Current() const { return state_; }
+  // Goes back to a state that it had, and stores nothing. The caller sets the records.
+  void Restore(const State& state) { state_ = state; }
+
   // Value and limits of the spin button of `parameter`.
-  const BoundedValue& Spin(Parameter parameter) const { return spins_[static_cast<std::size_t>(parameter)]; }
+  const BoundedValue& Spin(Parameter parameter) const {
+    return state_.spins[static_cast<std::size_t>(parameter)];
+  }
   // The record that the spin buttons describe. Only its eight pulse fields are valid.
   ChannelConfig WorkingValues() const;
   // The edited channel, 0 to 7.
-  std::optional<std::size_t> Channel() const { return channel_; }
+  std::optional<std::size_t> Channel() const { return state_.channel; }
   // Whether edits also go to `channel`, 0 to 7.
-  bool Ticked(std::size_t channel) const { return ticked_[channel]; }
+  bool Ticked(std::size_t channel) const { return state_.ticked[channel]; }
   // Whether "ALL" is ticked.
-  bool AllTicked() const { return all_ticked_; }
+  bool AllTicked() const { return state_.all_ticked; }
 
   // The user set a spin button to `value`: recalculates, and stores the parameter's own fields in the records of the
   // edited channel and of the ticked ones.
@@ -66,7 +80,7 @@ class ChannelEditor {
   void ApplyPreset(const Preset& preset);
 
  private:
-  BoundedValue& SpinOf(Parameter parameter) { return spins_[static_cast<std::size_t>(parameter)]; }
+  BoundedValue& SpinOf(Parameter parameter) { return state_.spins[static_cast<std::size_t>(parameter)]; }
   void RecalcParameters();
   void Load(const ChannelConfig& record);
   void StoreInTicked();
@@ -75,10 +89,7 @@ class ChannelEditor {
   void ForEachTarget(Store&& store);
 
   ChannelTable& working_;
-  std::array<BoundedValue, kParameterCount> spins_;
-  std::optional<std::size_t> channel_;
-  std::array<bool, kPortCount> ticked_{};
-  bool all_ticked_ = false;
+  State state_;
 };
 
 }  // namespace tendril
