@@ -64,8 +64,9 @@ ProgressArea::ProgressArea()
 }
 
 void ProgressArea::SetTitle(const std::string& title) {
-  setTitle(QString::fromStdString(title));
-  Q_EMIT Said(this->title());
+  what_ = QString::fromStdString(title);
+  setTitle(what_);
+  Q_EMIT Said(what_);
 }
 
 void ProgressArea::SharePlace(QStackedLayout& place, QWidget* other) {
@@ -85,7 +86,7 @@ void ProgressArea::SetColour(ProgressColour colour) {
 
 void ProgressArea::SetText(const std::string& text) {
   lblProgress_->setText(QString::fromStdString(text));
-  if (!text.empty()) Q_EMIT Said(title() + QStringLiteral(": ") + lblProgress_->text());
+  if (!text.empty()) Q_EMIT Said(what_ + QStringLiteral(": ") + lblProgress_->text());
 }
 
 void ProgressArea::changeEvent(QEvent* event) {

@@ -47,6 +47,7 @@ class ProgressArea : public QGroupBox, public CommandProgressView {
   QWidget* field_;          // the outcome, with its sign
   Sign* sign_;
   QLabel* lblProgress_;
+  QString what_;  // what runs, or where it stopped
   ProgressColour colour_ = ProgressColour::kBlue;
 };
 
