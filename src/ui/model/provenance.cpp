@@ -24,21 +24,20 @@ void Provenance::SentTo(std::uint8_t unit, const std::string& time) {
 }
 
 void Provenance::Begin(std::string origin) {
-  origin_ = std::move(origin);
-  records_ = *working_;
+  state_ = {std::move(origin), working_};
 }
 
 std::vector<std::size_t> Provenance::ChangedChannels() const {
   std::vector<std::size_t> changed;
   for (std::size_t channel = 0; channel < kPortCount; ++channel) {
-    if (working_->At(channel) != records_.At(channel)) changed.push_back(channel);
+    if (working_.At(channel) != state_.records.At(channel)) changed.push_back(channel);
   }
   return changed;
 }
 
 std::string Provenance::Sentence() const {
   const auto changed = ChangedChannels();
-  return changed.empty() ? origin_ : origin_ + "; " + ChannelsInWords(changed) + " changed since";
+  return changed.empty() ? state_.origin : state_.origin + "; " + ChannelsInWords(changed) + " changed since";
 }
 
 }  // namespace tendril

@@ -4,6 +4,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "config/channel_config.h"
@@ -16,11 +17,20 @@ std::string ChannelsInWords(const std::vector<std::size_t>& channels);
 // Keeps the records as they were when a preset, a unit or a send last gave or took all of them.
 class Provenance {
  public:
+  struct State {
+    std::string origin;
+    ChannelTable records;
+  };
+
   // `working` are the records; they must outlive this object.
-  explicit Provenance(const ChannelTable& working) : working_(&working) {}
+  explicit Provenance(const ChannelTable& working) : working_(working) {}
+
+  const State& Current() const { return state_; }
+  // Goes back to a state that it had.
+  void Restore(const State& state) { state_ = state; }
 
   // The records are those of the preset called `name`.
-  void FromPreset(const std::string& name) { Begin("Preset " + name); }
+  void FromPreset(std::string_view name) { Begin("Preset " + std::string(name)); }
   // They were read from `unit`, or sent to it, at `time` ("14:02").
   void ReadFrom(std::uint8_t unit, const std::string& time);
   void SentTo(std::uint8_t unit, const std::string& time);
@@ -33,9 +43,8 @@ class Provenance {
  private:
   void Begin(std::string origin);
 
-  const ChannelTable* working_;
-  std::string origin_;
-  ChannelTable records_;
+  const ChannelTable& working_;
+  State state_;
 };
 
 }  // namespace tendril

@@ -22,6 +22,9 @@ class RecordRemarks {
   void AcceptRecords() { given_ = working_; }
   // The record of `channel`, 0 to 7, was changed on purpose.
   void AcceptRecord(std::size_t channel) { given_.At(channel) = working_.At(channel); }
+  // What was given last; only the pulse fields are valid.
+  const ChannelTable& Given() const { return given_; }
+  void SetGiven(const ChannelTable& given) { given_ = given; }
   // The user made an edit in the editor: accepts the edited channel as the editor shows it, and the ticked channels'
   // records.
   void AcceptEdit();

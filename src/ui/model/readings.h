@@ -1,0 +1,40 @@
+// Readings: what units held when they were read.
+#pragma once
+
+#include <cstdint>
+#include <map>
+#include <optional>
+#include <string>
+
+#include "config/channel_config.h"
+
+namespace tendril {
+
+// What a unit held before it was sent to is kept until the program ends: it is the way back.
+class Readings {
+ public:
+  struct Reading {
+    ChannelTable records;
+    std::string time;  // "14:02"
+  };
+
+  // `unit` has given `records`.
+  void Keep(std::uint8_t unit, const ChannelTable& records, const std::string& time) {
+    units_[unit].latest = {records, time};
+  }
+  // A send to `unit` begins: its latest reading is the way back, until the next send after another reading.
+  void SendBegins(std::uint8_t unit);
+
+  // The way back of `unit`, or while it was not sent to, what it held when it was read last; nullptr when it was not
+  // read before.
+  const Reading* WayBack(std::uint8_t unit) const;
+
+ private:
+  struct Unit {
+    std::optional<Reading> latest;  // since the last send
+    std::optional<Reading> before_send;
+  };
+  std::map<std::uint8_t, Unit> units_;
+};
+
+}  // namespace tendril

@@ -1,0 +1,59 @@
+#include "ui/undo_history.h"
+
+#include <QUndoCommand>
+#include <utility>
+
+namespace tendril {
+namespace {
+
+constexpr int kMostSteps = 100;
+
+std::vector<std::size_t> ChannelsThatDiffer(const ChannelTable& a, const ChannelTable& b) {
+  std::vector<std::size_t> channels;
+  for (std::size_t channel = 0; channel < kPortCount; ++channel) {
+    if (a.At(channel) != b.At(channel)) channels.push_back(channel);
+  }
+  return channels;
+}
+
+}  // namespace
+
+class UndoHistory::Step : public QUndoCommand {
+ public:
+  Step(UndoHistory& history, const QString& what, State before, State after)
+      : QUndoCommand(what), history_(history), before_(std::move(before)), after_(std::move(after)) {}
+
+  void undo() override { history_.GoTo(before_); }
+  void redo() override { history_.GoTo(after_); }
+
+ private:
+  UndoHistory& history_;
+  const State before_;
+  const State after_;
+};
+
+UndoHistory::UndoHistory(EditedConfiguration& configuration)
+    : configuration_(configuration),
+      now_(std::make_shared<EditedConfiguration::Snapshot>(configuration.Take())) {
+  stack_.setUndoLimit(kMostSteps);
+}
+
+std::vector<std::size_t> UndoHistory::Note(const QString& what, bool goes_on) {
+  auto changed = ChannelsThatDiffer(configuration_.Records(), now_->records);
+  // What belongs to no record is brought back with the records as it was last.
+  if (changed.empty() || (goes_on && stack_.canUndo() && !stack_.canRedo())) {
+    *now_ = configuration_.Take();
+    return changed;
+  }
+  auto before = std::exchange(now_, std::make_shared<EditedConfiguration::Snapshot>(configuration_.Take()));
+  stack_.push(new Step(*this, what, std::move(before), now_));
+  return changed;
+}
+
+void UndoHistory::GoTo(const State& state) {
+  if (state == now_) return;  // a new step's first redo
+  now_ = state;
+  configuration_.Restore(*now_);
+}
+
+}  // namespace tendril
