@@ -23,9 +23,7 @@ void Provenance::SentTo(std::uint8_t unit, const std::string& time) {
   Begin("Sent to " + HexByte(unit) + " at " + time);
 }
 
-void Provenance::Begin(std::string origin) {
-  state_ = {std::move(origin), working_};
-}
+void Provenance::Begin(std::string origin) { state_ = {std::move(origin), working_}; }
 
 std::vector<std::size_t> Provenance::ChangedChannels() const {
   std::vector<std::size_t> changed;
