@@ -42,7 +42,7 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
                        return live_test_.MakeWay();
                      },
                  .replaced =
-                     [this] {
+                     [this](std::uint8_t /*unit*/) {
                        remarks_.AcceptRecords();
                        OnReplaced();
                      }}),

@@ -17,7 +17,8 @@ constexpr std::size_t kReplySize = 1 + kOptionByteCount;  // the port number and
 
 }  // namespace
 
-GetOperation::GetOperation(CommandContext& context, ChannelTable& working, std::function<void()> on_replaced)
+GetOperation::GetOperation(CommandContext& context, ChannelTable& working,
+                           std::function<void(std::uint8_t unit)> on_replaced)
     : UnitOperation(context, "n", "Upload Failed"), working_(working), on_replaced_(std::move(on_replaced)) {}
 
 void GetOperation::Begin() {
@@ -48,7 +49,7 @@ void GetOperation::OnReply(bool replied, std::uint8_t unit, const Bytes& data) {
     ShowProgress(unit);
   }
   if (ReceivedPorts() == kPortCount) {
-    ReplaceWorkingConfiguration();
+    ReplaceWorkingConfiguration(unit);
     return Succeed("SUCCESS: Upload Complete");
   }
   if (++repeats_ >= kMaxGetPolls) {
@@ -68,14 +69,14 @@ std::string GetOperation::Aftermath() const {
   return "Nothing has changed: the configuration shown here is the one from before.";
 }
 
-void GetOperation::ReplaceWorkingConfiguration() {
+void GetOperation::ReplaceWorkingConfiguration(std::uint8_t unit) {
   for (std::size_t slot = 0; slot < kPortCount; ++slot) {
     ChannelConfig& record = working_.At(slot);
     const bool received = record.Received;  // the mark belongs to the other table
     record = read_back_.At(slot);
     record.Received = received;
   }
-  if (on_replaced_) on_replaced_();
+  if (on_replaced_) on_replaced_(unit);
 }
 
 }  // namespace tendril

@@ -24,9 +24,10 @@ namespace tendril {
 //   Polling --a port above 8, 33 polls spent, or a fault--> Idle (failed; the working configuration is as before)
 class GetOperation final : public UnitOperation {
  public:
-  // `working` is what is replaced; `on_replaced` (may be empty) is called right after that, while the command still
-  // runs. Context and table must outlive the operation.
-  GetOperation(CommandContext& context, ChannelTable& working, std::function<void()> on_replaced);
+  // `working` is what is replaced; `on_replaced` (may be empty) is called with the unit right after that, while the
+  // command still runs. Context and table must outlive the operation.
+  GetOperation(CommandContext& context, ChannelTable& working,
+               std::function<void(std::uint8_t unit)> on_replaced);
 
  protected:
   void Begin() override;
@@ -36,10 +37,10 @@ class GetOperation final : public UnitOperation {
  private:
   std::size_t ReceivedPorts() const;
   void ShowProgress(std::uint8_t unit);
-  void ReplaceWorkingConfiguration();
+  void ReplaceWorkingConfiguration(std::uint8_t unit);
 
   ChannelTable& working_;
-  std::function<void()> on_replaced_;
+  std::function<void(std::uint8_t)> on_replaced_;
   ChannelTable read_back_;
   std::int16_t repeats_ = 0;  // polls after the first
 };

@@ -2,6 +2,7 @@
 
 #include <span>
 #include <string>
+#include <utility>
 
 #include "config/option_bytes.h"
 #include "platform/hex_text.h"
@@ -18,9 +19,11 @@ constexpr char kCannotPoll[] = "Error sending configuration, Please retry";
 
 }  // namespace
 
-SendOperation::SendOperation(CommandContext& context, const ChannelTable& working)
+SendOperation::SendOperation(CommandContext& context, const ChannelTable& working,
+                             std::function<void(std::uint8_t unit)> on_sent)
     : UnitOperation(context, "0", "Download Failed"),
       working_(working),
+      on_sent_(std::move(on_sent)),
       tmrDownload_(MakeTimer(kNextPortMs, [this] { OnNextPort(); })) {}
 
 void SendOperation::Begin() {
@@ -66,7 +69,10 @@ void SendOperation::OnNextPort() {
   tmrDownload_.SetEnabled(false);
   unanswered_ = 0;
   ++port_index_;
-  if (port_index_ >= kPortCount) return Succeed("SUCCESS: Send Complete!");
+  if (port_index_ >= kPortCount) {
+    if (on_sent_) on_sent_(unit_);
+    return Succeed("SUCCESS: Send Complete!");
+  }
   if (!EncodeAndSendPort(port_index_)) return;
   perhaps_written_ = true;
   ShowPort();

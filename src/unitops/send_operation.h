@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstdint>
+#include <functional>
 #include <string>
 
 #include "config/channel_config.h"
@@ -21,8 +22,10 @@ namespace tendril {
 //   any --a fault--> Idle
 class SendOperation final : public UnitOperation {
  public:
-  // `working` are the records that are sent; context and records must outlive the operation.
-  SendOperation(CommandContext& context, const ChannelTable& working);
+  // `working` are the records that are sent; `on_sent` (may be empty) is called with the unit when it has accepted the
+  // last of them, while the command still runs. Context and records must outlive the operation.
+  SendOperation(CommandContext& context, const ChannelTable& working,
+                std::function<void(std::uint8_t unit)> on_sent);
 
   // Encodes the record of slot `port_index` and sends it as options to the chosen unit. False: a field is invalid,
   // which has been shown, and nothing was sent. Raises what the link raises, and kErrOutOfRange for an index above 8.
@@ -39,6 +42,7 @@ class SendOperation final : public UnitOperation {
   void ShowPort();
 
   const ChannelTable& working_;
+  std::function<void(std::uint8_t)> on_sent_;
   Timer& tmrDownload_;  // enabled in the pause between two ports
   std::uint8_t unit_ = 0;
   std::uint8_t port_index_ = 0;

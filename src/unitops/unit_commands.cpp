@@ -9,10 +9,12 @@ UnitCommands::UnitCommands(HwSerial& link, TimerFactory& timers, MessageBoxes& b
                            ChannelTable& working, Events events)
     : running(timers, progress_view),
       context{link, timers, boxes, running, target, std::move(events.starting)},
-      send(context, working),
+      send(context, working, std::move(events.sent)),
       get(context, working, std::move(events.replaced)),
       change_id(context) {
-  link.SetPollReplyHandler([this](bool replied, std::uint8_t unit, std::uint8_t kind, Bytes& data) {
+  link.SetPollReplyHandler([this, polled = std::move(events.polled)](bool replied, std::uint8_t unit,
+                                                                     std::uint8_t kind, Bytes& data) {
+    if (polled) polled(unit, replied);
     if (running.Active()) running.Operation()->OnPollReply(replied, unit, kind, data);
   });
 }
@@ -21,6 +23,10 @@ UnitCommands::~UnitCommands() { context.link.SetPollReplyHandler(nullptr); }
 
 void UnitCommands::Stop() {
   if (running.Active()) running.Operation()->Stop();
+}
+
+void UnitCommands::Cancel() {
+  if (running.Active()) running.Operation()->Cancel();
 }
 
 }  // namespace tendril

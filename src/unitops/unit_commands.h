@@ -1,6 +1,7 @@
 // UnitCommands: the commands that the window runs against a unit.
 #pragma once
 
+#include <cstdint>
 #include <functional>
 
 #include "config/channel_config.h"
@@ -22,18 +23,25 @@ struct UnitCommands {
   // Callbacks to the window. Each may be empty; none raises.
   struct Events {
     // See CommandContext.
-    std::function<bool()> starting;
-    // A get has just replaced the working configuration, and still runs.
-    std::function<void()> replaced;
+    std::function<bool()> starting = nullptr;
+    // Each reply to a poll of a command, or its absence; before the command takes it.
+    std::function<void(std::uint8_t unit, bool replied)> polled = nullptr;
+    // A get has just replaced the working configuration by that of `unit`, and still runs.
+    std::function<void(std::uint8_t unit)> replaced = nullptr;
+    // A send has just written the working configuration into `unit`, all of it, and still runs.
+    std::function<void(std::uint8_t unit)> sent = nullptr;
   };
 
   // Takes the link's poll replies. Everything handed in must outlive it.
   UnitCommands(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes, CommandProgressView& progress_view,
-               const UnitTarget& target, ChannelTable& working, Events events = {});
+               const UnitTarget& target, ChannelTable& working, Events events);
   ~UnitCommands();
 
   // Stops the running command and shows nothing: the window is closing.
   void Stop();
+  // Ends the running command, if there is one, as the user wishes: as failed, and without a box. An outstanding poll
+  // ends first.
+  void Cancel();
 
   RunningCommand running;
   CommandContext context;

@@ -15,7 +15,7 @@ class Cancel : public CommandTest {
     operation.Start();
     world_.time.Advance(ms);
     const bool poll_out = link_.PollOutstanding();
-    operation.Cancel();
+    commands_.Cancel();
     EXPECT_EQ(commands_.running.Active(), poll_out) << "until the outstanding poll has ended";
     const auto heard = unit.polls_heard();
     world_.time.Advance(5000);

@@ -9,6 +9,7 @@
 #include <utility>
 
 #include "bench/faulty_units.h"
+#include "platform/hex_text.h"
 #include "serial/hw_serial.h"
 #include "support/recorded_progress.h"
 #include "support/simulated_world.h"
@@ -94,7 +95,19 @@ class CommandTest : public testing::Test {
   ChannelTable working_;
   std::function<bool()> on_starting_ = [] { return true; };
   std::function<void()> on_replaced_ = [] {};
-  UnitCommands::Events events_{[this] { return on_starting_(); }, [this] { on_replaced_(); }};
+  std::string
+      noted_;  // by events: "01+ 01- sent 01 " when a unit has replied to a poll, then not, and was sent to
+  UnitCommands::Events events_{
+      .starting = [this] { return on_starting_(); },
+      .polled = [this](std::uint8_t unit,
+                       bool replied) { noted_ += HexByte(unit) + (replied ? "+ " : "- "); },
+      .replaced =
+          [this](std::uint8_t unit) {
+            noted_ += "replaced " + HexByte(unit) + " ";
+            on_replaced_();
+          },
+      .sent = [this](std::uint8_t unit) { noted_ += "sent " + HexByte(unit) + " "; }};
+
   UnitCommands commands_{link_, world_.time, world_.boxes, progress_, target_, working_, events_};
 };
 
