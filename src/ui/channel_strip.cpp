@@ -7,7 +7,7 @@ namespace tendril {
 namespace {
 
 // Eight of them fit into a window 910 wide, and all of a window 700 high.
-constexpr QSize kSmallestSimulator(80, 80);
+constexpr QSize kSmallestSimulator(80, 72);
 
 }  // namespace
 

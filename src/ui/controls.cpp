@@ -171,6 +171,8 @@ QLabel* BoldLabel(QAnyStringView text) {
   return label;
 }
 
+int LowButtonHeight(const QWidget& button) { return button.fontMetrics().height() + 4; }
+
 void Reveal(QWidget& widget) {
   for (QWidget* outer = widget.parentWidget(); outer != nullptr; outer = outer->parentWidget()) {
     if (auto* area = qobject_cast<QScrollArea*>(outer)) area->ensureWidgetVisible(&widget);

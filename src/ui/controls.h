@@ -131,6 +131,9 @@ void CheckOnly(QButtonGroup& group, int id);
 QLabel* DimLabel(QAnyStringView text);
 QLabel* BoldLabel(QAnyStringView text = {});
 
+// The height of a button in a line of text.
+int LowButtonHeight(const QWidget& button);
+
 // Scrolls what contains `widget`, if that scrolls, until it is visible.
 void Reveal(QWidget& widget);
 

@@ -76,7 +76,7 @@ void frmNewServoConfig::LayOut() {
 
   auto* content = new QWidget;
   scroll->setWidget(content);
-  auto* column = AddLayout<QVBoxLayout>(content, {5, 4, 5, 6}, 4);
+  auto* column = AddLayout<QVBoxLayout>(content, {5, 2, 5, 2}, 3);
   column->addWidget(new WrappingRow(connection_, command_area_));
   auto* boxes_or_progress = new QStackedLayout;
   column->addLayout(boxes_or_progress);
@@ -86,7 +86,7 @@ void frmNewServoConfig::LayOut() {
   auto* simulator_view = new QWidget;
   simulator_view->installEventFilter(this);  // for its first paint
   views_->addWidget(simulator_view);
-  auto* simulator_column = AddLayout<QVBoxLayout>(simulator_view, {}, 4);
+  auto* simulator_column = AddLayout<QVBoxLayout>(simulator_view, {}, 3);
   auto* editor = new QWidget;
   auto* editor_row = AddLayout<QHBoxLayout>(editor, {}, 4);
   editor_row->addWidget(servo_, 3);

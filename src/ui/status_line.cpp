@@ -2,16 +2,59 @@
 
 #include <QClipboard>
 #include <QGuiApplication>
+#include <QHBoxLayout>
+#include <QVBoxLayout>
 
 #include "ui/controls.h"
 
 namespace tendril {
+namespace {
 
-StatusLine::StatusLine() : lblStatus_(Named(new Announcement, "lblStatus")) {
+constexpr int kApart = 12;             // between two facts
+constexpr int kOneLineOfFacts = 1200;  // the width from which they have room beside what moves
+
+}  // namespace
+
+StatusLine::StatusLine()
+    : lblPort_(Named(new ElidedLabel(QStringLiteral("Port")), "lblPort")),
+      lblUnit_(Named(new ElidedLabel(QStringLiteral("Unit")), "lblUnit")),
+      lblOrigin_(Named(new ElidedLabel(QStringLiteral("Configuration")), "lblOrigin")),
+      lblStatus_(Named(new Announcement, "lblStatus")),
+      cmdUndo_(Named(new QPushButton(QStringLiteral("Undo")), "cmdUndo")) {
   lblStatus_->setTextFormat(Qt::PlainText);
   lblStatus_->setTextInteractionFlags(Qt::TextSelectableByMouse);
-  lblStatus_->setContentsMargins(6, 0, 0, 0);  // below the areas of the window
-  addWidget(lblStatus_, 1);
+  lblStatus_->setSizePolicy(QSizePolicy::Ignored, QSizePolicy::Fixed);
+  Describe(cmdUndo_, "Takes back what the sentence beside it reports.");
+  cmdUndo_->setFixedHeight(LowButtonHeight(*cmdUndo_));
+  cmdUndo_->hide();
+  connect(cmdUndo_, &QAbstractButton::clicked, this, &StatusLine::UndoPressed);
+
+  auto* lines = new QWidget;
+  auto* column = AddLayout<QVBoxLayout>(lines, {6, 0, 0, 0}, 1);  // below the areas of the window
+  facts_ = new QBoxLayout(QBoxLayout::TopToBottom);
+  facts_->setSpacing(1);
+  facts_->addWidget(moving_, 2);
+  auto* three = new QHBoxLayout;
+  three->setSpacing(kApart);
+  three->addWidget(lblPort_, 7);
+  three->addWidget(lblUnit_, 4);
+  three->addWidget(lblOrigin_, 8);
+  facts_->addLayout(three, 5);
+  column->addLayout(facts_);
+  auto* sentence = new QHBoxLayout;
+  sentence->addWidget(lblStatus_, 1);
+  sentence->addWidget(cmdUndo_);
+  sentence->addItem(new QSpacerItem(0, cmdUndo_->height()));
+  column->addLayout(sentence);
+  addWidget(lines, 1);
+}
+
+void StatusLine::resizeEvent(QResizeEvent* event) {
+  QStatusBar::resizeEvent(event);
+  const auto direction = width() < kOneLineOfFacts ? QBoxLayout::TopToBottom : QBoxLayout::LeftToRight;
+  if (direction == facts_->direction()) return;
+  facts_->setDirection(direction);
+  facts_->setSpacing(direction == QBoxLayout::TopToBottom ? 1 : kApart);
 }
 
 void StatusLine::Say(const QString& sentence) {

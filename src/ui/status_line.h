@@ -1,25 +1,54 @@
 // StatusLine: the window's status bar.
 #pragma once
 
+#include <QBoxLayout>
+#include <QPushButton>
 #include <QStatusBar>
 #include <QString>
 
 #include "ui/announcement.h"
+#include "ui/elided_label.h"
+#include "ui/moving_line.h"
 
 namespace tendril {
 
-// Shows one sentence until the next one. The mouse can select it.
+// What moves; the port, the unit and the origin of the configuration, in the same line where the width suffices; and one
+// sentence, which stays until the next one. What has no room is elided. To show what is shown already costs nothing.
 class StatusLine : public QStatusBar {
+  Q_OBJECT
+
  public:
   StatusLine();
 
   // Shows `sentence`, and has it read out.
   void Say(const QString& sentence);
+  // Each shows one fact. An empty text shows nothing.
+  void ShowPort(const QString& text) { lblPort_->Show(text); }
+  void ShowUnit(const QString& text) { lblUnit_->Show(text); }
+  void ShowOrigin(const QString& text) { lblOrigin_->Show(text); }
+  // The notice of a borrowed port, beside what moves.
+  void ShowBorrowed(const QString& text) { moving_->ShowBorrowed(text); }
+  // Shows or hides the button that undoes what the sentence reports.
+  void OfferUndo(bool offer) { cmdUndo_->setVisible(offer); }
+  // The line that shows what moves.
+  MovingLine& Moving() { return *moving_; }
   // Puts the sentence on the clipboard.
   void Copy() const;
 
+ Q_SIGNALS:
+  void UndoPressed();
+
+ protected:
+  void resizeEvent(QResizeEvent* event) override;
+
  private:
+  MovingLine* moving_ = new MovingLine;
+  QBoxLayout* facts_;  // what moves, and the three facts
+  ElidedLabel* lblPort_;
+  ElidedLabel* lblUnit_;
+  ElidedLabel* lblOrigin_;
   Announcement* lblStatus_;
+  QPushButton* cmdUndo_;
 };
 
 }  // namespace tendril
