@@ -19,9 +19,8 @@ std::string WhyDrawingOnly(const MovingFacts& facts) {
 std::string MovingSentence(const MovingFacts& facts) {
   if (facts.moves == Moves::kNothing) return "Nothing moves";
   if (const std::string why = WhyDrawingOnly(facts); !why.empty()) return "Drawing only: " + why;
-  const std::string servo =
-      "channel " + std::to_string(*facts.channel + 1) + " of " +
-      (facts.unit == kAllUnits ? "every unit" : "unit " + HexByte(facts.unit));
+  const std::string servo = "channel " + std::to_string(*facts.channel + 1) + " of " +
+                            (facts.unit == kAllUnits ? "every unit" : "unit " + HexByte(facts.unit));
   return facts.moves == Moves::kSweep ? "Moving " + servo : "The slider moves " + servo;
 }
 
