@@ -28,8 +28,14 @@ ChannelChoices::ChannelChoices(ChannelEditor& editor, const ChannelTable& workin
   column->addStretch();
   connect(optChannelType_, &QButtonGroup::idClicked, this,
           [this](int id) { Q_EMIT KindChosen(static_cast<std::int16_t>(id - 1)); });
-  connect(optPowerUp_, &QButtonGroup::idClicked, this, [this](int id) { editor_.SetPowerUpOption(id); });
-  connect(optLostComm_, &QButtonGroup::idClicked, this, [this](int id) { editor_.SetLostCommOption(id); });
+  connect(optPowerUp_, &QButtonGroup::idClicked, this, [this](int id) {
+    editor_.SetPowerUpOption(id);
+    Q_EMIT OptionChosen();
+  });
+  connect(optLostComm_, &QButtonGroup::idClicked, this, [this](int id) {
+    editor_.SetLostCommOption(id);
+    Q_EMIT OptionChosen();
+  });
 }
 
 std::vector<ChannelChoices::Choice> ChannelChoices::Choices(std::initializer_list<const char*> captions,
@@ -44,7 +50,7 @@ std::vector<ChannelChoices::Choice> ChannelChoices::Choices(std::initializer_lis
 
 QWidget* ChannelChoices::MakePresets() {
   auto* frame = new QGroupBox(QStringLiteral("Standard Preset Values"));
-  auto* presets = Named(new CalmComboBox, "cmbPresets");
+  auto* presets = cmbPresets_ = Named(new CalmComboBox, "cmbPresets");
   presets->setAccessibleName(frame->title());
   Describe(presets,
            "Gives all eight channels these values at once: ranges, stops, positions, and "

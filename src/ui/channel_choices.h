@@ -22,12 +22,16 @@ class ChannelChoices : public QWidget {
   // but not applied.
   ChannelChoices(ChannelEditor& editor, const ChannelTable& working);
 
+  // Selects this row of kPresets, and applies nothing.
+  void ShowPreset(std::size_t preset) { cmbPresets_->setCurrentIndex(static_cast<int>(preset)); }
   // Checks what the edited channel's record holds; nothing for unknown values, or while no channel is edited.
   void ShowChoices();
 
  Q_SIGNALS:
   // The user chose an output kind, 0 to 2.
   void KindChosen(std::int16_t kind);
+  // The user chose an option; the records hold it.
+  void OptionChosen();
   // The user chose this row of kPresets.
   void PresetChosen(std::size_t preset);
 
@@ -44,6 +48,7 @@ class ChannelChoices : public QWidget {
 
   ChannelEditor& editor_;
   const ChannelTable& working_;
+  CalmComboBox* cmbPresets_ = nullptr;
   // The buttons' ids are the record's values; those of the output kind are one more.
   QButtonGroup* optChannelType_;
   QButtonGroup* optPowerUp_;

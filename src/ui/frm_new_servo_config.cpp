@@ -35,17 +35,14 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
       info_(info),
       ports_(link, boxes, control_panel),
       actuals_(new ActualsFrame(timers, *this)),
-      commands_(link, timers, boxes, *progress_, *connection_, working_,
+      commands_(link, timers, boxes, *progress_, *connection_, config_.Records(),
                 {.starting =
                      [this] {
                        CommitTyping();
                        return live_test_.MakeWay();
                      },
-                 .replaced =
-                     [this](std::uint8_t /*unit*/) {
-                       remarks_.AcceptRecords();
-                       OnReplaced();
-                     }}),
+                 .replaced = [this](std::uint8_t unit) { OnRead(unit); },
+                 .sent = [this](std::uint8_t unit) { OnSent(unit); }}),
       live_test_(link, timers, boxes, commands_.running, *connection_, *servo_, *live_test_area_,
                  simulators_),
       tmrSummaryScreen_(timers.CreateTimer([this] { OnSummaryScreen(); })),
@@ -116,6 +113,7 @@ void frmNewServoConfig::Connect() {
     live_test_.OnTestButton(button);
   });
   connect(choices_, &ChannelChoices::KindChosen, c, [this](std::int16_t kind) { OnKindChosen(kind); });
+  connect(choices_, &ChannelChoices::OptionChosen, c, [this] { NoteStep(QStringLiteral("Option")); });
   connect(choices_, &ChannelChoices::PresetChosen, c, [this](std::size_t preset) { OnPresetChosen(preset); });
   connect(live_test_area_, &LiveTestArea::SliderMoved, c, [this] { live_test_.OnSlider(); });
   connect(live_test_area_, &LiveTestArea::SliderSendsChanged, c, [this] {
@@ -133,6 +131,10 @@ void frmNewServoConfig::Connect() {
     connection_->StepUnitId(by);
     status_->Say(QStringLiteral("Unit ID ") + QString::fromStdString(HexByte(connection_->UnitId())));
   });
+  connect(status_, &StatusLine::UndoPressed, c, [this] { Undo(); });
+  connect(menu_, &MainMenu::UndoChosen, c, [this] { Undo(); });
+  connect(menu_, &MainMenu::RedoChosen, c, [this] { Redo(); });
+  connect(menu_, &MainMenu::RestoreChosen, c, [this] { RestoreReading(); });
   connect(menu_, &MainMenu::SimulatorChosen, c, [this] { ShowConfig(); });
   connect(menu_, &MainMenu::KeysChosen, c, [this] { ShowKeys(*this, *menu_); });
   connect(menu_, &MainMenu::ManualChosen, c, [this] {
@@ -140,7 +142,11 @@ void frmNewServoConfig::Connect() {
     OpenManual(boxes_);
   });
   connect(menu_, &MainMenu::AboutChosen, c, [this] { ShowAbout(*this, info_); });
-  connect(progress_, &ProgressArea::Said, c, [this](const QString& sentence) { status_->Say(sentence); });
+  connect(progress_, &ProgressArea::Said, c, [this](const QString& sentence) {
+    status_->Say(commands_.running.Active() || outcome_note_.isEmpty()
+                     ? sentence
+                     : sentence + QLatin1Char(' ') + std::exchange(outcome_note_, {}));
+  });
   commands_.running.SetObserver([this] { ShowRunning(); });
   link_.SetPortClosedHandler([this] { live_test_.OnPortClosed(); });
   ports_.SetOpeningHandler([this] { live_test_.OnTestButton(LiveTest::kNoButton); });
@@ -148,17 +154,16 @@ void frmNewServoConfig::Connect() {
 
 void frmNewServoConfig::StartUp() {
   setWindowTitle(QStringLiteral("Kelvane Tendril Utility v") + info_.version.Text());
-  for (std::size_t channel = 0; channel < kPortCount; ++channel)
-    SetFromPreset(kPresets[kStartPreset], working_.At(channel));
-  remarks_.AcceptRecords();
   connection_->ListCommPorts();
   control_panel_.ReadPreferences();
   control_panel_.InitializeCommListenerInterface();
   ShowRecords();
+  ShowOrigin();
 }
 
 void frmNewServoConfig::ShowRunning() {
   const RunningCommand& running = commands_.running;
+  if (running.Operation() == &commands_.send) readings_.SendBegins(connection_->UnitId());
   // Disabling a button moves its focus on to some servo or button, and scrolls there. So the focus rests on the window
   // while a command runs, and then goes back unless the user has moved it.
   if (running.Active()) {
@@ -182,6 +187,7 @@ void frmNewServoConfig::EnableControls() {
   live_test_area_->EnableControls(running_command);
   menu_->EnableIdSteps(running_command.isEmpty() && !live_test_area_->Moves());
   if (summary_ != nullptr) summary_->EnableCommands(running_command);
+  ShowUndo();
 }
 
 // The window is painted first: the summary has more controls than everything else, and the icon has to be decoded.
@@ -198,15 +204,19 @@ bool frmNewServoConfig::eventFilter(QObject* object, QEvent* event) {
 
 void frmNewServoConfig::MakeSummary() {
   if (summary_ != nullptr) return;
-  summary_ = new SummaryArea(timers_, working_, views_);
+  summary_ = new SummaryArea(timers_, config_.Records(), views_);
   views_->addWidget(summary_);
   EnableControls();
   connect(summary_, &SummaryArea::SendPressed, &connections_, [this] { commands_.send.Start(); });
   connect(summary_, &SummaryArea::GetPressed, &connections_, [this] { commands_.get.Start(); });
+  connect(summary_, &SummaryArea::OptionChosen, &connections_,
+          [this] { NoteStep(QStringLiteral("Option")); });
   connect(summary_, &SummaryArea::SimulatorPressed, &connections_, [this] { ShowConfig(); });
   connect(summary_, &SummaryArea::Edited, &connections_, [this](std::size_t channel) {
-    remarks_.AcceptRecord(channel);
+    config_.Remarks().AcceptRecord(channel);
+    config_.Editor().ReloadChannel();
     ShowRemarks();
+    NoteStep(QStringLiteral("Edit in the summary"));
   });
 }
 

@@ -22,14 +22,15 @@
 #include "ui/connection_area.h"
 #include "ui/live_test_area.h"
 #include "ui/main_menu.h"
-#include "ui/model/channel_editor.h"
-#include "ui/model/record_remarks.h"
+#include "ui/model/edited_configuration.h"
+#include "ui/model/readings.h"
 #include "ui/motion_parameters.h"
 #include "ui/program_info.h"
 #include "ui/progress_area.h"
 #include "ui/simulators.h"
 #include "ui/status_line.h"
 #include "ui/summary_area.h"
+#include "ui/undo_history.h"
 #include "unitops/control_panel.h"
 #include "unitops/live_test.h"
 #include "unitops/port_selection.h"
@@ -47,7 +48,7 @@ class frmNewServoConfig : public QMainWindow {
   ~frmNewServoConfig() override;
 
   // The records that are edited, sent and shown.
-  const ChannelTable& WorkingConfiguration() const { return working_; }
+  const ChannelTable& WorkingConfiguration() const { return config_.Records(); }
 
  protected:
   bool eventFilter(QObject* object, QEvent* event) override;
@@ -66,7 +67,16 @@ class frmNewServoConfig : public QMainWindow {
   void OnPresetChosen(std::size_t preset);
   void ShowRecords();
   void ShowRemarks();
-  void OnReplaced();
+  void OnReplaced(const QString& what);
+  void OnRead(std::uint8_t unit);
+  void OnSent(std::uint8_t unit);
+  void RestoreReading();
+  void NoteStep(const QString& what, bool goes_on = false);
+  void ShowOrigin();
+  void ShowUndo();
+  void Undo();
+  void Redo();
+  void ShowRestored(const QString& said);
   void CommitTyping();
   void MakeSummary();
   void ShowSummary();
@@ -81,20 +91,21 @@ class frmNewServoConfig : public QMainWindow {
   MessageBoxes& boxes_;
   ControlPanel& control_panel_;
   const ProgramInfo info_;
-  ChannelTable working_;
-  ChannelEditor channel_editor_{working_};
-  RecordRemarks remarks_{working_, channel_editor_};
+  EditedConfiguration config_;
+  UndoHistory history_{config_};
+  Readings readings_;
+  QString outcome_note_;  // what the status bar says after the outcome of the running command
   PortSelection ports_;
 
   // Owned by the window, as its child widgets.
   ConnectionArea* connection_ = new ConnectionArea(ports_);
   ProgressArea* progress_ = new ProgressArea;
   CommandArea* command_area_ = new CommandArea;
-  ApplyBoxes* apply_boxes_ = new ApplyBoxes(channel_editor_);
-  ChannelStrip* channels_ = new ChannelStrip(working_);
-  ChosenServo* servo_ = new ChosenServo(channel_editor_, working_);
-  MotionParameters* parameters_ = new MotionParameters(channel_editor_);
-  ChannelChoices* choices_ = new ChannelChoices(channel_editor_, working_);
+  ApplyBoxes* apply_boxes_ = new ApplyBoxes(config_.Editor());
+  ChannelStrip* channels_ = new ChannelStrip(config_.Records());
+  ChosenServo* servo_ = new ChosenServo(config_.Editor(), config_.Records());
+  MotionParameters* parameters_ = new MotionParameters(config_.Editor());
+  ChannelChoices* choices_ = new ChannelChoices(config_.Editor(), config_.Records());
   LiveTestArea* live_test_area_ = new LiveTestArea(*parameters_);
   QStackedWidget* views_ = new QStackedWidget;
   StatusLine* status_ = new StatusLine;
@@ -103,7 +114,7 @@ class frmNewServoConfig : public QMainWindow {
   SummaryArea* summary_ = nullptr;  // made after the first paint, or when it is first needed
 
   UnitCommands commands_;
-  Simulators simulators_{*channels_, *servo_, parameters_->Scale(), channel_editor_};
+  Simulators simulators_{*channels_, *servo_, parameters_->Scale(), config_.Editor()};
   LiveTest live_test_;
   // Where the focus was when the running command began, and where it went when its button was disabled.
   QPointer<QWidget> focus_before_command_;

@@ -1,7 +1,9 @@
 // The window's edits and views: what the user's acts do to the records, and how that is shown.
 #include <QAbstractSpinBox>
 #include <QGuiApplication>
+#include <QTime>
 
+#include "platform/hex_text.h"
 #include "ui/freeze.h"
 #include "ui/frm_new_servo_config.h"
 
@@ -11,19 +13,27 @@ namespace {
 // The table is filled before it is shown.
 constexpr std::int32_t kSummaryScreenMs = 20;
 
+std::string TimeOfDay() { return QTime::currentTime().toString(QStringLiteral("HH:mm")).toStdString(); }
+
+QString UnitHeld(std::uint8_t unit, const Readings::Reading& reading, const char* text) {
+  return QString::fromLatin1(text).arg(QString::fromStdString(HexByte(unit)),
+                                       QString::fromStdString(reading.time));
+}
+
 }  // namespace
 
 // By a click, a key or an action of assistive technology: the focus may be elsewhere.
 void frmNewServoConfig::ChooseChannel(std::size_t channel) {
   CommitTyping();
   SelectChannel(channel);
+  NoteStep(QStringLiteral("Leaving the channel"));
   status_->Say(QStringLiteral("Channel %1 selected").arg(channel + 1) +
                (live_test_area_->Sweeps() ? QStringLiteral("; the test goes on there") : QString()));
 }
 
 void frmNewServoConfig::SelectChannel(std::size_t channel) {
-  const auto left = channel_editor_.Channel();
-  channel_editor_.SelectChannel(channel);
+  const auto left = config_.Editor().Channel();
+  config_.Editor().SelectChannel(channel);
   if (left) channels_->UpdateSimulator(*left, live_test_.ShownPosition());
   apply_boxes_->ShowTicks();
   channels_->ShowSelected(channel);
@@ -37,12 +47,12 @@ void frmNewServoConfig::ShowEditor() {
   parameters_->ShowValues();
   choices_->ShowChoices();
   servo_->ShowChannel();
-  actuals_->SetValues(channel_editor_.WorkingValues());
+  actuals_->SetValues(config_.Editor().WorkingValues());
   ShowRemarks();
 }
 
 void frmNewServoConfig::ShowRemarks() {
-  const auto sentences = remarks_.Sentences(!SummaryShown());
+  const auto sentences = config_.Remarks().Sentences(!SummaryShown());
   if (SummaryShown()) {
     summary_->ShowRemarks(sentences);
   } else {
@@ -51,38 +61,41 @@ void frmNewServoConfig::ShowRemarks() {
 }
 
 void frmNewServoConfig::OnEdited(FollowUp follow_up) {
-  remarks_.AcceptEdit();
+  config_.Remarks().AcceptEdit();
   ShowEditor();
   if (follow_up == FollowUp::kRefreshLivePosition) {
     live_test_.OnSlider();
   } else {
     simulators_.UpdateSimulators(live_test_.ShownPosition());
   }
+  NoteStep(QStringLiteral("Edit"));
 }
 
 void frmNewServoConfig::OnApplied() {
-  remarks_.AcceptEdit();
+  config_.Remarks().AcceptEdit();
   ShowRemarks();
-  if (channel_editor_.Channel()) simulators_.UpdateSimulators(live_test_.ShownPosition());
+  if (config_.Editor().Channel()) simulators_.UpdateSimulators(live_test_.ShownPosition());
+  NoteStep(QStringLiteral("Storing"));
 }
 
 void frmNewServoConfig::OnKindChosen(std::int16_t kind) {
-  const auto channel = channel_editor_.Channel();
+  const auto channel = config_.Editor().Channel();
   if (!channel) return;
-  channel_editor_.SetPortType(kind);
+  config_.Editor().SetPortType(kind);
   channels_->ShowKinds();
   if (kind == kPortServo) {
     SelectChannel(*channel);
   } else {
     ShowEditor();
   }
+  NoteStep(QStringLiteral("Output"));
 }
 
 void frmNewServoConfig::OnPresetChosen(std::size_t preset) {
   QGuiApplication::setOverrideCursor(Qt::WaitCursor);
-  channel_editor_.ApplyPreset(kPresets.at(preset));
-  remarks_.AcceptRecords();
+  config_.ApplyPreset(preset);
   ShowRecords();
+  NoteStep(QStringLiteral("Preset ") + QAnyStringView(kPresets[preset].name).toString());
   QGuiApplication::restoreOverrideCursor();
 }
 
@@ -94,11 +107,90 @@ void frmNewServoConfig::ShowRecords() {
   live_test_.OnRecordsReplaced();
 }
 
-void frmNewServoConfig::OnReplaced() {
-  channel_editor_.ReloadChannel();
-  ShowRecords();
+// The records were read, or the summary has changed them.
+void frmNewServoConfig::OnReplaced(const QString& what) {
   if (SummaryShown()) summary_->NormaliseAndShowRecords();
+  config_.Editor().ReloadChannel();
+  ShowRecords();
   ShowRemarks();
+  NoteStep(what);
+}
+
+void frmNewServoConfig::OnRead(std::uint8_t unit) {
+  const std::string time = TimeOfDay();
+  readings_.Keep(unit, config_.Records(), time);
+  config_.ReadFrom(unit, time);
+  OnReplaced(QStringLiteral("Get from unit ") + QString::fromStdString(HexByte(unit)));
+}
+
+void frmNewServoConfig::OnSent(std::uint8_t unit) {
+  config_.SentTo(unit, TimeOfDay());
+  NoteStep({});
+  if (readings_.WayBack(unit) == nullptr)
+    outcome_note_ = QStringLiteral("What it held before is not known: it was not read.");
+}
+
+void frmNewServoConfig::RestoreReading() {
+  const std::uint8_t unit = connection_->UnitId();
+  const Readings::Reading* reading = readings_.WayBack(unit);
+  if (reading == nullptr) return;
+  CommitTyping();
+  config_.Load(reading->records, unit, reading->time);
+  const QString what = UnitHeld(unit, *reading, "what unit %1 held at %2");
+  OnReplaced(QStringLiteral("Restoring ") + what);
+  status_->Say(QStringLiteral("Shown now: %1. Nothing is sent yet.").arg(what));
+}
+
+// Called after everything that may have changed the configuration.
+void frmNewServoConfig::NoteStep(const QString& what, bool goes_on) {
+  const auto changed = history_.Note(what, goes_on);
+  // Offered until the next step, and after those that one may not have meant.
+  if (!changed.empty()) status_->OfferUndo(changed.size() > 1);
+  ShowOrigin();
+  ShowUndo();
+}
+
+void frmNewServoConfig::ShowOrigin() {
+  status_->ShowOrigin(QString::fromStdString(config_.Origin().Sentence()));
+}
+
+void frmNewServoConfig::ShowUndo() {
+  const bool may = !commands_.running.Active() && !live_test_area_->Moves();
+  menu_->ShowUndo(may && history_.CanUndo(), history_.UndoText(), may && history_.CanRedo(),
+                  history_.RedoText());
+  const std::uint8_t unit = connection_->UnitId();
+  const Readings::Reading* reading = readings_.WayBack(unit);
+  menu_->ShowWayBack(may && reading != nullptr,
+                     reading != nullptr ? UnitHeld(unit, *reading, "Unit %1 Held at %2") : QString());
+}
+
+void frmNewServoConfig::Undo() {
+  CommitTyping();
+  if (!history_.CanUndo()) return;
+  const QString what = history_.UndoText();
+  history_.Undo();
+  ShowRestored(QStringLiteral("Undone: ") + what);
+}
+
+void frmNewServoConfig::Redo() {
+  CommitTyping();
+  if (!history_.CanRedo()) return;  // what was typed is a step of its own
+  const QString what = history_.RedoText();
+  history_.Redo();
+  ShowRestored(QStringLiteral("Done again: ") + what);
+}
+
+// Shows the configuration that undo or redo has restored. Stores nothing, and sends nothing.
+void frmNewServoConfig::ShowRestored(const QString& said) {
+  choices_->ShowPreset(config_.ChosenPreset());
+  apply_boxes_->ShowTicks();
+  if (const auto channel = config_.Editor().Channel()) channels_->ShowSelected(*channel);
+  if (SummaryShown()) summary_->ShowRecords();
+  ShowRecords();
+  status_->OfferUndo(false);
+  ShowOrigin();
+  ShowUndo();
+  status_->Say(said);
 }
 
 // Lets typed text take effect. A key can trigger what uses it without taking the focus away.
@@ -120,6 +212,7 @@ void frmNewServoConfig::OnSummaryScreen() {
   focus_before_summary_ = focusWidget() == this ? focus_before_command_.data() : focusWidget();
   actuals_->hide();
   summary_->NormaliseAndShowRecords();
+  config_.Editor().ReloadChannel();
   live_test_.OnRecordsReplaced();  // the records may have changed
   views_->setCurrentWidget(summary_);
   command_area_->ShowSummaryButton(false);
@@ -128,6 +221,7 @@ void frmNewServoConfig::OnSummaryScreen() {
   summary_->TakeFocus();
   status_->Say(QStringLiteral("Summary of all eight channels"));
   ShowRemarks();
+  NoteStep(QStringLiteral("Showing the summary"));
 }
 
 void frmNewServoConfig::ShowConfig() {
@@ -139,7 +233,7 @@ void frmNewServoConfig::ShowConfig() {
   apply_boxes_->ShowEditing(true);
   if (focus_before_summary_) focus_before_summary_->setFocus();
   status_->Say(QStringLiteral("Simulator"));
-  OnReplaced();  // the summary has changed the records
+  OnReplaced({});  // the summary has changed the records
 }
 
 bool frmNewServoConfig::SummaryShown() const { return views_->currentWidget() == summary_; }

@@ -78,6 +78,8 @@ void MainMenu::AddUnitMenu(QWidget& window) {
                AddItem(menu, "P&revious Unit ID", "Ctrl+PgDown", this, [this] { Q_EMIT IdStepped(-1); })};
   menu.addSeparator();
   for (const ControlItem& item : kCommandItems) AddItem(menu, window, item);
+  restore_ = AddItem(menu, "", "", this, &MainMenu::RestoreChosen);
+  ShowWayBack(false, {});
   menu.addSeparator();
   AddTests(*menu.addMenu(QStringLiteral("&Test")), window);
   menu.addSeparator();
@@ -96,6 +98,11 @@ void MainMenu::AddTests(QMenu& menu, QWidget& window) {
 
 void MainMenu::AddEditMenu(QWidget& window) {
   QMenu& menu = AddMenu(*this, "&Edit");
+  undo_ = AddItem(menu, "", "Ctrl+Z", this, &MainMenu::UndoChosen);
+  redo_ = AddItem(menu, "", "Ctrl+Shift+Z", this, &MainMenu::RedoChosen);
+  redo_->setShortcuts({Key("Ctrl+Shift+Z"), Key("Ctrl+Y")});
+  ShowUndo(false, {}, false, {});
+  menu.addSeparator();
   AddItem(menu, "&Copy", "Ctrl+C", this, [] { CopyFocused(); });
   AddItem(menu, "Copy &Status", "Ctrl+Shift+S", this, &MainMenu::CopyStatusChosen);
   menu.addSeparator();
@@ -136,6 +143,19 @@ void MainMenu::ShowView(bool summary) {
   simulator_->setEnabled(summary);
   // In the summary a choice would store the editor's older values over an edited row.
   for (QAction* channel : channels_) channel->setEnabled(!summary);
+}
+
+void MainMenu::ShowUndo(bool may_undo, const QString& undo, bool may_redo, const QString& redo) {
+  undo_->setText((QStringLiteral("&Undo ") + undo).trimmed());
+  undo_->setEnabled(may_undo);
+  redo_->setText((QStringLiteral("&Redo ") + redo).trimmed());
+  redo_->setEnabled(may_redo);
+}
+
+void MainMenu::ShowWayBack(bool enabled, const QString& what) {
+  restore_->setText(
+      QStringLiteral("Rest&ore What %1").arg(what.isEmpty() ? QStringLiteral("the Unit Held") : what));
+  restore_->setEnabled(enabled);
 }
 
 void MainMenu::EnableIdSteps(bool enabled) {

@@ -21,6 +21,10 @@ class MainMenu : public QMenuBar {
 
   // Enables what only the shown view has.
   void ShowView(bool summary);
+  // Names the steps that undo and redo would go; each is enabled when it may be gone.
+  void ShowUndo(bool may_undo, const QString& undo, bool may_redo, const QString& redo);
+  // Names the reading that can be restored ("Unit 01 Held at 14:02"), and enables it when it may be.
+  void ShowWayBack(bool enabled, const QString& what);
   // Enables the steps through the unit IDs.
   void EnableIdSteps(bool enabled);
 
@@ -30,6 +34,9 @@ class MainMenu : public QMenuBar {
   // Choose the next (+1) or the previous (-1) unit ID.
   void IdStepped(int by);
   void SimulatorChosen();
+  void UndoChosen();
+  void RedoChosen();
+  void RestoreChosen();
   // Put the status bar's text on the clipboard.
   void CopyStatusChosen();
   void ManualChosen();
@@ -49,6 +56,9 @@ class MainMenu : public QMenuBar {
   std::array<QAction*, 2> id_steps_{};
   std::array<QAction*, kPortCount> channels_{};
   QAction* simulator_ = nullptr;
+  QAction* undo_ = nullptr;
+  QAction* redo_ = nullptr;
+  QAction* restore_ = nullptr;
   QAction* dark_ = nullptr;
 };
 

@@ -219,10 +219,12 @@ void SummaryArea::AddOptions(QGridLayout& table, std::size_t channel, const QStr
   connect(row.power_up, &QButtonGroup::idClicked, this, [this, channel](int id) {
     entry_->Close();
     working_.At(channel).PowerUPOpt = id;
+    Q_EMIT OptionChosen();
   });
   connect(row.lost_comm, &QButtonGroup::idClicked, this, [this, channel](int id) {
     entry_->Close();
     working_.At(channel).LostCommOption = id;
+    Q_EMIT OptionChosen();
   });
 }
 
@@ -232,11 +234,13 @@ void SummaryArea::EnableCommands(const QString& running_command) {
 }
 
 void SummaryArea::NormaliseAndShowRecords() {
+  for (std::size_t channel = 0; channel < kPortCount; ++channel) editor_.Normalise(channel);
+  ShowRecords();
+}
+
+void SummaryArea::ShowRecords() {
   entry_->Close();
-  for (std::size_t channel = 0; channel < kPortCount; ++channel) {
-    editor_.Normalise(channel);
-    ShowRow(channel);
-  }
+  for (std::size_t channel = 0; channel < kPortCount; ++channel) ShowRow(channel);
 }
 
 void SummaryArea::ShowRow(std::size_t channel) {

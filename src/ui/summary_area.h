@@ -30,6 +30,8 @@ class SummaryArea : public QWidget {
   // the number entry.
   SummaryArea(TimerFactory& timers, ChannelTable& working, QWidget* parent);
 
+  // Shows all records as they are.
+  void ShowRecords();
   // Brings all records into their bounds, and shows them.
   void NormaliseAndShowRecords();
   // Shows remarks on the records.
@@ -47,6 +49,8 @@ class SummaryArea : public QWidget {
   void SimulatorPressed();
   // The number entry has changed this channel's record.
   void Edited(std::size_t channel);
+  // The user chose an option; the record holds it.
+  void OptionChosen();
 
  protected:
   void keyPressEvent(QKeyEvent* event) override;

@@ -18,7 +18,10 @@ TEST_F(Window, StatusLine_SaysTheOutcomeAndCanBeCopied) {
   EXPECT_EQ(Text("lblStatus"), "Sending the configuration to unit 01");
   RunToTheEnd();
   window_->findChild<StatusLine*>()->Copy();
-  EXPECT_EQ(Copied(), "Sending the configuration to unit 01: SUCCESS: Send Complete!");
+  EXPECT_EQ(Copied(),
+            "Sending the configuration to unit 01: SUCCESS: Send Complete! What it held before is not known: "
+            "it was "
+            "not read.");
   EXPECT_EQ(Accessible("lblStatus").text(QAccessible::Name).toStdString(), Copied());
   EXPECT_EQ(Accessible("lblStatus").role(), QAccessible::Notification);
 }

@@ -35,7 +35,11 @@ EditedConfiguration::Snapshot EditedConfiguration::Take() const {
 void EditedConfiguration::Restore(const Snapshot& snapshot) {
   records_ = snapshot.records;
   remarks_.SetGiven(snapshot.given);
-  editor_.Restore(snapshot.editor);
+  ChannelEditor::State editor = snapshot.editor;
+  const bool chosen_since = !editor.channel && editor_.Channel();
+  if (chosen_since) editor = editor_.Current();
+  editor_.Restore(editor);
+  if (chosen_since) editor_.ReloadChannel();
   origin_.Restore(snapshot.origin);
   preset_ = snapshot.preset;
 }

@@ -48,6 +48,7 @@ class EditedConfiguration {
   void SentTo(std::uint8_t unit, const std::string& time) { origin_.SentTo(unit, time); }
 
   Snapshot Take() const;
+  // A channel stays chosen when none was.
   void Restore(const Snapshot& snapshot);
 
  private:
