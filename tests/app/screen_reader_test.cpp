@@ -9,7 +9,8 @@ namespace {
 
 constexpr char kTitle[] = "Kelvane Tendril Utility v" TENDRIL_VERSION;
 constexpr char kSending[] = "notification Sending the configuration to unit 01";
-const std::string kSent = std::string(kSending) + ": SUCCESS: Send Complete!";
+const std::string kSent =
+    std::string(kSending) + ": SUCCESS: Send Complete! What it held before is not known: it was not read.";
 
 // From the start to the outcome of a send. Returns what was heard from the send on.
 std::vector<std::string> Send() {
