@@ -106,7 +106,7 @@ void PseudoTerminal::ForgetClosings() const {
 
 bool PseudoTerminal::ProgramHasGone() const {
   ForgetClosings();
-  if (OpenInAnotherProcess(device_)) return false;
+  if (ProcessWithOpen(device_) != 0) return false;
   ::tcflush(near_end_, TCIOFLUSH);
   ::tcflush(far_end_, TCIFLUSH);
   // A program that was killed leaves its exclusive mode behind, which would keep every other one out.

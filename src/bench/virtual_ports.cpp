@@ -10,6 +10,8 @@
 namespace tendril {
 namespace {
 
+constexpr std::int32_t kChangeReportMs = 1000;
+
 RuntimeError Fault(std::int32_t number, std::string description) {
   return RuntimeError(number, std::move(description), "Serial port");
 }
@@ -71,6 +73,7 @@ struct VirtualPorts::Port {
   std::vector<std::unique_ptr<LineUnit>> units;
   bool plugged_in = true;
   bool held_by_another = false;
+  PortHolder holder;
   bool allowed = true;
   Device* opener = nullptr;
 };
@@ -86,6 +89,8 @@ class VirtualPorts::Device final : public SerialDevice {
   void SetEventHandler(std::function<void(SerialEvent)> handler) override { handler_ = std::move(handler); }
   bool Exists(std::int32_t number) const override;
   std::string Describe(std::int32_t number) const override;
+  PortHolder Holder(std::int32_t number) const override { return ports_.At(number).holder; }
+  void WatchPorts(std::function<void()> handler) override { watch_ = std::move(handler); }
 
   void Open(std::int32_t number, std::int32_t baud) override;
   void Close() noexcept override;
@@ -98,6 +103,7 @@ class VirtualPorts::Device final : public SerialDevice {
 
   // The adapter was pulled out.
   void Lose();
+  const std::function<void()>& Watch() const { return watch_; }
   bool HasEvent() const { return DataIsDue() || overflowed_ || lost_; }
   // Delivers one event. The owner may do anything in it, also destroy this device.
   void DeliverEvent();
@@ -115,6 +121,7 @@ class VirtualPorts::Device final : public SerialDevice {
 
   VirtualPorts& ports_;
   std::function<void(SerialEvent)> handler_;
+  std::function<void()> watch_;
   std::int32_t receive_threshold_ = 0;
   Port* port_ = nullptr;     // while open and plugged in
   Bytes input_;              // at most kSerialInputBufferBytes
@@ -243,7 +250,12 @@ void VirtualPorts::Device::DeliverEvent() {
 }
 
 VirtualPorts::VirtualPorts(Clock& clock, TimerFactory& timers)
-    : clock_(clock), last_ms_(clock.NowMs()), alarm_(std::make_unique<Alarm>(timers, [this] { Pump(); })) {}
+    : clock_(clock),
+      last_ms_(clock.NowMs()),
+      alarm_(std::make_unique<Alarm>(timers, [this] { Pump(); })),
+      change_timer_(timers.CreateTimer([this] { ReportChange(); })) {
+  change_timer_->SetInterval(kChangeReportMs);
+}
 
 VirtualPorts::~VirtualPorts() = default;
 
@@ -251,6 +263,7 @@ VirtualLine& VirtualPorts::AddPort(std::int32_t number, const VirtualLineOptions
   if (number < 1 || ports_.contains(number)) {
     throw std::invalid_argument("a port number is 1 or more and stands for one port");
   }
+  NoticeChange();
   return ports_.emplace(number, std::make_unique<Port>(options)).first->second->line;
 }
 
@@ -272,7 +285,10 @@ void VirtualPorts::Detach(std::int32_t number, LineUnit& unit) {
   std::erase_if(port.units, [&](const auto& attached) { return attached.get() == &unit; });
 }
 
-void VirtualPorts::SetHeldByAnother(std::int32_t number, bool held) { At(number).held_by_another = held; }
+void VirtualPorts::SetHeldByAnother(std::int32_t number, bool held, const PortHolder& holder) {
+  At(number).held_by_another = held;
+  At(number).holder = holder;
+}
 
 void VirtualPorts::SetAllowed(std::int32_t number, bool allowed) { At(number).allowed = allowed; }
 
@@ -280,9 +296,26 @@ void VirtualPorts::Unplug(std::int32_t number) {
   Port& port = At(number);
   port.plugged_in = false;
   if (port.opener != nullptr) port.opener->Lose();
+  NoticeChange();
 }
 
-void VirtualPorts::Replug(std::int32_t number) { At(number).plugged_in = true; }
+void VirtualPorts::Replug(std::int32_t number) {
+  At(number).plugged_in = true;
+  NoticeChange();
+}
+
+void VirtualPorts::NoticeChange() {
+  const bool watched = std::any_of(devices_.begin(), devices_.end(),
+                                   [](const Device* device) { return device->Watch() != nullptr; });
+  if (watched && !change_timer_->Enabled()) change_timer_->SetEnabled(true);
+}
+
+void VirtualPorts::ReportChange() {
+  change_timer_->SetEnabled(false);
+  for (const Device* device : devices_) {
+    if (device->Watch()) device->Watch()();
+  }
+}
 
 std::unique_ptr<SerialDevice> VirtualPorts::CreateDevice() { return std::make_unique<Device>(*this); }
 

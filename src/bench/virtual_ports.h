@@ -41,8 +41,8 @@ class VirtualPorts {
   // Takes a unit off its line and destroys it.
   void Detach(std::int32_t number, LineUnit& unit);
 
-  // Whether another program holds the port; an opening then fails with kErrPortAlreadyOpen.
-  void SetHeldByAnother(std::int32_t number, bool held);
+  // Whether another program holds the port, and which; an opening then fails with kErrPortAlreadyOpen.
+  void SetHeldByAnother(std::int32_t number, bool held, const PortHolder& holder = {});
   // Whether this user may open the port; else an opening fails with kErrNotAllowed.
   void SetAllowed(std::int32_t number, bool allowed);
   // Pulls the adapter out. A device that has the port open closes itself as soon as the event loop runs.
@@ -59,6 +59,8 @@ class VirtualPorts {
 
   Port& At(std::int32_t number);
   std::uint64_t NowUs();
+  void NoticeChange();
+  void ReportChange();
   void Pump();
   void Schedule();
 
@@ -68,6 +70,7 @@ class VirtualPorts {
   std::map<std::int32_t, std::unique_ptr<Port>> ports_;
   std::vector<Device*> devices_;
   std::unique_ptr<Alarm> alarm_;
+  std::unique_ptr<Timer> change_timer_;  // enabled while a change of the ports is not reported yet
 };
 
 }  // namespace tendril

@@ -125,6 +125,7 @@ void CommListenerInterface::StartConnecting() {
     TCPConnectTimer_->SetEnabled(true);
     TCPCommWinsock_->Connect(remote_address_, remote_port);
     request_outstanding_ = false;
+    EndCommPortControl(PortControl::kUnanswered);
     receive_buffer_.clear();  // may hold half a reply of the old connection
     cli_error_message_.clear();
     tcp_error_message_.clear();
@@ -178,6 +179,7 @@ void CommListenerInterface::Fail(std::int32_t code, const std::string& message, 
   TCPConnectTimer_->SetEnabled(false);
   TCPRequestTimer_->SetEnabled(false);
   request_outstanding_ = false;
+  EndCommPortControl(PortControl::kUnanswered);
   events_.CommError(code, message, tcp_error, tcp_error_message);
   SetConnectedFlag(false);
   if (TCPReconnectTimer_ == nullptr || !Closed())
@@ -226,6 +228,7 @@ void CommListenerInterface::ProcessReply() {
   if (receive_buffer_.size() < frame_size) return;
 
   request_outstanding_ = false;
+  EndCommPortControl(header->identifier == kRefused ? PortControl::kRefused : PortControl::kGranted);
   Bytes payload = std::exchange(receive_buffer_, {});
   payload.resize(frame_size);
   payload.erase(payload.begin(), payload.begin() + kFrameHeaderSize);

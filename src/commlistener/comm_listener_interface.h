@@ -4,6 +4,7 @@
 #include <cstdint>
 #include <deque>
 #include <functional>
+#include <map>
 #include <optional>
 #include <span>
 #include <string>
@@ -26,6 +27,15 @@ enum CLIErrorCode : std::int32_t {
   kCLIRefused = 6,
   kCLIRequestTooLong = 7,  // in the error event only; nothing was sent
   kCLICannotConnect = 8
+};
+
+// What the client knows of a serial port that was requested.
+enum class PortControl {
+  kNone,        // not requested, or given back
+  kAsked,       // requested; the listener has not answered yet
+  kGranted,     // the listener has given it up
+  kRefused,     // the listener has refused
+  kUnanswered,  // the connection ended without an answer
 };
 
 // What the client reports to its owner. A handler must not be empty. It may call the client, except SetEvents().
@@ -88,6 +98,8 @@ class CommListenerInterface {
   // Asks the listener to give up the serial port of this number, or gives it back.
   void RequestCommPortControl(std::uint8_t port);
   void RelinquishCommPortControl(std::uint8_t port);
+  // What became of the last of these for this port.
+  PortControl CommPortControl(std::uint8_t port) const;
   // Whether physical lights are controlled. Setting it notifies the listener.
   bool PhysicalLightsControl() const { return physical_lights_control_; }
   void SetPhysicalLightsControl(bool control);
@@ -161,6 +173,7 @@ class CommListenerInterface {
   template <typename Request>
   void Guarded(const char* failure, Request request);
   void QueueCommPortControl(std::int32_t entry);
+  void EndCommPortControl(PortControl outcome);
   void QueueLighting(LightingRecordType type, std::span<const std::uint8_t> data);
 
   CommListenerEvents events_;
@@ -199,6 +212,9 @@ class CommListenerInterface {
   bool physical_lights_pending_ = false;
   bool physical_lights_control_ = true;
   std::deque<std::int32_t> port_control_queue_;  // port number, plus kGiveBack
+  std::optional<std::int32_t>
+      port_control_outstanding_;                      // an entry of that queue, while it is not acknowledged
+  std::map<std::uint8_t, PortControl> port_control_;  // of the ports that are requested
   LightingQueue lighting_;
 };
 

@@ -90,10 +90,27 @@ void CommListenerInterface::SendAllOffOnDisconnect() {
   });
 }
 
-void CommListenerInterface::RequestCommPortControl(std::uint8_t port) { QueueCommPortControl(port); }
+void CommListenerInterface::RequestCommPortControl(std::uint8_t port) {
+  port_control_[port] = PortControl::kAsked;
+  QueueCommPortControl(port);
+}
 
 void CommListenerInterface::RelinquishCommPortControl(std::uint8_t port) {
+  port_control_.erase(port);
   QueueCommPortControl(port + kGiveBack);
+}
+
+PortControl CommListenerInterface::CommPortControl(std::uint8_t port) const {
+  const auto known = port_control_.find(port);
+  return known != port_control_.end() ? known->second : PortControl::kNone;
+}
+
+// The outstanding request for a port, if there is one, has ended.
+void CommListenerInterface::EndCommPortControl(PortControl outcome) {
+  const auto entry = std::exchange(port_control_outstanding_, std::nullopt);
+  if (!entry || *entry >= kGiveBack) return;
+  const auto known = port_control_.find(static_cast<std::uint8_t>(*entry));
+  if (known != port_control_.end()) known->second = outcome;
 }
 
 void CommListenerInterface::QueueCommPortControl(std::int32_t entry) {
@@ -105,6 +122,7 @@ void CommListenerInterface::SendCommPortControl() {
   Guarded("Error in SendCommPortControl", [this] {
     const std::int32_t entry = port_control_queue_.front();
     port_control_queue_.pop_front();
+    port_control_outstanding_ = entry;
     const std::uint8_t payload[] = {static_cast<std::uint8_t>(entry % kGiveBack),
                                     static_cast<std::uint8_t>(entry >= kGiveBack ? 1 : 0)};
     SendMessage('C', payload);

@@ -10,6 +10,7 @@
 #include <filesystem>
 #include <optional>
 #include <string>
+#include <vector>
 
 namespace tendril {
 
@@ -18,6 +19,9 @@ namespace tendril {
 std::optional<std::filesystem::path> FindSerialDevice(std::int32_t number);
 
 #ifndef _WIN32
+// The folders whose entries decide which devices the ports have. They need not exist.
+std::vector<std::filesystem::path> SerialDeviceFolders();
+
 // The device of port `number` without a link; empty when the number has none. It need not exist.
 std::filesystem::path DefaultSerialDevice(std::int32_t number);
 
@@ -26,7 +30,7 @@ std::filesystem::path DefaultSerialDevice(std::int32_t number);
 bool DriverFoundHardware(const std::filesystem::path& device,
                          const std::filesystem::path& tty_class = "/sys/class/tty");
 
-// The adapter's product name, its maker and the device's path, as far as they are known: "FT232R USB UART, FTDI,
+// The adapter's product name, its maker and the device's path, as far as they are known: "FT232R USB UART (FTDI),
 // /dev/ttyUSB0". `tty_class` as above.
 std::string DescribeSerialDevice(const std::filesystem::path& device,
                                  const std::filesystem::path& tty_class = "/sys/class/tty");

@@ -18,6 +18,14 @@ enum class SerialEvent {
   kDeviceLost        // the device was unplugged; the port is closed; reported once
 };
 
+// A program that may have a port open, as far as the system shows it to this user.
+struct PortHolder {
+  std::string program;       // empty: not known
+  std::int64_t process = 0;  // its number; 0: the program runs, and perhaps has the port open
+
+  friend bool operator==(const PortHolder&, const PortHolder&) = default;
+};
+
 // What users call port `number`.
 inline std::string CommName(std::int32_t number) { return "Comm " + std::to_string(number); }
 
@@ -42,8 +50,15 @@ class SerialDevice {
   virtual bool Exists(std::int32_t number) const = 0;
 
   // The device of port `number`, for the user: its product name and maker, as far as they are known, and its path, as
-  // in "FT232R USB UART, FTDI, /dev/ttyUSB0". Empty when there is none.
+  // in "FT232R USB UART (FTDI), /dev/ttyUSB0". Empty when there is none.
   virtual std::string Describe(std::int32_t number) const = 0;
+
+  // Which other program has port `number` open, where the system reports it.
+  virtual PortHolder Holder(std::int32_t /*number*/) const { return {}; }
+
+  // From now on `handler` is called from the event loop when ports may have come or gone: at most once a second, and
+  // only where the system reports it. nullptr ends that.
+  virtual void WatchPorts(std::function<void()> /*handler*/) {}
 
   // Opens port `number` (1 or more) at `baud` bit/s for this program alone. Raises kErrInvalidPort (no such device),
   // kErrPortAlreadyOpen (another program, or this one, has it), kErrNotAllowed (with the remedy) or

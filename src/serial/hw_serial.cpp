@@ -99,13 +99,14 @@ void HwSerial::OpenPort() {
                                            std::to_string(fault.number()) + ") " + fault.description() +
                                            "\r\nWhile: " + stage);
   }
+  if (port_handler_) port_handler_(true);
 }
 
 void HwSerial::ClosePort() noexcept {
   device_.Close();
   const bool was_open = std::exchange(port_open_, false);
   line_.OnClosed();
-  if (was_open && port_closed_) port_closed_();
+  if (was_open && port_handler_) port_handler_(false);
 }
 
 void HwSerial::OnDeviceEvent(SerialEvent event) {

@@ -55,8 +55,9 @@ class HwSerial {
   PollReplyHandler SetPollReplyHandler(PollReplyHandler handler) {
     return std::exchange(poll_reply_, std::move(handler));
   }
-  // `handler` is called whenever the open port has been closed. It raises nothing and does not use the link.
-  void SetPortClosedHandler(std::function<void()> handler) { port_closed_ = std::move(handler); }
+  // `handler` is called whenever the port has been opened (true) or the open port closed (false). It raises nothing,
+  // and only asks the link.
+  void SetPortHandler(std::function<void(bool open)> handler) { port_handler_ = std::move(handler); }
   // `sink` gets the trace lines while TraceOutput is on.
   void SetTraceSink(std::function<void(const std::string&)> sink) { line_.SetTraceSink(std::move(sink)); }
 
@@ -73,6 +74,10 @@ class HwSerial {
   bool ComPortExists(std::int16_t number) const { return device_.Exists(number); }
   // Which device that is, for the user; empty when it does not exist.
   std::string DescribeComPort(std::int16_t number) const { return device_.Describe(number); }
+  // Which other program has it open, where the system reports that.
+  PortHolder ComPortHolder(std::int16_t number) const { return device_.Holder(number); }
+  // As SerialDevice::WatchPorts().
+  void WatchComPorts(std::function<void()> handler) { device_.WatchPorts(std::move(handler)); }
   // Whether the port is open.
   bool PortOpen() const { return port_open_; }
   // True opens the port with the current settings, and does nothing when it is open with them already or when
@@ -203,7 +208,7 @@ class HwSerial {
   HalfDuplexLine line_;
   std::unique_ptr<Timer> HeartBeatTimer_;
   PollReplyHandler poll_reply_;
-  std::function<void()> port_closed_;
+  std::function<void(bool)> port_handler_;
 
   std::int16_t comm_port_ = 0;
   std::int32_t baud_rate_ = 0;

@@ -3,6 +3,8 @@
 #include <QGroupBox>
 #include <QRadioButton>
 
+#include "ui/list_combo_box.h"
+
 namespace tendril {
 
 ChannelChoices::ChannelChoices(ChannelEditor& editor, const ChannelTable& working)
@@ -50,7 +52,8 @@ std::vector<ChannelChoices::Choice> ChannelChoices::Choices(std::initializer_lis
 
 QWidget* ChannelChoices::MakePresets() {
   auto* frame = new QGroupBox(QStringLiteral("Standard Preset Values"));
-  auto* presets = cmbPresets_ = Named(new CalmComboBox, "cmbPresets");
+  // Enter only opens the list: one slip would overwrite eight channels.
+  auto* presets = cmbPresets_ = Named(new ListComboBox(ListComboBox::Enter::kOpensList), "cmbPresets");
   presets->setAccessibleName(frame->title());
   Describe(presets,
            "Gives all eight channels these values at once: ranges, stops, positions, and "

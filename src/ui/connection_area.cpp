@@ -5,6 +5,8 @@
 #include <QLabel>
 #include <QSignalBlocker>
 
+#include "ui/model/port_sentences.h"
+
 namespace tendril {
 namespace {
 
@@ -13,19 +15,21 @@ constexpr int kDigits = 16;
 constexpr int kFirstId = 0x01;
 constexpr int kLastId = 0xFD;
 constexpr int kLongestPortLine = 7;  // "Comm 25"
+constexpr char kDescription[] = "The serial port that the units are connected to. Choosing it opens it at once.";
 
 }  // namespace
 
 ConnectionArea::ConnectionArea(PortSelection& ports)
-    : ports_(ports), cmbNYX_(Named(new CalmComboBox, "cmbNYX")) {
+    : ports_(ports), cmbNYX_(Named(new ListComboBox(ListComboBox::Enter::kChoosesAgain), "cmbNYX")) {
   auto* port_label = new QLabel(QStringLiteral("&Comm Port"));
   port_label->setBuddy(cmbNYX_);
   cmbNYX_->setSizeAdjustPolicy(QComboBox::AdjustToContents);
   cmbNYX_->setMinimumContentsLength(kLongestPortLine);
   cmbNYX_->setSizePolicy(QSizePolicy::Fixed, QSizePolicy::Fixed);
   cmbNYX_->setAccessibleName(QStringLiteral("Comm Port"));
-  Describe(cmbNYX_, "The serial port that the units are connected to. Choosing it opens it at once.");
-  connect(cmbNYX_, &CalmComboBox::Opening, this, &ConnectionArea::RereadCommPorts);
+  connect(cmbNYX_, &CalmComboBox::Opening, this, &ConnectionArea::DescribePorts);
+  // Queued: a list that closes gives the focus back before it reports what was chosen in it.
+  connect(cmbNYX_, &ListComboBox::FocusArrived, this, &ConnectionArea::RereadCommPorts, Qt::QueuedConnection);
   // The user's own choice, also of the current line; what the program selects does not emit "activated".
   connect(cmbNYX_, &QComboBox::activated, this,
           [this](int line) { ports_.Choose(static_cast<std::size_t>(line)); });
@@ -65,20 +69,32 @@ CalmComboBox* ConnectionArea::MakeDigit(std::size_t index, const char* which) {
 
 void ConnectionArea::ListCommPorts() { ShowPorts(ports_.ListCommPorts(), 0); }
 
+void ConnectionArea::WatchCommPorts() {
+  ports_.WatchPorts([this] { RereadCommPorts(); });
+}
+
 void ConnectionArea::ShowPorts(const std::vector<std::string>& lines, std::size_t selected) {
+  if (lines_ == lines) return;
+  lines_ = lines;
+  const QSignalBlocker nothing_is_chosen(cmbNYX_);
   cmbNYX_->clear();
   for (const std::string& line : lines) cmbNYX_->addItem(QString::fromStdString(line));
   cmbNYX_->setCurrentIndex(static_cast<int>(selected));
+  Describe(cmbNYX_, QString::fromStdString(lines.size() > 1 ? kDescription : PortSentence({.any_listed = false})));
 }
 
-// Finds adapters that were plugged in meanwhile. Describes the ports now, not at start-up: it takes the system a moment
-// for each.
+// Not under the user's hand: when the open list closes, the focus arrives again.
 void ConnectionArea::RereadCommPorts() {
-  const QSignalBlocker nothing_is_chosen(cmbNYX_);
+  if (cmbNYX_->ListOpen()) return;
   auto selected = static_cast<std::size_t>(cmbNYX_->currentIndex());
   const std::vector<std::string> lines = ports_.RereadCommPorts(selected);
   ShowPorts(lines, selected);
-  for (std::size_t entry = 0; entry < lines.size(); ++entry) {
+}
+
+// When the list opens, not at start-up: it takes the system a moment for each port.
+void ConnectionArea::DescribePorts() {
+  RereadCommPorts();
+  for (std::size_t entry = 0; entry < lines_.size(); ++entry) {
     const QString device = QString::fromStdString(ports_.DescribePort(entry));
     for (const int role : {Qt::ToolTipRole, Qt::AccessibleDescriptionRole})
       cmbNYX_->setItemData(static_cast<int>(entry), device, role);

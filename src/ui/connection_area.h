@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "ui/controls.h"
+#include "ui/list_combo_box.h"
 #include "unitops/port_selection.h"
 #include "unitops/unit_target.h"
 
@@ -25,6 +26,8 @@ class ConnectionArea : public QWidget, public UnitTarget {
 
   // Fills the list of comm ports and selects "Select", which opens nothing.
   void ListCommPorts();
+  // From now on the list follows the devices that come and go.
+  void WatchCommPorts();
   // Chooses the next ID (`by` = 1) or the previous one (-1), from 01 to FD; the last one and the first one are neighbours.
   void StepUnitId(int by);
   // Enables the controls. `running_command` is what runs; empty when nothing does.
@@ -40,9 +43,11 @@ class ConnectionArea : public QWidget, public UnitTarget {
   CalmComboBox* MakeDigit(std::size_t index, const char* which);
   void ShowPorts(const std::vector<std::string>& lines, std::size_t selected);
   void RereadCommPorts();
+  void DescribePorts();
 
   PortSelection& ports_;
-  CalmComboBox* cmbNYX_;
+  ListComboBox* cmbNYX_;
+  std::vector<std::string> lines_;  // of the list
   std::array<CalmComboBox*, 2> CmbUnitID_{};  // the high digit, then the low one
 };
 

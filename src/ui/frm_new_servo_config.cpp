@@ -55,7 +55,7 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
 
 frmNewServoConfig::~frmNewServoConfig() {
   hide();  // typed text takes effect now, while all parts of the window exist
-  link_.SetPortClosedHandler(nullptr);
+  link_.SetPortHandler(nullptr);
 }
 
 // Stacks and scroll areas show a widget, and lay it out, as soon as they get it. So they get it empty, and only when

@@ -10,6 +10,7 @@ namespace {
 
 constexpr char kListenerAddress[] = "127.0.0.1";
 constexpr char kClientName[] = "Tendril Utility";
+constexpr std::int32_t kAnswerCheckMs = 1000;
 
 }  // namespace
 
@@ -21,7 +22,10 @@ ControlPanel::ControlPanel(TimerFactory& timers, MessageBoxes& boxes, TcpSocket&
       preferences_(registry),
       tmrCLIConnect_(timers.CreateTimer([this] { client_.OnConnectTimer(); })),
       tmrCLIReconnect_(timers.CreateTimer([this] { client_.OnReconnectTimer(); })),
-      tmrCLIRequest_(timers.CreateTimer([this] { client_.OnRequestTimer(); })) {}
+      tmrCLIRequest_(timers.CreateTimer([this] { client_.OnRequestTimer(); })),
+      answer_timer_(timers.CreateTimer([this] { OnAnswerTimer(); })) {
+  answer_timer_->SetInterval(kAnswerCheckMs);
+}
 
 // The client uses the timers, which are gone before it.
 ControlPanel::~ControlPanel() { client_.PrepareForShutdown(); }
@@ -60,10 +64,23 @@ void ControlPanel::AskControlPanelForPort(std::uint8_t port) {
   if (requested_port_ && *requested_port_ != port) RelinquishPort();
   requested_port_ = port;
   client_.RequestCommPortControl(port);
+  answer_timer_->SetEnabled(true);
+  if (changed_) changed_();
   boxes_.Show(
       {"The Tendril Utility has asked the Control Panel to stop using the port.\r\n\r\n"
        "Try selecting the port again.",
        "Port Control Requested"});
+}
+
+PortControl ControlPanel::RequestState() const {
+  return requested_port_ ? client_.CommPortControl(*requested_port_) : PortControl::kNone;
+}
+
+// Nothing handles the client's events, so its state is read.
+void ControlPanel::OnAnswerTimer() {
+  if (RequestState() == PortControl::kAsked) return;
+  answer_timer_->SetEnabled(false);
+  if (changed_) changed_();
 }
 
 void ControlPanel::RelinquishPort() {

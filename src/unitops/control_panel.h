@@ -3,8 +3,10 @@
 #pragma once
 
 #include <cstdint>
+#include <functional>
 #include <memory>
 #include <optional>
+#include <utility>
 
 #include "commlistener/comm_listener_interface.h"
 #include "platform/message_boxes.h"
@@ -38,20 +40,28 @@ class ControlPanel {
 
   // The port whose control was asked of the Control Panel; nothing when none was.
   std::optional<std::uint8_t> RequestedPort() const { return requested_port_; }
+  // What became of that request.
+  PortControl RequestState() const;
+  // `handler` is called when that has changed: at once for what the user does, and within a second of the answer.
+  void SetChangedHandler(std::function<void()> handler) { changed_ = std::move(handler); }
   // Gives that port back. It counts as requested no longer.
   void RelinquishPort();
 
  private:
+  void OnAnswerTimer();
+
   MessageBoxes& boxes_;
   TcpSocket& wsCLI_;
   const ProcessList& processes_;
   NetworkPreferences preferences_;
   std::optional<std::uint8_t> requested_port_;
+  std::function<void()> changed_;
 
   CommListenerInterface client_;
   std::unique_ptr<Timer> tmrCLIConnect_;
   std::unique_ptr<Timer> tmrCLIReconnect_;
   std::unique_ptr<Timer> tmrCLIRequest_;
+  std::unique_ptr<Timer> answer_timer_;  // looks for the answer while a request has none
 };
 
 }  // namespace tendril

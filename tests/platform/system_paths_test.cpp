@@ -56,7 +56,7 @@ TEST(PortNames, Description_IsTheAdaptersOwnAndNotItsHubs) {
   EXPECT_EQ(DescribeSerialDevice("/dev/ttyUSB0", usb), "/dev/ttyUSB0");
   std::ofstream(adapter / "product") << "USB Serial\n";
   std::ofstream(adapter / "manufacturer") << "Maker\n";
-  EXPECT_EQ(DescribeSerialDevice("/dev/ttyUSB0", usb), "USB Serial, Maker, /dev/ttyUSB0");
+  EXPECT_EQ(DescribeSerialDevice("/dev/ttyUSB0", usb), "USB Serial (Maker), /dev/ttyUSB0");
   EXPECT_EQ(DescribeSerialDevice("/dev/ttyS0", usb), "/dev/ttyS0");
 }
 #endif

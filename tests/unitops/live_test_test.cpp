@@ -58,7 +58,9 @@ class Live : public CommandTest {
  protected:
   Live() {
     on_starting_ = [this] { return test_.MakeWay(); };
-    link_.SetPortClosedHandler([this] { test_.OnPortClosed(); });
+    link_.SetPortHandler([this](bool open) {
+      if (!open) test_.OnPortClosed();
+    });
     choice_.values = working_.At(2);
     world_.bench.Line(1).SetTap([this](const LineByte& byte) { Hear(byte); });
   }
@@ -100,7 +102,7 @@ class Live : public CommandTest {
     test_.OnSliderSends();
   }
 
-  ~Live() override { link_.SetPortClosedHandler(nullptr); }
+  ~Live() override { link_.SetPortHandler(nullptr); }
 
   FakeChoice choice_;
   FakeView view_;

@@ -18,6 +18,8 @@ namespace fs = std::filesystem;
 // The UART type that the serial drivers of Linux report when they found none.
 constexpr int kNoUart = 0;
 
+fs::path PortsFolder() { return ConfigFolder() / "ports"; }
+
 std::string FirstLine(const fs::path& file) {
   std::ifstream stream(file);
   std::string line;
@@ -75,27 +77,26 @@ bool DriverFoundHardware(const fs::path& device, const fs::path& tty_class) {
 }
 
 std::string DescribeSerialDevice(const fs::path& device, const fs::path& tty_class) {
-  std::string description;
-  const auto add = [&description](const std::string& part) {
-    if (!part.empty()) description += (description.empty() ? "" : ", ") + part;
-  };
   // A USB adapter is described in the first folder above its terminal device that has a vendor's number. Further up are
   // the hubs.
   std::error_code error;
   for (fs::path folder = fs::canonical(tty_class / device.filename(), error);
        !error && folder.has_relative_path(); folder = folder.parent_path()) {
     if (!fs::exists(folder / "idVendor", error)) continue;
-    add(FirstLine(folder / "product"));
-    add(FirstLine(folder / "manufacturer"));
-    break;
+    const std::string product = FirstLine(folder / "product");
+    const std::string maker = FirstLine(folder / "manufacturer");
+    std::string adapter = product.empty() ? maker : product;
+    if (!product.empty() && !maker.empty()) adapter += " (" + maker + ")";
+    return adapter.empty() ? device.string() : adapter + ", " + device.string();
   }
-  add(device.string());
-  return description;
+  return device.string();
 }
+
+std::vector<fs::path> SerialDeviceFolders() { return {"/dev", PortsFolder()}; }
 
 std::optional<fs::path> FindSerialDevice(std::int32_t number) {
   std::error_code error;
-  fs::path device = ConfigFolder() / "ports" / ("com" + std::to_string(number));
+  fs::path device = PortsFolder() / ("com" + std::to_string(number));
   if (!fs::exists(fs::symlink_status(device, error))) device = DefaultSerialDevice(number);
   if (device.empty()) return std::nullopt;
 

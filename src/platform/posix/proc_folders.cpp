@@ -19,18 +19,22 @@ bool AnyProcess(const std::function<bool(const fs::path& process)>& matches) {
   return false;
 }
 
-bool OpenInAnotherProcess(const fs::path& device) {
+std::int64_t ProcessWithOpen(const fs::path& device) {
   const std::string self = std::to_string(::getpid());
-  return AnyProcess([&](const fs::path& process) {
+  std::int64_t found = 0;
+  AnyProcess([&](const fs::path& process) {
     if (process.filename() == self) return false;
     std::error_code error;
     for (fs::directory_iterator entry(process / "fd", error), end; !error && entry != end;
          entry.increment(error)) {
       std::error_code closed_meanwhile;
-      if (fs::read_symlink(entry->path(), closed_meanwhile) == device) return true;
+      if (fs::read_symlink(entry->path(), closed_meanwhile) != device) continue;
+      found = std::stoll(process.filename().string());
+      return true;
     }
     return false;
   });
+  return found;
 }
 
 }  // namespace tendril

@@ -74,7 +74,7 @@ int OpenDevice(const fs::path& device) {
 // killed, so it means "in use" only while another program has the device open.
 bool HeldExclusively(const fs::path& device, int own) {
   int exclusive = 0;
-  return ::ioctl(own, TIOCGEXCL, &exclusive) == 0 && exclusive != 0 && OpenInAnotherProcess(device);
+  return ::ioctl(own, TIOCGEXCL, &exclusive) == 0 && exclusive != 0 && ProcessWithOpen(device) != 0;
 }
 #else
 bool HeldExclusively(const fs::path& /*device*/, int /*own*/) { return false; }

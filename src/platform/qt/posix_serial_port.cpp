@@ -2,6 +2,7 @@
 #include <utility>
 
 #include "platform/port_names.h"
+#include "platform/posix/port_holder.h"
 #include "platform/posix/serial_terminal.h"
 #include "platform/qt/system_serial_port.h"
 
@@ -36,5 +37,7 @@ std::unique_ptr<SerialPort> OpenSerialPort(std::int32_t /*number*/, const std::f
 }
 
 std::string DescribeSerialPort(const std::filesystem::path& device) { return DescribeSerialDevice(device); }
+
+PortHolder FindSerialPortHolder(const std::filesystem::path& device) { return FindPortHolder(device); }
 
 }  // namespace tendril

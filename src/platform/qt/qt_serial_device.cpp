@@ -23,7 +23,7 @@ constexpr std::size_t kPieceBytes = 4096;
 }  // namespace
 
 QtSerialDevice::QtSerialDevice(FaultHandler on_fault, std::function<void(const std::string&)> trace)
-    : trace_(std::move(trace)), mailbox_(std::move(on_fault)) {
+    : trace_(std::move(trace)), mailbox_(on_fault), on_fault_(std::move(on_fault)) {
   dead_device_check_.setInterval(kDeadDeviceCheckMs);
   QObject::connect(&dead_device_check_, &QTimer::timeout, &dead_device_check_, [this] { CheckForLoss(); });
 }
@@ -39,6 +39,18 @@ bool QtSerialDevice::Exists(std::int32_t number) const { return FindSerialDevice
 std::string QtSerialDevice::Describe(std::int32_t number) const {
   const auto device = FindSerialDevice(number);
   return device ? DescribeSerialPort(*device) : std::string();
+}
+
+PortHolder QtSerialDevice::Holder(std::int32_t number) const {
+  const auto device = FindSerialDevice(number);
+  return device ? FindSerialPortHolder(*device) : PortHolder();
+}
+
+void QtSerialDevice::WatchPorts(std::function<void()> handler) {
+  watch_.reset();
+  if (!handler) return;
+  watch_ = std::make_unique<PortWatch>(
+      [on_fault = on_fault_, handler = std::move(handler)] { CallGuarded(on_fault, handler); });
 }
 
 void QtSerialDevice::Open(std::int32_t number, std::int32_t baud) {

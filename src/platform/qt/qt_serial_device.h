@@ -11,6 +11,7 @@
 
 #include "platform/bytes.h"
 #include "platform/qt/mailbox.h"
+#include "platform/qt/port_watch.h"
 #include "platform/serial_device.h"
 #include "platform/serial_port.h"
 
@@ -26,6 +27,8 @@ class QtSerialDevice final : public SerialDevice {
   void SetEventHandler(std::function<void(SerialEvent)> handler) override;
   bool Exists(std::int32_t number) const override;
   std::string Describe(std::int32_t number) const override;
+  PortHolder Holder(std::int32_t number) const override;
+  void WatchPorts(std::function<void()> handler) override;
   void Open(std::int32_t number, std::int32_t baud) override;
   void Close() noexcept override;
   void SetReceiveThreshold(std::int32_t bytes) override;
@@ -64,6 +67,8 @@ class QtSerialDevice final : public SerialDevice {
   bool overflow_posted_ = false;
   bool loss_posted_ = false;
   Mailbox mailbox_;
+  FaultHandler on_fault_;
+  std::unique_ptr<PortWatch> watch_;  // null while the ports are not watched
 };
 
 }  // namespace tendril

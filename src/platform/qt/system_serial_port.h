@@ -7,6 +7,7 @@
 #include <memory>
 #include <string>
 
+#include "platform/serial_device.h"
 #include "platform/serial_port.h"
 
 namespace tendril {
@@ -18,7 +19,8 @@ std::unique_ptr<SerialPort> OpenSerialPort(std::int32_t number, const std::files
                                            std::int32_t baud, std::function<void()> on_readable,
                                            std::function<void()> on_writable);
 
-// As SerialDevice::Describe().
+// As SerialDevice::Describe() and SerialDevice::Holder().
 std::string DescribeSerialPort(const std::filesystem::path& device);
+PortHolder FindSerialPortHolder(const std::filesystem::path& device);
 
 }  // namespace tendril

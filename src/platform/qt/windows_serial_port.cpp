@@ -106,9 +106,15 @@ std::unique_ptr<SerialPort> OpenSerialPort(std::int32_t number, const std::files
 
 std::string DescribeSerialPort(const std::filesystem::path& device) {
   const QSerialPortInfo info(QString::fromStdString(device.filename().string()));
-  QStringList parts{info.description(), info.manufacturer(), QString::fromStdString(device.string())};
+  QString adapter = info.description().isEmpty() ? info.manufacturer() : info.description();
+  if (adapter != info.manufacturer() && !info.manufacturer().isEmpty())
+    adapter += QStringLiteral(" (%1)").arg(info.manufacturer());
+  QStringList parts{adapter, QString::fromStdString(device.string())};
   parts.removeAll(QString());
   return parts.join(QStringLiteral(", ")).toStdString();
 }
+
+// An ordinary user's program cannot find out.
+PortHolder FindSerialPortHolder(const std::filesystem::path& /*device*/) { return {}; }
 
 }  // namespace tendril
