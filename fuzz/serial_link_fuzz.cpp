@@ -23,7 +23,7 @@ class Run {
           Check(data.size() <= ReplyParser::kMaxData, "a reply has no more data than the limit");
           if (std::exchange(polls_again_, false)) Try([&] { Poll(unit, 'n'); });
         });
-    link_.SetPortClosedHandler([this] { on_line_ = false; });
+    link_.SetPortHandler([this](bool open) { on_line_ = on_line_ && open; });
     link_.SetCommPort(1);
     link_.SetBaudRate(19200);
   }

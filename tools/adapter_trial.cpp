@@ -69,7 +69,7 @@ int Run(int times) {
 
   const EmptySocket socket;
   int losses = 0, failures = 0;
-  program.Serial1.SetPortClosedHandler([&losses] { ++losses; });
+  program.Serial1.SetPortHandler([&losses](bool open) { losses += open ? 0 : 1; });
   for (int command = 0; command < times; ++command) {
     const bool send = command % 2 == 0;
     user.read.clear();
@@ -82,7 +82,7 @@ int Run(int times) {
     for (const auto& [title, text] : user.read) std::printf("  %s: %s\n", title.c_str(), text.c_str());
     if (!program.Serial1.PortOpen()) user.ChoosePort(1);
   }
-  program.Serial1.SetPortClosedHandler(nullptr);
+  program.Serial1.SetPortHandler(nullptr);
   const auto empty_reads = static_cast<unsigned long long>(Adapter().empty_reads);
   std::printf(
       "%d sends and gets: %d failed, the port was taken for lost %d times; %llu empty reads, %d looks at an "

@@ -15,7 +15,8 @@ constexpr int kDigits = 16;
 constexpr int kFirstId = 0x01;
 constexpr int kLastId = 0xFD;
 constexpr int kLongestPortLine = 7;  // "Comm 25"
-constexpr char kDescription[] = "The serial port that the units are connected to. Choosing it opens it at once.";
+constexpr char kWhatItDoes[] =
+    "The serial port that the units are connected to. Choosing it opens it at once.";
 
 }  // namespace
 
@@ -80,7 +81,8 @@ void ConnectionArea::ShowPorts(const std::vector<std::string>& lines, std::size_
   cmbNYX_->clear();
   for (const std::string& line : lines) cmbNYX_->addItem(QString::fromStdString(line));
   cmbNYX_->setCurrentIndex(static_cast<int>(selected));
-  Describe(cmbNYX_, QString::fromStdString(lines.size() > 1 ? kDescription : PortSentence({.any_listed = false})));
+  Describe(cmbNYX_,
+           QString::fromStdString(lines.size() > 1 ? kWhatItDoes : PortSentence({.any_listed = false})));
 }
 
 // Not under the user's hand: when the open list closes, the focus arrives again.
@@ -113,7 +115,8 @@ void ConnectionArea::StepUnitId(int by) {
 }
 
 void ConnectionArea::EnableControls(const QString& running_command) {
-  for (CalmComboBox* box : {cmbNYX_, CmbUnitID_[0], CmbUnitID_[1]}) EnableUnless(running_command, box);
+  EnableUnless(running_command, cmbNYX_);
+  for (CalmComboBox* digit : CmbUnitID_) EnableUnless(running_command, digit);
 }
 
 bool ConnectionArea::PortChosen() const { return cmbNYX_->currentIndex() > 0; }

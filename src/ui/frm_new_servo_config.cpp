@@ -13,6 +13,7 @@
 #include "ui/appearance.h"
 #include "ui/keys_dialog.h"
 #include "ui/manual.h"
+#include "ui/model/port_sentences.h"
 #include "ui/program_icon.h"
 #include "ui/wrapping_row.h"
 
@@ -148,8 +149,18 @@ void frmNewServoConfig::Connect() {
                      : sentence + QLatin1Char(' ') + std::exchange(outcome_note_, {}));
   });
   commands_.running.SetObserver([this] { ShowRunning(); });
-  link_.SetPortClosedHandler([this] { live_test_.OnPortClosed(); });
+  link_.SetPortHandler([this](bool open) {
+    if (!open) live_test_.OnPortClosed();
+    ports_.OnPort(open);
+  });
+  ports_.SetChangedHandler([this] { ShowPort(); });
   ports_.SetOpeningHandler([this] { live_test_.OnTestButton(LiveTest::kNoButton); });
+}
+
+void frmNewServoConfig::ShowPort() {
+  const PortFacts facts = ports_.Facts();
+  status_->ShowPort(QString::fromStdString(PortSentence(facts)));
+  status_->ShowBorrowed(QString::fromStdString(BorrowedPortSentence(facts)));
 }
 
 void frmNewServoConfig::StartUp() {
@@ -196,6 +207,7 @@ bool frmNewServoConfig::eventFilter(QObject* object, QEvent* event) {
     object->removeEventFilter(this);
     QTimer::singleShot(0, &connections_, [this] {
       MakeSummary();
+      connection_->WatchCommPorts();
       setWindowIcon(ProgramIcon());
     });
   }

@@ -58,6 +58,7 @@ class frmNewServoConfig : public QMainWindow {
   void LayOut();
   void Connect();
   void StartUp();
+  void ShowPort();
   void ChooseChannel(std::size_t channel);
   void SelectChannel(std::size_t channel);
   void ShowEditor();

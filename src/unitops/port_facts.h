@@ -25,10 +25,10 @@ struct PortFacts {
   bool any_listed = true;   // the list has a port
   std::int16_t chosen = 0;  // the line that is selected; 0: "Select"
   std::int16_t open = 0;    // the port that is open; 0: none
-  std::string device;       // of the open port, for the user
+  std::string device = {};  // of the open port, for the user
   PortFault fault = PortFault::kNone;
-  std::string reason;          // in the system's words
-  PortHolder holder;           // kInUse, kControlPanelUsesIt: which program has it open
+  std::string reason = {};     // in the system's words
+  PortHolder holder = {};      // kInUse, kControlPanelUsesIt: which program has it open
   bool back = false;           // kGone: the device is there again
   std::int16_t requested = 0;  // the port that was asked of the Control Panel; 0: none
   PortControl request = PortControl::kNone;

@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 
 #include <QAbstractButton>
+#include <QAbstractItemView>
 #include <QAccessible>
 #include <QApplication>
 #include <QComboBox>
@@ -82,12 +83,14 @@ class Window : public testing::Test {
                       Qt::NoScrollPhase, false);
     QApplication::sendEvent(&widget, &wheel);
   }
-  // Chooses a line of a list with the arrow keys.
+  // Chooses a line of a list with the arrow keys and Enter.
   void ChooseByKeys(const char* list, int line) {
     auto& box = Find<QComboBox>(list);
     box.setFocus();
-    while (box.currentIndex() < line) QTest::keyClick(&box, Qt::Key_Down);
-    while (box.currentIndex() > line) QTest::keyClick(&box, Qt::Key_Up);
+    box.showPopup();
+    while (box.view()->currentIndex().row() < line) QTest::keyClick(box.view(), Qt::Key_Down);
+    while (box.view()->currentIndex().row() > line) QTest::keyClick(box.view(), Qt::Key_Up);
+    QTest::keyClick(box.view(), Qt::Key_Return);
   }
   // Attaches a unit to Comm 1 and chooses that port.
   VirtualUnit& ConnectUnit(std::uint8_t id = 0x01) {

@@ -289,22 +289,15 @@ TEST_F(Window, AccessibleActions_DoWhatClicksDo) {
 
 class WindowAndControlPanel : public Window {
  protected:
-  // Chooses in the opened list, where the current line can be chosen again.
-  void ChooseInOpenedList(int line) {
-    auto& list = Find<QComboBox>("cmbNYX");
-    list.showPopup();
-    list.view()->setCurrentIndex(list.model()->index(line, 0));
-    QTest::keyClick(list.view(), Qt::Key_Return);
-  }
   // Asks for Comm 3 and opens it.
   void TakeComm3() {
     panel_.Take(3);
     world_.boxes.answer_yes = true;
-    ChooseInOpenedList(3);
+    ChooseByKeys("cmbNYX", 3);
     ASSERT_EQ(world_.boxes.Take().size(), 2u);
     ASSERT_FALSE(link_.PortOpen());
     world_.time.Advance(10);
-    ChooseInOpenedList(3);
+    ChooseByKeys("cmbNYX", 3);
     ASSERT_TRUE(link_.PortOpen());
   }
 };
@@ -350,7 +343,7 @@ TEST_F(WindowAndControlPanel, OpenedList_ShowsNewPortsAndTheirDevices) {
   EXPECT_EQ(list.itemData(5, Qt::ToolTipRole).toString().toStdString(), "Virtual serial line 9");
   EXPECT_EQ(link_.CommPort(), 2);
   list.hidePopup();
-  ChooseInOpenedList(5);
+  ChooseByKeys("cmbNYX", 5);
   EXPECT_EQ(link_.CommPort(), 9);
 }
 
