@@ -307,5 +307,20 @@ TEST_F(SerialDeviceTest, EventHandler_MayDestroyTheDeviceAndFail) {
   EXPECT_THAT(faults_, ElementsAre("parser broke"));
 }
 
+// A burst of changes is one report.
+TEST_F(SerialDeviceTest, WatchedPorts_AreReportedWhenOneComes) {
+  int reports = 0;
+  bool there = false;
+  device_->WatchPorts([&] {
+    ++reports;
+    there = device_->Exists(8);
+  });
+  for (const int number : {6, 7, 8}) LinkPort(number, line_.path());
+  EXPECT_TRUE(WaitFor([&] { return reports > 0; }));
+  RunFor(100);
+  EXPECT_EQ(reports, 1);
+  EXPECT_TRUE(there);
+}
+
 }  // namespace
 }  // namespace tendril::test

@@ -3,9 +3,11 @@
 #include <gmock/gmock.h>
 #include <grp.h>
 #include <sys/ioctl.h>
+#include <sys/prctl.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
 
+#include "platform/posix/port_holder.h"
 #include "platform/pseudo_terminal.h"
 #include "platform/runtime_error.h"
 
@@ -61,6 +63,22 @@ TEST(SerialHold, NotAllowedText_SaysWhatHelpsAndNothingElse) {
               AllOf(HasSubstr("\"root\""), Not(HasSubstr("sudo"))));
   EXPECT_THAT(ExplainNotAllowed({"/dev/ttyUSB0", "dialout", false, "anna", false}),
               AllOf(HasSubstr("\"dialout\""), Not(HasSubstr("sudo"))));
+}
+
+TEST(PortHolder, IsAnotherProgramWithTheDeviceOpen) {
+  const PseudoTerminal line;  // which this program has open
+  EXPECT_EQ(FindPortHolder(line.path()).process, 0);
+  const pid_t child = ::fork();
+  if (child == 0) {
+    ::prctl(PR_SET_NAME, "other program");
+    ::kill(::getpid(), SIGSTOP);
+    ::_exit(0);
+  }
+  ::waitpid(child, nullptr, WUNTRACED);
+  EXPECT_EQ(FindPortHolder(line.path()), (PortHolder{"other program", child}));
+  ::kill(child, SIGKILL);
+  ::waitpid(child, nullptr, 0);
+  EXPECT_EQ(FindPortHolder(line.path()).process, 0);
 }
 
 }  // namespace

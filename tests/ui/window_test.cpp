@@ -8,7 +8,6 @@
 #include <QSlider>
 #include <vector>
 
-#include "bench/faulty_units.h"
 #include "ui/sign.h"
 #include "window_fixture.h"
 
@@ -285,66 +284,6 @@ TEST_F(Window, AccessibleActions_DoWhatClicksDo) {
   world_.time.Advance(20);
   act(Accessible("txtSumStopRange_4"));
   EXPECT_EQ(Text("lblDisplay"), "Channel 5 Stops");
-}
-
-class WindowAndControlPanel : public Window {
- protected:
-  // Asks for Comm 3 and opens it.
-  void TakeComm3() {
-    panel_.Take(3);
-    world_.boxes.answer_yes = true;
-    ChooseByKeys("cmbNYX", 3);
-    ASSERT_EQ(world_.boxes.Take().size(), 2u);
-    ASSERT_FALSE(link_.PortOpen());
-    world_.time.Advance(10);
-    ChooseByKeys("cmbNYX", 3);
-    ASSERT_TRUE(link_.PortOpen());
-  }
-};
-
-TEST_F(WindowAndControlPanel, PortThatItHolds_IsTakenAndGivenBackOnClosing) {
-  const Bytes identification = panel_.panel.requests().front().payload;
-  EXPECT_EQ(std::string(identification.begin(), identification.end()), "Tendril Utility");
-  TakeComm3();
-  world_.bench.Attach<MuteUnit>(3, std::uint8_t{0x01});
-  Click("Command3_0");
-  world_.time.Advance(150);
-
-  panel_.panel.SetPortHandler([this](std::uint8_t, bool held) {
-    EXPECT_FALSE(held && link_.PortOpen()) << "given back before it is closed";
-  });
-  EXPECT_FALSE(window_->close());
-  QTest::keyClick(&Find("cmbNYX"), Qt::Key_Up);
-  EXPECT_FALSE(link_.PortOpen());
-  EXPECT_THAT(panel_.PortRequests(), ElementsAre("3:0", "3:1"));
-  EXPECT_TRUE(panel_.panel.Holds(3));
-  world_.time.Advance(99);
-  EXPECT_TRUE(window_->isVisible());
-  world_.time.Advance(1);
-  EXPECT_FALSE(window_->isVisible());
-  world_.time.Advance(60000);
-  EXPECT_THAT(world_.boxes.shown, IsEmpty());
-}
-
-TEST_F(WindowAndControlPanel, SecondCloseRequest_ClosesAtOnce) {
-  TakeComm3();
-  EXPECT_FALSE(window_->close());
-  EXPECT_TRUE(window_->close());
-  EXPECT_EQ(panel_.PortRequests().back(), "3:1");
-}
-
-TEST_F(WindowAndControlPanel, OpenedList_ShowsNewPortsAndTheirDevices) {
-  ChooseByKeys("cmbNYX", 2);
-  world_.bench.AddPort(9);
-  auto& list = Find<QComboBox>("cmbNYX");
-  list.showPopup();
-  EXPECT_EQ(list.count(), 6);
-  EXPECT_EQ(list.currentText().toStdString(), "Comm 2");
-  EXPECT_EQ(list.itemData(5, Qt::ToolTipRole).toString().toStdString(), "Virtual serial line 9");
-  EXPECT_EQ(link_.CommPort(), 2);
-  list.hidePopup();
-  ChooseByKeys("cmbNYX", 5);
-  EXPECT_EQ(link_.CommPort(), 9);
 }
 
 }  // namespace
