@@ -14,7 +14,6 @@
 namespace tendril::test {
 namespace {
 
-using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
 
