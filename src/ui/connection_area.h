@@ -47,7 +47,7 @@ class ConnectionArea : public QWidget, public UnitTarget {
 
   PortSelection& ports_;
   ListComboBox* cmbNYX_;
-  std::vector<std::string> lines_;  // of the list
+  std::vector<std::string> lines_;            // of the list
   std::array<CalmComboBox*, 2> CmbUnitID_{};  // the high digit, then the low one
 };
 
