@@ -48,10 +48,11 @@ void ApplyBoxes::OnClicked(std::size_t index, bool ticked) {
   Q_EMIT Applied();
 }
 
-void ApplyBoxes::ShowEditing(bool editing) {
-  const QString why_not =
-      editing ? QString() : QStringLiteral("In the summary each change goes to its own channel alone.");
-  for (QLabel* label : lblUpdateNum_) label->setEnabled(editing);
+void ApplyBoxes::EnableControls(const QString& running_command, bool summary_shown) {
+  const QString why_not = running_command.isEmpty() && summary_shown
+                              ? QStringLiteral("In the summary each change goes to its own channel alone.")
+                              : running_command;
+  for (QLabel* label : lblUpdateNum_) label->setEnabled(why_not.isEmpty());
   for (QCheckBox* box : chkUpdate_) EnableUnless(why_not, box);
 }
 

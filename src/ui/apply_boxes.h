@@ -4,6 +4,7 @@
 #include <QCheckBox>
 #include <QGroupBox>
 #include <QLabel>
+#include <QString>
 #include <array>
 #include <cstddef>
 
@@ -23,8 +24,9 @@ class ApplyBoxes : public QGroupBox {
 
   // Shows which boxes are ticked.
   void ShowTicks();
-  // Enables the boxes while the editor is shown.
-  void ShowEditing(bool editing);
+  // Enables the boxes while no command runs and the summary is not shown. `running_command` is what runs; empty when
+  // nothing does.
+  void EnableControls(const QString& running_command, bool summary_shown);
 
  Q_SIGNALS:
   // A click has changed the records of the ticked channels.

@@ -92,8 +92,19 @@ void ChannelChoices::ShowChoices() {
   CheckOnly(*optChannelType_, record.PortType + 1);
   CheckOnly(*optPowerUp_, record.PowerUPOpt);
   CheckOnly(*optLostComm_, record.LostCommOption);
-  const QString why_not =
-      channel ? QString() : QStringLiteral("Choose a channel first: click a servo, or Ctrl+1.");
+  EnableOptions();
+}
+
+void ChannelChoices::EnableControls(const QString& running_command) {
+  running_command_ = running_command;
+  EnableUnless(running_command, cmbPresets_);
+  EnableOptions();
+}
+
+void ChannelChoices::EnableOptions() {
+  const QString why_not = running_command_.isEmpty() && !editor_.Channel()
+                              ? QStringLiteral("Choose a channel first: click a servo, or Ctrl+1.")
+                              : running_command_;
   for (const QButtonGroup* group : {optChannelType_, optPowerUp_, optLostComm_}) {
     for (QAbstractButton* option : group->buttons()) EnableUnless(why_not, option);
   }

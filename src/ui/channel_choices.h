@@ -3,6 +3,7 @@
 
 #include <QBoxLayout>
 #include <QButtonGroup>
+#include <QString>
 #include <QWidget>
 #include <cstddef>
 #include <cstdint>
@@ -26,6 +27,8 @@ class ChannelChoices : public QWidget {
   void ShowPreset(std::size_t preset) { cmbPresets_->setCurrentIndex(static_cast<int>(preset)); }
   // Checks what the edited channel's record holds; nothing for unknown values, or while no channel is edited.
   void ShowChoices();
+  // Enables presets and choices. `running_command` is what runs; empty when nothing does.
+  void EnableControls(const QString& running_command);
 
  Q_SIGNALS:
   // The user chose an output kind, 0 to 2.
@@ -43,11 +46,13 @@ class ChannelChoices : public QWidget {
 
   static std::vector<Choice> Choices(std::initializer_list<const char*> captions, const char* when);
   QWidget* MakePresets();
+  void EnableOptions();
   QButtonGroup* AddOptions(const QString& title, const char* array, const std::vector<Choice>& choices,
                            QBoxLayout::Direction direction);
 
   ChannelEditor& editor_;
   const ChannelTable& working_;
+  QString running_command_;
   CalmComboBox* cmbPresets_ = nullptr;
   // The buttons' ids are the record's values; those of the output kind are one more.
   QButtonGroup* optChannelType_;

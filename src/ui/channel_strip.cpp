@@ -54,6 +54,12 @@ void ChannelStrip::ShowSelected(std::size_t channel) {
   Reveal(*cells_[channel]);  // a key may have chosen it
 }
 
+// A choice stores the values of the channel that was chosen before.
+void ChannelStrip::EnableControls(const QString& running_command) {
+  for (ServoSimulator* simulator : ServoSimulator2_) EnableUnless(running_command, simulator);
+  for (OutputButton* output : cmdDigitalOutput_) EnableUnless(running_command, output);
+}
+
 void ChannelStrip::ShowKinds() {
   for (std::size_t channel = 0; channel < kPortCount; ++channel) ShowKind(channel);
 }

@@ -3,6 +3,7 @@
 
 #include <QGroupBox>
 #include <QStackedWidget>
+#include <QString>
 #include <array>
 #include <cstddef>
 
@@ -26,6 +27,8 @@ class ChannelStrip : public QGroupBox {
   void ShowKinds();
   // Shows the record of `channel`, with the arm at `arm`.
   void UpdateSimulator(std::size_t channel, Microseconds arm);
+  // Enables the choice of a channel. `running_command` is what runs; empty when nothing does.
+  void EnableControls(const QString& running_command);
   // Moves the arm alone.
   void MoveArm(std::size_t channel, Microseconds arm);
 

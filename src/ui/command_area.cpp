@@ -54,17 +54,16 @@ CommandArea::CommandArea()
   row->addLayout(files);
 }
 
-void CommandArea::EnableCommands(const QString& running_command, std::uint8_t unit_id) {
+void CommandArea::EnableCommands(const QString& running_command, std::uint8_t unit_id, bool summary_shown) {
   EnableUnless(running_command, cmdSend_);
   EnableUnless(running_command, cmdGet_);
   EnableUnless(running_command.isEmpty() && unit_id == 0
                    ? QStringLiteral("A unit cannot have the ID 00: nothing could ever find it again.")
                    : running_command,
                cmdChangeId_);
-}
-
-void CommandArea::ShowSummaryButton(bool enabled) {
-  EnableUnless(enabled ? QString() : QStringLiteral("The summary is shown. \"Simulator\" goes back."),
+  EnableUnless(running_command.isEmpty() && summary_shown
+                   ? QStringLiteral("The summary is shown. \"Simulator\" goes back.")
+                   : running_command,
                cmdShowSummary_);
 }
 

@@ -18,10 +18,9 @@ class CommandArea : public QWidget {
  public:
   CommandArea();
 
-  // Enables the unit commands. `running_command` is what runs; empty when nothing does. `unit_id` is the chosen one.
-  void EnableCommands(const QString& running_command, std::uint8_t unit_id);
-  // Enables "Summary" while the summary is not shown.
-  void ShowSummaryButton(bool enabled);
+  // Enables the unit commands, and "Summary" while the summary is not shown. `running_command` is what runs; empty when
+  // nothing does. `unit_id` is the chosen one.
+  void EnableCommands(const QString& running_command, std::uint8_t unit_id, bool summary_shown);
 
  Q_SIGNALS:
   void SendPressed();

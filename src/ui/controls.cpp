@@ -136,8 +136,10 @@ void PopUp::OpenBeside(const QWidget& widget, int right, int below) {
 }
 
 void Describe(QWidget* widget, QAnyStringView what_it_does) {
+  const bool gives_reason =
+      widget->toolTip() != widget->property(kDescription).toString();  // see EnableUnless()
   widget->setProperty(kDescription, what_it_does.toString());
-  widget->setToolTip(what_it_does.toString());
+  if (!gives_reason) widget->setToolTip(what_it_does.toString());
 }
 
 void EnableUnless(const QString& why_not, QWidget* widget) {

@@ -117,7 +117,8 @@ Layout* AddLayout(QWidget* parent, const QMargins& margins, int spacing = -1) {
   return layout;
 }
 
-// Sets what the control does, as its tool tip and for assistive technology.
+// Sets what the control does, as its tool tip and for assistive technology. While EnableUnless() disables it, the
+// reason stays.
 void Describe(QWidget* widget, QAnyStringView what_it_does);
 
 // Enables the control when `why_not` is empty. Otherwise disables it, and its tool tip gives the reason in the place

@@ -37,11 +37,7 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
       ports_(link, boxes, control_panel),
       actuals_(new ActualsFrame(timers, *this)),
       commands_(link, timers, boxes, *progress_, *connection_, config_.Records(),
-                {.starting =
-                     [this] {
-                       CommitTyping();
-                       return live_test_.MakeWay();
-                     },
+                {.starting = [this] { return MakeWayForCommand(); },
                  .replaced = [this](std::uint8_t unit) { OnRead(unit); },
                  .sent = [this](std::uint8_t unit) { OnSent(unit); }}),
       live_test_(link, timers, boxes, commands_.running, *connection_, *servo_, *live_test_area_,
@@ -143,12 +139,9 @@ void frmNewServoConfig::Connect() {
     OpenManual(boxes_);
   });
   connect(menu_, &MainMenu::AboutChosen, c, [this] { ShowAbout(*this, info_); });
-  connect(progress_, &ProgressArea::Said, c, [this](const QString& sentence) {
-    status_->Say(commands_.running.Active() || outcome_note_.isEmpty()
-                     ? sentence
-                     : sentence + QLatin1Char(' ') + std::exchange(outcome_note_, {}));
-  });
-  commands_.running.SetObserver([this] { ShowRunning(); });
+  connect(progress_, &ProgressArea::CancelPressed, c, [this] { commands_.Cancel(); });
+  commands_.running.SetObserver([this] { OnRunning(); });
+  commands_.running.SetReporter([this](const CommandReport& report) { OnReport(report); });
   link_.SetPortHandler([this](bool open) {
     if (!open) live_test_.OnPortClosed();
     ports_.OnPort(open);
@@ -172,32 +165,29 @@ void frmNewServoConfig::StartUp() {
   ShowOrigin();
 }
 
-void frmNewServoConfig::ShowRunning() {
+void frmNewServoConfig::OnRunning() {
   const RunningCommand& running = commands_.running;
   if (running.Operation() == &commands_.send) readings_.SendBegins(connection_->UnitId());
-  // Disabling a button moves its focus on to some servo or button, and scrolls there. So the focus rests on the window
-  // while a command runs, and then goes back unless the user has moved it.
-  if (running.Active()) {
-    focus_before_command_ = focusWidget();
-    setFocus();
-  }
-  EnableControls();
-  if (!focus_before_command_) return;
-  if (running.Active()) {
-    if (focus_before_command_->isEnabled()) focus_before_command_->setFocus();
-    focus_in_command_ = focusWidget();
-  } else if (focusWidget() == focus_in_command_) {
-    focus_before_command_->setFocus();
-  }
+  command_focus_.Follow(running.Active(), [this] { EnableControls(); });
 }
 
 void frmNewServoConfig::EnableControls() {
-  const QString running_command = QString::fromStdString(commands_.running.What());
+  const RunningCommand& running = commands_.running;
+  const QString running_command = QString::fromStdString(running.What());
   connection_->EnableControls(running_command);
-  command_area_->EnableCommands(running_command, connection_->UnitId());
+  command_area_->EnableCommands(running_command, connection_->UnitId(), SummaryShown());
   live_test_area_->EnableControls(running_command);
-  menu_->EnableIdSteps(running_command.isEmpty() && !live_test_area_->Moves());
-  if (summary_ != nullptr) summary_->EnableCommands(running_command);
+  apply_boxes_->EnableControls(running_command, SummaryShown());
+  channels_->EnableControls(running_command);
+  parameters_->EnableEditing(running_command);
+  choices_->EnableControls(running_command);
+  if (summary_ != nullptr) summary_->EnableControls(running_command);
+  menu_->EnableIdSteps(!running.Active() && !live_test_area_->Moves());
+  menu_->ShowView(SummaryShown(), running.Active());
+  progress_->EnableCancel(!running.Active() ? QStringLiteral("No command runs.")
+                          : running.Cancelled()
+                              ? QStringLiteral("The command ends with the unit's last reply.")
+                              : QString());
   ShowUndo();
 }
 

@@ -19,6 +19,7 @@
 #include "ui/channel_strip.h"
 #include "ui/chosen_servo.h"
 #include "ui/command_area.h"
+#include "ui/command_focus.h"
 #include "ui/connection_area.h"
 #include "ui/live_test_area.h"
 #include "ui/main_menu.h"
@@ -71,6 +72,8 @@ class frmNewServoConfig : public QMainWindow {
   void OnReplaced(const QString& what);
   void OnRead(std::uint8_t unit);
   void OnSent(std::uint8_t unit);
+  void OnRunning();
+  void OnReport(const CommandReport& report);
   void RestoreReading();
   void NoteStep(const QString& what, bool goes_on = false);
   void ShowOrigin();
@@ -79,12 +82,12 @@ class frmNewServoConfig : public QMainWindow {
   void Redo();
   void ShowRestored(const QString& said);
   void CommitTyping();
+  bool MakeWayForCommand();
   void MakeSummary();
   void ShowSummary();
   void OnSummaryScreen();
   void ShowConfig();
   bool SummaryShown() const;
-  void ShowRunning();
   void EnableControls();
 
   HwSerial& link_;
@@ -117,9 +120,7 @@ class frmNewServoConfig : public QMainWindow {
   UnitCommands commands_;
   Simulators simulators_{*channels_, *servo_, parameters_->Scale(), config_.Editor()};
   LiveTest live_test_;
-  // Where the focus was when the running command began, and where it went when its button was disabled.
-  QPointer<QWidget> focus_before_command_;
-  QPointer<QWidget> focus_in_command_;
+  CommandFocus command_focus_{*this};
   QPointer<QWidget> focus_before_summary_;
 
   std::unique_ptr<Timer> tmrSummaryScreen_;

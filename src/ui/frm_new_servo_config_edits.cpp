@@ -2,6 +2,7 @@
 #include <QAbstractSpinBox>
 #include <QGuiApplication>
 #include <QTime>
+#include <utility>
 
 #include "platform/hex_text.h"
 #include "ui/freeze.h"
@@ -130,6 +131,13 @@ void frmNewServoConfig::OnSent(std::uint8_t unit) {
     outcome_note_ = QStringLiteral("What it held before is not known: it was not read.");
 }
 
+void frmNewServoConfig::OnReport(const CommandReport& report) {
+  QString sentence = QString::fromStdString(report.Sentence(TimeOfDay()));
+  if (!report.outcome.empty() && !outcome_note_.isEmpty())
+    sentence += QLatin1Char(' ') + std::exchange(outcome_note_, {});
+  status_->Say(sentence);
+}
+
 void frmNewServoConfig::RestoreReading() {
   const std::uint8_t unit = connection_->UnitId();
   const Readings::Reading* reading = readings_.WayBack(unit);
@@ -198,6 +206,14 @@ void frmNewServoConfig::CommitTyping() {
   if (auto* spin = qobject_cast<QAbstractSpinBox*>(focusWidget())) spin->interpretText();
 }
 
+// A command is about to start: until it ends, nothing changes the records.
+bool frmNewServoConfig::MakeWayForCommand() {
+  CommitTyping();
+  if (tmrSummaryScreen_->Enabled()) OnSummaryScreen();
+  if (summary_ != nullptr) summary_->CloseNumberEntry();
+  return live_test_.MakeWay();
+}
+
 void frmNewServoConfig::ShowSummary() {
   CommitTyping();
   live_test_.OnTestButton(LiveTest::kNoButton);
@@ -208,16 +224,13 @@ void frmNewServoConfig::ShowSummary() {
 
 void frmNewServoConfig::OnSummaryScreen() {
   tmrSummaryScreen_->SetEnabled(false);
-  // While a command runs the focus rests on the window.
-  focus_before_summary_ = focusWidget() == this ? focus_before_command_.data() : focusWidget();
+  focus_before_summary_ = focusWidget();
   actuals_->hide();
   summary_->NormaliseAndShowRecords();
   config_.Editor().ReloadChannel();
   live_test_.OnRecordsReplaced();  // the records may have changed
   views_->setCurrentWidget(summary_);
-  command_area_->ShowSummaryButton(false);
-  menu_->ShowView(true);
-  apply_boxes_->ShowEditing(false);
+  EnableControls();
   summary_->TakeFocus();
   status_->Say(QStringLiteral("Summary of all eight channels"));
   ShowRemarks();
@@ -228,9 +241,7 @@ void frmNewServoConfig::ShowConfig() {
   CommitTyping();
   summary_->CloseNumberEntry();
   views_->setCurrentIndex(0);
-  command_area_->ShowSummaryButton(true);
-  menu_->ShowView(false);
-  apply_boxes_->ShowEditing(true);
+  EnableControls();
   if (focus_before_summary_) focus_before_summary_->setFocus();
   status_->Say(QStringLiteral("Simulator"));
   OnReplaced({});  // the summary has changed the records

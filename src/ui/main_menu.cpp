@@ -24,6 +24,7 @@ constexpr std::array<ControlItem, 2> kTargetItems{
 constexpr std::array<ControlItem, 2> kCommandItems{
     {{"&SEND(write) Configuration", "Ctrl+Return", "Command3_0"},
      {"&GET(read) Configuration", "Ctrl+G", "Command3_1"}}};
+constexpr ControlItem kCancelItem{"&Cancel Command", "", "cmdCancel"};
 constexpr ControlItem kChangeIdItem{"UPDATE Unit_ID", "", "Command3_2"};
 constexpr std::array<ControlItem, 2> kFileItems{
     {{"Export Config", "", "cmdWriteConfig"}, {"Import Config", "", "cmdReadConfig"}}};
@@ -68,7 +69,7 @@ MainMenu::MainMenu(QWidget& window) {
   AddEditMenu(window);
   AddViewMenu(window);
   AddHelpMenu();
-  ShowView(false);
+  ShowView(false, false);
 }
 
 void MainMenu::AddUnitMenu(QWidget& window) {
@@ -78,6 +79,7 @@ void MainMenu::AddUnitMenu(QWidget& window) {
                AddItem(menu, "P&revious Unit ID", "Ctrl+PgDown", this, [this] { Q_EMIT IdStepped(-1); })};
   menu.addSeparator();
   for (const ControlItem& item : kCommandItems) AddItem(menu, window, item);
+  AddItem(menu, window, kCancelItem);
   restore_ = AddItem(menu, "", "", this, &MainMenu::RestoreChosen);
   ShowWayBack(false, {});
   menu.addSeparator();
@@ -139,10 +141,10 @@ void MainMenu::changeEvent(QEvent* event) {
   if (event->type() == QEvent::PaletteChange && dark_ != nullptr) dark_->setChecked(DarkAppearance());
 }
 
-void MainMenu::ShowView(bool summary) {
+void MainMenu::ShowView(bool summary, bool command_runs) {
   simulator_->setEnabled(summary);
-  // In the summary a choice would store the editor's older values over an edited row.
-  for (QAction* channel : channels_) channel->setEnabled(!summary);
+  // A choice stores the editor's values: in the summary over an edited row, and in a send over what is sent.
+  for (QAction* channel : channels_) channel->setEnabled(!summary && !command_runs);
 }
 
 void MainMenu::ShowUndo(bool may_undo, const QString& undo, bool may_redo, const QString& redo) {

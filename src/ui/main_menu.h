@@ -19,8 +19,8 @@ class MainMenu : public QMenuBar {
   // `window` has all controls of the simulator view already; it must outlive the menu.
   explicit MainMenu(QWidget& window);
 
-  // Enables what only the shown view has.
-  void ShowView(bool summary);
+  // Enables what the shown view has, and no choice of a channel while a command runs.
+  void ShowView(bool summary, bool command_runs);
   // Names the steps that undo and redo would go; each is enabled when it may be gone.
   void ShowUndo(bool may_undo, const QString& undo, bool may_redo, const QString& redo);
   // Names the reading that can be restored ("Unit 01 Held at 14:02"), and enables it when it may be.

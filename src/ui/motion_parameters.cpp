@@ -221,6 +221,10 @@ void MotionParameters::ShowTestRunning(int button, bool running) {
           .arg(QString::fromUtf8(kTests[i].what)));
 }
 
+void MotionParameters::EnableEditing(const QString& why_not) {
+  for (CalmSpinBox* spin : spins_) EnableUnless(why_not, spin);
+}
+
 void MotionParameters::EnableTests(const QString& why_not) {
   for (QPushButton* test : cmdTest_) EnableUnless(why_not, test);
 }

@@ -35,6 +35,8 @@ class MotionParameters : public QGroupBox {
   void ShowTestRunning(int button, bool running);
   // The scale, for its arm.
   PulseScale& Scale() { return *scale_; }
+  // Enables the spin buttons unless there is a reason not to.
+  void EnableEditing(const QString& why_not);
   // Enables the test buttons unless there is a reason not to.
   void EnableTests(const QString& why_not);
 

@@ -44,7 +44,8 @@ ProgressArea::ProgressArea()
       ShapeProgress_(Named(new QWidget(pctProgress_), "ShapeProgress")),
       field_(new QWidget),
       sign_(new Sign(SignKind::kRunning)),
-      lblProgress_(Named(BoldLabel(), "lblProgress")) {
+      lblProgress_(Named(BoldLabel(), "lblProgress")),
+      cmdCancel_(Named(new QPushButton(QStringLiteral("Cancel")), "cmdCancel")) {
   setObjectName("frmProgress");
   pctProgress_->setFixedHeight(kBarHeight);
   pctProgress_->setAutoFillBackground(true);
@@ -57,16 +58,19 @@ ProgressArea::ProgressArea()
   outcome->addWidget(sign_);
   outcome->addWidget(lblProgress_, 1);
 
-  auto* column = AddLayout<QVBoxLayout>(this, {9, 0, 9, 3}, 2);
+  Describe(
+      cmdCancel_,
+      "Ends the command when the unit's outstanding reply is there, or its absence is certain. (Escape)");
+  connect(cmdCancel_, &QAbstractButton::clicked, this, &ProgressArea::CancelPressed);
+
+  auto* row = AddLayout<QHBoxLayout>(this, {9, 0, 9, 3});
+  auto* column = new QVBoxLayout;
+  column->setSpacing(2);
   column->addWidget(field_);
   column->addWidget(pctProgress_);
+  row->addLayout(column, 1);
+  row->addWidget(cmdCancel_);
   ApplyColour();
-}
-
-void ProgressArea::SetTitle(const std::string& title) {
-  what_ = QString::fromStdString(title);
-  setTitle(what_);
-  Q_EMIT Said(what_);
 }
 
 void ProgressArea::SharePlace(QStackedLayout& place, QWidget* other) {
@@ -84,9 +88,10 @@ void ProgressArea::SetColour(ProgressColour colour) {
   ApplyColour();
 }
 
-void ProgressArea::SetText(const std::string& text) {
-  lblProgress_->setText(QString::fromStdString(text));
-  if (!text.empty()) Q_EMIT Said(what_ + QStringLiteral(": ") + lblProgress_->text());
+// The disabled button would pass the focus on to some other control.
+void ProgressArea::EnableCancel(const QString& why_not) {
+  if (!why_not.isEmpty() && cmdCancel_->hasFocus()) window()->setFocus();
+  EnableUnless(why_not, cmdCancel_);
 }
 
 void ProgressArea::changeEvent(QEvent* event) {

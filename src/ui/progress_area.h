@@ -3,6 +3,7 @@
 
 #include <QGroupBox>
 #include <QLabel>
+#include <QPushButton>
 #include <QStackedLayout>
 #include <QWidget>
 
@@ -25,15 +26,14 @@ class ProgressArea : public QGroupBox, public CommandProgressView {
   void ShowProgress(bool shown) override;
   int FrameWidth() const override { return pctProgress_->width(); }
   void SetBarWidth(int width) override;
-  // The title stays until the next command.
-  void SetTitle(const std::string& title) override;
-  void ShowStep(const std::string& step) override { setTitle(QString::fromStdString(step)); }
+  void SetTitle(const std::string& title) override { setTitle(QString::fromStdString(title)); }
   void SetColour(ProgressColour colour) override;
-  void SetText(const std::string& text) override;
+  void SetText(const std::string& text) override { lblProgress_->setText(QString::fromStdString(text)); }
+  // Enables the button that cancels the command unless there is a reason not to.
+  void EnableCancel(const QString& why_not);
 
  Q_SIGNALS:
-  // What runs, how it ended, or where it stopped: a sentence to be read out.
-  void Said(const QString& sentence);
+  void CancelPressed();
 
  protected:
   void changeEvent(QEvent* event) override;
@@ -47,7 +47,7 @@ class ProgressArea : public QGroupBox, public CommandProgressView {
   QWidget* field_;          // the outcome, with its sign
   Sign* sign_;
   QLabel* lblProgress_;
-  QString what_;  // what runs, or where it stopped
+  QPushButton* cmdCancel_;
   ProgressColour colour_ = ProgressColour::kBlue;
 };
 

@@ -228,9 +228,15 @@ void SummaryArea::AddOptions(QGridLayout& table, std::size_t channel, const QStr
   });
 }
 
-void SummaryArea::EnableCommands(const QString& running_command) {
+void SummaryArea::EnableControls(const QString& running_command) {
   EnableUnless(running_command, cmdSend_);
   EnableUnless(running_command, cmdGet_);
+  for (const Row& row : rows_) {
+    for (PressableText* text : row.texts) EnableUnless(running_command, text);
+    for (const QButtonGroup* group : {row.power_up, row.lost_comm}) {
+      for (QAbstractButton* option : group->buttons()) EnableUnless(running_command, option);
+    }
+  }
 }
 
 void SummaryArea::NormaliseAndShowRecords() {

@@ -36,8 +36,8 @@ class SummaryArea : public QWidget {
   void NormaliseAndShowRecords();
   // Shows remarks on the records.
   void ShowRemarks(const std::vector<std::string>& sentences) { remarks_->ShowRemarks(sentences); }
-  // Enables the unit commands. `running_command` is what runs; empty when nothing does.
-  void EnableCommands(const QString& running_command);
+  // Enables the unit commands, and what changes records. `running_command` is what runs; empty when nothing does.
+  void EnableControls(const QString& running_command);
   // Gives the focus to the first value, if there is one.
   void TakeFocus();
   // Closes the number entry, if it is open.

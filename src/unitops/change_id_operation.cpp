@@ -18,11 +18,17 @@ constexpr std::int32_t kMaxStagePolls = 15;
 ChangeIdOperation::ChangeIdOperation(CommandContext& context)
     : UnitOperation(context, "*+", {}), tmrChangeAddr_(MakeTimer(kChangeAddrMs, [this] { OnTick(); })) {}
 
+std::string ChangeIdOperation::Prepare() {
+  new_id_ = UnitId();
+  stage_ = Stage::kFinding;
+  perhaps_changed_ = false;
+  return "Giving the unit the ID " + HexByte(new_id_);
+}
+
 void ChangeIdOperation::Begin() {
-  const std::uint8_t new_id = UnitId();
-  StartChangeAddress(kAllUnits, new_id);
-  Run("Giving the unit the ID " + HexByte(new_id));
-  ShowStep("Giving the unit the ID " + HexByte(new_id) + ": looking for it");
+  StartChangeAddress(kAllUnits, new_id_);
+  Run();
+  ShowStep("looking for it");
 }
 
 void ChangeIdOperation::StartChangeAddress(std::uint8_t old_id, std::uint8_t new_id) {
@@ -46,8 +52,8 @@ void ChangeIdOperation::OnTick() {
         stage_ = Stage::kConfirming;
         attempts_ = 0;
         reply_seen_ = false;
-        Link().cmdSetAddress(old_id_, new_id_, false);
-        ShowStep("Giving the unit the ID " + HexByte(new_id_) + ": asking whether it has it");
+        SendUnlocked(perhaps_changed_, [&] { Link().cmdSetAddress(old_id_, new_id_, false); });
+        ShowStep("asking whether it has it");
       } else if (MayPollAgain()) {
         Link().cmdPollStation(old_id_, kFindPoll);
       } else {
@@ -70,7 +76,7 @@ void ChangeIdOperation::OnTick() {
 }
 
 std::string ChangeIdOperation::Aftermath() const {
-  if (stage_ == Stage::kFinding) return "No ID has changed.";
+  if (!perhaps_changed_) return "No ID has changed.";
   const std::string id = HexByte(new_id_);
   return reply_seen_ ? "The unit answers at " + id + "." : "The unit may be at " + id + " already.";
 }

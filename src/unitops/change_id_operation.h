@@ -21,10 +21,12 @@ class ChangeIdOperation final : public UnitOperation {
   // The context must outlive the operation.
   explicit ChangeIdOperation(CommandContext& context);
 
-  // Opens the port if needed and enables the timer. Raises what the opening raises.
+  // Begins to give `new_id` to the unit at `old_id`: opens the port if needed and enables the timer. Raises what the
+  // opening raises.
   void StartChangeAddress(std::uint8_t old_id, std::uint8_t new_id);
 
  protected:
+  std::string Prepare() override;
   void Begin() override;
   void OnReply(bool replied, std::uint8_t unit, const Bytes& data) override;
   void OnLastReply(bool replied, const Bytes& data) override { OnReply(replied, new_id_, data); }
@@ -41,6 +43,7 @@ class ChangeIdOperation final : public UnitOperation {
   std::uint8_t old_id_ = 0;
   std::uint8_t new_id_ = 0;
   Stage stage_ = Stage::kFinding;
+  bool perhaps_changed_ = false;
   std::int32_t attempts_ = 0;  // polls made in the current stage
   bool reply_seen_ = false;    // whether the last poll was answered; a new poll does not clear it
 };

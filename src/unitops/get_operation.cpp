@@ -21,20 +21,23 @@ GetOperation::GetOperation(CommandContext& context, ChannelTable& working,
                            std::function<void(std::uint8_t unit)> on_replaced)
     : UnitOperation(context, "n", "Upload Failed"), working_(working), on_replaced_(std::move(on_replaced)) {}
 
-void GetOperation::Begin() {
+std::string GetOperation::Prepare() {
   for (std::size_t slot = 0; slot < kPortCount; ++slot) read_back_.At(slot).Received = false;
   repeats_ = 0;
-  const std::uint8_t unit = UnitId();
-  if (!Link().cmdPollStation(unit, kConfigurationPoll)) {
-    return Show(SendError("Error Uploading Configuration, Please retry"));
-  }
-  Run("Reading the configuration of unit " + HexByte(unit));
-  ShowProgress(unit);
+  replaced_ = false;
+  return "Reading unit " + HexByte(UnitId());
 }
 
-void GetOperation::ShowProgress(std::uint8_t unit) {
-  ShowStep("Reading unit " + HexByte(unit) + ": " + std::to_string(ReceivedPorts()) + " of " +
-           std::to_string(kPortCount) + " ports");
+void GetOperation::Begin() {
+  if (!Link().cmdPollStation(UnitId(), kConfigurationPoll)) {
+    return Refuse(SendError("Error Uploading Configuration, Please retry"));
+  }
+  Run();
+  ShowProgress();
+}
+
+void GetOperation::ShowProgress() {
+  ShowStep(std::to_string(ReceivedPorts()) + " of " + std::to_string(kPortCount) + " ports");
 }
 
 void GetOperation::OnReply(bool replied, std::uint8_t unit, const Bytes& data) {
@@ -46,7 +49,7 @@ void GetOperation::OnReply(bool replied, std::uint8_t unit, const Bytes& data) {
     }
     read_back_.At(static_cast<std::size_t>(slot)) =
         DecodeOptions(std::span(data).subspan<1, kOptionByteCount>());
-    ShowProgress(unit);
+    ShowProgress();
   }
   if (ReceivedPorts() == kPortCount) {
     ReplaceWorkingConfiguration(unit);
@@ -66,7 +69,7 @@ std::size_t GetOperation::ReceivedPorts() const {
 }
 
 std::string GetOperation::Aftermath() const {
-  return "Nothing has changed: the configuration shown here is the one from before.";
+  return replaced_ ? "Ports 1 to 8 are read." : "Nothing has changed.";
 }
 
 void GetOperation::ReplaceWorkingConfiguration(std::uint8_t unit) {
@@ -76,6 +79,7 @@ void GetOperation::ReplaceWorkingConfiguration(std::uint8_t unit) {
     record = read_back_.At(slot);
     record.Received = received;
   }
+  replaced_ = true;
   if (on_replaced_) on_replaced_(unit);
 }
 

@@ -30,18 +30,20 @@ class GetOperation final : public UnitOperation {
                std::function<void(std::uint8_t unit)> on_replaced);
 
  protected:
+  std::string Prepare() override;
   void Begin() override;
   void OnReply(bool replied, std::uint8_t unit, const Bytes& data) override;
   std::string Aftermath() const override;
 
  private:
   std::size_t ReceivedPorts() const;
-  void ShowProgress(std::uint8_t unit);
+  void ShowProgress();
   void ReplaceWorkingConfiguration(std::uint8_t unit);
 
   ChannelTable& working_;
   std::function<void(std::uint8_t)> on_replaced_;
   ChannelTable read_back_;
+  bool replaced_ = false;
   std::int16_t repeats_ = 0;  // polls after the first
 };
 

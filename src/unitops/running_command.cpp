@@ -15,7 +15,7 @@ RunningCommand::RunningCommand(TimerFactory& timers, CommandProgressView& view)
 void RunningCommand::StartCommandProgress(UnitOperation& operation, std::string what) {
   operation_ = &operation;
   what_ = std::move(what);
-  aftermath_.clear();
+  cancelled_ = false;
   value_ = kStep;
   if (observer_) observer_();
   view_.SetText("");
@@ -25,23 +25,42 @@ void RunningCommand::StartCommandProgress(UnitOperation& operation, std::string 
   view_.ShowProgress(true);
   tmrProgress_->SetInterval(kGrowPeriodMs);
   tmrProgress_->SetEnabled(true);
+  Report({what_, {}, {}});
 }
 
-void RunningCommand::EndCommandProgress(Outcome outcome, const std::string& text) {
+void RunningCommand::SetCancelled() {
+  cancelled_ = true;
+  view_.SetTitle("Cancelling: waiting for the unit's last reply");
+  if (observer_) observer_();
+}
+
+void RunningCommand::EndCommandProgress(Outcome outcome, const std::string& text, std::string aftermath) {
+  const std::string what = what_;
+  if (cancelled_) view_.SetTitle(what + ": cancelled");
   Stop();
   view_.SetColour(outcome == Outcome::kSuccess ? ProgressColour::kGreen : ProgressColour::kRed);
   view_.SetText(text);
   value_ = kEnded;
   tmrProgress_->SetInterval(kShowOutcomeMs);
   tmrProgress_->SetEnabled(true);
+  Report({what, (cancelled_ ? "Cancelled: " : "") + text, std::move(aftermath)});
 }
 
-void RunningCommand::Stop(const std::string& where) {
+void RunningCommand::Stop() {
   if (!Active()) return;
   operation_ = nullptr;
   what_.clear();
-  if (!where.empty()) view_.SetTitle(where);
   if (observer_) observer_();
+}
+
+void RunningCommand::StopAt(const CommandReport& report) {
+  if (Active()) view_.SetTitle(report.outcome);
+  Stop();
+  Report(report);
+}
+
+void RunningCommand::Report(const CommandReport& report) {
+  if (reporter_) reporter_(report);
 }
 
 void RunningCommand::OnTick() {

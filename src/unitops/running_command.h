@@ -8,6 +8,7 @@
 #include <utility>
 
 #include "platform/timer.h"
+#include "unitops/command_report.h"
 
 namespace tendril {
 
@@ -28,9 +29,8 @@ class CommandProgressView {
   virtual int FrameWidth() const = 0;
   // Draws the bar `width` wide, which may be a little more than the frame.
   virtual void SetBarWidth(int width) = 0;
-  // Sets the frame's title: what runs, or where it stopped. ShowStep() replaces it by how far it is.
+  // Sets the frame's title: what runs and how far it is, or where it stopped. It stays until the next one.
   virtual void SetTitle(const std::string& title) = 0;
-  virtual void ShowStep(const std::string& step) = 0;
   // Colours bar and label.
   virtual void SetColour(ProgressColour colour) = 0;
   // Sets the label; empty for none.
@@ -44,40 +44,45 @@ class RunningCommand {
   // `view` must outlive it.
   RunningCommand(TimerFactory& timers, CommandProgressView& view);
 
-  // `observer` is called after each start and each end.
+  // `observer` is called after each start, each end, and when a command has been cancelled and still runs.
   void SetObserver(std::function<void()> observer) { observer_ = std::move(observer); }
+  // `reporter` is called when a command has begun, and when it has ended or could not begin; not when the window closes.
+  void SetReporter(std::function<void(const CommandReport&)> reporter) { reporter_ = std::move(reporter); }
 
   // The command that runs; nullptr when none does.
   UnitOperation* Operation() const { return operation_; }
   // Whether a command runs.
   bool Active() const { return operation_ != nullptr; }
-  // What runs, for a tool tip ("Sending the configuration to unit 01"); empty when nothing does.
+  // What runs, for a tool tip ("Sending to unit 01"); empty when nothing does.
   const std::string& What() const { return what_; }
-  // How the last command left the unit or the configuration when it did not succeed ("Unit 01: port 1 is written, 2
-  // perhaps, 3 to 8 are not."); otherwise empty. Meaningful while no command runs.
-  const std::string& Aftermath() const { return aftermath_; }
+  // Whether the last command, which may still run, was cancelled.
+  bool Cancelled() const { return cancelled_; }
 
   // `operation` runs from now on: shows the empty bar and lets it grow. `what` as above.
   void StartCommandProgress(UnitOperation& operation, std::string what);
-  // Says how far the command is ("Sending to unit 01: port 3 of 8").
-  void ShowStep(const std::string& step) { view_.ShowStep(step); }
-  // To be called before the command ends.
-  void SetAftermath(std::string sentence) { aftermath_ = std::move(sentence); }
-  // Ends the command and shows `text` in green or red for three seconds.
-  void EndCommandProgress(Outcome outcome, const std::string& text);
-  // Ends the command, if one runs, and leaves the display as it is. `where` becomes its title ("Stopped: channel 3:
-  // 305 to 2695 cannot be sent"), if it is not empty.
-  void Stop(const std::string& where = {});
+  // Shows how far the command is ("port 3 of 8").
+  void ShowStep(const std::string& step) { view_.SetTitle(what_ + ": " + step); }
+  // The user has cancelled the command, which runs until its outstanding poll has ended.
+  void SetCancelled();
+  // Ends the command and shows `text` in green or red for three seconds. `aftermath`: see CommandReport.
+  void EndCommandProgress(Outcome outcome, const std::string& text, std::string aftermath);
+  // Ends the command, if one runs, and leaves the display as it is.
+  void Stop();
+  // The same for a command that stops without an outcome of its own, or that could not begin. While it runs, the
+  // report's outcome becomes the title ("Stopped: channel 3: 305 to 2695 cannot be sent").
+  void StopAt(const CommandReport& report);
 
  private:
   void OnTick();
+  void Report(const CommandReport& report);
 
   CommandProgressView& view_;
   std::unique_ptr<Timer> tmrProgress_;
   std::function<void()> observer_;
+  std::function<void(const CommandReport&)> reporter_;
   UnitOperation* operation_ = nullptr;
   std::string what_;
-  std::string aftermath_;
+  bool cancelled_ = false;
   std::int32_t value_ = kEnded;  // the bar's width; kEnded while an outcome is shown, or nothing
 
   static constexpr std::int32_t kEnded = -1;

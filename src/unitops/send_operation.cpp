@@ -26,22 +26,20 @@ SendOperation::SendOperation(CommandContext& context, const ChannelTable& workin
       on_sent_(std::move(on_sent)),
       tmrDownload_(MakeTimer(kNextPortMs, [this] { OnNextPort(); })) {}
 
-void SendOperation::Begin() {
+std::string SendOperation::Prepare() {
   port_index_ = 0;
   unanswered_ = 0;
   written_ = 0;
   perhaps_written_ = false;
   unit_ = UnitId();
-  if (!EncodeAndSendPort(port_index_)) return;
-  perhaps_written_ = true;
-  if (!Link().cmdPollStation(unit_, kAcknowledgePoll)) return Show(SendError(kCannotPoll));
-  Run("Sending the configuration to unit " + HexByte(unit_));
-  ShowPort();
+  return "Sending to unit " + HexByte(unit_);
 }
 
-void SendOperation::ShowPort() {
-  ShowStep("Sending to unit " + HexByte(unit_) + ": port " + std::to_string(port_index_ + 1) + " of " +
-           std::to_string(kPortCount));
+void SendOperation::Begin() {
+  if (!EncodeAndSendPort(port_index_)) return;
+  if (!Link().cmdPollStation(unit_, kAcknowledgePoll)) return Refuse(SendError(kCannotPoll));
+  Run();
+  ShowPort();
 }
 
 void SendOperation::OnReply(bool replied, std::uint8_t unit, const Bytes& data) {
@@ -74,7 +72,6 @@ void SendOperation::OnNextPort() {
     return Succeed("SUCCESS: Send Complete!");
   }
   if (!EncodeAndSendPort(port_index_)) return;
-  perhaps_written_ = true;
   ShowPort();
   if (!Link().cmdPollStation(UnitId(), kAcknowledgePoll)) Fail(SendError(kCannotPoll));
 }
@@ -87,8 +84,10 @@ bool SendOperation::EncodeAndSendPort(std::uint8_t port_index) {
     return false;
   }
   const auto& options = std::get<OptionBytes>(encoded);
-  Link().cmdSetManyOptions(UnitId(), 0, kOptionServoPort, static_cast<std::uint8_t>(port_index + 1),
-                           options[0], options[1], options[2], std::span(options).subspan(3));
+  SendUnlocked(perhaps_written_, [&] {
+    Link().cmdSetManyOptions(UnitId(), 0, kOptionServoPort, static_cast<std::uint8_t>(port_index + 1),
+                             options[0], options[1], options[2], std::span(options).subspan(3));
+  });
   return true;
 }
 
@@ -98,13 +97,13 @@ std::string SendOperation::Aftermath() const {
   };
   const std::int32_t count = static_cast<std::int32_t>(kPortCount);
   const std::int32_t untouched = written_ + (perhaps_written_ ? 2 : 1);  // the first one
-  std::string text = "Unit " + HexByte(unit_) + ": ";
-  if (written_ == 0 && !perhaps_written_) return text + "nothing is written.";
+  std::string text;
+  if (written_ == 0 && !perhaps_written_) return "Nothing is written.";
   if (written_ > 0)
-    text += std::string(written_ == 1 ? "port " : "ports ") + ports(1, written_) +
+    text += std::string(written_ == 1 ? "Port " : "Ports ") + ports(1, written_) +
             (written_ == 1 ? " is" : " are") + " written";
   if (perhaps_written_)
-    text += written_ == 0 ? "port 1 is perhaps written" : ", " + std::to_string(written_ + 1) + " perhaps";
+    text += written_ == 0 ? "Port 1 is perhaps written" : ", " + std::to_string(written_ + 1) + " perhaps";
   if (untouched <= count)
     text += ", " + ports(untouched, count) + (untouched == count ? " is" : " are") + " not";
   return text + ".";

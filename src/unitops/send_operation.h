@@ -32,6 +32,7 @@ class SendOperation final : public UnitOperation {
   bool EncodeAndSendPort(std::uint8_t port_index);
 
  protected:
+  std::string Prepare() override;
   void Begin() override;
   void OnReply(bool replied, std::uint8_t unit, const Bytes& data) override;
   void OnLastReply(bool replied, const Bytes& data) override;
@@ -39,7 +40,9 @@ class SendOperation final : public UnitOperation {
 
  private:
   void OnNextPort();
-  void ShowPort();
+  void ShowPort() {
+    ShowStep("port " + std::to_string(port_index_ + 1) + " of " + std::to_string(kPortCount));
+  }
 
   const ChannelTable& working_;
   std::function<void(std::uint8_t)> on_sent_;
@@ -47,7 +50,7 @@ class SendOperation final : public UnitOperation {
   std::uint8_t unit_ = 0;
   std::uint8_t port_index_ = 0;
   std::int32_t written_ = 0;      // ports whose options the unit has accepted
-  bool perhaps_written_ = false;  // the next port's options went out
+  bool perhaps_written_ = false;  // the next port's options may have gone out
   std::int32_t unanswered_ = 0;   // polls of the current port without a reply
 };
 

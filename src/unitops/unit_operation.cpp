@@ -1,8 +1,14 @@
 #include "unitops/unit_operation.h"
 
 #include "platform/runtime_error.h"
+#include "serial/packets.h"
 
 namespace tendril {
+namespace {
+
+constexpr char kStopped[] = "Stopped";
+
+}  // namespace
 
 void ShowCommError(MessageBoxes& boxes, const std::string& failure, const std::string& description) {
   boxes.Show(
@@ -14,10 +20,13 @@ UnitOperation::UnitOperation(CommandContext& context, std::string_view poll_kind
 
 void UnitOperation::Start() {
   if (!MayStart()) return;
+  what_ = Prepare();
   try {
     Begin();
   } catch (...) {
-    ShowCommError(context_.boxes, fault_text_, DescribeCurrentFault());
+    const std::string fault = DescribeCurrentFault();
+    StopAt(kStopped);
+    ShowCommError(context_.boxes, fault_text_, fault);
   }
 }
 
@@ -34,7 +43,7 @@ bool UnitOperation::MayStart() const {
 void UnitOperation::OnPollReply(bool replied, std::uint8_t unit, std::uint8_t kind, const Bytes& data) {
   if (poll_kinds_.find(static_cast<char>(kind)) == std::string_view::npos) return;
   try {
-    if (cancelled_) {
+    if (context_.running.Cancelled()) {
       OnLastReply(replied, data);
       return Abort();
     }
@@ -48,7 +57,7 @@ void UnitOperation::OnPollReply(bool replied, std::uint8_t unit, std::uint8_t ki
 Timer& UnitOperation::MakeTimer(std::int32_t interval_ms, std::function<void()> on_tick) {
   timer_ = context_.timers.CreateTimer([this, on_tick = std::move(on_tick)] {
     try {
-      if (!cancelled_) {
+      if (!context_.running.Cancelled()) {
         on_tick();
       } else if (!Link().PollOutstanding()) {
         Abort();
@@ -63,19 +72,24 @@ Timer& UnitOperation::MakeTimer(std::int32_t interval_ms, std::function<void()> 
   return *timer_;
 }
 
-void UnitOperation::Run(std::string what) {
-  cancelled_ = false;
-  context_.running.StartCommandProgress(*this, std::move(what));
+void UnitOperation::Refuse(const BoxMessage& box) {
+  StopAt(kStopped);
+  Show(box);
+}
+
+void UnitOperation::Stop() {
+  StopTimer();
+  context_.running.Stop();
 }
 
 void UnitOperation::Cancel() {
-  cancelled_ = true;
+  context_.running.SetCancelled();
   if (!Link().PollOutstanding()) Abort();
 }
 
 void UnitOperation::Succeed(const std::string& text) {
   StopTimer();
-  context_.running.EndCommandProgress(Outcome::kSuccess, text);
+  context_.running.EndCommandProgress(Outcome::kSuccess, text, Aftermath());
 }
 
 void UnitOperation::Fail(const BoxMessage& box) {
@@ -85,14 +99,24 @@ void UnitOperation::Fail(const BoxMessage& box) {
 
 void UnitOperation::StopAt(const std::string& where) {
   StopTimer();
-  context_.running.SetAftermath(Aftermath());
-  context_.running.Stop(where);
+  context_.running.StopAt({what_, where, Aftermath()});
 }
 
 void UnitOperation::Abort() {
   StopTimer();
-  context_.running.SetAftermath(Aftermath());
-  context_.running.EndCommandProgress(Outcome::kFailure, "COMMAND FAILED!");
+  context_.running.EndCommandProgress(Outcome::kFailure, "COMMAND FAILED!", Aftermath());
+}
+
+void UnitOperation::SendUnlocked(bool& perhaps, const std::function<void()>& command) {
+  // The link counts a packet when it tries to write it, as one byte less.
+  const double with_unlock = Link().SentByteCount() + static_cast<double>(UnlockPacket(kAllUnits).size()) - 1;
+  try {
+    command();
+    perhaps = true;
+  } catch (...) {
+    perhaps = Link().SentByteCount() > with_unlock;
+    throw;
+  }
 }
 
 void UnitOperation::StopTimer() {

@@ -47,7 +47,7 @@ class UnitOperation {
   // raises none.
   void Start();
   // Ends the operation where it is and shows nothing: the window is closing.
-  void Stop() { StopAt({}); }
+  void Stop();
   // Ends the operation at the user's wish, as failed and without a box: at once, or when the outstanding poll has ended.
   void Cancel();
 
@@ -60,29 +60,39 @@ class UnitOperation {
   // shows a fault of Begin() or a tick; empty for none.
   UnitOperation(CommandContext& context, std::string_view poll_kinds, std::string fault_text);
 
-  // Sends the first packets and calls Run(); or shows why it cannot. May raise.
+  // Sets the operation back to its beginning, for the unit that is chosen now. Returns what it does: see
+  // RunningCommand::What().
+  virtual std::string Prepare() = 0;
+  // Sends the first packets and calls Run(); or calls Refuse() or StopAt(). May raise.
   virtual void Begin() = 0;
   // The reply to a poll of the operation's own kinds. May raise.
   virtual void OnReply(bool replied, std::uint8_t unit, const Bytes& data) = 0;
 
   // The reply to the poll that was outstanding at Cancel(). Nothing follows it.
   virtual void OnLastReply(bool /*replied*/, const Bytes& /*data*/) {}
-  // How the unit or the configuration is left when the operation ends now without success: a sentence.
+  // How the unit or the configuration is left when the operation ends now: a sentence. Valid from Prepare() on.
   virtual std::string Aftermath() const = 0;
 
   // The operation's timer, at most one: disabled, and disabled again when the operation ends. `on_tick` may raise.
   Timer& MakeTimer(std::int32_t interval_ms, std::function<void()> on_tick);
 
-  // The operation runs from now on. `what`: see RunningCommand::What().
-  void Run(std::string what);
+  // The operation runs from now on.
+  void Run() { context_.running.StartCommandProgress(*this, what_); }
+  // The operation cannot begin: shows `box`.
+  void Refuse(const BoxMessage& box);
   // See RunningCommand::ShowStep().
   void ShowStep(const std::string& step) { context_.running.ShowStep(step); }
   // Ends the operation and shows `text` in the progress display.
   void Succeed(const std::string& text);
   // Ends the operation as failed and shows `box`.
   void Fail(const BoxMessage& box);
-  // Ends the operation without an outcome. `where`: see RunningCommand::Stop().
+  // Ends the operation without an outcome in the progress display, or before it has begun. `where`: see
+  // RunningCommand::StopAt().
   void StopAt(const std::string& where);
+
+  // Runs `command`, which sends one configuration command after its unlock, and may raise. Sets `perhaps` to whether
+  // the unit may have got it.
+  void SendUnlocked(bool& perhaps, const std::function<void()>& command);
 
   HwSerial& Link() const { return context_.link; }
   // The unit ID that is chosen now.
@@ -102,7 +112,7 @@ class UnitOperation {
   CommandContext& context_;
   std::string_view poll_kinds_;
   std::string fault_text_;
-  bool cancelled_ = false;
+  std::string what_;
   std::unique_ptr<Timer> timer_;  // nullptr when the operation has none
 };
 

@@ -8,9 +8,8 @@ namespace tendril::test {
 namespace {
 
 constexpr char kTitle[] = "Kelvane Tendril Utility v" TENDRIL_VERSION;
-constexpr char kSending[] = "notification Sending the configuration to unit 01";
-const std::string kSent =
-    std::string(kSending) + ": SUCCESS: Send Complete! What it held before is not known: it was not read.";
+constexpr char kSending[] = "notification Sending to unit 01";
+constexpr char kSent[] = "SUCCESS: Send Complete! Ports 1 to 8 are written.";
 
 // From the start to the outcome of a send. Returns what was heard from the send on.
 std::vector<std::string> Send() {
@@ -32,17 +31,18 @@ std::vector<std::string> Send() {
   EXPECT_TRUE(reader.Hears("focused SEND(write) Configuration"));
   reader.heard.clear();
   reader.Act(send);
-  EXPECT_TRUE(reader.Hears(std::string(kSending) + ": "));
+  EXPECT_TRUE(reader.Hears(std::string(kSending) + " at "));
   return reader.heard;
 }
 
 TEST(ScreenReader, Configuration_IsSentByActionsAlone) {
   std::vector<std::string> heard = Send();
   // Units and window share a thread: on a slow computer the line may be released too late for a reply.
-  for (int again = 0; again < 6 && !HasFailure() && heard.back() != kSent; ++again) heard = Send();
+  for (int again = 0; again < 6 && !HasFailure() && heard.back().find(kSent) == std::string::npos; ++again)
+    heard = Send();
   // The focus rests on the window meanwhile.
   EXPECT_THAT(heard, testing::ElementsAre(std::string("focused ") + kTitle, kSending,
-                                          "focused SEND(write) Configuration", kSent));
+                                          "focused SEND(write) Configuration", testing::HasSubstr(kSent)));
 }
 
 }  // namespace

@@ -12,7 +12,6 @@ struct RecordedProgress final : public CommandProgressView {
   int FrameWidth() const override { return frame_width; }
   void SetBarWidth(int width) override { bar_width = width; }
   void SetTitle(const std::string& now_title) override { title = now_title; }
-  void ShowStep(const std::string& step) override { title = step; }
   void SetColour(ProgressColour now_colour) override { colour = now_colour; }
   void SetText(const std::string& now_text) override { text = now_text; }
 

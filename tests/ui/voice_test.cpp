@@ -15,13 +15,13 @@ std::string Copied() { return QGuiApplication::clipboard()->text().toStdString()
 TEST_F(Window, StatusLine_SaysTheOutcomeAndCanBeCopied) {
   ConnectUnit();
   Click("Command3_0");
-  EXPECT_EQ(Text("lblStatus"), "Sending the configuration to unit 01");
+  EXPECT_EQ(Text("lblStatus"), "Sending to unit 01");
   RunToTheEnd();
   window_->findChild<StatusLine*>()->Copy();
-  EXPECT_EQ(Copied(),
-            "Sending the configuration to unit 01: SUCCESS: Send Complete! What it held before is not known: "
-            "it was "
-            "not read.");
+  EXPECT_THAT(Copied(),
+              testing::MatchesRegex(
+                  "Sending to unit 01 at [0-9][0-9]:[0-9][0-9]: SUCCESS: Send Complete! Ports 1 to 8 are "
+                  "written. What it held before is not known: it was not read."));
   EXPECT_EQ(Accessible("lblStatus").text(QAccessible::Name).toStdString(), Copied());
   EXPECT_EQ(Accessible("lblStatus").role(), QAccessible::Notification);
 }

@@ -82,7 +82,7 @@ TEST_F(Window, Send_ByMouse_WritesTheRecordsIntoTheUnit) {
   for (const char* busy : {"cmbNYX", "CmbUnitID_0", "CmbUnitID_1", "Command3_0", "Command3_2", "cmdTest_0",
                            "HScrollSendServoPosition"}) {
     EXPECT_FALSE(Find(busy).isEnabled()) << busy;
-    EXPECT_EQ(ToolTip(busy), "Sending the configuration to unit 0A") << busy;
+    EXPECT_EQ(ToolTip(busy), "Sending to unit 0A") << busy;
   }
   world_.time.Advance(150);
   EXPECT_GT(Find("ShapeProgress").width(), 50);
@@ -110,9 +110,9 @@ TEST_F(Window, Send_ByKeyboardAlone_LeavesTheFocusWhereItWas) {
   // It stays where the user moves it meanwhile.
   Find<QLabel>("lblProgress").clear();
   Key(Qt::Key_Space);
-  Find("ServoSimulator2_3").setFocus();
+  Find("chkSendSlideCommands").setFocus();
   RunToTheEnd();
-  EXPECT_EQ(QApplication::focusWidget(), &Find("ServoSimulator2_3"));
+  EXPECT_EQ(QApplication::focusWidget(), &Find("chkSendSlideCommands"));
 }
 
 TEST_F(Window, Get_ShowsThePortsOfTheUnit) {

@@ -44,6 +44,7 @@ class CommandTest : public testing::Test {
     link_.SetBaudRate(19200);
     for (std::size_t slot = 0; slot < kPortCount; ++slot)
       SetFromPreset(kPresets[kStartPreset], working_.At(slot));
+    commands_.running.SetReporter([this](const CommandReport& report) { said_ = report.Sentence("14:05"); });
     // A box runs the event loop: the command has ended and shows it before one opens.
     world_.boxes.while_open = [this] {
       settled_at_the_box_ = !commands_.running.Active() && progress_.colour == ProgressColour::kRed;
@@ -91,6 +92,7 @@ class CommandTest : public testing::Test {
   HwSerial link_{*world_.device, world_.time, world_.time, world_.log};
   RecordedProgress progress_;
   bool settled_at_the_box_ = false;
+  std::string said_;  // the last report
   ChosenTarget target_;
   ChannelTable working_;
   std::function<bool()> on_starting_ = [] { return true; };

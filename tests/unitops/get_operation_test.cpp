@@ -32,7 +32,7 @@ TEST_F(Get, Units_EndAsTheyReportTheirPorts) {
     }
     on_replaced_ = [&] { EXPECT_TRUE(commands_.running.Active()); };
     commands_.get.Start();
-    EXPECT_EQ(commands_.running.What(), "Reading the configuration of unit 05");
+    EXPECT_EQ(commands_.running.What(), "Reading unit 05");
     const auto ended = [&] {
       // All at one moment, or not at all.
       EXPECT_TRUE(working_ == before || working_ == of_the_unit);

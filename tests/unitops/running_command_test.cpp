@@ -8,7 +8,7 @@ namespace {
 class Progress : public CommandTest {
  protected:
   void Start() { commands_.running.StartCommandProgress(commands_.send, "Sending"); }
-  void End(Outcome outcome) { commands_.running.EndCommandProgress(outcome, "done"); }
+  void End(Outcome outcome) { commands_.running.EndCommandProgress(outcome, "done", ""); }
   void Expect(std::uint64_t after_ms, bool shown, int bar_width, ProgressColour colour) {
     world_.time.Advance(after_ms);
     EXPECT_EQ(progress_.shown, shown);

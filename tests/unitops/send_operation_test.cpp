@@ -57,7 +57,7 @@ TEST_F(Send, EveryPort_GoesOutAsUnlockOptionsAndPoll) {
 TEST_F(Send, Ports_FollowEachOther300msAfterTheAcknowledgement) {
   auto& unit = Attach("", 0x01);
   commands_.send.Start();
-  EXPECT_EQ(commands_.running.What(), "Sending the configuration to unit 01");
+  EXPECT_EQ(commands_.running.What(), "Sending to unit 01");
   AcknowledgePort(unit, 1);
   // Nothing until the pause is over.
   EXPECT_THAT(Sent([&] { world_.time.Advance(298); }), testing::Each(0));

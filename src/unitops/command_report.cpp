@@ -1,0 +1,10 @@
+#include "unitops/command_report.h"
+
+namespace tendril {
+
+std::string CommandReport::Sentence(const std::string& time) const {
+  if (outcome.empty()) return what;
+  return what + " at " + time + ": " + outcome + (outcome.back() == '!' ? " " : ". ") + aftermath;
+}
+
+}  // namespace tendril
