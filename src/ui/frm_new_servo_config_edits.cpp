@@ -132,6 +132,7 @@ void frmNewServoConfig::OnSent(std::uint8_t unit) {
 }
 
 void frmNewServoConfig::OnReport(const CommandReport& report) {
+  if (report.outcome.empty()) status_->OfferUndo(false);  // it is off while a command runs
   QString sentence = QString::fromStdString(report.Sentence(TimeOfDay()));
   if (!report.outcome.empty() && !outcome_note_.isEmpty())
     sentence += QLatin1Char(' ') + std::exchange(outcome_note_, {});
