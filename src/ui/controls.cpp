@@ -5,7 +5,6 @@
 #include <QGuiApplication>
 #include <QKeyEvent>
 #include <QScrollArea>
-#include <QSignalBlocker>
 #include <algorithm>
 
 #include "config/channel_config.h"
@@ -57,64 +56,6 @@ void PressableText::keyPressEvent(QKeyEvent* event) {
     QGuiApplication::clipboard()->setText(text());
   } else {
     QLineEdit::keyPressEvent(event);
-  }
-}
-
-CalmSpinBox::CalmSpinBox(QWidget* parent) : QSpinBox(parent) {
-  setKeyboardTracking(false);
-  setFocusPolicy(Qt::StrongFocus);
-  setSingleStep(10);
-  setSuffix(QStringLiteral(" µs"));
-  ApplyLimits();
-  setFixedWidth(sizeHint().width());  // new limits move nothing around it
-}
-
-void CalmSpinBox::Show(const BoundedValue& value) {
-  const QSignalBlocker silent(this);
-  shown_ = value;
-  if (!ArrowHeld()) ApplyLimits();
-  setValue(value.Value());
-}
-
-// Ctrl+C without a selection is left to the window, which copies the value.
-bool CalmSpinBox::event(QEvent* event) {
-  if (event->type() == QEvent::ShortcutOverride && !lineEdit()->hasSelectedText() &&
-      static_cast<QKeyEvent*>(event)->matches(QKeySequence::Copy)) {
-    event->ignore();
-    return false;
-  }
-  return QSpinBox::event(event);
-}
-
-// New limits would stop a held arrow from repeating. The release does not arrive here when a message box has opened
-// meanwhile, so the state of the mouse button decides.
-bool CalmSpinBox::ArrowHeld() const {
-  return pressed_ && QGuiApplication::mouseButtons().testFlag(Qt::LeftButton);
-}
-
-void CalmSpinBox::ApplyLimits() {
-  if (minimum() != shown_.Minimum() || maximum() != shown_.Maximum()) {
-    setRange(shown_.Minimum(), shown_.Maximum());
-  }
-}
-
-void CalmSpinBox::mousePressEvent(QMouseEvent* event) {
-  pressed_ = true;
-  QSpinBox::mousePressEvent(event);
-}
-
-void CalmSpinBox::mouseReleaseEvent(QMouseEvent* event) {
-  QSpinBox::mouseReleaseEvent(event);
-  pressed_ = false;
-  const QSignalBlocker silent(this);
-  ApplyLimits();
-}
-
-void CalmSpinBox::wheelEvent(QWheelEvent* event) {
-  if (hasFocus()) {
-    QSpinBox::wheelEvent(event);
-  } else {
-    event->ignore();
   }
 }
 

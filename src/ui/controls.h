@@ -9,13 +9,10 @@
 #include <QLineEdit>
 #include <QMargins>
 #include <QPalette>
-#include <QSpinBox>
 #include <QString>
 #include <QWheelEvent>
 #include <cstddef>
 #include <cstdint>
-
-#include "ui/model/bounded_value.h"
 
 namespace tendril {
 
@@ -37,30 +34,6 @@ class CalmComboBox : public QComboBox {
 
  protected:
   void wheelEvent(QWheelEvent* event) override { event->ignore(); }
-};
-
-// A spin box in microseconds. The wheel changes it only while it has the focus. Typed text takes effect when it is
-// complete: at Enter, or when the focus leaves.
-class CalmSpinBox : public QSpinBox {
- public:
-  explicit CalmSpinBox(QWidget* parent = nullptr);
-
-  // Shows a value and its limits. Emits no signal.
-  void Show(const BoundedValue& value);
-
-  bool event(QEvent* event) override;
-
- protected:
-  void wheelEvent(QWheelEvent* event) override;
-  void mousePressEvent(QMouseEvent* event) override;
-  void mouseReleaseEvent(QMouseEvent* event) override;
-
- private:
-  void ApplyLimits();
-  bool ArrowHeld() const;
-
-  BoundedValue shown_;
-  bool pressed_ = false;  // a mouse button went down here; the release may have gone to another widget
 };
 
 // A read-only text that can be pressed: with the left mouse button, Enter or the space bar. Ctrl+C copies it; no part of

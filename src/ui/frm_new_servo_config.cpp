@@ -6,6 +6,7 @@
 #include <QScrollArea>
 #include <QTimer>
 #include <QVBoxLayout>
+#include <utility>
 
 #include "platform/hex_text.h"
 #include "ui/about_dialog.h"
@@ -105,6 +106,8 @@ void frmNewServoConfig::Connect() {
   connect(parameters_, &MotionParameters::Edited, c, [this](FollowUp follow_up) { OnEdited(follow_up); });
   connect(parameters_, &MotionParameters::LabelPressed, c,
           [this](const QWidget* label) { actuals_->ShowActuals(*label); });
+  connect(parameters_, &MotionParameters::NumberDropped, c,
+          [this](const QString& typed, const QString& sentence) { OnNumberDropped(typed, sentence); });
   connect(parameters_, &MotionParameters::TestPressed, c, [this](int button) {
     CommitTyping();
     live_test_.OnTestButton(button);
@@ -167,7 +170,11 @@ void frmNewServoConfig::StartUp() {
 
 void frmNewServoConfig::OnRunning() {
   const RunningCommand& running = commands_.running;
-  if (running.Operation() == &commands_.send) readings_.SendBegins(connection_->UnitId());
+  if (running.Operation() == &commands_.send) {
+    readings_.SendBegins(connection_->UnitId());
+    if (!dropped_.isEmpty())
+      NoteOutcome(QStringLiteral("Sent without the %1 that was typed.").arg(std::exchange(dropped_, {})));
+  }
   command_focus_.Follow(running.Active(), [this] { EnableControls(); });
 }
 
@@ -214,11 +221,14 @@ void frmNewServoConfig::MakeSummary() {
   connect(summary_, &SummaryArea::OptionChosen, &connections_,
           [this] { NoteStep(QStringLiteral("Option")); });
   connect(summary_, &SummaryArea::SimulatorPressed, &connections_, [this] { ShowConfig(); });
+  connect(summary_, &SummaryArea::NumberDropped, &connections_,
+          [this](const QString& typed, const QString& sentence) { OnNumberDropped(typed, sentence); });
   connect(summary_, &SummaryArea::Edited, &connections_, [this](std::size_t channel) {
+    ForgetDropped();
     config_.Remarks().AcceptRecord(channel);
     config_.Editor().ReloadChannel();
     ShowRemarks();
-    NoteStep(QStringLiteral("Edit in the summary"));
+    NoteStep(QStringLiteral("Edit in the summary"), summary_->Repeats());
   });
 }
 

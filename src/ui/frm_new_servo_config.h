@@ -82,6 +82,9 @@ class frmNewServoConfig : public QMainWindow {
   void Redo();
   void ShowRestored(const QString& said);
   void CommitTyping();
+  void OnNumberDropped(const QString& typed, const QString& sentence);
+  void ForgetDropped();
+  void NoteOutcome(const QString& sentence) { outcome_note_ += QLatin1Char(' ') + sentence; }
   bool MakeWayForCommand();
   void MakeSummary();
   void ShowSummary();
@@ -98,6 +101,7 @@ class frmNewServoConfig : public QMainWindow {
   EditedConfiguration config_;
   UndoHistory history_{config_};
   Readings readings_;
+  QString dropped_;       // what was typed last and could not be taken, until the next edit
   QString outcome_note_;  // what the status bar says after the outcome of the running command
   PortSelection ports_;
 

@@ -1,10 +1,10 @@
 // The window's edits and views: what the user's acts do to the records, and how that is shown.
-#include <QAbstractSpinBox>
 #include <QGuiApplication>
 #include <QTime>
 #include <utility>
 
 #include "platform/hex_text.h"
+#include "ui/calm_spin_box.h"
 #include "ui/freeze.h"
 #include "ui/frm_new_servo_config.h"
 
@@ -62,6 +62,7 @@ void frmNewServoConfig::ShowRemarks() {
 }
 
 void frmNewServoConfig::OnEdited(FollowUp follow_up) {
+  ForgetDropped();
   config_.Remarks().AcceptEdit();
   ShowEditor();
   if (follow_up == FollowUp::kRefreshLivePosition) {
@@ -69,7 +70,7 @@ void frmNewServoConfig::OnEdited(FollowUp follow_up) {
   } else {
     simulators_.UpdateSimulators(live_test_.ShownPosition());
   }
-  NoteStep(QStringLiteral("Edit"));
+  NoteStep(QStringLiteral("Edit"), parameters_->Repeats());
 }
 
 void frmNewServoConfig::OnApplied() {
@@ -110,6 +111,7 @@ void frmNewServoConfig::ShowRecords() {
 
 // The records were read, or the summary has changed them.
 void frmNewServoConfig::OnReplaced(const QString& what) {
+  ForgetDropped();
   if (SummaryShown()) summary_->NormaliseAndShowRecords();
   config_.Editor().ReloadChannel();
   ShowRecords();
@@ -128,14 +130,13 @@ void frmNewServoConfig::OnSent(std::uint8_t unit) {
   config_.SentTo(unit, TimeOfDay());
   NoteStep({});
   if (readings_.WayBack(unit) == nullptr)
-    outcome_note_ = QStringLiteral("What it held before is not known: it was not read.");
+    NoteOutcome(QStringLiteral("What it held before is not known: it was not read."));
 }
 
 void frmNewServoConfig::OnReport(const CommandReport& report) {
   if (report.outcome.empty()) status_->OfferUndo(false);  // it is off while a command runs
   QString sentence = QString::fromStdString(report.Sentence(TimeOfDay()));
-  if (!report.outcome.empty() && !outcome_note_.isEmpty())
-    sentence += QLatin1Char(' ') + std::exchange(outcome_note_, {});
+  if (!report.outcome.empty()) sentence += std::exchange(outcome_note_, {});
   status_->Say(sentence);
 }
 
@@ -204,7 +205,18 @@ void frmNewServoConfig::ShowRestored(const QString& said) {
 
 // Lets typed text take effect. A key can trigger what uses it without taking the focus away.
 void frmNewServoConfig::CommitTyping() {
-  if (auto* spin = qobject_cast<QAbstractSpinBox*>(focusWidget())) spin->interpretText();
+  if (auto* number = qobject_cast<CalmSpinBox*>(focusWidget())) number->EndTyping();
+}
+
+void frmNewServoConfig::ForgetDropped() {
+  dropped_.clear();
+  status_->ForgetEarlier();
+}
+
+// A send that follows before the next edit goes without it.
+void frmNewServoConfig::OnNumberDropped(const QString& typed, const QString& sentence) {
+  dropped_ = typed;
+  status_->SayTwice(sentence);
 }
 
 // A command is about to start: until it ends, nothing changes the records.

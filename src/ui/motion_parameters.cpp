@@ -3,6 +3,7 @@
 #include <QEvent>
 #include <QStyle>
 #include <algorithm>
+#include <utility>
 
 #include "ui/test_icons.h"
 
@@ -103,6 +104,23 @@ void ShowPhysicalValue(Parameter parameter, const ChannelConfig& values, PulseWi
   label.ShowPosition(values.DefaultPosition);
 }
 
+// What the parameter's number means, and the pulse width that it is relative to.
+std::pair<NumberMeaning, int> MeaningOf(Parameter parameter, Microseconds neutral) {
+  switch (parameter) {
+    case Parameter::kActualRange:
+      return {NumberMeaning::kHalfWidth, kCentrePulseWidth};
+    case Parameter::kVirtualRange:
+      return {NumberMeaning::kHalfWidth, neutral};
+    case Parameter::kNeutralTrim:
+      return {NumberMeaning::kDistance, kCentrePulseWidth};
+    case Parameter::kLeftStop:
+    case Parameter::kRightStop:
+    case Parameter::kDefaultPosition:
+      break;
+  }
+  return {NumberMeaning::kDistance, neutral};
+}
+
 // A caption beside a spin button, less prominent than the pulse widths.
 QLabel* CaptionLabel(QAnyStringView text = {}) {
   auto* label = DimLabel(text);
@@ -116,6 +134,8 @@ MotionParameters::MotionParameters(ChannelEditor& editor)
     : QGroupBox(QStringLiteral("Motion Parameters")),
       editor_(editor),
       lblActPulseLeft_(Named(CaptionLabel(), "lblActPulseLeft")),
+      heading_(DimLabel("Relative to Neutral")),
+      typed_(Named(new HintLabel(1), "lblTyped")),
       remarks_(Named(new RemarksLabel, "lblRemarks", 0)),
       scale_(Named(new PulseScale, "PulseScale")),
       hint_(Named(new QLabel(QStringLiteral("Choose a channel: click a servo, or Ctrl+1")), "lblNoChannel")) {
@@ -140,11 +160,9 @@ MotionParameters::MotionParameters(ChannelEditor& editor)
 void MotionParameters::AddParameters(QGridLayout& grid) {
   for (std::size_t i = 0; i < kRows.size(); ++i) {
     const Row& row = kRows[i];
-    const auto parameter = static_cast<Parameter>(i);
-    auto* spin = spins_[i] = Named(new CalmSpinBox, row.spin);
-    auto* name = names_[i] = new QLabel(QString::fromUtf8(row.name));
+    auto* spin = spins_[i] = MakeSpin(i);
+    auto* name = names_[i] = new QLabel(spin->accessibleName());
     name->setBuddy(spin);
-    spin->setAccessibleName(name->text());
     captions_[i] = Named(CaptionLabel(), row.caption);
     pulse_widths_[i] = new PulseWidthLabel;
     // Only the first two rows have a caption on the left, too.
@@ -153,18 +171,30 @@ void MotionParameters::AddParameters(QGridLayout& grid) {
     grid.addWidget(captions_[i], row.row, first, 1, kRightValue - first + 1);
     grid.addWidget(spin, row.row, kSpin);
     grid.addWidget(pulse_widths_[i], row.row, kPulseWidth);
-    connect(spin, &QSpinBox::valueChanged, this,
-            [this, parameter](int value) { Q_EMIT Edited(editor_.Change(parameter, value)); });
   }
   auto* bracket = Named(CaptionLabel("[ +/-"), "Label13");
   grid.addWidget(lblActPulseLeft_, 0, kLeftValue);
   grid.addWidget(bracket, 1, kLeftValue);
-  grid.addWidget(DimLabel("Relative to Neutral"), kHeadingRow, kName, 1, kSpin, Qt::AlignBottom);
+  grid.addWidget(heading_, kHeadingRow, kName, 1, kSpin, Qt::AlignBottom);
+  grid.addWidget(typed_, kHeadingRow, kName, 1, kRest - kName + 1, Qt::AlignBottom);
   MakePressable(bracket);
   for (const Parameter parameter :
        {Parameter::kVirtualRange, Parameter::kLeftStop, Parameter::kRightStop, Parameter::kDefaultPosition}) {
     MakePressable(captions_[static_cast<std::size_t>(parameter)]);
   }
+}
+
+CalmSpinBox* MotionParameters::MakeSpin(std::size_t index) {
+  auto* spin = Named(new CalmSpinBox, kRows[index].spin);
+  spin->setAccessibleName(QString::fromUtf8(kRows[index].name));
+  connect(spin, &QSpinBox::valueChanged, this,
+          [this, index](int value) { Q_EMIT Edited(editor_.Change(static_cast<Parameter>(index), value)); });
+  connect(spin, &CalmSpinBox::HintChanged, this, [this, spin](const QString& hint) {
+    typed_->ShowHint(spin->accessibleName(), hint);
+    heading_->setVisible(hint.isEmpty());
+  });
+  connect(spin, &CalmSpinBox::Dropped, this, &MotionParameters::NumberDropped);
+  return spin;
 }
 
 void MotionParameters::AddTests(QGridLayout& grid) {
@@ -225,6 +255,10 @@ void MotionParameters::EnableEditing(const QString& why_not) {
   for (CalmSpinBox* spin : spins_) EnableUnless(why_not, spin);
 }
 
+bool MotionParameters::Repeats() const {
+  return std::any_of(spins_.begin(), spins_.end(), [](const CalmSpinBox* spin) { return spin->Repeats(); });
+}
+
 void MotionParameters::EnableTests(const QString& why_not) {
   for (QPushButton* test : cmdTest_) EnableUnless(why_not, test);
 }
@@ -247,6 +281,8 @@ void MotionParameters::ShowValues() {
   for (std::size_t i = 0; i < kRows.size(); ++i) {
     const auto parameter = static_cast<Parameter>(i);
     const BoundedValue& value = editor_.Spin(parameter);
+    const auto [meaning, origin] = MeaningOf(parameter, values.NeutralPosition);
+    spins_[i]->SetMeaning(meaning, origin);
     spins_[i]->Show(value);
     captions_[i]->setText(CaptionOf(parameter, value.Value()));
     ShowPhysicalValue(parameter, values, *pulse_widths_[i]);

@@ -10,7 +10,9 @@
 #include <string>
 #include <vector>
 
+#include "ui/calm_spin_box.h"
 #include "ui/controls.h"
+#include "ui/hint_label.h"
 #include "ui/model/channel_editor.h"
 #include "ui/pulse_scale.h"
 #include "ui/pulse_width_label.h"
@@ -39,6 +41,8 @@ class MotionParameters : public QGroupBox {
   void EnableEditing(const QString& why_not);
   // Enables the test buttons unless there is a reason not to.
   void EnableTests(const QString& why_not);
+  // Whether the edit that is reported just now goes on with the one before.
+  bool Repeats() const;
 
  Q_SIGNALS:
   // The user has changed the records.
@@ -47,12 +51,15 @@ class MotionParameters : public QGroupBox {
   void LabelPressed(const QWidget* label);
   // The user pressed a test button, 0 to 4.
   void TestPressed(int button);
+  // A typed number cannot be taken; see CalmSpinBox.
+  void NumberDropped(const QString& typed, const QString& sentence);
 
  protected:
   bool eventFilter(QObject* object, QEvent* event) override;
 
  private:
   void AddParameters(QGridLayout& grid);
+  CalmSpinBox* MakeSpin(std::size_t index);
   void AddTests(QGridLayout& grid);
   void AddSpacing(QGridLayout& grid);
   void MakePressable(QLabel* label);
@@ -65,6 +72,8 @@ class MotionParameters : public QGroupBox {
   std::array<PulseWidthLabel*, kParameterCount> pulse_widths_{};
   std::array<QPushButton*, LiveTest::kTestButtons> cmdTest_{};
   QLabel* lblActPulseLeft_;
+  QLabel* heading_;   // of what is relative to the neutral position
+  HintLabel* typed_;  // lies on the heading
   RemarksLabel* remarks_;
   PulseScale* scale_;
   QLabel* hint_;  // that no channel is chosen; lies on the scale

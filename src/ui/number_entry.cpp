@@ -2,11 +2,15 @@
 
 #include <QGridLayout>
 #include <QKeyEvent>
+#include <algorithm>
 
 namespace tendril {
 namespace {
 
 constexpr std::int32_t kOpenMs = 3500;
+// The room for a hint.
+constexpr int kHintLines = 2;
+constexpr char kHintLine[] = "-1000 to 1000. This is relative to 1500";
 
 }  // namespace
 
@@ -14,20 +18,32 @@ NumberEntry::NumberEntry(SummaryEditor& editor, TimerFactory& timers, QWidget& w
     : PopUp("fraNumberEntry", window),
       editor_(editor),
       tmrAdjustDual_(timers.CreateTimer([this] { OnAdjustDual(); })),
-      lblDisplay_(Named(BoldLabel(), "lblDisplay")) {
+      lblDisplay_(Named(BoldLabel(), "lblDisplay")),
+      typed_(Named(new HintLabel(kHintLines), "lblSumTyped")) {
   tmrAdjustDual_->SetInterval(kOpenMs);
   auto* grid = new QGridLayout(this);
   grid->addWidget(lblDisplay_, 0, 0, 1, 2);
   for (std::size_t i = 0; i < spnSumValue_.size(); ++i) {
-    auto* spin = spnSumValue_[i] = Named(new CalmSpinBox, "spnSumValue", i);
-    spin->setAccessibleName(i == 0 ? QStringLiteral("New value") : QStringLiteral("New right stop"));
-    Describe(spin, "The new value, in µs.");
+    spnSumValue_[i] = MakeSpin(i);
     auto* reading = lblSumValue_[i] = Named(new QLabel, "lblSumValue", i);
     reading->setAlignment(Qt::AlignCenter);
-    grid->addWidget(spin, 1, static_cast<int>(i));
+    grid->addWidget(spnSumValue_[i], 1, static_cast<int>(i));
     grid->addWidget(reading, 2, static_cast<int>(i));
-    connect(spin, &QSpinBox::valueChanged, this, [this, i](int value) { OnSpin(i, value); });
   }
+  typed_->setMinimumWidth(typed_->fontMetrics().horizontalAdvance(QString::fromLatin1(kHintLine)));
+  grid->addWidget(typed_, 3, 0, 1, 2);
+}
+
+CalmSpinBox* NumberEntry::MakeSpin(std::size_t index) {
+  auto* spin = Named(new CalmSpinBox, "spnSumValue", index);
+  spin->setAccessibleName(index == 0 ? QStringLiteral("New value") : QStringLiteral("New right stop"));
+  Describe(spin, "The new value, in µs.");
+  spin->installEventFilter(this);
+  connect(spin, &QSpinBox::valueChanged, this, [this, index](int value) { OnSpin(index, value); });
+  connect(spin, &CalmSpinBox::HintChanged, this,
+          [this, spin](const QString& hint) { typed_->ShowHint(spin->accessibleName(), hint); });
+  connect(spin, &CalmSpinBox::Dropped, this, &NumberEntry::NumberDropped);
+  return spin;
 }
 
 void NumberEntry::OnSpin(std::size_t index, int value) {
@@ -54,10 +70,12 @@ void NumberEntry::OpenNumberEntry(std::size_t channel, SummaryField field, QWidg
 void NumberEntry::ShowEntry() {
   lblDisplay_->setText(QString::fromStdString(editor_.Title()));
   const auto readings = editor_.Readings();
+  const auto [meaning, origin] = editor_.Meaning();
   const bool two = editor_.ShownSpins() > 1;
   for (std::size_t i = 0; i < spnSumValue_.size(); ++i) {
     CalmSpinBox& spin = *spnSumValue_[i];
     const QString side = !two ? QString() : i == 0 ? QStringLiteral(", left") : QStringLiteral(", right");
+    spin.SetMeaning(meaning, origin);
     spin.Show(editor_.Spin(i));
     spin.setVisible(i == 0 || two);
     spin.setAccessibleName(lblDisplay_->text() + side);
@@ -70,12 +88,18 @@ void NumberEntry::ShowEntry() {
 
 void NumberEntry::OnAdjustDual() {
   tmrAdjustDual_->SetEnabled(false);
-  for (CalmSpinBox* spin : spnSumValue_) spin->interpretText();  // typed text is a change, too
+  for (CalmSpinBox* spin : spnSumValue_) spin->EndTyping();  // a typed number is a change, too
   if (!tmrAdjustDual_->Enabled()) Close();
+}
+
+void NumberEntry::Leave() {
+  for (CalmSpinBox* spin : spnSumValue_) spin->EndTyping();
+  Close();
 }
 
 void NumberEntry::Close() {
   tmrAdjustDual_->SetEnabled(false);
+  for (CalmSpinBox* spin : spnSumValue_) spin->PutBack();
   editor_.CloseNumberEntry();
   if (!isVisible()) return;
   const bool had_focus = isAncestorOf(window()->focusWidget());
@@ -83,12 +107,18 @@ void NumberEntry::Close() {
   if (had_focus && text_) text_->setFocus();
 }
 
-void NumberEntry::keyPressEvent(QKeyEvent* event) {
-  if (event->key() == Qt::Key_Escape) {
-    Close();
-  } else {
-    QFrame::keyPressEvent(event);
-  }
+bool NumberEntry::Repeats() const {
+  return std::any_of(spnSumValue_.begin(), spnSumValue_.end(),
+                     [](const CalmSpinBox* spin) { return spin->Repeats(); });
+}
+
+// Escape closes the panel whatever is typed.
+bool NumberEntry::eventFilter(QObject* spin, QEvent* event) {
+  const bool key = event->type() == QEvent::ShortcutOverride || event->type() == QEvent::KeyPress;
+  if (!key || static_cast<QKeyEvent*>(event)->key() != Qt::Key_Escape) return PopUp::eventFilter(spin, event);
+  event->accept();
+  if (event->type() == QEvent::KeyPress) Close();
+  return true;
 }
 
 }  // namespace tendril

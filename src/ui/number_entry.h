@@ -8,13 +8,15 @@
 #include <memory>
 
 #include "platform/timer.h"
+#include "ui/calm_spin_box.h"
 #include "ui/controls.h"
+#include "ui/hint_label.h"
 #include "ui/model/summary_editor.h"
 
 namespace tendril {
 
 // The frame `fraNumberEntry`, with one spin button or two. Opens beside the text that was pressed. Closes 3.5 s after
-// the last change, or on Escape, and gives the focus back to the text.
+// the last change, or on Escape, and gives the focus back to the text. Escape drops what is typed.
 class NumberEntry : public PopUp {
   Q_OBJECT
 
@@ -24,17 +26,25 @@ class NumberEntry : public PopUp {
 
   // Opens beside `text`, which shows `field` of `channel`, 0 to 7.
   void OpenNumberEntry(std::size_t channel, SummaryField field, QWidget& text);
-  // Closes the panel if it is open.
+  // Closes the panel if it is open, and drops what is typed.
   void Close();
+  // The same, but what is typed takes effect.
+  void Leave();
+  bool Open() const { return editor_.OpenEntry().has_value(); }
+  // Whether the change that is reported just now goes on with the one before.
+  bool Repeats() const;
 
  Q_SIGNALS:
   // The record of `channel` was changed.
   void Changed(std::size_t channel);
+  // A typed number cannot be taken; see CalmSpinBox.
+  void NumberDropped(const QString& typed, const QString& sentence);
 
  protected:
-  void keyPressEvent(QKeyEvent* event) override;
+  bool eventFilter(QObject* spin, QEvent* event) override;
 
  private:
+  CalmSpinBox* MakeSpin(std::size_t index);
   void OnSpin(std::size_t index, int value);
   void ShowEntry();
   void OnAdjustDual();
@@ -45,6 +55,7 @@ class NumberEntry : public PopUp {
   QLabel* lblDisplay_;
   std::array<CalmSpinBox*, 2> spnSumValue_{};
   std::array<QLabel*, 2> lblSumValue_{};
+  HintLabel* typed_;
 };
 
 }  // namespace tendril

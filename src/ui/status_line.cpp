@@ -58,8 +58,16 @@ void StatusLine::resizeEvent(QResizeEvent* event) {
 }
 
 void StatusLine::Say(const QString& sentence) {
-  lblStatus_->setText(sentence);
-  lblStatus_->Announce(sentence);
+  const QString both = earlier_.isEmpty() ? sentence : sentence + QStringLiteral(". ") + earlier_;
+  earlier_.clear();
+  lblStatus_->setText(both);
+  lblStatus_->Announce(both);
+}
+
+void StatusLine::SayTwice(const QString& sentence) {
+  earlier_.clear();
+  Say(sentence);
+  earlier_ = sentence;
 }
 
 void StatusLine::Copy() const { QGuiApplication::clipboard()->setText(lblStatus_->text()); }

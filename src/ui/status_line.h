@@ -22,6 +22,10 @@ class StatusLine : public QStatusBar {
 
   // Shows `sentence`, and has it read out.
   void Say(const QString& sentence);
+  // The same, and shows `sentence` beside the next one, too: what the user just did may say something itself.
+  void SayTwice(const QString& sentence);
+  // Shows nothing of an earlier sentence beside the next one.
+  void ForgetEarlier() { earlier_.clear(); }
   // Each shows one fact. An empty text shows nothing.
   void ShowPort(const QString& text) { lblPort_->Show(text); }
   void ShowUnit(const QString& text) { lblUnit_->Show(text); }
@@ -48,6 +52,7 @@ class StatusLine : public QStatusBar {
   ElidedLabel* lblUnit_;
   ElidedLabel* lblOrigin_;
   Announcement* lblStatus_;
+  QString earlier_;  // shown beside the next sentence
   QPushButton* cmdUndo_;
 };
 

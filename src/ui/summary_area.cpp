@@ -138,6 +138,7 @@ SummaryArea::SummaryArea(TimerFactory& timers, ChannelTable& working, QWidget* p
     ShowTexts(channel);
     Q_EMIT Edited(channel);
   });
+  connect(entry_, &NumberEntry::NumberDropped, this, &SummaryArea::NumberDropped);
 }
 
 QLayout* SummaryArea::MakeButtons() {
@@ -217,12 +218,12 @@ void SummaryArea::AddOptions(QGridLayout& table, std::size_t channel, const QStr
     table.addWidget(button, kHeaderLines + static_cast<int>(channel), column++, Qt::AlignCenter);
   }
   connect(row.power_up, &QButtonGroup::idClicked, this, [this, channel](int id) {
-    entry_->Close();
+    entry_->Leave();
     working_.At(channel).PowerUPOpt = id;
     Q_EMIT OptionChosen();
   });
   connect(row.lost_comm, &QButtonGroup::idClicked, this, [this, channel](int id) {
-    entry_->Close();
+    entry_->Leave();
     working_.At(channel).LostCommOption = id;
     Q_EMIT OptionChosen();
   });
@@ -277,7 +278,7 @@ void SummaryArea::ShowTexts(std::size_t channel) {
 }
 
 void SummaryArea::keyPressEvent(QKeyEvent* event) {
-  if (event->key() == Qt::Key_Escape) {
+  if (event->key() == Qt::Key_Escape && entry_->Open()) {
     entry_->Close();
   } else {
     QWidget::keyPressEvent(event);

@@ -42,6 +42,8 @@ class SummaryArea : public QWidget {
   void TakeFocus();
   // Closes the number entry, if it is open.
   void CloseNumberEntry() { entry_->Close(); }
+  // Whether the change that is reported just now goes on with the one before.
+  bool Repeats() const { return entry_->Repeats(); }
 
  Q_SIGNALS:
   void SendPressed();
@@ -51,6 +53,8 @@ class SummaryArea : public QWidget {
   void Edited(std::size_t channel);
   // The user chose an option; the record holds it.
   void OptionChosen();
+  // A number typed into the number entry cannot be taken; see CalmSpinBox.
+  void NumberDropped(const QString& typed, const QString& sentence);
 
  protected:
   void keyPressEvent(QKeyEvent* event) override;

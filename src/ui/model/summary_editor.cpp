@@ -123,4 +123,13 @@ std::array<std::string, 2> SummaryEditor::Readings() const {
   return {};
 }
 
+std::pair<NumberMeaning, int> SummaryEditor::Meaning() const {
+  if (!entry_) return {};
+  const SummaryField field = entry_->field;
+  const bool half = field == SummaryField::kActualRange || field == SummaryField::kVirtualRange;
+  const bool from_centre = field == SummaryField::kActualRange || field == SummaryField::kNeutralTrim;
+  return {half ? NumberMeaning::kHalfWidth : NumberMeaning::kDistance,
+          from_centre ? kCentrePulseWidth : working_.At(entry_->channel).NeutralPosition};
+}
+
 }  // namespace tendril

@@ -5,10 +5,12 @@
 #include <cstddef>
 #include <optional>
 #include <string>
+#include <utility>
 
 #include "config/channel_config.h"
 #include "ui/model/bounded_value.h"
 #include "ui/model/motion.h"
+#include "ui/model/typed_number.h"
 
 namespace tendril {
 
@@ -46,6 +48,8 @@ class SummaryEditor {
   const BoundedValue& Spin(std::size_t index) const { return spins_[index]; }
   std::size_t ShownSpins() const { return entry_ && entry_->field == SummaryField::kStops ? 2 : 1; }
   std::array<std::string, 2> Readings() const;
+  // What its numbers mean, and the pulse width that they are relative to.
+  std::pair<NumberMeaning, int> Meaning() const;
 
  private:
   void ApplySummaryEntry(std::size_t channel, std::optional<SummaryField> field);

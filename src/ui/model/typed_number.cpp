@@ -5,10 +5,17 @@
 #include "config/channel_config.h"
 
 namespace tendril {
+namespace {
+
+std::string RangeOf(const BoundedValue& limits) {
+  return std::to_string(limits.Minimum()) + " to " + std::to_string(limits.Maximum());
+}
+
+}  // namespace
 
 std::string TypedNumberHint(std::optional<long long> typed, const BoundedValue& limits, NumberMeaning meaning,
                             int origin) {
-  const std::string range = std::to_string(limits.Minimum()) + " to " + std::to_string(limits.Maximum());
+  const std::string range = RangeOf(limits);
   if (!typed) return "A whole number, " + range;
   if (*typed < kMinPulseWidth || *typed > kMaxPulseWidth) return range;
   const bool half = meaning == NumberMeaning::kHalfWidth;
@@ -20,6 +27,11 @@ std::string TypedNumberHint(std::optional<long long> typed, const BoundedValue& 
                     std::to_string(origin + wanted) + type
               : range + ". This is relative to " + std::to_string(origin) + " µs: for " +
                     std::to_string(*typed) + type;
+}
+
+std::string DroppedNumber(const std::string& typed, const std::string& field, const BoundedValue& value) {
+  return (typed.empty() ? "Nothing was typed" : typed + " was not taken") + " as " + field + ": " +
+         RangeOf(value) + ". It is " + std::to_string(value.Value()) + " again.";
 }
 
 }  // namespace tendril

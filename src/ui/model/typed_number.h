@@ -16,4 +16,8 @@ enum class NumberMeaning { kHalfWidth, kDistance };
 std::string TypedNumberHint(std::optional<long long> typed, const BoundedValue& limits, NumberMeaning meaning,
                             int origin);
 
+// That `typed` is gone and the value is shown again: "2400 was not taken as Actual Pulse Range: 0 to 1000. It is 900
+// again." `typed` may be empty.
+std::string DroppedNumber(const std::string& typed, const std::string& field, const BoundedValue& value);
+
 }  // namespace tendril

@@ -21,6 +21,8 @@ TEST(TypedNumber, HintSaysWhatToTypeInstead) {
   EXPECT_EQ(hint(std::nullopt, width, NumberMeaning::kHalfWidth, 1500), "A whole number, 0 to 1000");
   EXPECT_EQ(hint(1250, stop, NumberMeaning::kDistance, 1600),
             "-500 to 0. This is relative to 1600 µs: for 1250 type -350");
+  EXPECT_EQ(DroppedNumber("", "Left Virtual Stop", stop),
+            "Nothing was typed as Left Virtual Stop: -500 to 0. It is 0 again.");
   EXPECT_EQ(hint(1700, stop, NumberMeaning::kDistance, 1600), "-500 to 0");
 }
 
