@@ -22,6 +22,7 @@ constexpr int kLeastLightness = 152;  // of a window to which the blue of the se
 constexpr double kSelectionOutline = 1;
 constexpr double kMarkSize = 12;  // of the check mark of the selection
 constexpr double kMarkLine = 1.6;
+constexpr double kDotSize = 7;  // of the mark
 constexpr double kAngleTextScale = 0.75;  // of the control's font
 constexpr double kMinTextScale = 0.8;     // of a text's full size
 constexpr double kMinTextPixels = 7;
@@ -174,7 +175,8 @@ class ServoAccessible : public QAccessibleWidget, public QAccessibleValueInterfa
 
   QString text(QAccessible::Text kind) const override {
     if (kind == QAccessible::Value) return QStringLiteral("%1 µs").arg(servo_.dial().arm_pulse());
-    if (kind == QAccessible::Description && servo_.dial().selected()) return QStringLiteral("Selected");
+    if (kind == QAccessible::Description && servo_.dial().selected())
+      return DescribeSelected(servo_.accessibleDescription());
     if (kind == QAccessible::Name && servo_.accessibleName().isEmpty()) {
       QString name = QString::fromStdString(servo_.dial().caption());
       const QLatin1String abbreviation("CHAN ");
@@ -240,6 +242,18 @@ void PaintSelection(QPainter& painter, const QRectF& rect, const QPalette& palet
   for (QPointF& point : mark) point = corner.topLeft() + point * kMarkSize;
   painter.drawPolyline(mark.data(), static_cast<int>(mark.size()));
   if (focus) PaintFocus(painter, rect, Qt::white);
+}
+
+void PaintMark(QPainter& painter, const QRectF& rect, const QColor& colour) {
+  painter.setRenderHint(QPainter::Antialiasing);
+  painter.setPen(Qt::NoPen);
+  painter.setBrush(colour);
+  const double left = rect.center().x() - std::min(rect.width(), rect.height()) / 2;
+  painter.drawEllipse(QRectF(left + kDotSize, rect.top() + kDotSize, kDotSize, kDotSize));
+}
+
+QString DescribeSelected(const QString& more) {
+  return QStringLiteral("Selected") + (more.isEmpty() ? QString() : QStringLiteral(". ") + more);
 }
 
 ServoSimulator::ServoSimulator(QWidget* parent)
@@ -315,6 +329,12 @@ void ServoSimulator::SelectServo(bool selected) {
   update();
 }
 
+void ServoSimulator::Mark(bool marked) {
+  if (marked == marked_) return;
+  marked_ = marked;
+  update();
+}
+
 void ServoSimulator::AnnounceArm() {
   if (dial_.arm_pulse() == announced_pulse_) return;
   announced_pulse_ = dial_.arm_pulse();
@@ -354,6 +374,7 @@ void ServoSimulator::PaintBackground(QPainter& painter) const {
   } else if (hasFocus()) {
     PaintFocus(painter, whole, palette().color(QPalette::WindowText));
   }
+  if (marked_) PaintMark(painter, whole, palette().color(QPalette::ButtonText));
 }
 
 void ServoSimulator::resizeEvent(QResizeEvent* event) {

@@ -21,6 +21,11 @@ QColor ToColour(DialColour colour);
 // check mark in the corner, and `inside` where the picture lies. Adds the line that shows the focus.
 void PaintSelection(QPainter& painter, const QRectF& rect, const QPalette& palette, const QColor& inside,
                     bool focus);
+// Paints the mark of a servo into `rect`: a dot at the top left of the picture, where no arc reaches.
+void PaintMark(QPainter& painter, const QRectF& rect, const QColor& colour);
+
+// The accessible description of a selected servo. `more` is what else is to be said of it.
+QString DescribeSelected(const QString& more);
 
 // Shows one servo channel as a picture. The operations below set what it shows, in degrees (0 straight up, positive to
 // the right) or in microseconds (a longer pulse turns the arm left). Operations that convert raise
@@ -31,7 +36,7 @@ void PaintSelection(QPainter& painter, const QRectF& rect, const QPalette& palet
 //
 // To assistive technology it is a button with a value. Its name is accessibleName() or else its caption ("CHAN 3" is
 // spoken "Channel 3"), its value is the pulse width of the arm ("1500 µs"). While it is selected its description says
-// so: most readers do not read that state of a button.
+// so: most readers do not read that state of a button. accessibleDescription() follows.
 class ServoSimulator : public QAbstractButton {
   Q_OBJECT
 
@@ -70,6 +75,8 @@ class ServoSimulator : public QAbstractButton {
   void DisplayCaption(const QString& text);
   // Shows the control as selected or not.
   void SelectServo(bool selected);
+  // Shows the mark, or hides it. The accessible description has to say what it means.
+  void Mark(bool marked);
 
   // What the control shows.
   const ServoDial& dial() const { return dial_; }
@@ -96,6 +103,7 @@ class ServoSimulator : public QAbstractButton {
   void PaintBackground(QPainter& painter) const;
 
   ServoDial dial_;
+  bool marked_ = false;
   std::int64_t announced_pulse_;  // the pulse width of the arm that assistive technology was notified of
 };
 

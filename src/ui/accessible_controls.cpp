@@ -7,6 +7,7 @@
 #include <QRadioButton>
 #include <QStackedWidget>
 
+#include "simulator/servo_simulator.h"
 #include "ui/accessible_combo_box.h"
 #include "ui/accessible_text.h"
 #include "ui/announcement.h"
@@ -25,7 +26,7 @@ class ButtonAccessible : public QAccessibleWidget {
   QString text(QAccessible::Text kind) const override {
     QString text = QAccessibleWidget::text(kind);
     if (kind != QAccessible::Description) return text;
-    if (state().selected) return QStringLiteral("Selected");
+    if (state().selected) return DescribeSelected(button_.accessibleDescription());
     return text == QAccessibleWidget::text(QAccessible::Name) ? QString() : text;  // read once
   }
   // The name is complete: a label beside the button would be read in its place.

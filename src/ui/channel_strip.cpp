@@ -84,6 +84,27 @@ void ChannelStrip::UpdateSimulator(std::size_t channel, Microseconds arm) {
   FeedSimulator(*ServoSimulator2_[channel], working_.At(channel), arm);
 }
 
+void ChannelStrip::ShowChanged(const std::vector<std::size_t>& channels) {
+  std::array<bool, kPortCount> changed{};
+  for (const std::size_t channel : channels) changed.at(channel) = true;
+  for (std::size_t channel = 0; channel < kPortCount; ++channel) {
+    if (changed_[channel] != changed[channel]) MarkChanged(channel, changed[channel]);
+  }
+  changed_ = changed;
+}
+
+void ChannelStrip::MarkChanged(std::size_t channel, bool changed) {
+  const auto show = [changed](auto& picture) {
+    const QString what_it_does = picture.toolTip().section(QLatin1Char('\n'), 0, 0);
+    const QString meaning = QStringLiteral("Changed since it was read, sent or taken from a preset");
+    picture.Mark(changed);
+    picture.setAccessibleDescription(changed ? meaning : QString());
+    picture.setToolTip(changed ? what_it_does + QStringLiteral("\n• ") + meaning : what_it_does);
+  };
+  show(*ServoSimulator2_[channel]);
+  show(*cmdDigitalOutput_[channel]);
+}
+
 void ChannelStrip::MoveArm(std::size_t channel, Microseconds arm) {
   ServoSimulator2_[channel]->SetMovingArmPositionUS(arm);
 }

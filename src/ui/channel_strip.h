@@ -6,6 +6,7 @@
 #include <QString>
 #include <array>
 #include <cstddef>
+#include <vector>
 
 #include "config/channel_config.h"
 #include "simulator/servo_simulator.h"
@@ -29,6 +30,8 @@ class ChannelStrip : public QGroupBox {
   void UpdateSimulator(std::size_t channel, Microseconds arm);
   // Enables the choice of a channel. `running_command` is what runs; empty when nothing does.
   void EnableControls(const QString& running_command);
+  // Marks these channels, and no other, as changed since the configuration was read, sent or taken from a preset.
+  void ShowChanged(const std::vector<std::size_t>& channels);
   // Moves the arm alone.
   void MoveArm(std::size_t channel, Microseconds arm);
 
@@ -37,6 +40,7 @@ class ChannelStrip : public QGroupBox {
   void ChannelChosen(std::size_t channel);
 
  private:
+  void MarkChanged(std::size_t channel, bool changed);
   QWidget* MakeCell(std::size_t channel);
   void ShowKind(std::size_t channel);
 
@@ -45,6 +49,7 @@ class ChannelStrip : public QGroupBox {
   std::array<QStackedWidget*, kPortCount> cells_{};
   std::array<ServoSimulator*, kPortCount> ServoSimulator2_{};
   std::array<OutputButton*, kPortCount> cmdDigitalOutput_{};
+  std::array<bool, kPortCount> changed_{};
 };
 
 }  // namespace tendril

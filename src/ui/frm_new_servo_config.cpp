@@ -12,6 +12,7 @@
 #include "ui/about_dialog.h"
 #include "ui/accessible_controls.h"
 #include "ui/appearance.h"
+#include "ui/escape_key.h"
 #include "ui/keys_dialog.h"
 #include "ui/manual.h"
 #include "ui/model/port_sentences.h"
@@ -39,6 +40,7 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
       actuals_(new ActualsFrame(timers, *this)),
       commands_(link, timers, boxes, *progress_, *connection_, config_.Records(),
                 {.starting = [this] { return MakeWayForCommand(); },
+                 .polled = [this](std::uint8_t unit, bool replied) { facts_.NotePoll(unit, replied); },
                  .replaced = [this](std::uint8_t unit) { OnRead(unit); },
                  .sent = [this](std::uint8_t unit) { OnSent(unit); }}),
       live_test_(link, timers, boxes, commands_.running, *connection_, *servo_, *live_test_area_,
@@ -115,7 +117,10 @@ void frmNewServoConfig::Connect() {
   connect(choices_, &ChannelChoices::KindChosen, c, [this](std::int16_t kind) { OnKindChosen(kind); });
   connect(choices_, &ChannelChoices::OptionChosen, c, [this] { NoteStep(QStringLiteral("Option")); });
   connect(choices_, &ChannelChoices::PresetChosen, c, [this](std::size_t preset) { OnPresetChosen(preset); });
-  connect(live_test_area_, &LiveTestArea::SliderMoved, c, [this] { live_test_.OnSlider(); });
+  connect(live_test_area_, &LiveTestArea::SliderMoved, c, [this] {
+    live_test_.OnSlider();
+    facts_.Show();
+  });
   connect(live_test_area_, &LiveTestArea::SliderSendsChanged, c, [this] {
     EnableControls();
     live_test_.OnSliderSends();
@@ -142,6 +147,12 @@ void frmNewServoConfig::Connect() {
     OpenManual(boxes_);
   });
   connect(menu_, &MainMenu::AboutChosen, c, [this] { ShowAbout(*this, info_); });
+  connect(menu_, &MainMenu::StopChosen, c, [this] { live_test_.EndSweep(); });
+  connect(&status_->Moving(), &MovingLine::StopPressed, c, [this] {
+    if (!live_test_.EndSweep()) live_test_area_->ClearSliderSends();
+  });
+  new EscapeKey(*this, {[this] { return summary_ != nullptr && summary_->CloseNumberEntry(); },
+                        [this] { return live_test_.EndSweep(); }, [this] { return commands_.Cancel(); }});
   connect(progress_, &ProgressArea::CancelPressed, c, [this] { commands_.Cancel(); });
   commands_.running.SetObserver([this] { OnRunning(); });
   commands_.running.SetReporter([this](const CommandReport& report) { OnReport(report); });
@@ -157,6 +168,7 @@ void frmNewServoConfig::ShowPort() {
   const PortFacts facts = ports_.Facts();
   status_->ShowPort(QString::fromStdString(PortSentence(facts)));
   status_->ShowBorrowed(QString::fromStdString(BorrowedPortSentence(facts)));
+  facts_.Show();
 }
 
 void frmNewServoConfig::StartUp() {
@@ -166,6 +178,7 @@ void frmNewServoConfig::StartUp() {
   control_panel_.InitializeCommListenerInterface();
   ShowRecords();
   ShowOrigin();
+  facts_.Show();
 }
 
 void frmNewServoConfig::OnRunning() {
@@ -196,6 +209,8 @@ void frmNewServoConfig::EnableControls() {
                               ? QStringLiteral("The command ends with the unit's last reply.")
                               : QString());
   ShowUndo();
+  menu_->EnableStop(live_test_area_->Sweeps());
+  facts_.Show();
 }
 
 // The window is painted first: the summary has more controls than everything else, and the icon has to be decoded.

@@ -32,6 +32,7 @@
 #include "ui/status_line.h"
 #include "ui/summary_area.h"
 #include "ui/undo_history.h"
+#include "ui/window_facts.h"
 #include "unitops/control_panel.h"
 #include "unitops/live_test.h"
 #include "unitops/port_selection.h"
@@ -125,6 +126,7 @@ class frmNewServoConfig : public QMainWindow {
   Simulators simulators_{*channels_, *servo_, parameters_->Scale(), config_.Editor()};
   LiveTest live_test_;
   CommandFocus command_focus_{*this};
+  WindowFacts facts_{link_, *connection_, *servo_, commands_.running, *live_test_area_, *status_};
   QPointer<QWidget> focus_before_summary_;
 
   std::unique_ptr<Timer> tmrSummaryScreen_;

@@ -40,6 +40,7 @@ void frmNewServoConfig::SelectChannel(std::size_t channel) {
   channels_->ShowSelected(channel);
   ShowEditor();
   live_test_.OnSlider();
+  facts_.Show();
 }
 
 void frmNewServoConfig::ShowEditor() {
@@ -162,6 +163,7 @@ void frmNewServoConfig::NoteStep(const QString& what, bool goes_on) {
 
 void frmNewServoConfig::ShowOrigin() {
   status_->ShowOrigin(QString::fromStdString(config_.Origin().Sentence()));
+  channels_->ShowChanged(config_.Origin().ChangedChannels());
 }
 
 void frmNewServoConfig::ShowUndo() {

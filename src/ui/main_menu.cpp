@@ -84,6 +84,8 @@ void MainMenu::AddUnitMenu(QWidget& window) {
   ShowWayBack(false, {});
   menu.addSeparator();
   AddTests(*menu.addMenu(QStringLiteral("&Test")), window);
+  // Its key is shown, not bound: a list or field that has the focus needs it first.
+  stop_ = AddItem(menu, "Stop\tEsc", "", this, &MainMenu::StopChosen);
   menu.addSeparator();
   AddItem(menu, window, kChangeIdItem);
   menu.addSeparator();

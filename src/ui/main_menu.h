@@ -25,6 +25,8 @@ class MainMenu : public QMenuBar {
   void ShowUndo(bool may_undo, const QString& undo, bool may_redo, const QString& redo);
   // Names the reading that can be restored ("Unit 01 Held at 14:02"), and enables it when it may be.
   void ShowWayBack(bool enabled, const QString& what);
+  // Enables "Stop" while a sweep runs.
+  void EnableStop(bool enabled) { stop_->setEnabled(enabled); }
   // Enables the steps through the unit IDs.
   void EnableIdSteps(bool enabled);
 
@@ -37,6 +39,8 @@ class MainMenu : public QMenuBar {
   void UndoChosen();
   void RedoChosen();
   void RestoreChosen();
+  // End the sweep.
+  void StopChosen();
   // Put the status bar's text on the clipboard.
   void CopyStatusChosen();
   void ManualChosen();
@@ -60,6 +64,7 @@ class MainMenu : public QMenuBar {
   QAction* redo_ = nullptr;
   QAction* restore_ = nullptr;
   QAction* dark_ = nullptr;
+  QAction* stop_ = nullptr;
 };
 
 // Puts the selected text of the focused control on the clipboard, or else its value. Does nothing when it has neither.

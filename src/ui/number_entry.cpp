@@ -97,14 +97,15 @@ void NumberEntry::Leave() {
   Close();
 }
 
-void NumberEntry::Close() {
+bool NumberEntry::Close() {
   tmrAdjustDual_->SetEnabled(false);
   for (CalmSpinBox* spin : spnSumValue_) spin->PutBack();
   editor_.CloseNumberEntry();
-  if (!isVisible()) return;
+  if (!isVisible()) return false;
   const bool had_focus = isAncestorOf(window()->focusWidget());
   hide();
   if (had_focus && text_) text_->setFocus();
+  return true;
 }
 
 bool NumberEntry::Repeats() const {

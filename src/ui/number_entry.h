@@ -26,11 +26,10 @@ class NumberEntry : public PopUp {
 
   // Opens beside `text`, which shows `field` of `channel`, 0 to 7.
   void OpenNumberEntry(std::size_t channel, SummaryField field, QWidget& text);
-  // Closes the panel if it is open, and drops what is typed.
-  void Close();
+  // Closes the panel, and drops what is typed. False: it is not open.
+  bool Close();
   // The same, but what is typed takes effect.
   void Leave();
-  bool Open() const { return editor_.OpenEntry().has_value(); }
   // Whether the change that is reported just now goes on with the one before.
   bool Repeats() const;
 

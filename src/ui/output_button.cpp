@@ -27,17 +27,26 @@ void OutputButton::Select(bool selected) {
   update();
 }
 
+void OutputButton::Mark(bool marked) {
+  if (marked == marked_) return;
+  marked_ = marked;
+  update();
+}
+
 void OutputButton::paintEvent(QPaintEvent* event) {
   if (!selected_) QPushButton::paintEvent(event);
   QPainter painter(this);
-  painter.setPen(selected_ ? QColor(Qt::white) : palette().color(QPalette::ButtonText));
+  const QColor colour = selected_ ? QColor(Qt::white) : palette().color(QPalette::ButtonText);
+  painter.setPen(colour);
   if (selected_) {
     PaintSelection(painter, rect(), palette(), ToColour(kSelectedBackground), hasFocus());
     painter.drawText(rect(), Qt::AlignCenter, text());
   }
+  if (marked_) PaintMark(painter, rect(), colour);
   QFont regular = font();
   regular.setBold(false);
   painter.setFont(regular);
+  painter.setPen(colour);
   painter.drawText(rect().adjusted(0, 0, 0, -kCaptionMargin), Qt::AlignHCenter | Qt::AlignBottom, caption_);
 }
 

@@ -17,6 +17,8 @@ class OutputButton : public QPushButton {
   bool Selected() const { return selected_; }
   // Assistive technology is notified of a change.
   void Select(bool selected);
+  // See ServoSimulator::Mark().
+  void Mark(bool marked);
 
  protected:
   void paintEvent(QPaintEvent* event) override;
@@ -24,6 +26,7 @@ class OutputButton : public QPushButton {
  private:
   const QString caption_;
   bool selected_ = false;
+  bool marked_ = false;
 };
 
 }  // namespace tendril

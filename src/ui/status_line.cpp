@@ -11,7 +11,7 @@ namespace tendril {
 namespace {
 
 constexpr int kApart = 12;             // between two facts
-constexpr int kOneLineOfFacts = 1200;  // the width from which they have room beside what moves
+constexpr int kOneLineOfFacts = 1260;  // the width from which they have room beside what moves
 
 }  // namespace
 
@@ -33,13 +33,13 @@ StatusLine::StatusLine()
   auto* column = AddLayout<QVBoxLayout>(lines, {6, 0, 0, 0}, 1);  // below the areas of the window
   facts_ = new QBoxLayout(QBoxLayout::TopToBottom);
   facts_->setSpacing(1);
-  facts_->addWidget(moving_, 2);
+  facts_->addWidget(moving_, 1);
   auto* three = new QHBoxLayout;
   three->setSpacing(kApart);
-  three->addWidget(lblPort_, 7);
-  three->addWidget(lblUnit_, 4);
-  three->addWidget(lblOrigin_, 8);
-  facts_->addLayout(three, 5);
+  three->addWidget(lblPort_, 13);
+  three->addWidget(lblUnit_, 8);
+  three->addWidget(lblOrigin_, 15);
+  facts_->addLayout(three, 2);
   column->addLayout(facts_);
   auto* sentence = new QHBoxLayout;
   sentence->addWidget(lblStatus_, 1);
@@ -61,6 +61,7 @@ void StatusLine::Say(const QString& sentence) {
   const QString both = earlier_.isEmpty() ? sentence : sentence + QStringLiteral(". ") + earlier_;
   earlier_.clear();
   lblStatus_->setText(both);
+  lblStatus_->setToolTip(both);
   lblStatus_->Announce(both);
 }
 
@@ -70,6 +71,12 @@ void StatusLine::SayTwice(const QString& sentence) {
   earlier_ = sentence;
 }
 
-void StatusLine::Copy() const { QGuiApplication::clipboard()->setText(lblStatus_->text()); }
+void StatusLine::Copy() const {
+  QString text = lblStatus_->text();
+  for (const auto* fact : findChildren<ElidedLabel*>()) {
+    if (!fact->text().isEmpty()) text += QLatin1Char('\n') + fact->text();
+  }
+  QGuiApplication::clipboard()->setText(text);
+}
 
 }  // namespace tendril

@@ -36,7 +36,7 @@ class StatusLine : public QStatusBar {
   void OfferUndo(bool offer) { cmdUndo_->setVisible(offer); }
   // The line that shows what moves.
   MovingLine& Moving() { return *moving_; }
-  // Puts the sentence on the clipboard.
+  // Puts the sentence and the facts on the clipboard, each in a line of its own.
   void Copy() const;
 
  Q_SIGNALS:

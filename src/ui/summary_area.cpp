@@ -1,7 +1,6 @@
 #include "ui/summary_area.h"
 
 #include <QFrame>
-#include <QKeyEvent>
 #include <QPainter>
 #include <QRadioButton>
 #include <QVBoxLayout>
@@ -275,14 +274,6 @@ void SummaryArea::ShowTexts(std::size_t channel) {
                                           QString::number(record.DefaultPosition)};
   for (std::size_t value = 0; value < texts.size(); ++value)
     rows_[channel].texts[value]->setText(texts[value]);
-}
-
-void SummaryArea::keyPressEvent(QKeyEvent* event) {
-  if (event->key() == Qt::Key_Escape && entry_->Open()) {
-    entry_->Close();
-  } else {
-    QWidget::keyPressEvent(event);
-  }
 }
 
 void SummaryArea::TakeFocus() {

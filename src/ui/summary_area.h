@@ -40,8 +40,8 @@ class SummaryArea : public QWidget {
   void EnableControls(const QString& running_command);
   // Gives the focus to the first value, if there is one.
   void TakeFocus();
-  // Closes the number entry, if it is open.
-  void CloseNumberEntry() { entry_->Close(); }
+  // Closes the number entry. False: it is not open.
+  bool CloseNumberEntry() { return entry_->Close(); }
   // Whether the change that is reported just now goes on with the one before.
   bool Repeats() const { return entry_->Repeats(); }
 
@@ -55,9 +55,6 @@ class SummaryArea : public QWidget {
   void OptionChosen();
   // A number typed into the number entry cannot be taken; see CalmSpinBox.
   void NumberDropped(const QString& typed, const QString& sentence);
-
- protected:
-  void keyPressEvent(QKeyEvent* event) override;
 
  private:
   static constexpr std::size_t kTexts = 5;

@@ -83,6 +83,12 @@ void LiveTest::OnTestButton(int button) {
   Guarded([&] { Press(button); });
 }
 
+bool LiveTest::EndSweep() {
+  if (!sweep_) return false;
+  OnTestButton(*sweep_);
+  return true;
+}
+
 void LiveTest::Press(int button) {
   const bool was_running = sweep_ == button;
   StopSweep();

@@ -89,6 +89,8 @@ class LiveTest {
   // the actual range, move to the centre. kNoButton resets the captions and stops a sweep where it is. Shows
   // every failure; raises none.
   void OnTestButton(int button);
+  // Ends a sweep as the second press of its button does. False: none runs.
+  bool EndSweep();
   // The slider was moved, or the range that it spans has changed by an edit.
   void OnSlider();
   // The records were replaced: shows the slider again and sends nothing; a position that still waits is dropped.

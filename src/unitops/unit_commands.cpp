@@ -25,8 +25,10 @@ void UnitCommands::Stop() {
   if (running.Active()) running.Operation()->Stop();
 }
 
-void UnitCommands::Cancel() {
-  if (running.Active()) running.Operation()->Cancel();
+bool UnitCommands::Cancel() {
+  if (!running.Active()) return false;
+  running.Operation()->Cancel();
+  return true;
 }
 
 }  // namespace tendril

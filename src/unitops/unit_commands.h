@@ -40,8 +40,8 @@ struct UnitCommands {
   // Stops the running command and shows nothing: the window is closing.
   void Stop();
   // Ends the running command, if there is one, as the user wishes: as failed, and without a box. An outstanding poll
-  // ends first.
-  void Cancel();
+  // ends first. False: no command runs.
+  bool Cancel();
 
   RunningCommand running;
   CommandContext context;

@@ -18,10 +18,15 @@ std::string WhyDrawingOnly(const MovingFacts& facts) {
 
 std::string MovingSentence(const MovingFacts& facts) {
   if (facts.moves == Moves::kNothing) return "Nothing moves";
-  if (const std::string why = WhyDrawingOnly(facts); !why.empty()) return "Drawing only: " + why;
+  const bool sweep = facts.moves == Moves::kSweep;
+  if (facts.command_runs && !sweep) return "The slider waits: a command runs";
+  if (const std::string why = WhyDrawingOnly(facts); !why.empty())
+    return (sweep ? "Drawing only: " : "The slider only draws: ") + why;
   const std::string servo = "channel " + std::to_string(*facts.channel + 1) + " of " +
                             (facts.unit == kAllUnits ? "every unit" : "unit " + HexByte(facts.unit));
-  return facts.moves == Moves::kSweep ? "Moving " + servo : "The slider moves " + servo;
+  if (sweep) return "Moving " + servo;
+  if (facts.port_open) return "The slider moves " + servo;
+  return "The slider's next move opens Comm " + std::to_string(facts.port);
 }
 
 }  // namespace tendril

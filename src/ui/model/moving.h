@@ -15,6 +15,7 @@ enum class Moves { kNothing, kSweep, kSlider };
 struct MovingFacts {
   Moves moves = Moves::kNothing;
   std::int16_t port = 0;  // the chosen comm port; 0: none
+  bool port_open = false;
   std::uint8_t unit = 0;
   std::optional<std::size_t> channel;  // 0 to 7
   bool command_runs = false;
@@ -22,7 +23,8 @@ struct MovingFacts {
   bool operator==(const MovingFacts&) const = default;
 };
 
-// "Nothing moves", "Moving channel 3 of unit 01", "Drawing only: no port chosen" ...
+// "Nothing moves", "Moving channel 3 of unit 01", "Drawing only: no port chosen" ... A command of the live test opens
+// the chosen port when it is closed.
 std::string MovingSentence(const MovingFacts& facts);
 
 }  // namespace tendril

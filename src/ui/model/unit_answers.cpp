@@ -1,0 +1,18 @@
+#include "ui/model/unit_answers.h"
+
+#include "platform/hex_text.h"
+
+namespace tendril {
+
+void UnitAnswers::Note(std::int16_t port, std::uint8_t unit, bool replied, const std::string& time) {
+  polls_[{port, unit}] = {replied, time};
+}
+
+std::string UnitAnswers::Sentence(std::int16_t port, std::uint8_t unit) const {
+  const std::string name = "Unit " + HexByte(unit);
+  const auto poll = polls_.find({port, unit});
+  if (poll == polls_.end()) return name + ": not asked yet";
+  return name + (poll->second.replied ? " answered at " : ": no answer at ") + poll->second.time;
+}
+
+}  // namespace tendril
