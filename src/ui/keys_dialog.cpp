@@ -30,7 +30,8 @@ constexpr std::array<GeneralKey, 9> kGeneralKeys{
      {"Page Up, Page Down", "A number by 100 µs; the slider by 10 %"},
      {"F4, Alt+Down", "Opens a list"},
      {"Enter", "A typed number takes effect"},
-     {"Escape", "Closes the number entry, a list, or this window; then ends a servo test; then cancels a command"}}};
+     {"Escape",
+      "Closes the number entry, a list, or this window; then ends a servo test; then cancels a command"}}};
 
 QTreeWidgetItem* AddGroup(QTreeWidget& list, const QString& title) {
   auto* group = new QTreeWidgetItem(&list, {title});

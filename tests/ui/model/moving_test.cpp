@@ -33,8 +33,10 @@ TEST(Moving, SaysWhatReachesAServo) {
            {with(sweep, [](auto& facts) { facts.command_runs = true; }), "Drawing only: a command runs"},
            {slider, "The slider moves channel 3 of unit 0A"},
            {with(slider, no_channel), "The slider only draws: no channel chosen"},
-           {with(slider, [](auto& facts) { facts.port_open = false; }), "The slider's next move opens Comm 3"},
-           {with(slider, [](auto& facts) { facts.command_runs = true; }), "The slider waits: a command runs"}}) {
+           {with(slider, [](auto& facts) { facts.port_open = false; }),
+            "The slider's next move opens Comm 3"},
+           {with(slider, [](auto& facts) { facts.command_runs = true; }),
+            "The slider waits: a command runs"}}) {
     EXPECT_EQ(MovingSentence(facts), sentence);
   }
 }
