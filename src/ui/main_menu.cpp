@@ -104,6 +104,8 @@ void MainMenu::AddEditMenu(QWidget& window) {
   QMenu& menu = AddMenu(*this, "&Edit");
   undo_ = AddItem(menu, "", "Ctrl+Z", this, &MainMenu::UndoChosen);
   redo_ = AddItem(menu, "", "Ctrl+Shift+Z", this, &MainMenu::RedoChosen);
+  undo_->setObjectName("actUndo");
+  redo_->setObjectName("actRedo");
   redo_->setShortcuts({Key("Ctrl+Shift+Z"), Key("Ctrl+Y")});
   ShowUndo(false, {}, false, {});
   menu.addSeparator();

@@ -129,6 +129,7 @@ bool Simulation::AllRecordsValid() const {
 
 void Simulation::OnWritten(std::span<const std::uint8_t> bytes) {
   Require(!closed_, "a closed window sends nothing");
+  Require(!undoing_, "undo sends nothing");
   for (const Bytes& packet : SplitPackets(bytes)) OnPacket(packet);
 }
 
@@ -214,8 +215,9 @@ void Simulation::EndOperation() {
   const std::string outcome = Find<QLabel>("lblProgress").text().toStdString();
   const bool success = outcome.starts_with("SUCCESS");
   Note(operation_.what + " ended: " + outcome);
-  Require(BoxesShown() - operation_.boxes_before == (success ? 0 : 1),
-          "a failure shows one box, a success none");
+  const std::size_t boxes = BoxesShown() - operation_.boxes_before;
+  Require(boxes == (success ? 0 : 1) || (boxes == 0 && operation_.cancelled),
+          "a failure shows one box, a success and a cancel none");
   if (!success) {
     Require(outcome == "COMMAND FAILED!" || !AllRecordsValid(), "a command ends with one of its outcomes");
     return;

@@ -51,7 +51,8 @@ class Simulation {
     int max_polls = 0;  // of one step
     std::int32_t comm_port = 0;
     bool running = false;
-    bool swept = false;  // a sweep ran when the command was pressed
+    bool swept = false;      // a sweep ran when the command was pressed
+    bool cancelled = false;  // perhaps
     std::uint8_t unit = 0;
     std::size_t boxes_before = 0;
     std::uint64_t last_activity_ms = 0;
@@ -78,6 +79,9 @@ class Simulation {
   void ChooseUnit(std::uint8_t id);
   void UseSlider();
   void UseAnyControl();
+  void TypeAnything();
+  void PressEscape();
+  void UndoOrRedo();
   void Use(QWidget& control);
   void RunCommand(QAbstractButton& button);
   void Close();
@@ -137,6 +141,7 @@ class Simulation {
   Operation operation_;
   ChannelTable records_;  // as the user left them, or a get that succeeded
   bool using_test_button_ = false;
+  bool undoing_ = false;
   bool calm_ = false;  // nothing goes wrong any more
   bool closed_ = false;
   std::uint64_t polls_ = 0;

@@ -1,6 +1,7 @@
 // What the world and the user do in a simulation.
 #include <QAbstractButton>
 #include <QAbstractSlider>
+#include <QAction>
 #include <QApplication>
 #include <QComboBox>
 #include <QSpinBox>
@@ -190,6 +191,12 @@ void Simulation::ActAsUser() {
     UseSlider();
   } else if (act <= 60 && SummaryShown()) {
     Use(Find(random_.Pick(std::array{"cmdShowConfig", "spnSumValue_0"})));
+  } else if (act <= 64) {
+    TypeAnything();
+  } else if (act <= 68) {
+    PressEscape();
+  } else if (act <= 76) {
+    UndoOrRedo();
   } else {
     UseAnyControl();
   }
@@ -237,10 +244,11 @@ void Simulation::UseAnyControl() {
 void Simulation::Use(QWidget& control) {
   const std::string name = control.objectName().toStdString();
   if (!Usable(control) || name == "cmbNYX") return;
+  if (name == "cmdCancel") operation_.cancelled = true;
   Note("the user uses " + name);
   if (auto* button = qobject_cast<QAbstractButton*>(&control)) {
     if (name.starts_with("Command3_")) return RunCommand(*button);
-    using_test_button_ = name.starts_with("cmdTest_");
+    using_test_button_ = name.starts_with("cmdTest_") || name == "cmdStop";
     button->click();
     using_test_button_ = false;
   } else if (auto* list = qobject_cast<QComboBox*>(&control)) {
@@ -255,6 +263,64 @@ void Simulation::Use(QWidget& control) {
     QTest::mouseClick(&control, Qt::LeftButton);
   }
   records_ = window_->WorkingConfiguration();
+}
+
+void Simulation::TypeAnything() {
+  auto& spin = Find<QSpinBox>(
+      SummaryShown() ? "spnSumValue_0"
+                     : random_.Pick(std::array{"spnActPulseRange", "spnVirtPulseRange", "spnNeutralTrim",
+                                               "spnLeftVirtStop", "spnDefaultPos"}));
+  if (!Usable(spin)) return;
+  const auto text = QString::fromLatin1(random_.Pick(
+      std::array{"2400", "-1500", "99999999999999999999", "abc", "", "-", "+20", "1e3", "12a", "55"}));
+  Note("the user types " + text.toStdString() + " into " + spin.objectName().toStdString());
+  bool number = false;
+  const int value = text.toInt(&number);
+  const bool taken = number && value >= spin.minimum() && value <= spin.maximum();
+  spin.setFocus();
+  spin.selectAll();
+  QTest::keyClick(&spin, Qt::Key_Delete);
+  QTest::keyClicks(&spin, text);
+  Require(window_->WorkingConfiguration() == records_, "what is typed is not stored before it is complete");
+  const bool entered = random_.Chance(60);
+  QTest::keyClick(&spin, entered ? Qt::Key_Return : Qt::Key_Escape);
+  Require((entered && taken) || window_->WorkingConfiguration() == records_,
+          "only a number within the limits is stored");
+  records_ = window_->WorkingConfiguration();
+}
+
+void Simulation::PressEscape() {
+  Note("the user presses Escape");
+  const bool swept = SweepRuns();
+  const bool slider = Find<QAbstractButton>("chkSendSlideCommands").isChecked();
+  operation_.cancelled |= operation_.running;
+  using_test_button_ = true;  // the end of a sweep moves the servo to the centre
+  QTest::keyClick(window_.get(), Qt::Key_Escape);
+  using_test_button_ = false;
+  Require(!swept || !SweepRuns(), "Escape ends a sweep");
+  Require(slider == Find<QAbstractButton>("chkSendSlideCommands").isChecked(),
+          "Escape leaves the slider alone");
+}
+
+void Simulation::UndoOrRedo() {
+  auto* undo = window_->findChild<QAction*>(QStringLiteral("actUndo"));
+  auto* redo = window_->findChild<QAction*>(QStringLiteral("actRedo"));
+  Require(!(SweepRuns() || CommandRuns()) || !(undo->isEnabled() || redo->isEnabled()),
+          "undo is off while something moves or a command runs");
+  for (const auto& [action, back] : {std::pair(undo, redo), {redo, undo}}) {
+    if (!action->isEnabled() || random_.Chance(30)) continue;
+    Note("the user chooses " + action->text().toStdString());
+    undoing_ = true;
+    action->trigger();
+    const ChannelTable there = window_->WorkingConfiguration();
+    back->trigger();
+    Require(window_->WorkingConfiguration() == records_,
+            "redo takes back what undo did, and undo what redo did");
+    action->trigger();
+    Require(window_->WorkingConfiguration() == there, "undo is the same each time");
+    undoing_ = false;
+    records_ = there;
+  }
 }
 
 void Simulation::RunCommand(QAbstractButton& button) {
