@@ -32,11 +32,11 @@ ChannelChoices::ChannelChoices(ChannelEditor& editor, const ChannelTable& workin
           [this](int id) { Q_EMIT KindChosen(static_cast<std::int16_t>(id - 1)); });
   connect(optPowerUp_, &QButtonGroup::idClicked, this, [this](int id) {
     editor_.SetPowerUpOption(id);
-    Q_EMIT OptionChosen();
+    Q_EMIT OptionChosen(QStringLiteral("Power Up Parameters"));
   });
   connect(optLostComm_, &QButtonGroup::idClicked, this, [this](int id) {
     editor_.SetLostCommOption(id);
-    Q_EMIT OptionChosen();
+    Q_EMIT OptionChosen(QStringLiteral("Lost Communications Parameters"));
   });
 }
 

@@ -33,8 +33,8 @@ class ChannelChoices : public QWidget {
  Q_SIGNALS:
   // The user chose an output kind, 0 to 2.
   void KindChosen(std::int16_t kind);
-  // The user chose an option; the records hold it.
-  void OptionChosen();
+  // The user chose an option of `what`; the records hold it.
+  void OptionChosen(const QString& what);
   // The user chose this row of kPresets.
   void PresetChosen(std::size_t preset);
 

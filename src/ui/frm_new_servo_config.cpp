@@ -105,7 +105,8 @@ void frmNewServoConfig::Connect() {
   connect(apply_boxes_, &ApplyBoxes::Applied, c, [this] { OnApplied(); });
   connect(channels_, &ChannelStrip::ChannelChosen, c,
           [this](std::size_t channel) { ChooseChannel(channel); });
-  connect(parameters_, &MotionParameters::Edited, c, [this](FollowUp follow_up) { OnEdited(follow_up); });
+  connect(parameters_, &MotionParameters::Edited, c,
+          [this](const QString& what, FollowUp follow_up) { OnEdited(what, follow_up); });
   connect(parameters_, &MotionParameters::LabelPressed, c,
           [this](const QWidget* label) { actuals_->ShowActuals(*label); });
   connect(parameters_, &MotionParameters::NumberDropped, c,
@@ -115,7 +116,7 @@ void frmNewServoConfig::Connect() {
     live_test_.OnTestButton(button);
   });
   connect(choices_, &ChannelChoices::KindChosen, c, [this](std::int16_t kind) { OnKindChosen(kind); });
-  connect(choices_, &ChannelChoices::OptionChosen, c, [this] { NoteStep(QStringLiteral("Option")); });
+  connect(choices_, &ChannelChoices::OptionChosen, c, [this](const QString& what) { NoteStep(what); });
   connect(choices_, &ChannelChoices::PresetChosen, c, [this](std::size_t preset) { OnPresetChosen(preset); });
   connect(live_test_area_, &LiveTestArea::SliderMoved, c, [this] {
     live_test_.OnSlider();
@@ -234,7 +235,7 @@ void frmNewServoConfig::MakeSummary() {
   connect(summary_, &SummaryArea::SendPressed, &connections_, [this] { commands_.send.Start(); });
   connect(summary_, &SummaryArea::GetPressed, &connections_, [this] { commands_.get.Start(); });
   connect(summary_, &SummaryArea::OptionChosen, &connections_,
-          [this] { NoteStep(QStringLiteral("Option")); });
+          [this](std::size_t channel) { NoteStep(QStringLiteral("Option of channel %1").arg(channel + 1)); });
   connect(summary_, &SummaryArea::SimulatorPressed, &connections_, [this] { ShowConfig(); });
   connect(summary_, &SummaryArea::NumberDropped, &connections_,
           [this](const QString& typed, const QString& sentence) { OnNumberDropped(typed, sentence); });
@@ -243,7 +244,7 @@ void frmNewServoConfig::MakeSummary() {
     config_.Remarks().AcceptRecord(channel);
     config_.Editor().ReloadChannel();
     ShowRemarks();
-    NoteStep(QStringLiteral("Edit in the summary"), summary_->Repeats());
+    NoteStep(QStringLiteral("Edit of channel %1").arg(channel + 1), summary_->Repeats());
   });
 }
 

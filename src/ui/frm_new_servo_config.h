@@ -64,7 +64,7 @@ class frmNewServoConfig : public QMainWindow {
   void ChooseChannel(std::size_t channel);
   void SelectChannel(std::size_t channel);
   void ShowEditor();
-  void OnEdited(FollowUp follow_up);
+  void OnEdited(const QString& what, FollowUp follow_up);
   void OnApplied();
   void OnKindChosen(std::int16_t kind);
   void OnPresetChosen(std::size_t preset);

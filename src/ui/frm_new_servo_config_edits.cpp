@@ -62,7 +62,7 @@ void frmNewServoConfig::ShowRemarks() {
   }
 }
 
-void frmNewServoConfig::OnEdited(FollowUp follow_up) {
+void frmNewServoConfig::OnEdited(const QString& what, FollowUp follow_up) {
   ForgetDropped();
   config_.Remarks().AcceptEdit();
   ShowEditor();
@@ -71,7 +71,7 @@ void frmNewServoConfig::OnEdited(FollowUp follow_up) {
   } else {
     simulators_.UpdateSimulators(live_test_.ShownPosition());
   }
-  NoteStep(QStringLiteral("Edit"), parameters_->Repeats());
+  NoteStep(what, parameters_->Repeats());
 }
 
 void frmNewServoConfig::OnApplied() {

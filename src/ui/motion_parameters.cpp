@@ -187,8 +187,10 @@ void MotionParameters::AddParameters(QGridLayout& grid) {
 CalmSpinBox* MotionParameters::MakeSpin(std::size_t index) {
   auto* spin = Named(new CalmSpinBox, kRows[index].spin);
   spin->setAccessibleName(QString::fromUtf8(kRows[index].name));
-  connect(spin, &QSpinBox::valueChanged, this,
-          [this, index](int value) { Q_EMIT Edited(editor_.Change(static_cast<Parameter>(index), value)); });
+  connect(spin, &QSpinBox::valueChanged, this, [this, index](int value) {
+    const FollowUp follow_up = editor_.Change(static_cast<Parameter>(index), value);
+    Q_EMIT Edited(QString::fromUtf8(kRows[index].name), follow_up);
+  });
   connect(spin, &CalmSpinBox::HintChanged, this, [this, spin](const QString& hint) {
     typed_->ShowHint(spin->accessibleName(), hint);
     heading_->setVisible(hint.isEmpty());

@@ -45,8 +45,8 @@ class MotionParameters : public QGroupBox {
   bool Repeats() const;
 
  Q_SIGNALS:
-  // The user has changed the records.
-  void Edited(FollowUp follow_up);
+  // The user has changed `what` in the records.
+  void Edited(const QString& what, FollowUp follow_up);
   // The user pressed a parameter's label.
   void LabelPressed(const QWidget* label);
   // The user pressed a test button, 0 to 4.

@@ -106,7 +106,21 @@ TEST_F(Undoing, ShowsWhatItBrought) {
   Undo();
   EXPECT_EQ(Text("txtSumVirtualRange_1"), "1000-2000");
   Redo();
-  EXPECT_EQ(Text("txtSumVirtualRange_1", "lblStatus"), "990-2010 Done again: Edit");
+  EXPECT_EQ(Text("txtSumVirtualRange_1", "lblStatus"), "990-2010 Done again: Virtual Pulse Range");
+}
+
+TEST_F(Undoing, HeldArrowIsOneStep) {
+  Click("ServoSimulator2_1");
+  ArrowUp("spnDefaultPos");
+  for (const bool repeated : {false, true, true, true}) {
+    QKeyEvent press(QEvent::KeyPress, Qt::Key_Up, Qt::NoModifier, {}, repeated);
+    QApplication::sendEvent(&Spin("spnDefaultPos"), &press);
+  }
+  EXPECT_EQ(Record(1).DefaultPosition, 1550);
+  Undo();
+  EXPECT_EQ(Record(1).DefaultPosition, 1510);
+  Redo();
+  EXPECT_EQ(Record(1).DefaultPosition, 1550);
 }
 
 TEST_F(Undoing, StepsOfTheSummaryLeaveNothingToStore) {
