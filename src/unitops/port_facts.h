@@ -14,7 +14,7 @@ namespace tendril {
 enum class PortFault {
   kNone,  // it is open, or was closed by the program
   kInUse,
-  kControlPanelUsesIt,
+  kControlPanelHasIt,
   kNotAllowed,
   kGone,   // its device was unplugged
   kOther,  // see PortFacts::reason
@@ -28,7 +28,7 @@ struct PortFacts {
   std::string device = {};  // of the open port, for the user
   PortFault fault = PortFault::kNone;
   std::string reason = {};     // in the system's words
-  PortHolder holder = {};      // kInUse, kControlPanelUsesIt: which program has it open
+  PortHolder holder = {};      // kInUse, kControlPanelHasIt: which program has it open
   bool back = false;           // kGone: the device is there again
   std::int16_t requested = 0;  // the port that was asked of the Control Panel; 0: none
   PortControl request = PortControl::kNone;

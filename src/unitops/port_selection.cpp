@@ -82,12 +82,12 @@ void PortSelection::Choose(std::size_t entry) {
     link_.SetBaudRate(kNetworkBaudRate);
     link_.SetPortOpen(true);
     link_.SetRTS(true);
-    choosing_ = false;
-    Changed();
   } catch (...) {
     choosing_ = false;
-    ReportPortOpenError(CurrentFault());
+    return ReportPortOpenError(CurrentFault());
   }
+  choosing_ = false;
+  Changed();
 }
 
 // A port that closes while none is being chosen has lost its device, unless the program has set another one: it does so
@@ -132,7 +132,7 @@ void PortSelection::ReportPortOpenError(const RuntimeError& fault) {
 void PortSelection::KeepWhyNotOpen(const RuntimeError& fault, bool control_panel) {
   switch (fault.number()) {
     case kErrPortAlreadyOpen:
-      kept_.fault = control_panel ? PortFault::kControlPanelUsesIt : PortFault::kInUse;
+      kept_.fault = control_panel ? PortFault::kControlPanelHasIt : PortFault::kInUse;
       kept_.holder = link_.ComPortHolder(kept_.chosen);
       return;
     case kErrNotAllowed:

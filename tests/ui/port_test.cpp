@@ -135,7 +135,7 @@ TEST_F(Ports, PortThatDoesNotOpen_StaysNamedWithTheReason) {
   world_.bench.SetAllowed(4, false);
   std::string behind_the_box;
   world_.boxes.while_open = [&] { behind_the_box = Text("lblPort"); };
-  for (const auto& [line, sentence] : {std::pair(3, "Comm 3 is not open: in use by picocom (process 812)"),
+  for (const auto& [line, sentence] : {std::pair(3, "Comm 3 is not open: picocom (process 812) has it"),
                                        std::pair(4, "Comm 4 is not open: you are not allowed to use it")}) {
     ChooseByKeys("cmbNYX", line);
     EXPECT_EQ(behind_the_box, sentence);
@@ -156,13 +156,13 @@ TEST_F(Ports, PortOfTheControlPanel_StaysInSight) {
     world_.time.Advance(2000);
     return before + "|" + Text("lblBorrowed") + "|" + Text("lblPort");
   };
-  EXPECT_EQ(ask(PanelBehaviour::kProper), "||Comm 3 is not open: the Control Panel uses it");
+  EXPECT_EQ(ask(PanelBehaviour::kProper), "||Comm 3 is not open: the Control Panel has it");
   world_.boxes.answer_yes = true;
   const std::string asked = "The Control Panel is asked for Comm 3 and has not answered yet.|";
   EXPECT_EQ(ask(PanelBehaviour::kRefuse),
             asked +
                 "The Control Panel refuses to give up Comm 3: shows go on using it.|Comm 3 is not open: the "
-                "Control Panel refuses to give it up");
+                "Control Panel keeps it");
   EXPECT_EQ(ask(PanelBehaviour::kSilent).substr(0, asked.size() + 34),
             asked + "The Control Panel was asked for Co");
   panel_.Take(3);
@@ -170,8 +170,7 @@ TEST_F(Ports, PortOfTheControlPanel_StaysInSight) {
       "Comm 3 is taken from the Control Panel: shows cannot use it. It goes back when this window is closed "
       "or "
       "another port is asked for.|";
-  EXPECT_EQ(ask(PanelBehaviour::kProper),
-            asked + taken + "Comm 3 is not open: the Control Panel has given it up, Enter opens it");
+  EXPECT_EQ(ask(PanelBehaviour::kProper), asked + taken + "Comm 3 is not open: given up, Enter opens it");
   Find("cmbNYX").setFocus();
   Key(Qt::Key_Return);
   EXPECT_TRUE(link_.PortOpen());

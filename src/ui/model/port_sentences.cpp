@@ -3,25 +3,25 @@
 namespace tendril {
 namespace {
 
-std::string InUse(const PortHolder& holder) {
-  if (holder.program.empty()) return "in use by another program";
-  if (holder.process == 0) return "in use, perhaps by " + holder.program;
-  return "in use by " + holder.program + " (process " + std::to_string(holder.process) + ")";
+std::string WhoHasIt(const PortHolder& holder) {
+  if (holder.program.empty()) return "another program has it";
+  if (holder.process == 0) return "perhaps " + holder.program + " has it";
+  return holder.program + " (process " + std::to_string(holder.process) + ") has it";
 }
 
 // For a port that the Control Panel has, or had until it was asked for it.
-std::string ControlPanelUsesIt(const PortFacts& facts) {
+std::string ControlPanelHasIt(const PortFacts& facts) {
   switch (facts.requested == facts.chosen ? facts.request : PortControl::kNone) {
     case PortControl::kNone:
-      return facts.holder.process == 0 ? "the Control Panel uses it" : InUse(facts.holder);
+      return facts.holder.process == 0 ? "the Control Panel has it" : WhoHasIt(facts.holder);
     case PortControl::kAsked:
       return "the Control Panel is asked for it";
     case PortControl::kGranted:
-      return "the Control Panel has given it up, Enter opens it";
+      return "given up, Enter opens it";
     case PortControl::kRefused:
-      return "the Control Panel refuses to give it up";
+      return "the Control Panel keeps it";
     case PortControl::kUnanswered:
-      return "the Control Panel does not answer";
+      return "the Control Panel is silent";
   }
   return {};
 }
@@ -31,9 +31,9 @@ std::string WhyNotOpen(const PortFacts& facts) {
     case PortFault::kNone:
       return {};
     case PortFault::kInUse:
-      return InUse(facts.holder);
-    case PortFault::kControlPanelUsesIt:
-      return ControlPanelUsesIt(facts);
+      return WhoHasIt(facts.holder);
+    case PortFault::kControlPanelHasIt:
+      return ControlPanelHasIt(facts);
     case PortFault::kNotAllowed:
       return "you are not allowed to use it";
     case PortFault::kGone:
