@@ -196,6 +196,13 @@ void Simulation::Check() {
               "no byte leaves while the line is released");
     }
   }
+  const QString port_sentence = Find<QLabel>("lblPort").text();
+  for (const std::int32_t port : kPorts) {
+    const QString name = QString::fromStdString(CommName(port));
+    const bool said_open = port_sentence.startsWith(name + QStringLiteral(" open: ")) ||
+                           port_sentence.endsWith(name + QStringLiteral(" is still open"));
+    Require(said_open == (OpenPort() == port), "the window says which port is open");
+  }
   if (boxes_open_ > 0) return;
   if (operation_.running) CheckCommand();
   if (SummaryShown()) records_ = window_->WorkingConfiguration();  // it changes records by showing them

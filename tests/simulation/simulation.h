@@ -75,7 +75,7 @@ class Simulation {
 
   // What the user does.
   void ActAsUser();
-  void ChoosePort(int line);
+  void ChoosePort(int number);
   void ChooseUnit(std::uint8_t id);
   void UseSlider();
   void UseAnyControl();

@@ -11,6 +11,7 @@
 
 #include "bench/faulty_units.h"
 #include "simulation/simulation.h"
+#include "ui/controls.h"
 
 namespace tendril::test {
 namespace {
@@ -204,9 +205,12 @@ void Simulation::ActAsUser() {
           "an act of the user brings up one box, or a question and its answer");
 }
 
-void Simulation::ChoosePort(int line) {
-  auto& ports = Find<QComboBox>("cmbNYX");
+void Simulation::ChoosePort(int number) {
+  auto& ports = Find<CalmComboBox>("cmbNYX");
   if (!Usable(ports)) return;
+  Q_EMIT ports.Opening();
+  const int line = number == 0 ? 0 : ports.findText(QString::fromStdString(CommName(number)));
+  if (line < 0) return;
   Note("the user chooses " + ports.itemText(line).toStdString());
   ports.setCurrentIndex(line);
   Q_EMIT ports.activated(line);
