@@ -4,6 +4,7 @@
 #include <gtest/gtest.h>
 
 #include "serial/hw_serial.h"
+#include "support/recording_device.h"
 #include "support/scripted_socket.h"
 #include "support/simulated_control_panel.h"
 
@@ -59,27 +60,11 @@ TEST_F(PortSelectionTest, List_HoldsThePortsThatExistUpTo25) {
   EXPECT_TRUE(link_.PortOpen());
 }
 
-// Two readings of the list: what is selected stays selected, also when the rest moves or its device is gone.
-TEST_F(PortSelectionTest, OpenedList_IsReadAgainAndKeepsTheSelection) {
-  world_.bench.Unplug(1);
-  world_.bench.AddPort(7);
-  std::size_t selected = 3;
-  EXPECT_THAT(selection_.RereadCommPorts(selected),
-              ElementsAre("Select", "Comm 2", "Comm 3", "Comm 4", "Comm 7"));
-  EXPECT_EQ(selected, 2u);
-  EXPECT_EQ(selection_.DescribePort(selected), "Virtual serial line 3");
+TEST_F(PortSelectionTest, DevicesOfTheLines_AreDescribed) {
+  EXPECT_EQ(selection_.DescribePort(2), "Virtual serial line 2");
   world_.bench.Unplug(3);
-  EXPECT_EQ(selection_.RereadCommPorts(selected).size(), 5u);
-  EXPECT_EQ(selected, 2u);
-  EXPECT_EQ(selection_.DescribePort(selected), "The device is not there at the moment.");
-  for (const std::size_t none : {0u, 5u}) {  // "Select", and beyond the list
-    EXPECT_EQ(selection_.DescribePort(none), "");
-    selected = none;
-    EXPECT_THAT(selection_.RereadCommPorts(selected), ElementsAre("Select", "Comm 2", "Comm 4", "Comm 7"));
-    EXPECT_EQ(selected, 0u);
-  }
-  selection_.Choose(3);
-  EXPECT_EQ(link_.CommPort(), 7);
+  EXPECT_EQ(selection_.DescribePort(3), "The device is not there at the moment.");
+  for (const std::size_t none : {0u, 5u}) EXPECT_EQ(selection_.DescribePort(none), "");
 }
 
 TEST_F(PortSelectionTest, FailedOpening_IsShownAndTheSameLineTriesAgain) {
@@ -100,6 +85,17 @@ TEST_F(PortSelectionTest, FailedOpening_IsShownAndTheSameLineTriesAgain) {
       testing::StartsWith("The serial port (Comm2) has a problem.\r\nYou may need to select another port."
                           "\r\n\r\nOpen of serial port 2 has failed\r\n\r\nError: (8002) Comm 2 "));
   EXPECT_EQ(world_.boxes.shown[0].icon, BoxIcon::kExclamation);
+}
+
+TEST_F(PortSelectionTest, ReasonOfAnyOtherFailure_IsKeptWithoutWhatTheLinkAdds) {
+  RecordingDevice device;
+  device.open_failure = RuntimeError(kErrSettingsRefused, "It does not do 19200 bit/s.");
+  HwSerial link(device, world_.time, world_.time, world_.log);
+  PortSelection selection(link, world_.boxes, panel_.control_panel);
+  selection.ListCommPorts();
+  selection.Choose(2);
+  EXPECT_EQ(selection.Facts().fault, PortFault::kOther);
+  EXPECT_EQ(selection.Facts().reason, "It does not do 19200 bit/s");
 }
 
 TEST_F(PortSelectionTest, PortOfTheControlPanel_IsAskedForAndOpensWhenItIsChosenAgain) {
