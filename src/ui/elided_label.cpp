@@ -6,9 +6,18 @@
 
 namespace tendril {
 
+void PaintElided(QLabel& label) {
+  QPainter painter(&label);
+  const QRect room = label.contentsRect();
+  label.style()->drawItemText(&painter, room, Qt::AlignLeft | Qt::AlignVCenter, label.palette(),
+                              label.isEnabled(),
+                              label.fontMetrics().elidedText(label.text(), Qt::ElideRight, room.width()),
+                              label.foregroundRole());
+}
+
 ElidedLabel::ElidedLabel(QString what) : what_(std::move(what)) {
   setTextFormat(Qt::PlainText);
-  setSizePolicy(QSizePolicy::Ignored, QSizePolicy::Fixed);
+  setSizePolicy(QSizePolicy::Preferred, QSizePolicy::Fixed);
   setAccessibleName(what_);
 }
 
@@ -19,11 +28,6 @@ void ElidedLabel::Show(const QString& text) {
   setAccessibleName(what_ + QStringLiteral(": ") + text);
 }
 
-void ElidedLabel::paintEvent(QPaintEvent* /*event*/) {
-  QPainter painter(this);
-  const QRect room = contentsRect();
-  style()->drawItemText(&painter, room, Qt::AlignLeft | Qt::AlignVCenter, palette(), isEnabled(),
-                        fontMetrics().elidedText(text(), Qt::ElideRight, room.width()), foregroundRole());
-}
+void ElidedLabel::paintEvent(QPaintEvent* /*event*/) { PaintElided(*this); }
 
 }  // namespace tendril

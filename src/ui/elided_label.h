@@ -6,8 +6,10 @@
 
 namespace tendril {
 
-// Shows as much of the text as there is room for. The tool tip and the accessible name have all of it. It asks for no
-// width, so that another text moves nothing around it.
+// Paints the text of `label`, with an ellipsis where the label is too narrow.
+void PaintElided(QLabel& label);
+
+// Shows as much of the text as there is room for. The tool tip and the accessible name have all of it.
 class ElidedLabel : public QLabel {
   Q_OBJECT
 

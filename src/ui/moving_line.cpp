@@ -10,7 +10,6 @@ MovingLine::MovingLine()
     : lblMoving_(Named(new ElidedLabel(QStringLiteral("What moves")), "lblMoving")),
       cmdStop_(Named(new QPushButton(QStringLiteral("Stop (goes to 1500 µs)")), "cmdStop")),
       lblBorrowed_(Named(new ElidedLabel(QStringLiteral("Borrowed port")), "lblBorrowed")) {
-  lblMoving_->setSizePolicy(QSizePolicy::Preferred, QSizePolicy::Fixed);
   Describe(cmdStop_, "Ends the test and moves the servo to the centre, 1500 µs.");
   cmdStop_->setFixedHeight(LowButtonHeight(*cmdStop_));
   cmdStop_->hide();

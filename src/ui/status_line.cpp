@@ -8,6 +8,19 @@
 #include "ui/controls.h"
 
 namespace tendril {
+
+// An announcement that fits into any width. Its text can be selected while all of it is shown.
+class StatusLine::Sentence : public Announcement {
+ protected:
+  void paintEvent(QPaintEvent* event) override {
+    if (sizeHint().width() <= width()) {
+      Announcement::paintEvent(event);
+    } else {
+      PaintElided(*this);
+    }
+  }
+};
+
 namespace {
 
 constexpr int kApart = 12;             // between two facts
@@ -19,7 +32,7 @@ StatusLine::StatusLine()
     : lblPort_(Named(new ElidedLabel(QStringLiteral("Port")), "lblPort")),
       lblUnit_(Named(new ElidedLabel(QStringLiteral("Unit")), "lblUnit")),
       lblOrigin_(Named(new ElidedLabel(QStringLiteral("Configuration")), "lblOrigin")),
-      lblStatus_(Named(new Announcement, "lblStatus")),
+      lblStatus_(Named(new Sentence, "lblStatus")),
       cmdUndo_(Named(new QPushButton(QStringLiteral("Undo")), "cmdUndo")) {
   lblStatus_->setTextFormat(Qt::PlainText);
   lblStatus_->setTextInteractionFlags(Qt::TextSelectableByMouse);
@@ -36,9 +49,10 @@ StatusLine::StatusLine()
   facts_->addWidget(moving_, 1);
   auto* three = new QHBoxLayout;
   three->setSpacing(kApart);
-  three->addWidget(lblPort_, 13);
-  three->addWidget(lblUnit_, 8);
-  three->addWidget(lblOrigin_, 15);
+  for (ElidedLabel* fact : {lblPort_, lblUnit_, lblOrigin_}) three->addWidget(fact);
+  three->addStretch(1);
+  // Always shown in full. The other two share what is missing.
+  lblUnit_->setMinimumWidth(fontMetrics().horizontalAdvance(QStringLiteral("Unit 00: no answer at 00:00")));
   facts_->addLayout(three, 2);
   column->addLayout(facts_);
   auto* sentence = new QHBoxLayout;

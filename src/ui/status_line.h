@@ -46,6 +46,8 @@ class StatusLine : public QStatusBar {
   void resizeEvent(QResizeEvent* event) override;
 
  private:
+  class Sentence;
+
   MovingLine* moving_ = new MovingLine;
   QBoxLayout* facts_;  // what moves, and the three facts
   ElidedLabel* lblPort_;
