@@ -20,7 +20,7 @@ struct GeneralKey {
 // Of a window, and of the screen's bars.
 constexpr QSize kRoomForFrames(16, 60);
 
-constexpr std::array<GeneralKey, 9> kGeneralKeys{
+constexpr std::array<GeneralKey, 10> kGeneralKeys{
     {{"Tab, Shift+Tab", "Next and previous control"},
      {"Alt+underlined letter", "The button or list with that letter, or the menu"},
      {"Space, Enter",
@@ -30,8 +30,8 @@ constexpr std::array<GeneralKey, 9> kGeneralKeys{
      {"Page Up, Page Down", "A number by 100 µs; the slider by 10 %"},
      {"F4, Alt+Down", "Opens a list"},
      {"Enter", "A typed number takes effect"},
-     {"Escape",
-      "Closes the number entry, a list, or this window; then ends a servo test; then cancels a command"}}};
+     {"Escape", "Closes a list, the number entry, or this window"},
+     {"Escape", "With none of these open: ends a servo test, or else cancels a command"}}};
 
 QTreeWidgetItem* AddGroup(QTreeWidget& list, const QString& title) {
   auto* group = new QTreeWidgetItem(&list, {title});
