@@ -9,10 +9,9 @@ namespace tendril {
 void PaintElided(QLabel& label) {
   QPainter painter(&label);
   const QRect room = label.contentsRect();
-  label.style()->drawItemText(&painter, room, Qt::AlignLeft | Qt::AlignVCenter, label.palette(),
-                              label.isEnabled(),
-                              label.fontMetrics().elidedText(label.text(), Qt::ElideRight, room.width()),
-                              label.foregroundRole());
+  label.style()->drawItemText(
+      &painter, room, Qt::AlignLeft | Qt::AlignVCenter, label.palette(), label.isEnabled(),
+      label.fontMetrics().elidedText(label.text(), Qt::ElideRight, room.width()), label.foregroundRole());
 }
 
 ElidedLabel::ElidedLabel(QString what) : what_(std::move(what)) {
