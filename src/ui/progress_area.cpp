@@ -60,7 +60,7 @@ ProgressArea::ProgressArea()
 
   Describe(
       cmdCancel_,
-      "Ends the command when the unit's outstanding reply is there, or its absence is certain. (Escape)");
+      "Ends the command after the unit's next reply. The status bar says how the unit is left. (Escape)");
   connect(cmdCancel_, &QAbstractButton::clicked, this, &ProgressArea::CancelPressed);
 
   auto* row = AddLayout<QHBoxLayout>(this, {9, 0, 9, 3});
