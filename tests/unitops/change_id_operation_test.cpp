@@ -92,6 +92,8 @@ TEST_F(ChangeId, Faults_StopItAndAreShownOnce) {
   EXPECT_TRUE(link_.PortOpen());
   world_.log.broken = true;
   RunToTheEnd();
+  EXPECT_EQ(said_, "Giving the unit the ID 01 at 14:05: COMMAND FAILED! No ID has changed.")
+      << "only unlocked";
   ExpectFailure(Fault("Comm Error!", "The command log cannot be written\r\n"));
   world_.log.broken = false;
   Run(commands_.change_id);

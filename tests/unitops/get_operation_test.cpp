@@ -103,6 +103,7 @@ TEST_F(Get, Unplugged_IsAFaultAndChangesNothing) {
   commands_.get.Start();
   EXPECT_THAT(world_.boxes.Take(),
               ElementsAre(Fault("Comm Error!", "Upload Failed\r\nOpen of serial port 1 has failed\r\n")));
+  EXPECT_EQ(said_, "Reading unit 01 at 14:05: Stopped. Nothing has changed.");
   EXPECT_EQ(working_, before);
 }
 

@@ -14,6 +14,8 @@ using testing::IsEmpty;
 const BoxMessage kNoResponse{"Unit did not respond to the Option Settings, Retry Command", "No Repsonse",
                              BoxIcon::kCritical};
 
+const std::string kSending = "Sending to unit 01 at 14:05: ";
+
 class Send : public CommandTest {
  protected:
   void ExpectSuccess() { CommandTest::ExpectSuccess("SUCCESS: Send Complete!"); }
@@ -64,6 +66,7 @@ TEST_F(Send, Ports_FollowEachOther300msAfterTheAcknowledgement) {
   EXPECT_THAT(Sent([&] { world_.time.Advance(20); }).size(), testing::Gt(10u));
   RunToTheEnd();
   ExpectSuccess();
+  EXPECT_EQ(progress_.title, "Sending to unit 01: port 8 of 8");
   EXPECT_TRUE(progress_.shown);
   world_.time.Advance(3000);
   EXPECT_FALSE(progress_.shown);
@@ -119,6 +122,7 @@ TEST_F(Send, IdSetTo00InTheMiddle_IsASendErrorAtTheNextPort) {
   commands_.send.Start();
   target_.unit = 0;
   RunToTheEnd();
+  EXPECT_EQ(said_, kSending + "COMMAND FAILED! Port 1 is written, 2 perhaps, 3 to 8 are not.");
   ExpectFailure({"Error sending configuration, Please retry", "Send Error", BoxIcon::kCritical});
 }
 
@@ -135,6 +139,7 @@ TEST_F(Send, Refusals_AreShownAndStartNothing) {
                                                           "Send Error", BoxIcon::kCritical}));
   EXPECT_FALSE(commands_.running.Active());
   EXPECT_FALSE(progress_.shown);
+  EXPECT_EQ(said_, "Sending to unit 00 at 14:05: Stopped. Port 1 is perhaps written, 2 to 8 are not.");
 }
 
 TEST_F(Send, InvalidRecord_StopsBeforeItsPort) {
@@ -146,6 +151,8 @@ TEST_F(Send, InvalidRecord_StopsBeforeItsPort) {
   Run(commands_.send);
   EXPECT_EQ(world_.boxes.Take(), box);
   EXPECT_EQ(unit.accepted_commands(), 4u);
+  EXPECT_EQ(progress_.title, "Stopped: channel 5: 9 to 2400 cannot be sent");
+  EXPECT_EQ(said_, kSending + progress_.title + ". Ports 1 to 4 are written, 5 to 8 are not.");
   // The display is not ended; the next command takes it over.
   world_.time.Advance(10000);
   EXPECT_EQ(unit.polls_heard(), 4u);
@@ -155,6 +162,7 @@ TEST_F(Send, InvalidRecord_StopsBeforeItsPort) {
   commands_.send.Start();
   EXPECT_EQ(world_.boxes.Take(), box);
   EXPECT_FALSE(commands_.running.Active());
+  EXPECT_EQ(said_, kSending + "Stopped: channel 1: 9 to 2400 cannot be sent. Nothing is written.");
   working_.At(0).ActualRange[0] = 10;
   Run(commands_.send);
   ExpectSuccess();
@@ -169,10 +177,12 @@ TEST_F(Send, UnpluggedBetweenTwoPorts_IsADownloadFailure) {
   EXPECT_EQ(world_.boxes.shown.at(0).icon, BoxIcon::kCritical);
   const auto fault = Fault("Comm Error!", "Download Failed\r\nOpen of serial port 1 has failed\r\n");
   ExpectFailure(fault);
+  EXPECT_EQ(said_, kSending + "COMMAND FAILED! Ports 1 to 2 are written, 3 to 8 are not.");
 
   // Still gone: the start itself fails. Back again: it works, without choosing the port anew.
   commands_.send.Start();
   EXPECT_THAT(world_.boxes.Take(), ElementsAre(fault));
+  EXPECT_EQ(said_, kSending + "Stopped. Nothing is written.");
   world_.bench.Replug(1);
   Run(commands_.send);
   ExpectSuccess();
