@@ -29,8 +29,6 @@ ConnectionArea::ConnectionArea(PortSelection& ports)
   cmbNYX_->setSizePolicy(QSizePolicy::Fixed, QSizePolicy::Fixed);
   cmbNYX_->setAccessibleName(QStringLiteral("Comm Port"));
   connect(cmbNYX_, &CalmComboBox::Opening, this, &ConnectionArea::DescribePorts);
-  // Queued: a list that closes gives the focus back before it reports what was chosen in it.
-  connect(cmbNYX_, &ListComboBox::FocusArrived, this, &ConnectionArea::RereadCommPorts, Qt::QueuedConnection);
   // The user's own choice, also of the current line; what the program selects does not emit "activated".
   connect(cmbNYX_, &QComboBox::activated, this,
           [this](int line) { ports_.Choose(static_cast<std::size_t>(line)); });
@@ -72,6 +70,8 @@ void ConnectionArea::ListCommPorts() { ShowPorts(ports_.ListCommPorts(), 0); }
 
 void ConnectionArea::WatchCommPorts() {
   ports_.WatchPorts([this] { RereadCommPorts(); });
+  // Queued: a list that closes gives the focus back before it reports what was chosen in it.
+  connect(cmbNYX_, &ListComboBox::FocusArrived, this, &ConnectionArea::RereadCommPorts, Qt::QueuedConnection);
 }
 
 void ConnectionArea::ShowPorts(const std::vector<std::string>& lines, std::size_t selected) {

@@ -26,7 +26,7 @@ class ConnectionArea : public QWidget, public UnitTarget {
 
   // Fills the list of comm ports and selects "Select", which opens nothing.
   void ListCommPorts();
-  // From now on the list follows the devices that come and go.
+  // From now on the list is read again with the focus, and when devices come and go.
   void WatchCommPorts();
   // Chooses the next ID (`by` = 1) or the previous one (-1), from 01 to FD; the last one and the first one are neighbours.
   void StepUnitId(int by);
