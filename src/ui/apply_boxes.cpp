@@ -56,6 +56,10 @@ void ApplyBoxes::EnableControls(const QString& running_command, bool summary_sho
   for (QCheckBox* box : chkUpdate_) EnableUnless(why_not, box);
 }
 
+void ApplyBoxes::Store() {
+  if (const auto channel = editor_.Channel()) OnClicked(*channel, true);
+}
+
 void ApplyBoxes::ShowTicks() {
   for (std::size_t channel = 0; channel < kPortCount; ++channel) {
     chkUpdate_[channel]->setChecked(editor_.Ticked(channel));

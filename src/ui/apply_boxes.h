@@ -22,6 +22,8 @@ class ApplyBoxes : public QGroupBox {
   // Clicks go to `editor`, which must outlive the area.
   explicit ApplyBoxes(ChannelEditor& editor);
 
+  // Does what a click on the edited channel's own box does. Does nothing while no channel is edited.
+  void Store();
   // Shows which boxes are ticked.
   void ShowTicks();
   // Enables the boxes while no command runs and the summary is not shown. `running_command` is what runs; empty when

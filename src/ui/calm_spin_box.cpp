@@ -122,7 +122,8 @@ void CalmSpinBox::ShowHint() {
   if (hint == hint_) return;
   hint_ = hint;
   Mark();
-  Q_EMIT HintChanged(hint);
+  Q_EMIT HintChanged(hint.isEmpty() ? hint : QStringLiteral("⚠ ") + hint,
+                     hint.isEmpty() ? hint : accessibleName() + QStringLiteral(": ") + hint);
 }
 
 // Bold, and in a warning's colour.
@@ -199,10 +200,12 @@ void CalmSpinBox::stepBy(int steps) {
   if (held && value() != before) stepped_ = true;
 }
 
-// A menu of the field itself opens without ending the typing.
+// The field's own menu opens without ending the typing, and a look into another window drops nothing.
 void CalmSpinBox::focusOutEvent(QFocusEvent* event) {
   key_held_ = false;
-  if (event->reason() == Qt::PopupFocusReason && Typing()) {
+  const bool comes_back = event->reason() == Qt::PopupFocusReason ||
+                          (event->reason() == Qt::ActiveWindowFocusReason && !Takes(text()));
+  if (comes_back && Typing()) {
     lineEdit()->event(event);
     QWidget::focusOutEvent(event);
     return;

@@ -39,8 +39,9 @@ class CalmSpinBox : public QSpinBox {
   bool event(QEvent* event) override;
 
  Q_SIGNALS:
-  // Why what is typed cannot be taken, and what to type instead. Empty: it can be taken.
-  void HintChanged(const QString& hint);
+  // Why what is typed cannot be taken, and what to type instead; for the screen, and to be read out. Empty: it can be
+  // taken.
+  void HintChanged(const QString& hint, const QString& spoken);
   // `typed` cannot be taken, and the old value is shown again; `sentence` says so.
   void Dropped(const QString& typed, const QString& sentence);
 

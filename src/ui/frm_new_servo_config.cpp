@@ -111,6 +111,10 @@ void frmNewServoConfig::Connect() {
           [this](const QWidget* label) { actuals_->ShowActuals(*label); });
   connect(parameters_, &MotionParameters::NumberDropped, c,
           [this](const QString& typed, const QString& sentence) { OnNumberDropped(typed, sentence); });
+  connect(parameters_, &MotionParameters::StorePressed, c, [this] {
+    CommitTyping();
+    apply_boxes_->Store();
+  });
   connect(parameters_, &MotionParameters::TestPressed, c, [this](int button) {
     CommitTyping();
     live_test_.OnTestButton(button);

@@ -113,7 +113,7 @@ class frmNewServoConfig : public QMainWindow {
   ApplyBoxes* apply_boxes_ = new ApplyBoxes(config_.Editor());
   ChannelStrip* channels_ = new ChannelStrip(config_.Records());
   ChosenServo* servo_ = new ChosenServo(config_.Editor(), config_.Records());
-  MotionParameters* parameters_ = new MotionParameters(config_.Editor());
+  MotionParameters* parameters_ = new MotionParameters(config_.Editor(), config_.Records());
   ChannelChoices* choices_ = new ChannelChoices(config_.Editor(), config_.Records());
   LiveTestArea* live_test_area_ = new LiveTestArea(*parameters_);
   QStackedWidget* views_ = new QStackedWidget;

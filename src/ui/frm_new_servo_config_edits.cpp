@@ -76,6 +76,7 @@ void frmNewServoConfig::OnEdited(const QString& what, FollowUp follow_up) {
 
 void frmNewServoConfig::OnApplied() {
   config_.Remarks().AcceptEdit();
+  parameters_->ShowValues();  // as stored
   ShowRemarks();
   if (config_.Editor().Channel()) simulators_.UpdateSimulators(live_test_.ShownPosition());
   NoteStep(QStringLiteral("Storing"));

@@ -35,6 +35,7 @@ constexpr std::array<ControlItem, 5> kTestItems{{{"Test &Actual Pulse Range", "C
                                                  {"Test Virtual &Stops", "Ctrl+F8", "cmdTest_1"},
                                                  {"Test &Default Position", "Ctrl+F9", "cmdTest_2"}}};
 constexpr ControlItem kSliderItem{"&Use Slider to Test Intensity Values", "Ctrl+L", "chkSendSlideCommands"};
+constexpr ControlItem kStoreItem{"S&tore What Is Shown", "Ctrl+S", "cmdStore"};
 constexpr ControlItem kPresetsItem{"Standard &Preset Values", "Ctrl+Shift+P", "cmbPresets"};
 constexpr ControlItem kSummaryItem{"Summar&y", "F7", "cmdShowSummary"};
 
@@ -112,6 +113,7 @@ void MainMenu::AddEditMenu(QWidget& window) {
   AddItem(menu, "&Copy", "Ctrl+C", this, [] { CopyFocused(); });
   AddItem(menu, "Copy &Status", "Ctrl+Shift+S", this, &MainMenu::CopyStatusChosen);
   menu.addSeparator();
+  AddItem(menu, window, kStoreItem);
   AddItem(menu, window, kPresetsItem);
 }
 

@@ -36,7 +36,7 @@ constexpr std::array<Row, kParameterCount> kRows{
 constexpr int kHeadingRow = 3;  // of those that are measured from the neutral position
 constexpr int kGapRow = 7;
 constexpr int kScaleRow = 8;
-constexpr int kRemarksRow = 9;
+constexpr int kNotesRow = 9;
 constexpr int kRestRow = 10;
 constexpr int kGap = 12;  // between two columns
 constexpr int kMinGap = 4;
@@ -130,13 +130,14 @@ QLabel* CaptionLabel(QAnyStringView text = {}) {
 
 }  // namespace
 
-MotionParameters::MotionParameters(ChannelEditor& editor)
+MotionParameters::MotionParameters(ChannelEditor& editor, const ChannelTable& working)
     : QGroupBox(QStringLiteral("Motion Parameters")),
       editor_(editor),
+      working_(working),
       lblActPulseLeft_(Named(CaptionLabel(), "lblActPulseLeft")),
       heading_(DimLabel("Relative to Neutral")),
-      typed_(Named(new HintLabel(1), "lblTyped")),
-      remarks_(Named(new RemarksLabel, "lblRemarks", 0)),
+      typed_(Named(new NoticeLabel(1), "lblTyped")),
+      notes_(new EditorNotes),
       scale_(Named(new PulseScale, "PulseScale")),
       hint_(Named(new QLabel(QStringLiteral("Choose a channel: click a servo, or Ctrl+1")), "lblNoChannel")) {
   auto* grid = AddLayout<QGridLayout>(this, {6, 2, 6, 2});
@@ -150,11 +151,23 @@ MotionParameters::MotionParameters(ChannelEditor& editor)
   const int columns = kRest - kName + 1;
   grid->addWidget(scale_, kScaleRow, kName, 1, columns);
   grid->addWidget(hint_, kScaleRow, kName, 1, columns, Qt::AlignCenter);
-  grid->addWidget(remarks_, kRemarksRow, kName, 1, columns);
+  grid->addWidget(notes_, kNotesRow, kName, 1, columns);
   for (const Row& row : kRows) grid->setRowStretch(row.row, 1);
   grid->setRowStretch(kGapRow, 1);
   grid->setRowStretch(kRestRow, 10);
   hint_->hide();
+  connect(notes_, &EditorNotes::StorePressed, this, &MotionParameters::OnStore);
+}
+
+// The button hides when all is stored: its focus goes to a value that it stores.
+void MotionParameters::OnStore() {
+  if (notes_->isAncestorOf(window()->focusWidget())) {
+    const Unstored unstored(editor_, working_);
+    std::size_t first = 0;
+    while (first + 1 < kParameterCount && !unstored.Has(static_cast<Parameter>(first))) ++first;
+    spins_[first]->setFocus();
+  }
+  Q_EMIT StorePressed();
 }
 
 void MotionParameters::AddParameters(QGridLayout& grid) {
@@ -191,8 +204,8 @@ CalmSpinBox* MotionParameters::MakeSpin(std::size_t index) {
     const FollowUp follow_up = editor_.Change(static_cast<Parameter>(index), value);
     Q_EMIT Edited(QString::fromUtf8(kRows[index].name), follow_up);
   });
-  connect(spin, &CalmSpinBox::HintChanged, this, [this, spin](const QString& hint) {
-    typed_->ShowHint(spin->accessibleName(), hint);
+  connect(spin, &CalmSpinBox::HintChanged, this, [this](const QString& hint, const QString& spoken) {
+    typed_->ShowNotice(hint, spoken);
     heading_->setVisible(hint.isEmpty());
   });
   connect(spin, &CalmSpinBox::Dropped, this, &MotionParameters::NumberDropped);
@@ -255,6 +268,7 @@ void MotionParameters::ShowTestRunning(int button, bool running) {
 
 void MotionParameters::EnableEditing(const QString& why_not) {
   for (CalmSpinBox* spin : spins_) EnableUnless(why_not, spin);
+  notes_->EnableStore(why_not);
 }
 
 bool MotionParameters::Repeats() const {
@@ -278,7 +292,9 @@ void MotionParameters::ShowHasChannel() {
 void MotionParameters::ShowValues() {
   ShowHasChannel();
   const ChannelConfig values = editor_.WorkingValues();
-  scale_->ShowValues(editor_.Channel() ? std::optional(values) : std::nullopt);
+  const Unstored unstored(editor_, working_);
+  scale_->ShowValues(editor_.Channel() ? std::optional(values) : std::nullopt, unstored);
+  notes_->ShowUnstored(unstored.Sentence(), StoreCaption(editor_));
   lblActPulseLeft_->setNum(kCentrePulseWidth - editor_.Spin(Parameter::kActualRange).Value());
   for (std::size_t i = 0; i < kRows.size(); ++i) {
     const auto parameter = static_cast<Parameter>(i);
@@ -288,13 +304,15 @@ void MotionParameters::ShowValues() {
     spins_[i]->Show(value);
     captions_[i]->setText(CaptionOf(parameter, value.Value()));
     ShowPhysicalValue(parameter, values, *pulse_widths_[i]);
+    const QString unless_stored = unstored.Has(parameter) ? QStringLiteral(", not stored yet") : QString();
+    pulse_widths_[i]->ShowStored(unless_stored.isEmpty());
     pulse_widths_[i]->setAccessibleName(names_[i]->text() + QStringLiteral(": ") +
-                                        pulse_widths_[i]->InFull());
+                                        pulse_widths_[i]->InFull() + unless_stored);
     Describe(spins_[i], QStringLiteral("%1. From %2 to %3 µs; now %4.")
                             .arg(QString::fromUtf8(kRows[i].what))
                             .arg(value.Minimum())
                             .arg(value.Maximum())
-                            .arg(pulse_widths_[i]->InFull()));
+                            .arg(pulse_widths_[i]->InFull() + unless_stored));
   }
 }
 

@@ -12,11 +12,11 @@
 
 #include "ui/calm_spin_box.h"
 #include "ui/controls.h"
-#include "ui/hint_label.h"
+#include "ui/editor_notes.h"
 #include "ui/model/channel_editor.h"
+#include "ui/notice_label.h"
 #include "ui/pulse_scale.h"
 #include "ui/pulse_width_label.h"
-#include "ui/remarks_label.h"
 #include "unitops/live_test.h"
 
 namespace tendril {
@@ -26,13 +26,13 @@ class MotionParameters : public QGroupBox {
   Q_OBJECT
 
  public:
-  // `editor` must outlive the area.
-  explicit MotionParameters(ChannelEditor& editor);
+  // `working` are the records that `editor` edits. Both must outlive the area.
+  MotionParameters(ChannelEditor& editor, const ChannelTable& working);
 
   // Shows values, limits and captions, and whether there is a channel to edit. Emits no signal.
   void ShowValues();
   // Shows remarks on the records.
-  void ShowRemarks(const std::vector<std::string>& sentences) { remarks_->ShowRemarks(sentences); }
+  void ShowRemarks(const std::vector<std::string>& sentences) { notes_->ShowRemarks(sentences); }
   // Captions test button `button`, 0 to 4: "Stop" while its sweep runs, else "Test".
   void ShowTestRunning(int button, bool running);
   // The scale, for its arm.
@@ -51,6 +51,8 @@ class MotionParameters : public QGroupBox {
   void LabelPressed(const QWidget* label);
   // The user pressed a test button, 0 to 4.
   void TestPressed(int button);
+  // The user wants what is shown to be stored.
+  void StorePressed();
   // A typed number cannot be taken; see CalmSpinBox.
   void NumberDropped(const QString& typed, const QString& sentence);
 
@@ -64,17 +66,19 @@ class MotionParameters : public QGroupBox {
   void AddSpacing(QGridLayout& grid);
   void MakePressable(QLabel* label);
   void ShowHasChannel();
+  void OnStore();
 
   ChannelEditor& editor_;
+  const ChannelTable& working_;
   std::array<CalmSpinBox*, kParameterCount> spins_{};
   std::array<QLabel*, kParameterCount> names_{};
   std::array<QLabel*, kParameterCount> captions_{};
   std::array<PulseWidthLabel*, kParameterCount> pulse_widths_{};
   std::array<QPushButton*, LiveTest::kTestButtons> cmdTest_{};
   QLabel* lblActPulseLeft_;
-  QLabel* heading_;   // of what is relative to the neutral position
-  HintLabel* typed_;  // lies on the heading
-  RemarksLabel* remarks_;
+  QLabel* heading_;     // of what is relative to the neutral position
+  NoticeLabel* typed_;  // lies on the heading
+  EditorNotes* notes_;
   PulseScale* scale_;
   QLabel* hint_;  // that no channel is chosen; lies on the scale
 };

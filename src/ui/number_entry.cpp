@@ -19,10 +19,10 @@ NumberEntry::NumberEntry(SummaryEditor& editor, TimerFactory& timers, QWidget& w
       editor_(editor),
       tmrAdjustDual_(timers.CreateTimer([this] { OnAdjustDual(); })),
       lblDisplay_(Named(BoldLabel(), "lblDisplay")),
-      typed_(Named(new HintLabel(kHintLines), "lblSumTyped")) {
+      typed_(Named(new NoticeLabel(kHintLines), "lblSumTyped")) {
   tmrAdjustDual_->SetInterval(kOpenMs);
   auto* grid = new QGridLayout(this);
-  grid->addWidget(lblDisplay_, 0, 0, 1, 2);
+  grid->addWidget(lblDisplay_, 0, 0, 1, 3);
   for (std::size_t i = 0; i < spnSumValue_.size(); ++i) {
     spnSumValue_[i] = MakeSpin(i);
     auto* reading = lblSumValue_[i] = Named(new QLabel, "lblSumValue", i);
@@ -31,7 +31,8 @@ NumberEntry::NumberEntry(SummaryEditor& editor, TimerFactory& timers, QWidget& w
     grid->addWidget(reading, 2, static_cast<int>(i));
   }
   typed_->setMinimumWidth(typed_->fontMetrics().horizontalAdvance(QString::fromLatin1(kHintLine)));
-  grid->addWidget(typed_, 3, 0, 1, 2);
+  grid->addWidget(typed_, 3, 0, 1, 3);
+  grid->setColumnStretch(2, 1);
 }
 
 CalmSpinBox* NumberEntry::MakeSpin(std::size_t index) {
@@ -40,8 +41,7 @@ CalmSpinBox* NumberEntry::MakeSpin(std::size_t index) {
   Describe(spin, "The new value, in µs.");
   spin->installEventFilter(this);
   connect(spin, &QSpinBox::valueChanged, this, [this, index](int value) { OnSpin(index, value); });
-  connect(spin, &CalmSpinBox::HintChanged, this,
-          [this, spin](const QString& hint) { typed_->ShowHint(spin->accessibleName(), hint); });
+  connect(spin, &CalmSpinBox::HintChanged, typed_, &NoticeLabel::ShowNotice);
   connect(spin, &CalmSpinBox::Dropped, this, &NumberEntry::NumberDropped);
   return spin;
 }

@@ -10,8 +10,8 @@
 #include "platform/timer.h"
 #include "ui/calm_spin_box.h"
 #include "ui/controls.h"
-#include "ui/hint_label.h"
 #include "ui/model/summary_editor.h"
+#include "ui/notice_label.h"
 
 namespace tendril {
 
@@ -54,7 +54,7 @@ class NumberEntry : public PopUp {
   QLabel* lblDisplay_;
   std::array<CalmSpinBox*, 2> spnSumValue_{};
   std::array<QLabel*, 2> lblSumValue_{};
-  HintLabel* typed_;
+  NoticeLabel* typed_;
 };
 
 }  // namespace tendril

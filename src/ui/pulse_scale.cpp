@@ -4,13 +4,18 @@
 #include <QAccessibleWidget>
 #include <QFontMetricsF>
 #include <QPainter>
+#include <algorithm>
 #include <cmath>
 
 #include "ui/controls.h"
+#include "ui/hatch.h"
 #include "ui/servo_parts.h"
 
 namespace tendril {
 namespace {
+
+constexpr double kDash = 4;
+constexpr double kDashGap = 3;
 
 // A half circle with its head at the right end for a `side` of 1, at the left end for -1.
 void PaintTurn(QPainter& painter, const QRectF& box, int side) {
@@ -57,9 +62,10 @@ PulseScale::PulseScale() {
   setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Maximum);
 }
 
-void PulseScale::ShowValues(const std::optional<ChannelConfig>& shown) {
-  if (shown == shown_) return;
+void PulseScale::ShowValues(const std::optional<ChannelConfig>& shown, const Unstored& unstored) {
+  if (shown == shown_ && unstored == unstored_) return;
   shown_ = shown;
+  unstored_ = unstored;
   update();
   if (!QAccessible::isActive()) return;
   QAccessibleEvent event(this, QAccessible::DescriptionChanged);
@@ -78,7 +84,8 @@ QString PulseScale::InWords() const {
   QString words = QStringLiteral("Actual range ");
   for (const PulseFieldText& field : PulseFieldTexts(*shown_))
     words += QString::fromStdString(field.InWords()) + QStringLiteral(" µs, ");
-  return words + QStringLiteral("arm at %1 µs. A longer pulse turns the servo to the left.").arg(arm_);
+  words += QStringLiteral("arm at %1 µs. A longer pulse turns the servo to the left.").arg(arm_);
+  return unstored_.Any() ? words + QLatin1Char(' ') + QString::fromStdString(unstored_.Sentence()) : words;
 }
 
 ScaleRoom PulseScale::Room() const {
@@ -102,7 +109,58 @@ void PulseScale::paintEvent(QPaintEvent*) {
   QPainter painter(this);
   std::optional<ScaleValues> values;
   if (shown_) values = {*shown_, arm_};
-  for (const ScaleElement& element : LayOutPulseScale(values, Room())) Paint(painter, element);
+  const std::vector<ScaleElement> elements = LayOutPulseScale(values, Room());
+  for (const ScaleElement& element : elements) {
+    if (IsUnstored(element.part)) {
+      PaintUnstored(painter, element, elements);
+    } else {
+      Paint(painter, element);
+    }
+  }
+}
+
+bool PulseScale::IsUnstored(ScalePart part) const {
+  switch (part) {
+    case ScalePart::kActual:
+      return unstored_.Has(Parameter::kActualRange);
+    case ScalePart::kVirtual:
+      return unstored_.Has(Parameter::kVirtualRange);
+    case ScalePart::kStops:
+      return unstored_.Has(Parameter::kLeftStop) || unstored_.Has(Parameter::kRightStop);
+    case ScalePart::kDefault:
+      return unstored_.Has(Parameter::kDefaultPosition);
+    case ScalePart::kNeutral:
+      return unstored_.Has(Parameter::kNeutralTrim);
+    case ScalePart::kAxis:
+    case ScalePart::kArm:
+      break;
+  }
+  return false;
+}
+
+// Bars are hatched beside their numbers; lines, which are too thin for it, are dashed.
+void PulseScale::PaintUnstored(QPainter& painter, const ScaleElement& element,
+                               const std::vector<ScaleElement>& elements) const {
+  if (element.shape == ScaleShape::kLine) {
+    ScaleElement dash = element;
+    for (dash.y = element.y; dash.y < element.Bottom(); dash.y += kDash + kDashGap) {
+      dash.height = std::min(kDash, element.Bottom() - dash.y);
+      Paint(painter, dash);
+    }
+    return;
+  }
+  Paint(painter, element);
+  if (element.shape != ScaleShape::kBar) return;
+  const QRectF box(element.x, element.y, element.width, element.height);
+  QRegion beside_numbers(box.toAlignedRect());
+  for (const ScaleElement& number : elements) {
+    if (number.part == element.part && number.shape == ScaleShape::kNumber)
+      beside_numbers -= QRectF(number.x - 2, number.y, number.width + 4, number.height).toAlignedRect();
+  }
+  painter.save();
+  painter.setClipRegion(beside_numbers);
+  PaintHatch(painter, box, Qt::black);
+  painter.restore();
 }
 
 void PulseScale::Paint(QPainter& painter, const ScaleElement& element) const {

@@ -4,8 +4,10 @@
 #include <QString>
 #include <QWidget>
 #include <optional>
+#include <vector>
 
 #include "ui/model/pulse_scale_layout.h"
+#include "ui/model/unstored.h"
 
 class QPainter;
 
@@ -19,8 +21,8 @@ class PulseScale : public QWidget {
  public:
   PulseScale();
 
-  // Shows the pulse fields of `shown`; the axis alone when there is none.
-  void ShowValues(const std::optional<ChannelConfig>& shown);
+  // Shows the pulse fields of `shown`, hatched where they are `unstored`; the axis alone when there is none.
+  void ShowValues(const std::optional<ChannelConfig>& shown, const Unstored& unstored);
   // Moves the arm alone.
   void MoveArm(Microseconds arm);
 
@@ -36,8 +38,12 @@ class PulseScale : public QWidget {
  private:
   ScaleRoom Room() const;
   void Paint(QPainter& painter, const ScaleElement& element) const;
+  void PaintUnstored(QPainter& painter, const ScaleElement& element,
+                     const std::vector<ScaleElement>& elements) const;
+  bool IsUnstored(ScalePart part) const;
 
   std::optional<ChannelConfig> shown_;
+  Unstored unstored_;
   Microseconds arm_ = kCentrePulseWidth;
 };
 

@@ -1,9 +1,15 @@
 #include "ui/pulse_width_label.h"
 
+#include <QPainter>
 #include <QResizeEvent>
+#include <algorithm>
+
+#include "ui/hatch.h"
 
 namespace tendril {
 namespace {
+
+constexpr double kUnstoredBand = 4;  // high, below the text
 
 QString InWords(int first, int second) { return QStringLiteral("%1 to %2 µs").arg(first).arg(second); }
 QString InBrief(int first, int second) { return QStringLiteral("%1–%2").arg(first).arg(second); }
@@ -30,6 +36,22 @@ void PulseWidthLabel::Show(const QString& full, const QString& brief) {
   full_ = full;
   brief_ = brief;
   Fit();
+}
+
+void PulseWidthLabel::ShowStored(bool stored) {
+  if (stored == stored_) return;
+  stored_ = stored;
+  update();
+}
+
+void PulseWidthLabel::paintEvent(QPaintEvent* event) {
+  QLabel::paintEvent(event);
+  if (stored_) return;
+  QPainter painter(this);
+  const double bottom = (height() + fontMetrics().height()) / 2.0;
+  const double top = std::min(bottom - 1, height() - kUnstoredBand);
+  PaintHatch(painter, QRectF(0, top, fontMetrics().horizontalAdvance(text()), kUnstoredBand),
+             palette().color(foregroundRole()));
 }
 
 // All digits are equally wide, and no pulse width has more of them.

@@ -18,6 +18,9 @@ class PulseWidthLabel : public QLabel {
   void ShowRange(const PulsePair& ends);
   void ShowPosition(Microseconds position);
 
+  // Hatches it from below unless the record holds it.
+  void ShowStored(bool stored);
+
   // What it shows, in full.
   const QString& InFull() const { return full_; }
 
@@ -26,6 +29,7 @@ class PulseWidthLabel : public QLabel {
 
  protected:
   void resizeEvent(QResizeEvent* event) override;
+  void paintEvent(QPaintEvent* event) override;
 
  private:
   void Show(const QString& full, const QString& brief);
@@ -33,6 +37,7 @@ class PulseWidthLabel : public QLabel {
 
   QString full_;
   QString brief_;
+  bool stored_ = true;
 };
 
 }  // namespace tendril

@@ -1,5 +1,7 @@
 #include "ui/remarks_label.h"
 
+#include <algorithm>
+
 namespace tendril {
 namespace {
 
@@ -14,13 +16,9 @@ constexpr char kWhy[] =
 void RemarksLabel::ShowRemarks(const std::vector<std::string>& sentences) {
   QStringList all;
   for (const std::string& sentence : sentences) all += QString::fromStdString(sentence);
-  QStringList lines;
-  for (const QString& sentence : all.first(std::min(all.size(), kShownRemarks)))
-    lines += QStringLiteral("⚠ ") + sentence;
-  if (all.size() > kShownRemarks) lines += QStringLiteral("and %1 more").arg(all.size() - kShownRemarks);
+  if (all == remarks_) return;
+  remarks_ = all;
   const QString whole = all.join(QLatin1Char('\n'));
-  if (lines == lines_ && accessibleName() == whole) return;
-  lines_ = lines;
   setToolTip(all.isEmpty() ? QString() : whole + QStringLiteral("\n\n") + QString::fromUtf8(kWhy));
   ShowLines();
   Announce(whole);
@@ -33,10 +31,22 @@ void RemarksLabel::resizeEvent(QResizeEvent* event) {
   ShowLines();
 }
 
+// Where no line is left for the number of the others, it follows the last remark.
 void RemarksLabel::ShowLines() {
-  QStringList fitting;
-  for (const QString& line : lines_) fitting += fontMetrics().elidedText(line, Qt::ElideRight, width());
-  setText(fitting.join(QLatin1Char('\n')));
+  const qsizetype room = std::max(1, height() / fontMetrics().lineSpacing());
+  const qsizetype shown = std::min({remarks_.size(), kShownRemarks, room});
+  const qsizetype others = remarks_.size() - shown;
+  const QString more = others > 0 ? QStringLiteral("and %1 more").arg(others) : QString();
+  const bool own_line = room > shown;
+  const QString tail = more.isEmpty() || own_line ? QString() : QStringLiteral(" ") + more;
+  QStringList lines;
+  for (qsizetype i = 0; i < shown; ++i) {
+    const QString end = i + 1 == shown ? tail : QString();
+    const int width_left = width() - fontMetrics().horizontalAdvance(end);
+    lines += fontMetrics().elidedText(QStringLiteral("⚠ ") + remarks_[i], Qt::ElideRight, width_left) + end;
+  }
+  if (own_line && !more.isEmpty()) lines += more;
+  setText(lines.join(QLatin1Char('\n')));
 }
 
 }  // namespace tendril

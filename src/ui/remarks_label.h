@@ -15,12 +15,12 @@ class RemarksLabel : public Announcement {
  public:
   RemarksLabel() { setAlignment(Qt::AlignLeft | Qt::AlignTop); }
 
-  // Shows the first two of `sentences`, one to a line, and the number of the others. The tool tip and the accessible name
-  // contain all of them.
+  // Shows the first two of `sentences`, one to a line, or as many as it is high, and the number of the others. The tool
+  // tip and the accessible name contain all of them.
   void ShowRemarks(const std::vector<std::string>& sentences);
 
   QSize sizeHint() const override;
-  QSize minimumSizeHint() const override { return sizeHint(); }
+  QSize minimumSizeHint() const override { return {0, fontMetrics().lineSpacing()}; }
 
  protected:
   void resizeEvent(QResizeEvent* event) override;
@@ -28,7 +28,7 @@ class RemarksLabel : public Announcement {
  private:
   void ShowLines();
 
-  QStringList lines_;
+  QStringList remarks_;
 };
 
 }  // namespace tendril

@@ -4,6 +4,8 @@
 #include <QPolygonF>
 #include <array>
 
+#include "ui/hatch.h"
+
 namespace tendril {
 namespace {
 
@@ -50,6 +52,15 @@ void Sign::paintEvent(QPaintEvent* /*event*/) {
       painter.drawLine(kExclamation);
       painter.drawPoint(kDot);
       break;
+    case SignKind::kUnstored: {
+      painter.resetTransform();
+      const QRectF box = QRectF(rect()).adjusted(2.5, 2.5, -2.5, -2.5);
+      const QColor colour = palette().color(QPalette::WindowText);
+      PaintHatch(painter, box, colour);
+      painter.setPen(QPen(colour, 1));
+      painter.drawRect(box);
+      break;
+    }
   }
 }
 

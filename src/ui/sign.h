@@ -5,7 +5,7 @@
 
 namespace tendril {
 
-enum class SignKind { kRunning, kSuccess, kFailure, kWarning };
+enum class SignKind { kRunning, kSuccess, kFailure, kWarning, kUnstored };
 
 // Shows in its form what a colour shows. It is as high as the type, and has the text's colour.
 class Sign : public QWidget {

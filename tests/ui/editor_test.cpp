@@ -124,6 +124,51 @@ TEST_F(Editor, PulseScale_ShowsTheEditedValuesAndTheArm) {
   EXPECT_EQ(needed.boundedTo({440, 330}), needed);
 }
 
+TEST_F(Editor, ShownButNotStored_IsSaidUntilItIsStored) {
+  Activate();
+  window_->resize(1280, 800);
+  const auto& unit = ConnectUnit();
+  Click("ServoSimulator2_2");
+  Press("chkUpdate_6");
+  EXPECT_FALSE(Visible("lblUnstored") || Visible("cmdStore"));
+  const QPoint scale = PlaceOf("PulseScale");
+  const auto stored = [&] { return Find("PulseScale").grab().toImage(); };
+  const auto described = [&](const char* spin) {
+    return Accessible(spin).text(QAccessible::Description).contains(QStringLiteral("not stored yet"));
+  };
+  Type("spnNeutralTrim", "100");
+  const std::string sentence =
+      "Shown, not stored yet: virtual range, stops, default. SEND would write what is stored.";
+  EXPECT_EQ(Text("lblUnstored", "cmdStore"), sentence + " Store to 3, 7");
+  EXPECT_EQ(Accessible("lblUnstored").text(QAccessible::Name).toStdString(), sentence);
+  EXPECT_THAT(Accessible("PulseScale").text(QAccessible::Description).toStdString(),
+              testing::HasSubstr(sentence));
+  EXPECT_TRUE(described("spnVirtPulseRange") && described("spnDefaultPos"));
+  EXPECT_FALSE(described("spnActPulseRange") || described("spnNeutralTrim"));
+  Press("Command3_0");
+  RunToTheEnd();
+  EXPECT_EQ(unit.PortOptions(3), (PortOptionBytes{1, 60, 240, 100, 200, 100, 200, 150, 160}))
+      << "what is stored";
+  Press("chkUpdate_7");
+  EXPECT_FALSE(Visible("cmdStore")) << "an apply box stores it, too";
+
+  // By its key, and from the keyboard; the focus then stays in the editor.
+  Type("spnNeutralTrim", "50");
+  const QImage hatched = stored();
+  QTest::keySequence(window_.get(), QKeySequence(QStringLiteral("Ctrl+S")));
+  EXPECT_FALSE(Visible("cmdStore") || described("spnDefaultPos"));
+  EXPECT_NE(stored(), hatched);
+  EXPECT_EQ(PlaceOf("PulseScale"), scale) << "the editor jumps";
+  for (const std::size_t channel : {2u, 6u, 7u})
+    EXPECT_EQ(Record(channel).VirtualRange, (PulsePair{1050, 2050}));
+  EXPECT_EQ(Record(3).VirtualRange, (PulsePair{1000, 2000}));
+  Type("spnNeutralTrim", "0");
+  Find("cmdStore").setFocus();
+  Key(Qt::Key_Space);
+  EXPECT_EQ(Record(7).VirtualRange, (PulsePair{1000, 2000}));
+  EXPECT_EQ(window_->focusWidget(), &Spin("spnVirtPulseRange"));
+}
+
 TEST_F(Editor, OutputKind_ReplacesTheServo) {
   Click("ServoSimulator2_4");
   Press("chkUpdate_5");

@@ -40,10 +40,13 @@ std::string Unstored::Sentence() const {
 
 std::string StoreCaption(const ChannelEditor& editor) {
   std::string list;
+  std::size_t count = 0;
   for (std::size_t channel = 0; channel < kPortCount; ++channel) {
-    if (editor.Ticked(channel)) list += (list.empty() ? "" : ", ") + std::to_string(channel + 1);
+    if (!editor.Ticked(channel)) continue;
+    list += (list.empty() ? "" : ", ") + std::to_string(channel + 1);
+    ++count;
   }
-  return "Store to " + list;
+  return "Store to " + (count == kPortCount ? "all eight" : list);
 }
 
 }  // namespace tendril

@@ -13,6 +13,7 @@ namespace tendril {
 // left or an apply box is clicked.
 class Unstored {
  public:
+  Unstored() = default;  // all is stored
   // `working` are the records that `editor` edits.
   Unstored(const ChannelEditor& editor, const ChannelTable& working);
 
@@ -22,11 +23,13 @@ class Unstored {
   // "Shown, not stored yet: virtual range, stops. SEND would write what is stored."; empty when all is stored.
   std::string Sentence() const;
 
+  friend bool operator==(const Unstored&, const Unstored&) = default;
+
  private:
   std::array<bool, kParameterCount> differs_{};
 };
 
-// The button that stores, with the channels that it stores to: "Store to 1, 2, 5".
+// The button that stores, with the channels that it stores to: "Store to 1, 2, 5", or "Store to all eight".
 std::string StoreCaption(const ChannelEditor& editor);
 
 }  // namespace tendril

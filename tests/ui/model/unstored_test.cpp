@@ -24,6 +24,8 @@ TEST(Unstored, NamesWhatAnEditChangedBeyondItsOwnFields) {
   editor.ClickApplyBox(4, true);
   EXPECT_EQ(sentence(), "");
   EXPECT_EQ(StoreCaption(editor), "Store to 3, 5");
+  editor.ClickAllBox(true);
+  EXPECT_EQ(StoreCaption(editor), "Store to all eight");
   editor.Change(Parameter::kActualRange, 300);
   EXPECT_EQ(
       sentence(),

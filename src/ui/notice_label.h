@@ -1,4 +1,4 @@
-// HintLabel: why a typed number cannot be taken.
+// NoticeLabel: a notice that is shown for a time.
 #pragma once
 
 #include <QString>
@@ -7,14 +7,15 @@
 
 namespace tendril {
 
-// Keeps the room for its lines while it is empty, so that nothing around it moves. New hints are read out.
-class HintLabel : public Announcement {
+// Keeps the room for its lines while it is empty, so that nothing around it moves. New notices are read out. The tool tip
+// has all of a notice that does not fit.
+class NoticeLabel : public Announcement {
  public:
   // One line elides what has no room; two or more are wrapped.
-  explicit HintLabel(int lines);
+  explicit NoticeLabel(int lines);
 
-  // Shows `hint` about `field`, which is read out before it. An empty hint shows nothing.
-  void ShowHint(const QString& field, const QString& hint);
+  // Shows `text`. `spoken` is read out. Empty texts show nothing.
+  void ShowNotice(const QString& text, const QString& spoken);
 
   QSize sizeHint() const override { return {0, lines_ * fontMetrics().lineSpacing()}; }
   QSize minimumSizeHint() const override { return sizeHint(); }
