@@ -71,6 +71,9 @@ TEST_F(Moving, Escape_EndsOneThingForEachPress) {
   presets.showPopup();
   QTest::keyClick(presets.view(), Qt::Key_Escape);
   EXPECT_TRUE(!presets.view()->isVisible() && Sweeps());
+  TypeOver("spnNeutralTrim", "5");
+  Key(Qt::Key_Escape);
+  EXPECT_TRUE(Spin("spnNeutralTrim").value() == 0 && Sweeps());
   Press("cmdShowSummary");
   Press("cmdTest_0");  // before the summary is shown
   world_.time.Advance(20);
