@@ -122,6 +122,7 @@ class Show {
   void SavePicture(const char* name) { SavePicture(program_.window, name); }
   void SavePicture(QWidget& shown, const char* name) const {
     const QString path = QDir(folder_).filePath(QString::fromUtf8(name));
+    QApplication::sendPostedEvents(nullptr, QEvent::LayoutRequest);  // of texts that have just changed
     Require(shown.grab().save(path), "Cannot save the picture " + path.toStdString());
     Print("Picture: " + path.toStdString());
   }
