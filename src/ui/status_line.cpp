@@ -37,7 +37,7 @@ StatusLine::StatusLine()
   lblStatus_->setTextFormat(Qt::PlainText);
   lblStatus_->setTextInteractionFlags(Qt::TextSelectableByMouse);
   lblStatus_->setSizePolicy(QSizePolicy::Ignored, QSizePolicy::Fixed);
-  Describe(cmdUndo_, "Takes back what the sentence beside it reports.");
+  Describe(cmdUndo_, "Takes back the last change, which concerns several channels (Ctrl+Z).");
   cmdUndo_->setFixedHeight(LowButtonHeight(*cmdUndo_));
   cmdUndo_->hide();
   connect(cmdUndo_, &QAbstractButton::clicked, this, &StatusLine::UndoPressed);

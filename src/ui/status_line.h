@@ -32,7 +32,7 @@ class StatusLine : public QStatusBar {
   void ShowOrigin(const QString& text) { lblOrigin_->Show(text); }
   // The notice of a borrowed port, beside what moves.
   void ShowBorrowed(const QString& text) { moving_->ShowBorrowed(text); }
-  // Shows or hides the button that undoes what the sentence reports.
+  // Shows or hides the button that undoes the last change.
   void OfferUndo(bool offer) { cmdUndo_->setVisible(offer); }
   // The line that shows what moves.
   MovingLine& Moving() { return *moving_; }
