@@ -79,6 +79,7 @@ class frmNewServoConfig : public QMainWindow {
   void NoteStep(const QString& what, bool goes_on = false);
   void ShowOrigin();
   void ShowUndo();
+  bool MayUndo() const;
   void Undo();
   void Redo();
   void ShowRestored(const QString& said);

@@ -136,7 +136,7 @@ void frmNewServoConfig::OnSent(std::uint8_t unit) {
 }
 
 void frmNewServoConfig::OnReport(const CommandReport& report) {
-  if (report.outcome.empty()) status_->OfferUndo(false);  // it is off while a command runs
+  if (report.outcome.empty()) status_->OfferUndo({});  // it is off while a command runs
   QString sentence = QString::fromStdString(report.Sentence(TimeOfDay()));
   if (!report.outcome.empty()) sentence += std::exchange(outcome_note_, {});
   status_->Say(sentence);
@@ -156,8 +156,12 @@ void frmNewServoConfig::RestoreReading() {
 // Called after everything that may have changed the configuration.
 void frmNewServoConfig::NoteStep(const QString& what, bool goes_on) {
   const auto changed = history_.Note(what, goes_on);
-  // Offered until the next step, and after those that one may not have meant.
-  if (!changed.empty()) status_->OfferUndo(changed.size() > 1);
+  const bool many = changed.size() > 1;
+  if (many) {
+    const QString channels = QString::fromStdString(ChannelsInWords(changed));
+    status_->Say(QStringLiteral("%1: %2 changed").arg(what, channels));
+  }
+  if (!changed.empty()) status_->OfferUndo(many ? history_.UndoText() : QString());
   ShowOrigin();
   ShowUndo();
 }
@@ -168,7 +172,8 @@ void frmNewServoConfig::ShowOrigin() {
 }
 
 void frmNewServoConfig::ShowUndo() {
-  const bool may = !commands_.running.Active() && !live_test_area_->Moves();
+  const bool may = MayUndo();
+  status_->EnableUndo(may);
   menu_->ShowUndo(may && history_.CanUndo(), history_.UndoText(), may && history_.CanRedo(),
                   history_.RedoText());
   const std::uint8_t unit = connection_->UnitId();
@@ -177,9 +182,11 @@ void frmNewServoConfig::ShowUndo() {
                      reading != nullptr ? UnitHeld(unit, *reading, "Unit %1 Held at %2") : QString());
 }
 
+bool frmNewServoConfig::MayUndo() const { return !commands_.running.Active() && !live_test_area_->Moves(); }
+
 void frmNewServoConfig::Undo() {
   CommitTyping();
-  if (!history_.CanUndo()) return;
+  if (!MayUndo() || !history_.CanUndo()) return;
   const QString what = history_.UndoText();
   history_.Undo();
   ShowRestored(QStringLiteral("Undone: ") + what);
@@ -187,7 +194,7 @@ void frmNewServoConfig::Undo() {
 
 void frmNewServoConfig::Redo() {
   CommitTyping();
-  if (!history_.CanRedo()) return;  // what was typed is a step of its own
+  if (!MayUndo() || !history_.CanRedo()) return;  // what was typed is a step of its own
   const QString what = history_.RedoText();
   history_.Redo();
   ShowRestored(QStringLiteral("Done again: ") + what);
@@ -200,7 +207,7 @@ void frmNewServoConfig::ShowRestored(const QString& said) {
   if (const auto channel = config_.Editor().Channel()) channels_->ShowSelected(*channel);
   if (SummaryShown()) summary_->ShowRecords();
   ShowRecords();
-  status_->OfferUndo(false);
+  status_->OfferUndo({});
   ShowOrigin();
   ShowUndo();
   status_->Say(said);

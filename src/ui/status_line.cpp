@@ -37,7 +37,7 @@ StatusLine::StatusLine()
   lblStatus_->setTextFormat(Qt::PlainText);
   lblStatus_->setTextInteractionFlags(Qt::TextSelectableByMouse);
   lblStatus_->setSizePolicy(QSizePolicy::Ignored, QSizePolicy::Fixed);
-  Describe(cmdUndo_, "Takes back the last change, which concerns several channels (Ctrl+Z).");
+  Describe(cmdUndo_, "Takes back the last change. It sends nothing, and moves no servo. (Ctrl+Z)");
   cmdUndo_->setFixedHeight(LowButtonHeight(*cmdUndo_));
   cmdUndo_->hide();
   connect(cmdUndo_, &QAbstractButton::clicked, this, &StatusLine::UndoPressed);
@@ -83,6 +83,11 @@ void StatusLine::SayTwice(const QString& sentence) {
   earlier_.clear();
   Say(sentence);
   earlier_ = sentence;
+}
+
+void StatusLine::OfferUndo(const QString& what) {
+  cmdUndo_->setText(QStringLiteral("Undo ") + what);
+  cmdUndo_->setVisible(!what.isEmpty());
 }
 
 void StatusLine::Copy() const {

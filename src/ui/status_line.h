@@ -32,8 +32,9 @@ class StatusLine : public QStatusBar {
   void ShowOrigin(const QString& text) { lblOrigin_->Show(text); }
   // The notice of a borrowed port, beside what moves.
   void ShowBorrowed(const QString& text) { moving_->ShowBorrowed(text); }
-  // Shows or hides the button that undoes the last change.
-  void OfferUndo(bool offer) { cmdUndo_->setVisible(offer); }
+  // Shows the button that undoes `what`; empty: hides it.
+  void OfferUndo(const QString& what);
+  void EnableUndo(bool enabled) { cmdUndo_->setEnabled(enabled); }
   // The line that shows what moves.
   MovingLine& Moving() { return *moving_; }
   // Puts the sentence and the facts on the clipboard, each in a line of its own.

@@ -249,6 +249,7 @@ void Simulation::Use(QWidget& control) {
   const std::string name = control.objectName().toStdString();
   if (!Usable(control) || name == "cmbNYX") return;
   if (name == "cmdCancel") operation_.cancelled = true;
+  const bool locked = CommandRuns();
   Note("the user uses " + name);
   if (auto* button = qobject_cast<QAbstractButton*>(&control)) {
     if (name.starts_with("Command3_")) return RunCommand(*button);
@@ -266,6 +267,8 @@ void Simulation::Use(QWidget& control) {
   } else {
     QTest::mouseClick(&control, Qt::LeftButton);
   }
+  Require(!locked || window_->WorkingConfiguration() == records_,
+          "nothing changes the records while a command runs");
   records_ = window_->WorkingConfiguration();
 }
 

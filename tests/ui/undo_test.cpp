@@ -92,8 +92,10 @@ TEST_F(Undoing, ShowsWhatItBrought) {
   Click("ServoSimulator2_1");
   ArrowUp("spnVirtPulseRange");
   ChooseByKeys("cmbPresets", 0);
+  EXPECT_EQ(Text("lblStatus"), "Preset Narrow Range: all channels changed");
+  EXPECT_TRUE(Visible("cmdUndo"));
   Click("ServoSimulator2_4");
-  Undo();
+  Press("cmdUndo");
   EXPECT_EQ(Find<QComboBox>("cmbPresets").currentIndex(), 1);
   EXPECT_EQ(Text("lblVirtPulseRange", "lblStatus"), "510] Undone: Preset Narrow Range");
   EXPECT_TRUE(Checked("chkUpdate_1") && !Checked("chkUpdate_4")) << "the edited channel is back";

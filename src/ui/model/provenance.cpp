@@ -7,6 +7,7 @@
 namespace tendril {
 
 std::string ChannelsInWords(const std::vector<std::size_t>& channels) {
+  if (channels.size() == kPortCount) return "all channels";
   std::string text = channels.size() == 1 ? "channel " : "channels ";
   for (std::size_t i = 0; i < channels.size(); ++i) {
     if (i > 0) text += i + 1 == channels.size() ? " and " : ", ";

@@ -11,7 +11,7 @@
 
 namespace tendril {
 
-// "channel 2", "channels 2 and 5", "channels 1, 2 and 5": channels 0 to 7 in words.
+// "channel 2", "channels 2 and 5", "channels 1, 2 and 5", "all channels": channels 0 to 7 in words.
 std::string ChannelsInWords(const std::vector<std::size_t>& channels);
 
 // Keeps the records as they were when a preset, a unit or a send last gave or took all of them.
