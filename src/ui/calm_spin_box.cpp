@@ -155,7 +155,7 @@ bool CalmSpinBox::event(QEvent* event) {
     event->ignore();
     return false;
   }
-  if (Typing() && (IsUndoOrRedo(key) || key.key() == Qt::Key_Escape)) {
+  if (Typing() && (IsRedo(key) || key.key() == Qt::Key_Escape)) {
     event->accept();
     return true;
   }
