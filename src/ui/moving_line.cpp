@@ -39,6 +39,9 @@ void MovingLine::ShowMoving(const QString& sentence, Moves moves) {
   // Qt would give the focus to the next control, and scroll there.
   if (moves == Moves::kNothing && cmdStop_->hasFocus()) window()->setFocus();
   cmdStop_->setVisible(moves != Moves::kNothing);
+  QFont font = lblMoving_->font();
+  font.setBold(moves != Moves::kNothing);
+  lblMoving_->setFont(font);
 }
 
 void MovingLine::ShowBorrowed(const QString& notice) {

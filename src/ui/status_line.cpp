@@ -65,7 +65,19 @@ StatusLine::StatusLine()
 
 void StatusLine::resizeEvent(QResizeEvent* event) {
   QStatusBar::resizeEvent(event);
-  const auto direction = width() < kOneLineOfFacts ? QBoxLayout::TopToBottom : QBoxLayout::LeftToRight;
+  ArrangeFacts();
+}
+
+void StatusLine::ShowBorrowed(const QString& text) {
+  moving_->ShowBorrowed(text);
+  borrowed_ = !text.isEmpty();
+  ArrangeFacts();
+}
+
+// The notice needs a whole line.
+void StatusLine::ArrangeFacts() {
+  const bool one_line = width() >= kOneLineOfFacts && !borrowed_;
+  const auto direction = one_line ? QBoxLayout::LeftToRight : QBoxLayout::TopToBottom;
   if (direction == facts_->direction()) return;
   facts_->setDirection(direction);
   facts_->setSpacing(direction == QBoxLayout::TopToBottom ? 1 : kApart);

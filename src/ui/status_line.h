@@ -31,7 +31,7 @@ class StatusLine : public QStatusBar {
   void ShowUnit(const QString& text) { lblUnit_->Show(text); }
   void ShowOrigin(const QString& text) { lblOrigin_->Show(text); }
   // The notice of a borrowed port, beside what moves.
-  void ShowBorrowed(const QString& text) { moving_->ShowBorrowed(text); }
+  void ShowBorrowed(const QString& text);
   // Shows the button that undoes `what`; empty: hides it.
   void OfferUndo(const QString& what);
   void EnableUndo(bool enabled) { cmdUndo_->setEnabled(enabled); }
@@ -49,12 +49,15 @@ class StatusLine : public QStatusBar {
  private:
   class Sentence;
 
+  void ArrangeFacts();
+
   MovingLine* moving_ = new MovingLine;
   QBoxLayout* facts_;  // what moves, and the three facts
   ElidedLabel* lblPort_;
   ElidedLabel* lblUnit_;
   ElidedLabel* lblOrigin_;
   Announcement* lblStatus_;
+  bool borrowed_ = false;  // the notice is shown
   QString earlier_;  // shown beside the next sentence
   QPushButton* cmdUndo_;
 };
