@@ -58,7 +58,7 @@ class StatusLine : public QStatusBar {
   ElidedLabel* lblOrigin_;
   Announcement* lblStatus_;
   bool borrowed_ = false;  // the notice is shown
-  QString earlier_;  // shown beside the next sentence
+  QString earlier_;        // shown beside the next sentence
   QPushButton* cmdUndo_;
 };
 
