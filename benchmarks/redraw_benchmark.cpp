@@ -245,8 +245,9 @@ class BareStrokes {
 struct Canvas {
   explicit Canvas(ServoSimulator& of)
       : servo(of), strokes(of), painted(of.size(), QImage::Format_RGB32), bare(painted) {
-    // Neither is part of the dial.
+    // None of these is part of the dial.
     servo.SelectServo(false);
+    servo.Mark(false);
     servo.setAttribute(Qt::WA_UnderMouse, false);
     painted.fill(servo.palette().color(QPalette::Button));
     bare = painted.copy();
