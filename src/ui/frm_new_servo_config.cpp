@@ -49,7 +49,9 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
       shutdown_(link, timers, control_panel, [this] { close(); }) {
   setObjectName("frmNewServoConfig");
   LayOut();
-  Connect();
+  ConnectAreas();
+  ConnectMenu();
+  ConnectOperations();
   StartUp();
 }
 
@@ -95,7 +97,7 @@ void frmNewServoConfig::LayOut() {
   setMenuBar(menu_ = new MainMenu(*this));
 }
 
-void frmNewServoConfig::Connect() {
+void frmNewServoConfig::ConnectAreas() {
   QObject* const c = &connections_;
   connect(connection_, &ConnectionArea::UnitIdChanged, c, [this] { EnableControls(); });
   connect(command_area_, &CommandArea::SendPressed, c, [this] { commands_.send.Start(); });
@@ -135,13 +137,34 @@ void frmNewServoConfig::Connect() {
     status_->Say(live_test_area_->Sweeps() ? QStringLiteral("Servo test running")
                                            : QStringLiteral("Servo test stopped"));
   });
+  connect(status_, &StatusLine::UndoPressed, c, [this] { Undo(); });
+  connect(&status_->Moving(), &MovingLine::StopPressed, c, [this] {
+    if (!live_test_.EndSweep()) live_test_area_->ClearSliderSends();
+  });
+  new EscapeKey(*this, {[this] { return summary_ != nullptr && summary_->CloseNumberEntry(); },
+                        [this] { return live_test_.EndSweep(); }, [this] { return commands_.Cancel(); }});
+  connect(progress_, &ProgressArea::CancelPressed, c, [this] { commands_.Cancel(); });
+}
+
+void frmNewServoConfig::ConnectOperations() {
+  commands_.running.SetObserver([this] { OnRunning(); });
+  commands_.running.SetReporter([this](const CommandReport& report) { OnReport(report); });
+  link_.SetPortHandler([this](bool open) {
+    if (!open) live_test_.OnPortClosed();
+    ports_.OnPort(open);
+  });
+  ports_.SetChangedHandler([this] { ShowPort(); });
+  ports_.SetOpeningHandler([this] { live_test_.OnTestButton(LiveTest::kNoButton); });
+}
+
+void frmNewServoConfig::ConnectMenu() {
+  QObject* const c = &connections_;
   connect(menu_, &MainMenu::ChannelChosen, c, [this](std::size_t channel) { ChooseChannel(channel); });
   connect(menu_, &MainMenu::CopyStatusChosen, c, [this] { status_->Copy(); });
   connect(menu_, &MainMenu::IdStepped, c, [this](int by) {
     connection_->StepUnitId(by);
     status_->Say(QStringLiteral("Unit ID ") + QString::fromStdString(HexByte(connection_->UnitId())));
   });
-  connect(status_, &StatusLine::UndoPressed, c, [this] { Undo(); });
   connect(menu_, &MainMenu::UndoChosen, c, [this] { Undo(); });
   connect(menu_, &MainMenu::RedoChosen, c, [this] { Redo(); });
   connect(menu_, &MainMenu::RestoreChosen, c, [this] { RestoreReading(); });
@@ -153,20 +176,6 @@ void frmNewServoConfig::Connect() {
   });
   connect(menu_, &MainMenu::AboutChosen, c, [this] { ShowAbout(*this, info_); });
   connect(menu_, &MainMenu::StopChosen, c, [this] { live_test_.EndSweep(); });
-  connect(&status_->Moving(), &MovingLine::StopPressed, c, [this] {
-    if (!live_test_.EndSweep()) live_test_area_->ClearSliderSends();
-  });
-  new EscapeKey(*this, {[this] { return summary_ != nullptr && summary_->CloseNumberEntry(); },
-                        [this] { return live_test_.EndSweep(); }, [this] { return commands_.Cancel(); }});
-  connect(progress_, &ProgressArea::CancelPressed, c, [this] { commands_.Cancel(); });
-  commands_.running.SetObserver([this] { OnRunning(); });
-  commands_.running.SetReporter([this](const CommandReport& report) { OnReport(report); });
-  link_.SetPortHandler([this](bool open) {
-    if (!open) live_test_.OnPortClosed();
-    ports_.OnPort(open);
-  });
-  ports_.SetChangedHandler([this] { ShowPort(); });
-  ports_.SetOpeningHandler([this] { live_test_.OnTestButton(LiveTest::kNoButton); });
 }
 
 void frmNewServoConfig::ShowPort() {
@@ -174,6 +183,7 @@ void frmNewServoConfig::ShowPort() {
   status_->ShowPort(QString::fromStdString(PortSentence(facts)));
   status_->ShowBorrowed(QString::fromStdString(BorrowedPortSentence(facts)));
   facts_.Show();
+  ShowUndo();  // each port has a way back of its own
 }
 
 void frmNewServoConfig::StartUp() {
@@ -189,7 +199,7 @@ void frmNewServoConfig::StartUp() {
 void frmNewServoConfig::OnRunning() {
   const RunningCommand& running = commands_.running;
   if (running.Operation() == &commands_.send) {
-    readings_.SendBegins(connection_->UnitId());
+    readings_.SendBegins(link_.CommPort(), connection_->UnitId());
     if (!dropped_.isEmpty())
       NoteOutcome(QStringLiteral("Sent without the %1 that was typed.").arg(std::exchange(dropped_, {})));
   }

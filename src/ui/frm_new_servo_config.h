@@ -58,7 +58,9 @@ class frmNewServoConfig : public QMainWindow {
 
  private:
   void LayOut();
-  void Connect();
+  void ConnectAreas();
+  void ConnectMenu();
+  void ConnectOperations();
   void StartUp();
   void ShowPort();
   void ChooseChannel(std::size_t channel);

@@ -1,20 +1,18 @@
 // The window's edits and views: what the user's acts do to the records, and how that is shown.
 #include <QGuiApplication>
-#include <QTime>
 #include <utility>
 
 #include "platform/hex_text.h"
 #include "ui/calm_spin_box.h"
 #include "ui/freeze.h"
 #include "ui/frm_new_servo_config.h"
+#include "ui/time_of_day.h"
 
 namespace tendril {
 namespace {
 
 // The table is filled before it is shown.
 constexpr std::int32_t kSummaryScreenMs = 20;
-
-std::string TimeOfDay() { return QTime::currentTime().toString(QStringLiteral("HH:mm")).toStdString(); }
 
 QString UnitHeld(std::uint8_t unit, const Readings::Reading& reading, const char* text) {
   return QString::fromLatin1(text).arg(QString::fromStdString(HexByte(unit)),
@@ -123,7 +121,7 @@ void frmNewServoConfig::OnReplaced(const QString& what) {
 
 void frmNewServoConfig::OnRead(std::uint8_t unit) {
   const std::string time = TimeOfDay();
-  readings_.Keep(unit, config_.Records(), time);
+  readings_.Keep(link_.CommPort(), unit, config_.Records(), time);
   config_.ReadFrom(unit, time);
   OnReplaced(QStringLiteral("Get from unit ") + QString::fromStdString(HexByte(unit)));
 }
@@ -131,7 +129,7 @@ void frmNewServoConfig::OnRead(std::uint8_t unit) {
 void frmNewServoConfig::OnSent(std::uint8_t unit) {
   config_.SentTo(unit, TimeOfDay());
   NoteStep({});
-  if (readings_.WayBack(unit) == nullptr)
+  if (readings_.WayBack(link_.CommPort(), unit) == nullptr)
     NoteOutcome(QStringLiteral("What it held before is not known: it was not read."));
 }
 
@@ -144,7 +142,7 @@ void frmNewServoConfig::OnReport(const CommandReport& report) {
 
 void frmNewServoConfig::RestoreReading() {
   const std::uint8_t unit = connection_->UnitId();
-  const Readings::Reading* reading = readings_.WayBack(unit);
+  const Readings::Reading* reading = readings_.WayBack(link_.CommPort(), unit);
   if (reading == nullptr) return;
   CommitTyping();
   config_.Load(reading->records, unit, reading->time);
@@ -177,7 +175,7 @@ void frmNewServoConfig::ShowUndo() {
   menu_->ShowUndo(may && history_.CanUndo(), history_.UndoText(), may && history_.CanRedo(),
                   history_.RedoText());
   const std::uint8_t unit = connection_->UnitId();
-  const Readings::Reading* reading = readings_.WayBack(unit);
+  const Readings::Reading* reading = readings_.WayBack(link_.CommPort(), unit);
   menu_->ShowWayBack(may && reading != nullptr,
                      reading != nullptr ? UnitHeld(unit, *reading, "Unit %1 Held at %2") : QString());
 }

@@ -1,7 +1,8 @@
 #include "ui/window_facts.h"
 
 #include <QString>
-#include <QTime>
+
+#include "ui/time_of_day.h"
 
 namespace tendril {
 
@@ -14,8 +15,7 @@ void WindowFacts::Show() {
 }
 
 void WindowFacts::NotePoll(std::uint8_t unit, bool replied) {
-  const QString now = QTime::currentTime().toString(QStringLiteral("HH:mm"));
-  answers_.Note(link_.CommPort(), unit, replied, now.toStdString());
+  answers_.Note(link_.CommPort(), unit, replied, TimeOfDay());
   Show();
 }
 

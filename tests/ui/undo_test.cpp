@@ -185,8 +185,10 @@ TEST_F(Undoing, NamesTheOriginAndTheWayBack) {
   EXPECT_THAT(Text("lblOrigin"), StartsWith("Read from 01 at "));
   Undo();
   EXPECT_TRUE(Records() == preset);
-  ChooseByKeys("CmbUnitID_1", 2);
-  EXPECT_FALSE(Item("Restore What the Unit Held").isEnabled());
+  ChooseByKeys("cmbNYX", 2);
+  EXPECT_FALSE(Item("Restore What the Unit Held").isEnabled()) << "another unit 01";
+  ChooseByKeys("cmbNYX", 1);
+  EXPECT_TRUE(Item("Restore What Unit 01 Held at ").isEnabled());
 }
 
 }  // namespace

@@ -1,16 +1,14 @@
 #include "ui/model/readings.h"
 
-#include <utility>
-
 namespace tendril {
 
-void Readings::SendBegins(std::uint8_t unit) {
-  Unit& kept = units_[unit];
+void Readings::SendBegins(std::int16_t port, std::uint8_t unit) {
+  Unit& kept = units_[{port, unit}];
   if (kept.latest) kept.before_send = std::exchange(kept.latest, std::nullopt);
 }
 
-const Readings::Reading* Readings::WayBack(std::uint8_t unit) const {
-  const auto found = units_.find(unit);
+const Readings::Reading* Readings::WayBack(std::int16_t port, std::uint8_t unit) const {
+  const auto found = units_.find({port, unit});
   if (found == units_.end()) return nullptr;
   const Unit& kept = found->second;
   const auto& reading = kept.before_send ? kept.before_send : kept.latest;

@@ -5,6 +5,7 @@
 #include <map>
 #include <optional>
 #include <string>
+#include <utility>
 
 #include "config/channel_config.h"
 
@@ -18,23 +19,23 @@ class Readings {
     std::string time;  // "14:02"
   };
 
-  // `unit` has given `records`.
-  void Keep(std::uint8_t unit, const ChannelTable& records, const std::string& time) {
-    units_[unit].latest = {records, time};
+  // `unit` on comm port `port` has given `records`.
+  void Keep(std::int16_t port, std::uint8_t unit, const ChannelTable& records, const std::string& time) {
+    units_[{port, unit}].latest = {records, time};
   }
-  // A send to `unit` begins: its latest reading is the way back, until the next send after another reading.
-  void SendBegins(std::uint8_t unit);
+  // A send to the unit begins: its latest reading is the way back, until the next send after another reading.
+  void SendBegins(std::int16_t port, std::uint8_t unit);
 
-  // The way back of `unit`, or while it was not sent to, what it held when it was read last; nullptr when it was not
+  // The way back of the unit, or while it was not sent to, what it held when it was read last; nullptr when it was not
   // read before.
-  const Reading* WayBack(std::uint8_t unit) const;
+  const Reading* WayBack(std::int16_t port, std::uint8_t unit) const;
 
  private:
   struct Unit {
     std::optional<Reading> latest;  // since the last send
     std::optional<Reading> before_send;
   };
-  std::map<std::uint8_t, Unit> units_;
+  std::map<std::pair<std::int16_t, std::uint8_t>, Unit> units_;
 };
 
 }  // namespace tendril
