@@ -147,7 +147,8 @@ void frmNewServoConfig::ConnectAreas() {
 }
 
 void frmNewServoConfig::ConnectOperations() {
-  commands_.running.SetObserver([this] { OnRunning(); });
+  commands_.running.SetObserver(
+      [this] { command_focus_.Follow(commands_.running.Active(), [this] { EnableControls(); }); });
   commands_.running.SetReporter([this](const CommandReport& report) { OnReport(report); });
   link_.SetPortHandler([this](bool open) {
     if (!open) live_test_.OnPortClosed();
@@ -194,16 +195,6 @@ void frmNewServoConfig::StartUp() {
   ShowRecords();
   ShowOrigin();
   facts_.Show();
-}
-
-void frmNewServoConfig::OnRunning() {
-  const RunningCommand& running = commands_.running;
-  if (running.Operation() == &commands_.send) {
-    readings_.SendBegins(link_.CommPort(), connection_->UnitId());
-    if (!dropped_.isEmpty())
-      NoteOutcome(QStringLiteral("Sent without the %1 that was typed.").arg(std::exchange(dropped_, {})));
-  }
-  command_focus_.Follow(running.Active(), [this] { EnableControls(); });
 }
 
 void frmNewServoConfig::EnableControls() {

@@ -75,8 +75,8 @@ class frmNewServoConfig : public QMainWindow {
   void OnReplaced(const QString& what);
   void OnRead(std::uint8_t unit);
   void OnSent(std::uint8_t unit);
-  void OnRunning();
   void OnReport(const CommandReport& report);
+  void OnBegun();
   void RestoreReading();
   void NoteStep(const QString& what, bool goes_on = false);
   void ShowOrigin();

@@ -129,15 +129,28 @@ void frmNewServoConfig::OnRead(std::uint8_t unit) {
 void frmNewServoConfig::OnSent(std::uint8_t unit) {
   config_.SentTo(unit, TimeOfDay());
   NoteStep({});
-  if (readings_.WayBack(link_.CommPort(), unit) == nullptr)
-    NoteOutcome(QStringLiteral("What it held before is not known: it was not read."));
 }
 
 void frmNewServoConfig::OnReport(const CommandReport& report) {
-  if (report.outcome.empty()) status_->OfferUndo({});  // it is off while a command runs
   QString sentence = QString::fromStdString(report.Sentence(TimeOfDay()));
-  if (!report.outcome.empty()) sentence += std::exchange(outcome_note_, {});
+  if (report.outcome.empty()) {
+    OnBegun();
+  } else {
+    sentence += std::exchange(outcome_note_, {});
+  }
   status_->Say(sentence);
+}
+
+// Keeps what the status bar says beside the command's outcome.
+void frmNewServoConfig::OnBegun() {
+  status_->OfferUndo({});  // it is off while a command runs
+  if (commands_.running.Operation() != &commands_.send) return;
+  if (!dropped_.isEmpty())
+    NoteOutcome(QStringLiteral("Sent without the %1 that was typed.").arg(std::exchange(dropped_, {})));
+  const std::uint8_t unit = connection_->UnitId();
+  readings_.SendBegins(link_.CommPort(), unit);
+  if (readings_.WayBack(link_.CommPort(), unit) == nullptr)
+    NoteOutcome(QStringLiteral("What it held before is not known: it was not read."));
 }
 
 void frmNewServoConfig::RestoreReading() {

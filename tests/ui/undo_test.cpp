@@ -10,6 +10,7 @@
 namespace tendril::test {
 namespace {
 
+using testing::EndsWith;
 using testing::HasSubstr;
 using testing::StartsWith;
 
@@ -163,6 +164,12 @@ TEST_F(Undoing, NamesTheOriginAndTheWayBack) {
   auto& unit = ConnectUnit();
   EXPECT_EQ(Text("lblOrigin"), "Preset Medium Range (default)");
   EXPECT_FALSE(Item("Restore What the Unit Held").isEnabled());
+  Click("Command3_0");
+  Press("cmdCancel");
+  RunToTheEnd();
+  EXPECT_EQ(Text("lblOrigin"), "Preset Medium Range (default)");
+  EXPECT_THAT(Text("lblStatus"), EndsWith("are not. What it held before is not known: it was not read."));
+  Find<QLabel>("lblProgress").clear();
   Click("Command3_0");
   RunToTheEnd();
   EXPECT_THAT(Text("lblOrigin"), StartsWith("Sent to 01 at "));
