@@ -1,11 +1,10 @@
 #include "ui/model/moving.h"
 
 #include "platform/hex_text.h"
+#include "serial/packets.h"
 
 namespace tendril {
 namespace {
-
-constexpr std::uint8_t kAllUnits = 0xFF;
 
 // What keeps the live test's commands from being sent; empty when nothing does.
 std::string WhyDrawingOnly(const MovingFacts& facts) {

@@ -1,10 +1,14 @@
 #include "ui/model/readings.h"
 
+#include "serial/packets.h"
+
 namespace tendril {
 
 void Readings::SendBegins(std::int16_t port, std::uint8_t unit) {
-  Unit& kept = units_[{port, unit}];
-  if (kept.latest) kept.before_send = std::exchange(kept.latest, std::nullopt);
+  for (auto& [place, kept] : units_) {
+    const bool meant = place.first == port && (place.second == unit || unit == kAllUnits);
+    if (meant && kept.latest) kept.before_send = std::exchange(kept.latest, std::nullopt);
+  }
 }
 
 const Readings::Reading* Readings::WayBack(std::int16_t port, std::uint8_t unit) const {

@@ -23,7 +23,8 @@ class Readings {
   void Keep(std::int16_t port, std::uint8_t unit, const ChannelTable& records, const std::string& time) {
     units_[{port, unit}].latest = {records, time};
   }
-  // A send to the unit begins: its latest reading is the way back, until the next send after another reading.
+  // A send to the unit, or with FF to every unit on the port, begins: the latest reading is the way back, until the next
+  // send after another reading.
   void SendBegins(std::int16_t port, std::uint8_t unit);
 
   // The way back of the unit, or while it was not sent to, what it held when it was read last; nullptr when it was not

@@ -2,6 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include "ui/model/readings.h"
+
 namespace tendril {
 namespace {
 
@@ -21,6 +23,17 @@ TEST(Provenance, NamesTheOriginAndWhatChangedSince) {
   EXPECT_EQ(provenance.Sentence(), "Sent to 0A at 14:02");
   provenance.ReadFrom(0x01, "14:05");
   EXPECT_EQ(provenance.Sentence(), "Read from 01 at 14:05");
+}
+
+TEST(Readings, SendToEveryUnit_KeepsTheWayBackOfEach) {
+  Readings readings;
+  readings.Keep(1, 0x01, {}, "14:02");
+  readings.Keep(2, 0x01, {}, "14:03");
+  readings.SendBegins(1, 0xFF);
+  readings.Keep(1, 0x01, {}, "14:09");
+  readings.Keep(2, 0x01, {}, "14:09");
+  EXPECT_EQ(readings.WayBack(1, 0x01)->time, "14:02");
+  EXPECT_EQ(readings.WayBack(2, 0x01)->time, "14:09") << "of another port";
 }
 
 }  // namespace
