@@ -95,6 +95,7 @@ void frmNewServoConfig::OnKindChosen(std::int16_t kind) {
 
 void frmNewServoConfig::OnPresetChosen(std::size_t preset) {
   QGuiApplication::setOverrideCursor(Qt::WaitCursor);
+  ForgetDropped();
   config_.ApplyPreset(preset);
   ShowRecords();
   NoteStep(QStringLiteral("Preset ") + QAnyStringView(kPresets[preset].name).toString());

@@ -200,8 +200,11 @@ void MotionParameters::AddParameters(QGridLayout& grid) {
 CalmSpinBox* MotionParameters::MakeSpin(std::size_t index) {
   auto* spin = Named(new CalmSpinBox, kRows[index].spin);
   spin->setAccessibleName(QString::fromUtf8(kRows[index].name));
-  connect(spin, &QSpinBox::valueChanged, this, [this, index](int value) {
-    const FollowUp follow_up = editor_.Change(static_cast<Parameter>(index), value);
+  connect(spin, &QSpinBox::valueChanged, this, [this, spin, index](int value) {
+    const auto parameter = static_cast<Parameter>(index);
+    // Assistive technology can set a disabled one.
+    if (!spin->isEnabled()) return spin->Show(editor_.Spin(parameter));
+    const FollowUp follow_up = editor_.Change(parameter, value);
     Q_EMIT Edited(QString::fromUtf8(kRows[index].name), follow_up);
   });
   connect(spin, &CalmSpinBox::HintChanged, this, [this](const QString& hint, const QString& spoken) {

@@ -55,6 +55,7 @@ void NumberEntry::OnSpin(std::size_t index, int value) {
 }
 
 void NumberEntry::OpenNumberEntry(std::size_t channel, SummaryField field, QWidget& text) {
+  for (CalmSpinBox* spin : spnSumValue_) spin->EndTyping();  // it was meant for the value before
   tmrAdjustDual_->SetEnabled(false);
   text_ = &text;
   editor_.OpenNumberEntry(channel, field);

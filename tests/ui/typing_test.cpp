@@ -123,6 +123,10 @@ TEST_F(Typing, CommandsAndViews_LeaveTheField) {
     Find<QLabel>("lblProgress").clear();
   }
   type();
+  ChooseByKeys("cmbPresets", 2);
+  EXPECT_EQ(Text("lblStatus"), "Preset Wide Range: all channels changed") << "it is not 900 again";
+  ChooseByKeys("cmbPresets", 1);
+  type();
   Key(Qt::Key_Tab);
   TypeOver("spnActPulseRange", "890");
   Press("Command3_0");
@@ -151,6 +155,24 @@ TEST_F(Typing, NumberEntry_DropsItAfterItsTimeAndOnEscape) {
     EXPECT_EQ(Record(2).VirtualStops, before.At(2).VirtualStops);
     EXPECT_EQ(window_->focusWidget(), &Find("txtSumStopRange_2"));
   }
+}
+
+// Assistive technology acts without the focus, and on disabled controls.
+TEST_F(Typing, AssistiveTechnology_NeitherTakesANumberElsewhereNorChangesWhatIsSent) {
+  ShowSummary();
+  Click("txtSumActualRange_1");
+  TypeOver("spnSumValue_0", "700");
+  Accessible("txtSumActualRange_2").actionInterface()->doAction(QAccessibleActionInterface::pressAction());
+  EXPECT_EQ(Record(1).ActualRange[0], 800) << "as it was left";
+  EXPECT_EQ(Shown("spnSumValue_0"), "900 µs") << "of channel 3";
+  Press("cmdShowConfig");
+
+  ConnectUnit();
+  Click("ServoSimulator2_2");
+  Press("Command3_0");
+  Accessible("spnActPulseRange").valueInterface()->setCurrentValue(700);
+  EXPECT_EQ(Record(2).ActualRange[0], 600);
+  EXPECT_EQ(Shown("spnActPulseRange"), "900 µs");
 }
 
 TEST_F(Typing, HeldKey_RepeatsItsFirstChange) {
