@@ -116,6 +116,10 @@ QLabel* BoldLabel(QAnyStringView text) {
 
 int LowButtonHeight(const QWidget& button) { return button.fontMetrics().height() + 4; }
 
+void MoveFocusToWindow(QWidget& widget) {
+  if (widget.hasFocus()) widget.window()->setFocus();
+}
+
 void Reveal(QWidget& widget) {
   for (QWidget* outer = widget.parentWidget(); outer != nullptr; outer = outer->parentWidget()) {
     if (auto* area = qobject_cast<QScrollArea*>(outer)) area->ensureWidgetVisible(&widget);

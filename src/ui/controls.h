@@ -111,6 +111,10 @@ int LowButtonHeight(const QWidget& button);
 // Scrolls what contains `widget`, if that scrolls, until it is visible.
 void Reveal(QWidget& widget);
 
+// If `widget` has the focus, its window gets it. Called before the widget is hidden or disabled: Qt would give the focus
+// to the next control, and scroll there.
+void MoveFocusToWindow(QWidget& widget);
+
 // Multiplies the type size of `widget`.
 void ScaleType(QWidget* widget, double factor);
 

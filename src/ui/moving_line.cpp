@@ -36,8 +36,7 @@ void MovingLine::ShowMoving(const QString& sentence, Moves moves) {
     cmdStop_->setText(QStringLiteral("Stop (goes to 1500 µs)"));
     Describe(cmdStop_, "Ends the test and moves the servo to the centre, 1500 µs (Escape).");
   }
-  // Qt would give the focus to the next control, and scroll there.
-  if (moves == Moves::kNothing && cmdStop_->hasFocus()) window()->setFocus();
+  if (moves == Moves::kNothing) MoveFocusToWindow(*cmdStop_);
   cmdStop_->setVisible(moves != Moves::kNothing);
   QFont font = lblMoving_->font();
   font.setBold(moves != Moves::kNothing);

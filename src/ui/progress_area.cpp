@@ -88,9 +88,8 @@ void ProgressArea::SetColour(ProgressColour colour) {
   ApplyColour();
 }
 
-// The disabled button would pass the focus on to some other control.
 void ProgressArea::EnableCancel(const QString& why_not) {
-  if (!why_not.isEmpty() && cmdCancel_->hasFocus()) window()->setFocus();
+  if (!why_not.isEmpty()) MoveFocusToWindow(*cmdCancel_);
   EnableUnless(why_not, cmdCancel_);
 }
 

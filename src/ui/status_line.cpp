@@ -99,7 +99,13 @@ void StatusLine::SayTwice(const QString& sentence) {
 
 void StatusLine::OfferUndo(const QString& what) {
   cmdUndo_->setText(QStringLiteral("Undo ") + what);
+  if (what.isEmpty()) MoveFocusToWindow(*cmdUndo_);
   cmdUndo_->setVisible(!what.isEmpty());
+}
+
+void StatusLine::EnableUndo(bool enabled) {
+  if (!enabled) MoveFocusToWindow(*cmdUndo_);
+  cmdUndo_->setEnabled(enabled);
 }
 
 void StatusLine::Copy() const {

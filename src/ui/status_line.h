@@ -34,7 +34,7 @@ class StatusLine : public QStatusBar {
   void ShowBorrowed(const QString& text);
   // Shows the button that undoes `what`; empty: hides it.
   void OfferUndo(const QString& what);
-  void EnableUndo(bool enabled) { cmdUndo_->setEnabled(enabled); }
+  void EnableUndo(bool enabled);
   // The line that shows what moves.
   MovingLine& Moving() { return *moving_; }
   // Puts the sentence and the facts on the clipboard, each in a line of its own.

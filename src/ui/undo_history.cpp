@@ -42,7 +42,9 @@ UndoHistory::UndoHistory(EditedConfiguration& configuration)
 std::vector<std::size_t> UndoHistory::Note(const QString& what, bool goes_on) {
   auto changed = ChannelsThatDiffer(configuration_.Records(), now_->records);
   // What belongs to no record is brought back with the records as it was last.
-  if (changed.empty() || (goes_on && stack_.canUndo() && !stack_.canRedo())) {
+  const bool same_step = goes_on && grows_;
+  grows_ = !changed.empty();
+  if (changed.empty() || same_step) {
     *now_ = configuration_.Take();
     return changed;
   }
@@ -54,6 +56,7 @@ std::vector<std::size_t> UndoHistory::Note(const QString& what, bool goes_on) {
 void UndoHistory::GoTo(const State& state) {
   if (state == now_) return;  // a new step's first redo
   now_ = state;
+  grows_ = false;
   configuration_.Restore(*now_);
 }
 

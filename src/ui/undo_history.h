@@ -18,7 +18,8 @@ class UndoHistory {
   explicit UndoHistory(EditedConfiguration& configuration);
 
   // Called after everything that may have changed the configuration. Keeps a step called `what` if a record has changed.
-  // With `goes_on` it belongs to the step before, as one more step of a held arrow does. Returns the changed channels.
+  // With `goes_on` it belongs to the step that the call before has kept, if it has: one more step of a held arrow does.
+  // Returns the changed channels.
   std::vector<std::size_t> Note(const QString& what, bool goes_on = false);
 
   // Whether there is a step to undo or redo.
@@ -38,7 +39,8 @@ class UndoHistory {
   void GoTo(const State& state);
 
   EditedConfiguration& configuration_;
-  State now_;  // what the configuration is; the newest step ends with it
+  State now_;           // what the configuration is; the newest step ends with it
+  bool grows_ = false;  // the last Note() has changed the newest step
   QUndoStack stack_;
 };
 

@@ -127,6 +127,30 @@ TEST_F(Undoing, HeldArrowIsOneStep) {
   EXPECT_EQ(Record(1).DefaultPosition, held);
 }
 
+TEST_F(Undoing, HeldArrowThatStartsWithoutAChange_DoesNotGoOnWithTheStepBefore) {
+  Click("ServoSimulator2_1");
+  for (const char* range : {"490", "900"}) {
+    TypeOver("spnActPulseRange", range);
+    Key(Qt::Key_Return);
+  }
+  Spin("spnVirtPulseRange").setFocus();  // 490; the record still holds 500
+  for (const bool repeated : {false, true, true}) {
+    QKeyEvent press(QEvent::KeyPress, Qt::Key_Up, Qt::NoModifier, {}, repeated);
+    QApplication::sendEvent(&Spin("spnVirtPulseRange"), &press);
+  }
+  ASSERT_GT(Record(1).VirtualRange[1], 2000);
+  Undo();
+  EXPECT_EQ(Record(1).VirtualRange, (PulsePair{1000, 2000}));
+  EXPECT_EQ(Record(1).ActualRange, (PulsePair{600, 2400}));
+}
+
+TEST_F(Undoing, ItsButtonGivesTheFocusToTheWindow) {
+  ChooseByKeys("cmbPresets", 0);
+  Find("cmdUndo").setFocus();
+  Key(Qt::Key_Space);
+  EXPECT_EQ(window_->focusWidget(), window_.get());
+}
+
 TEST_F(Undoing, StepsOfTheSummaryLeaveNothingToStore) {
   Click("ServoSimulator2_1");
   ShowSummary();
