@@ -67,9 +67,8 @@ std::string BorrowedPortSentence(const PortFacts& facts) {
       return "The Control Panel is asked for " + port + " and has not answered yet.";
     case PortControl::kGranted:
       return port +
-             " is taken from the Control Panel: shows cannot use it. It goes back when this window is closed "
-             "or "
-             "another port is asked for.";
+             " is taken from the Control Panel: shows cannot use it. "
+             "It goes back when this window is closed or another port is asked for.";
     case PortControl::kRefused:
       // Nothing is borrowed then.
       return facts.chosen == facts.requested
