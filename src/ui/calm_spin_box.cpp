@@ -214,7 +214,14 @@ void CalmSpinBox::focusOutEvent(QFocusEvent* event) {
   QSpinBox::focusOutEvent(event);
 }
 
+// A minimised window keeps what is typed. The base class would put the value back, also when the window is shown again.
+void CalmSpinBox::showEvent(QShowEvent* event) {
+  if (event->spontaneous()) return QWidget::showEvent(event);
+  QSpinBox::showEvent(event);
+}
+
 void CalmSpinBox::hideEvent(QHideEvent* event) {
+  if (event->spontaneous()) return QWidget::hideEvent(event);
   EndTyping();
   QSpinBox::hideEvent(event);
 }

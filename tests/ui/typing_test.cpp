@@ -157,6 +157,13 @@ TEST_F(Typing, NumberEntry_DropsItAfterItsTimeAndOnEscape) {
   }
 }
 
+TEST_F(Typing, MinimisedWindow_KeepsWhatIsTyped) {
+  TypeOver("spnActPulseRange", "2400");
+  window_->showMinimized();
+  window_->showNormal();
+  EXPECT_EQ(Shown("spnActPulseRange"), "2400 µs");
+}
+
 // Assistive technology acts without the focus, and on disabled controls.
 TEST_F(Typing, AssistiveTechnology_NeitherTakesANumberElsewhereNorChangesWhatIsSent) {
   ShowSummary();
