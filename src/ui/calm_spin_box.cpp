@@ -4,6 +4,7 @@
 #include <QLineEdit>
 #include <QSignalBlocker>
 #include <algorithm>
+#include <cstdint>
 #include <limits>
 
 #include "ui/appearance.h"
@@ -12,6 +13,7 @@ namespace tendril {
 namespace {
 
 constexpr QColor kMarkColour(0xC0, 0x10, 0x20);
+constexpr std::uint64_t kPairMs = 2;
 constexpr int kLongestQuote = 20;  // of what was typed, in the status bar
 
 bool IsEnter(const QKeyEvent& key) { return key.key() == Qt::Key_Return || key.key() == Qt::Key_Enter; }
@@ -40,6 +42,7 @@ void CalmSpinBox::Show(const BoundedValue& value) {
   shown_ = value;
   const QString typed = Typing() ? text() : QString();
   const int position = lineEdit()->cursorPosition();
+  const bool other_value = value.Value() != this->value();
   {
     const QSignalBlocker silent(this);
     if (!ArrowHeld()) ApplyLimits();
@@ -48,6 +51,8 @@ void CalmSpinBox::Show(const BoundedValue& value) {
   if (!typed.isNull() && typed != text()) {
     lineEdit()->setText(typed);
     lineEdit()->setCursorPosition(position);
+  } else if (other_value && hasFocus()) {
+    selectAll();  // the selection was of the old text; what is typed next replaces the number
   }
   ShowHint();  // for the new limits
 }
@@ -155,7 +160,7 @@ bool CalmSpinBox::event(QEvent* event) {
     event->ignore();
     return false;
   }
-  if (Typing() && (IsRedo(key) || key.key() == Qt::Key_Escape)) {
+  if (Typing() && (IsUndoOrRedo(key) || key.key() == Qt::Key_Escape)) {
     event->accept();
     return true;
   }
@@ -163,25 +168,28 @@ bool CalmSpinBox::event(QEvent* event) {
 }
 
 void CalmSpinBox::keyPressEvent(QKeyEvent* event) {
-  if (!event->isAutoRepeat()) {
-    key_held_ = true;
-    stepped_ = false;
-  }
-  if (event->key() == Qt::Key_Escape && Typing()) {
+  if (!event->isAutoRepeat() && !GoesOn(*event)) stepped_ = false;
+  if (!event->isAutoRepeat()) key_held_ = true;
+  if (Typing() && (event->key() == Qt::Key_Escape || event->matches(QKeySequence::Undo))) {
     PutBack();
     selectAll();
-  } else if (IsUndoOrRedo(*event) && !Typing()) {
-    event->ignore();
-  } else if (IsRedo(*event)) {
-    lineEdit()->redo();
+  } else if (IsUndoOrRedo(*event)) {
+    if (!Typing()) event->ignore();
   } else {
     if (IsEnter(*event)) EndTyping();
     QSpinBox::keyPressEvent(event);
   }
 }
 
+// X reports a held key as pairs of a release and a press at the same time. Qt does not recognise each of them.
+bool CalmSpinBox::GoesOn(const QKeyEvent& press) const {
+  return press.key() == released_ && press.timestamp() != 0 && press.timestamp() - released_at_ <= kPairMs;
+}
+
 void CalmSpinBox::keyReleaseEvent(QKeyEvent* event) {
   if (!event->isAutoRepeat()) key_held_ = false;
+  released_ = event->key();
+  released_at_ = event->timestamp();
   QSpinBox::keyReleaseEvent(event);
 }
 

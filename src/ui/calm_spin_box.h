@@ -5,6 +5,7 @@
 #include <QSpinBox>
 #include <QString>
 #include <QWheelEvent>
+#include <cstdint>
 #include <optional>
 
 #include "ui/model/bounded_value.h"
@@ -68,6 +69,7 @@ class CalmSpinBox : public QSpinBox {
   void Mark();
   void ApplyLimits();
   bool ArrowHeld() const;
+  bool GoesOn(const QKeyEvent& press) const;
 
   BoundedValue shown_;
   NumberMeaning meaning_ = NumberMeaning::kDistance;
@@ -77,6 +79,8 @@ class CalmSpinBox : public QSpinBox {
   bool key_held_ = false;  // since a key went down here
   bool stepped_ = false;   // the value has changed since then
   bool repeats_ = false;
+  int released_ = 0;  // the key that was released last, and when
+  std::uint64_t released_at_ = 0;
 };
 
 }  // namespace tendril

@@ -240,7 +240,7 @@ void frmNewServoConfig::MakeSummary() {
   connect(summary_, &SummaryArea::SendPressed, &connections_, [this] { commands_.send.Start(); });
   connect(summary_, &SummaryArea::GetPressed, &connections_, [this] { commands_.get.Start(); });
   connect(summary_, &SummaryArea::OptionChosen, &connections_,
-          [this](std::size_t channel) { NoteStep(QStringLiteral("Option of channel %1").arg(channel + 1)); });
+          [this] { NoteStep(QStringLiteral("Option")); });
   connect(summary_, &SummaryArea::SimulatorPressed, &connections_, [this] { ShowConfig(); });
   connect(summary_, &SummaryArea::NumberDropped, &connections_,
           [this](const QString& typed, const QString& sentence) { OnNumberDropped(typed, sentence); });
@@ -249,7 +249,7 @@ void frmNewServoConfig::MakeSummary() {
     config_.Remarks().AcceptRecord(channel);
     config_.Editor().ReloadChannel();
     ShowRemarks();
-    NoteStep(QStringLiteral("Edit of channel %1").arg(channel + 1), summary_->Repeats());
+    NoteStep(QStringLiteral("Edit"), summary_->Repeats());
   });
 }
 

@@ -81,6 +81,7 @@ void frmNewServoConfig::OnApplied() {
 }
 
 void frmNewServoConfig::OnKindChosen(std::int16_t kind) {
+  CommitTyping();
   const auto channel = config_.Editor().Channel();
   if (!channel) return;
   config_.Editor().SetPortType(kind);
@@ -94,8 +95,9 @@ void frmNewServoConfig::OnKindChosen(std::int16_t kind) {
 }
 
 void frmNewServoConfig::OnPresetChosen(std::size_t preset) {
-  QGuiApplication::setOverrideCursor(Qt::WaitCursor);
+  CommitTyping();
   ForgetDropped();
+  QGuiApplication::setOverrideCursor(Qt::WaitCursor);
   config_.ApplyPreset(preset);
   ShowRecords();
   NoteStep(QStringLiteral("Preset ") + QAnyStringView(kPresets[preset].name).toString());
@@ -149,8 +151,7 @@ void frmNewServoConfig::OnBegun() {
   if (!dropped_.isEmpty())
     NoteOutcome(QStringLiteral("Sent without the %1 that was typed.").arg(std::exchange(dropped_, {})));
   const std::uint8_t unit = connection_->UnitId();
-  readings_.SendBegins(link_.CommPort(), unit);
-  if (readings_.WayBack(link_.CommPort(), unit) == nullptr)
+  if (!readings_.SendBegins(link_.CommPort(), unit))
     NoteOutcome(QStringLiteral("What it held before is not known: it was not read."));
 }
 
@@ -214,6 +215,7 @@ void frmNewServoConfig::Redo() {
 
 // Shows the configuration that undo or redo has restored. Stores nothing, and sends nothing.
 void frmNewServoConfig::ShowRestored(const QString& said) {
+  ForgetDropped();
   choices_->ShowPreset(config_.ChosenPreset());
   apply_boxes_->ShowTicks();
   if (const auto channel = config_.Editor().Channel()) channels_->ShowSelected(*channel);

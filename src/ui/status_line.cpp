@@ -23,8 +23,10 @@ class StatusLine::Sentence : public Announcement {
 
 namespace {
 
-constexpr int kApart = 12;             // between two facts
-constexpr int kOneLineOfFacts = 1260;  // the width from which they have room beside what moves
+constexpr int kApart = 12;  // between two facts
+// A window that is lower, and at least as wide, shows them beside what moves.
+constexpr int kRoomForThreeLines = 760;
+constexpr int kOneLineOfFacts = 1260;
 
 }  // namespace
 
@@ -68,6 +70,12 @@ void StatusLine::resizeEvent(QResizeEvent* event) {
   ArrangeFacts();
 }
 
+// The window's height has changed, too.
+void StatusLine::moveEvent(QMoveEvent* event) {
+  QStatusBar::moveEvent(event);
+  ArrangeFacts();
+}
+
 void StatusLine::ShowBorrowed(const QString& text) {
   moving_->ShowBorrowed(text);
   borrowed_ = !text.isEmpty();
@@ -76,7 +84,8 @@ void StatusLine::ShowBorrowed(const QString& text) {
 
 // The notice needs a whole line.
 void StatusLine::ArrangeFacts() {
-  const bool one_line = width() >= kOneLineOfFacts && !borrowed_;
+  const bool low = window()->height() < kRoomForThreeLines;
+  const bool one_line = low && width() >= kOneLineOfFacts && !borrowed_;
   const auto direction = one_line ? QBoxLayout::LeftToRight : QBoxLayout::TopToBottom;
   if (direction == facts_->direction()) return;
   facts_->setDirection(direction);
@@ -94,7 +103,18 @@ void StatusLine::Say(const QString& sentence) {
 void StatusLine::SayTwice(const QString& sentence) {
   earlier_.clear();
   Say(sentence);
-  earlier_ = sentence;
+  earlier_ = said_twice_ = sentence;
+}
+
+void StatusLine::ForgetEarlier() {
+  earlier_.clear();
+  if (said_twice_.isEmpty()) return;
+  QString rest = lblStatus_->text();
+  rest.remove(QStringLiteral(". ") + said_twice_).remove(said_twice_);
+  said_twice_.clear();
+  if (rest == lblStatus_->text()) return;
+  lblStatus_->setText(rest);
+  lblStatus_->setToolTip(rest);
 }
 
 void StatusLine::OfferUndo(const QString& what) {

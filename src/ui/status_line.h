@@ -24,8 +24,8 @@ class StatusLine : public QStatusBar {
   void Say(const QString& sentence);
   // The same, and shows `sentence` beside the next one, too: what the user just did may say something itself.
   void SayTwice(const QString& sentence);
-  // Shows nothing of an earlier sentence beside the next one.
-  void ForgetEarlier() { earlier_.clear(); }
+  // What SayTwice() said is no longer so: takes it away, and shows it beside no other sentence.
+  void ForgetEarlier();
   // Each shows one fact. An empty text shows nothing.
   void ShowPort(const QString& text) { lblPort_->Show(text); }
   void ShowUnit(const QString& text) { lblUnit_->Show(text); }
@@ -45,6 +45,7 @@ class StatusLine : public QStatusBar {
 
  protected:
   void resizeEvent(QResizeEvent* event) override;
+  void moveEvent(QMoveEvent* event) override;
 
  private:
   class Sentence;
@@ -58,7 +59,8 @@ class StatusLine : public QStatusBar {
   ElidedLabel* lblOrigin_;
   Announcement* lblStatus_;
   bool borrowed_ = false;  // the notice is shown
-  QString earlier_;        // shown beside the next sentence
+  QString said_twice_;
+  QString earlier_;  // shown beside the next sentence
   QPushButton* cmdUndo_;
 };
 

@@ -219,12 +219,12 @@ void SummaryArea::AddOptions(QGridLayout& table, std::size_t channel, const QStr
   connect(row.power_up, &QButtonGroup::idClicked, this, [this, channel](int id) {
     entry_->Leave();
     working_.At(channel).PowerUPOpt = id;
-    Q_EMIT OptionChosen(channel);
+    Q_EMIT OptionChosen();
   });
   connect(row.lost_comm, &QButtonGroup::idClicked, this, [this, channel](int id) {
     entry_->Leave();
     working_.At(channel).LostCommOption = id;
-    Q_EMIT OptionChosen(channel);
+    Q_EMIT OptionChosen();
   });
 }
 

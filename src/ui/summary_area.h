@@ -51,8 +51,8 @@ class SummaryArea : public QWidget {
   void SimulatorPressed();
   // The number entry has changed this channel's record.
   void Edited(std::size_t channel);
-  // The user chose an option; this channel's record holds it.
-  void OptionChosen(std::size_t channel);
+  // The user chose an option; the record holds it.
+  void OptionChosen();
   // A number typed into the number entry cannot be taken; see CalmSpinBox.
   void NumberDropped(const QString& typed, const QString& sentence);
 

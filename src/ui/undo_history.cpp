@@ -49,7 +49,8 @@ std::vector<std::size_t> UndoHistory::Note(const QString& what, bool goes_on) {
     return changed;
   }
   auto before = std::exchange(now_, std::make_shared<EditedConfiguration::Snapshot>(configuration_.Take()));
-  stack_.push(new Step(*this, what, std::move(before), now_));
+  const QString channels = QString::fromStdString(ChannelsInWords(changed));
+  stack_.push(new Step(*this, QStringLiteral("%1 (%2)").arg(what, channels), std::move(before), now_));
   return changed;
 }
 

@@ -84,8 +84,7 @@ TEST_F(Typing, Escape_PutsTheValueBackAtOnceAndIsTheWindowsOtherwise) {
     Key(Qt::Key_Escape);
     EXPECT_EQ(Shown("spnDefaultPos"), "0 µs") << typed;
     TypeOver("spnDefaultPos", typed);
-    for (std::size_t keys = 0; Shown("spnDefaultPos") != "0 µs" && keys < 9; ++keys)
-      QTest::keyClick(&Spin("spnDefaultPos"), Qt::Key_Z, Qt::ControlModifier);
+    QTest::keyClick(&Spin("spnDefaultPos"), Qt::Key_Z, Qt::ControlModifier);
     EXPECT_EQ(Shown("spnDefaultPos"), "0 µs") << typed;
     EXPECT_EQ(Hint(), "");
   }
@@ -94,6 +93,13 @@ TEST_F(Typing, Escape_PutsTheValueBackAtOnceAndIsTheWindowsOtherwise) {
   QTest::keyClick(&Spin("spnDefaultPos"), Qt::Key_Z, Qt::ControlModifier);
   EXPECT_EQ(of_the_window, 2);
   EXPECT_EQ(Record(0).DefaultPosition, 1500);
+
+  // What was said of a number goes with its next edit.
+  TypeOver("spnDefaultPos", "2400");
+  Key(Qt::Key_Return);
+  EXPECT_THAT(Text("lblStatus"), HasSubstr("It is 0 again."));
+  Key(Qt::Key_Up);
+  EXPECT_EQ(Text("lblStatus"), "");
 }
 
 TEST_F(Typing, CommandsAndViews_LeaveTheField) {

@@ -10,8 +10,10 @@
 namespace tendril::test {
 namespace {
 
+using testing::AllOf;
 using testing::EndsWith;
 using testing::HasSubstr;
+using testing::Not;
 using testing::StartsWith;
 
 class Undoing : public Window {
@@ -98,7 +100,7 @@ TEST_F(Undoing, ShowsWhatItBrought) {
   Click("ServoSimulator2_4");
   Press("cmdUndo");
   EXPECT_EQ(Find<QComboBox>("cmbPresets").currentIndex(), 1);
-  EXPECT_EQ(Text("lblVirtPulseRange", "lblStatus"), "510] Undone: Preset Narrow Range");
+  EXPECT_EQ(Text("lblVirtPulseRange", "lblStatus"), "510] Undone: Preset Narrow Range (all channels)");
   EXPECT_TRUE(Checked("chkUpdate_1") && !Checked("chkUpdate_4")) << "the edited channel is back";
   EXPECT_EQ(Arcs("ServoSimulator2_1"), "-90 90 -51 51 -50 50 ");
   EXPECT_EQ(Text("lblOrigin"), "Preset Medium Range (default); channel 2 changed since");
@@ -109,7 +111,8 @@ TEST_F(Undoing, ShowsWhatItBrought) {
   Undo();
   EXPECT_EQ(Text("txtSumVirtualRange_1"), "1000-2000");
   Redo();
-  EXPECT_EQ(Text("txtSumVirtualRange_1", "lblStatus"), "990-2010 Done again: Virtual Pulse Range");
+  EXPECT_EQ(Text("txtSumVirtualRange_1", "lblStatus"),
+            "990-2010 Done again: Virtual Pulse Range (channel 2)");
 }
 
 TEST_F(Undoing, HeldArrowIsOneStep) {
@@ -197,7 +200,7 @@ TEST_F(Undoing, NamesTheOriginAndTheWayBack) {
   Click("Command3_0");
   RunToTheEnd();
   EXPECT_THAT(Text("lblOrigin"), StartsWith("Sent to 01 at "));
-  EXPECT_THAT(Text("lblStatus"), HasSubstr("What it held before is not known: it was not read."));
+  EXPECT_THAT(Text("lblStatus"), EndsWith("Ports 1 to 8 are written.")) << "it holds what was sent";
 
   unit.SetPortOptions(2, {1, 70, 230, 90, 190, 95, 180, 130, 140});
   Click("Command3_1");
@@ -208,6 +211,10 @@ TEST_F(Undoing, NamesTheOriginAndTheWayBack) {
   const ChannelTable preset = Records();
   Click("Command3_0");
   RunToTheEnd();
+  Undo();  // of the preset, not of the send
+  EXPECT_THAT(Text("lblOrigin"), AllOf(StartsWith("Sent to 01 at "), EndsWith("all channels changed since")));
+  Redo();
+  EXPECT_THAT(Text("lblOrigin"), Not(HasSubstr("changed since")));
   Click("Command3_1");  // what was sent is read again: the way back stays
   RunToTheEnd();
   EXPECT_TRUE(Records() == preset);

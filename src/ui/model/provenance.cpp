@@ -22,9 +22,13 @@ void Provenance::ReadFrom(std::uint8_t unit, const std::string& time) {
 
 void Provenance::SentTo(std::uint8_t unit, const std::string& time) {
   Begin("Sent to " + HexByte(unit) + " at " + time);
+  ++state_.sends;
 }
 
-void Provenance::Begin(std::string origin) { state_ = {std::move(origin), working_}; }
+void Provenance::Begin(std::string origin) {
+  state_.origin = std::move(origin);
+  state_.records = working_;
+}
 
 std::vector<std::size_t> Provenance::ChangedChannels() const {
   std::vector<std::size_t> changed;

@@ -20,14 +20,17 @@ class Provenance {
   struct State {
     std::string origin;
     ChannelTable records;
+    int sends = 0;  // so far
   };
 
   // `working` are the records; they must outlive this object.
   explicit Provenance(const ChannelTable& working) : working_(working) {}
 
   const State& Current() const { return state_; }
-  // Goes back to a state that it had.
-  void Restore(const State& state) { state_ = state; }
+  // Goes back to a state that it had, unless there was a send since: no undo takes that back.
+  void Restore(const State& state) {
+    if (state.sends == state_.sends) state_ = state;
+  }
 
   // The records are those of the preset called `name`.
   void FromPreset(std::string_view name) { Begin("Preset " + std::string(name)); }

@@ -4,11 +4,12 @@
 
 namespace tendril {
 
-void Readings::SendBegins(std::int16_t port, std::uint8_t unit) {
+bool Readings::SendBegins(std::int16_t port, std::uint8_t unit) {
   for (auto& [place, kept] : units_) {
     const bool meant = place.first == port && (place.second == unit || unit == kAllUnits);
     if (meant && kept.latest) kept.before_send = std::exchange(kept.latest, std::nullopt);
   }
+  return !units_.try_emplace({port, unit}).second;
 }
 
 const Readings::Reading* Readings::WayBack(std::int16_t port, std::uint8_t unit) const {

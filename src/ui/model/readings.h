@@ -24,8 +24,8 @@ class Readings {
     units_[{port, unit}].latest = {records, time};
   }
   // A send to the unit, or with FF to every unit on the port, begins: the latest reading is the way back, until the next
-  // send after another reading.
-  void SendBegins(std::int16_t port, std::uint8_t unit);
+  // send after another reading. False: the unit was neither read nor sent to before.
+  bool SendBegins(std::int16_t port, std::uint8_t unit);
 
   // The way back of the unit, or while it was not sent to, what it held when it was read last; nullptr when it was not
   // read before.
