@@ -24,7 +24,7 @@ constexpr std::array<ControlItem, 2> kTargetItems{
 constexpr std::array<ControlItem, 2> kCommandItems{
     {{"&SEND(write) Configuration", "Ctrl+Return", "Command3_0"},
      {"&GET(read) Configuration", "Ctrl+G", "Command3_1"}}};
-constexpr ControlItem kCancelItem{"&Cancel Command", "", "cmdCancel"};
+constexpr ControlItem kCancelItem{"&Cancel Command\tEsc", "", "cmdCancel"};
 constexpr ControlItem kChangeIdItem{"UPDATE Unit_ID", "", "Command3_2"};
 constexpr std::array<ControlItem, 2> kFileItems{
     {{"Export Config", "", "cmdWriteConfig"}, {"Import Config", "", "cmdReadConfig"}}};
