@@ -170,11 +170,14 @@ void frmNewServoConfig::RestoreReading() {
 void frmNewServoConfig::NoteStep(const QString& what, bool goes_on) {
   const auto changed = history_.Note(what, goes_on);
   const bool many = changed.size() > 1;
-  if (many) {
-    const QString channels = QString::fromStdString(ChannelsInWords(changed));
-    status_->Say(QStringLiteral("%1: %2 changed").arg(what, channels));
-  }
   if (!changed.empty()) status_->OfferUndo(many ? history_.UndoText() : QString());
+  if (!changed.empty() && !goes_on) {  // a held arrow says it once
+    status_->ForgetChange();
+    if (many) {
+      const QString channels = QString::fromStdString(ChannelsInWords(changed));
+      status_->SayOfChange(QStringLiteral("%1: %2 changed").arg(what, channels));
+    }
+  }
   ShowOrigin();
   ShowUndo();
 }
@@ -224,7 +227,7 @@ void frmNewServoConfig::ShowRestored(const QString& said) {
   status_->OfferUndo({});
   ShowOrigin();
   ShowUndo();
-  status_->Say(said);
+  status_->SayOfChange(said);
 }
 
 // Lets typed text take effect. A key can trigger what uses it without taking the focus away.

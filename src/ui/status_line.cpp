@@ -108,10 +108,20 @@ void StatusLine::SayTwice(const QString& sentence) {
 
 void StatusLine::ForgetEarlier() {
   earlier_.clear();
-  if (said_twice_.isEmpty()) return;
+  TakeAway(said_twice_);
+}
+
+void StatusLine::SayOfChange(const QString& sentence) {
+  Say(sentence);
+  of_change_ = sentence;
+}
+
+// It is no longer so.
+void StatusLine::TakeAway(QString& said) {
+  if (said.isEmpty()) return;
   QString rest = lblStatus_->text();
-  rest.remove(QStringLiteral(". ") + said_twice_).remove(said_twice_);
-  said_twice_.clear();
+  rest.remove(QStringLiteral(". ") + said).remove(said);
+  said.clear();
   if (rest == lblStatus_->text()) return;
   lblStatus_->setText(rest);
   lblStatus_->setToolTip(rest);

@@ -26,6 +26,9 @@ class StatusLine : public QStatusBar {
   void SayTwice(const QString& sentence);
   // What SayTwice() said is no longer so: takes it away, and shows it beside no other sentence.
   void ForgetEarlier();
+  // Shows `sentence` about the last change of a record, until the next change.
+  void SayOfChange(const QString& sentence);
+  void ForgetChange() { TakeAway(of_change_); }
   // Each shows one fact. An empty text shows nothing.
   void ShowPort(const QString& text) { lblPort_->Show(text); }
   void ShowUnit(const QString& text) { lblUnit_->Show(text); }
@@ -51,6 +54,7 @@ class StatusLine : public QStatusBar {
   class Sentence;
 
   void ArrangeFacts();
+  void TakeAway(QString& said);
 
   MovingLine* moving_ = new MovingLine;
   QBoxLayout* facts_;  // what moves, and the three facts
@@ -60,6 +64,7 @@ class StatusLine : public QStatusBar {
   Announcement* lblStatus_;
   bool borrowed_ = false;  // the notice is shown
   QString said_twice_;
+  QString of_change_;
   QString earlier_;  // shown beside the next sentence
   QPushButton* cmdUndo_;
 };

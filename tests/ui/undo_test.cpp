@@ -104,6 +104,9 @@ TEST_F(Undoing, ShowsWhatItBrought) {
   EXPECT_TRUE(Checked("chkUpdate_1") && !Checked("chkUpdate_4")) << "the edited channel is back";
   EXPECT_EQ(Arcs("ServoSimulator2_1"), "-90 90 -51 51 -50 50 ");
   EXPECT_EQ(Text("lblOrigin"), "Preset Medium Range (default); channel 2 changed since");
+  ArrowUp("spnDefaultPos");
+  EXPECT_EQ(Text("lblStatus"), "") << "it was said of the change before";
+  Undo();
 
   // In the summary the rows are shown as they were, not within their bounds.
   ShowSummary();
