@@ -151,7 +151,10 @@ void frmNewServoConfig::ConnectOperations() {
       [this] { command_focus_.Follow(commands_.running.Active(), [this] { EnableControls(); }); });
   commands_.running.SetReporter([this](const CommandReport& report) { OnReport(report); });
   link_.SetPortHandler([this](bool open) {
+    const bool swept = live_test_area_->Sweeps();
     if (!open) live_test_.OnPortClosed();
+    if (!open && swept)
+      status_->Say(QStringLiteral("Servo test stopped: the port is closed, and the servo stays where it is"));
     ports_.OnPort(open);
   });
   ports_.SetChangedHandler([this] { ShowPort(); });

@@ -79,8 +79,10 @@ TEST_F(Ports, List_FollowsTheDevicesAndKeepsTheChosenLine) {
   list.setFocus();
   QTest::qWait(0);
   EXPECT_EQ(list.count(), 6) << "read again with the focus";
+  Press("cmdTest_0");
   world_.bench.Unplug(2);
   world_.time.Advance(2);
+  EXPECT_EQ(Text("lblStatus"), "Servo test stopped: the port is closed, and the servo stays where it is");
   EXPECT_EQ(Text("lblPort"), "Comm 2 is not open: it was unplugged");
   list.showPopup();
   EXPECT_EQ(list.itemData(5, Qt::ToolTipRole).toString().toStdString(), "Virtual serial line 9");
