@@ -90,7 +90,7 @@ class VirtualPorts::Device final : public SerialDevice {
   bool Exists(std::int32_t number) const override;
   std::string Describe(std::int32_t number) const override;
   PortHolder Holder(std::int32_t number) const override { return ports_.At(number).holder; }
-  void WatchPorts(std::function<void()> handler) override { watch_ = std::move(handler); }
+  void WatchPorts(const std::function<void()>& handler) override { watch_ = handler; }
 
   void Open(std::int32_t number, std::int32_t baud) override;
   void Close() noexcept override;

@@ -58,7 +58,7 @@ class SerialDevice {
 
   // From now on `handler` is called from the event loop when ports may have come or gone: at most once a second, and
   // only where the system reports it. nullptr ends that.
-  virtual void WatchPorts(std::function<void()> /*handler*/) {}
+  virtual void WatchPorts(const std::function<void()>& /*handler*/) {}
 
   // Opens port `number` (1 or more) at `baud` bit/s for this program alone. Raises kErrInvalidPort (no such device),
   // kErrPortAlreadyOpen (another program, or this one, has it), kErrNotAllowed (with the remedy) or

@@ -77,7 +77,7 @@ class HwSerial {
   // Which other program has it open, where the system reports that.
   PortHolder ComPortHolder(std::int16_t number) const { return device_.Holder(number); }
   // As SerialDevice::WatchPorts().
-  void WatchComPorts(std::function<void()> handler) { device_.WatchPorts(std::move(handler)); }
+  void WatchComPorts(const std::function<void()>& handler) { device_.WatchPorts(handler); }
   // Whether the port is open.
   bool PortOpen() const { return port_open_; }
   // True opens the port with the current settings, and does nothing when it is open with them already or when

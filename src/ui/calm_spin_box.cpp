@@ -215,7 +215,7 @@ void CalmSpinBox::focusOutEvent(QFocusEvent* event) {
                           (event->reason() == Qt::ActiveWindowFocusReason && !Takes(text()));
   if (comes_back && Typing()) {
     lineEdit()->event(event);
-    QWidget::focusOutEvent(event);
+    update();
     return;
   }
   EndTyping();
@@ -224,12 +224,11 @@ void CalmSpinBox::focusOutEvent(QFocusEvent* event) {
 
 // A minimised window keeps what is typed. The base class would put the value back, also when the window is shown again.
 void CalmSpinBox::showEvent(QShowEvent* event) {
-  if (event->spontaneous()) return QWidget::showEvent(event);
-  QSpinBox::showEvent(event);
+  if (!event->spontaneous()) QSpinBox::showEvent(event);
 }
 
 void CalmSpinBox::hideEvent(QHideEvent* event) {
-  if (event->spontaneous()) return QWidget::hideEvent(event);
+  if (event->spontaneous()) return;
   EndTyping();
   QSpinBox::hideEvent(event);
 }

@@ -17,8 +17,11 @@ void PaintHatch(QPainter& painter, const QRectF& box, const QColor& colour) {
   // From the same origin everywhere, so that a bar that grows does not flicker.
   const double first = kHatchStep * std::floor((box.left() - box.height()) / kHatchStep);
   QVarLengthArray<QLineF, kUsualLines> lines;
-  for (double x = first; x < box.right(); x += kHatchStep)
+  const int count = static_cast<int>(std::ceil((box.right() - first) / kHatchStep));
+  for (int line = 0; line < count; ++line) {
+    const double x = first + line * kHatchStep;
     lines.append(QLineF(x, box.bottom(), x + box.height(), box.top()));
+  }
   painter.save();
   painter.setClipRect(box, Qt::IntersectClip);
   painter.setRenderHint(QPainter::Antialiasing, false);

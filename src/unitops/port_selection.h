@@ -32,7 +32,7 @@ class PortSelection {
   std::string DescribePort(std::size_t entry) const;
 
   // `handler` is called when devices may have come or gone, at most once a second.
-  void WatchPorts(std::function<void()> handler) { link_.WatchComPorts(std::move(handler)); }
+  void WatchPorts(const std::function<void()>& handler) { link_.WatchComPorts(handler); }
   // `handler` is called when Facts() may have changed.
   void SetChangedHandler(std::function<void()> handler) { changed_ = std::move(handler); }
   // `handler` is called when a port is about to be opened.

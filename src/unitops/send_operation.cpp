@@ -99,9 +99,10 @@ std::string SendOperation::Aftermath() const {
   const std::int32_t untouched = written_ + (perhaps_written_ ? 2 : 1);  // the first one
   std::string text;
   if (written_ == 0 && !perhaps_written_) return "Nothing is written.";
-  if (written_ > 0)
+  if (written_ > 0) {
     text += std::string(written_ == 1 ? "Port " : "Ports ") + ports(1, written_) +
             (written_ == 1 ? " is" : " are") + " written";
+  }
   if (perhaps_written_)
     text += written_ == 0 ? "Port 1 is perhaps written" : ", " + std::to_string(written_ + 1) + " perhaps";
   if (untouched <= count)

@@ -46,11 +46,10 @@ PortHolder QtSerialDevice::Holder(std::int32_t number) const {
   return device ? FindSerialPortHolder(*device) : PortHolder();
 }
 
-void QtSerialDevice::WatchPorts(std::function<void()> handler) {
+void QtSerialDevice::WatchPorts(const std::function<void()>& handler) {
   watch_.reset();
   if (!handler) return;
-  watch_ = std::make_unique<PortWatch>(
-      [on_fault = on_fault_, handler = std::move(handler)] { CallGuarded(on_fault, handler); });
+  watch_ = std::make_unique<PortWatch>([on_fault = on_fault_, handler] { CallGuarded(on_fault, handler); });
 }
 
 void QtSerialDevice::Open(std::int32_t number, std::int32_t baud) {

@@ -28,7 +28,7 @@ class QtSerialDevice final : public SerialDevice {
   bool Exists(std::int32_t number) const override;
   std::string Describe(std::int32_t number) const override;
   PortHolder Holder(std::int32_t number) const override;
-  void WatchPorts(std::function<void()> handler) override;
+  void WatchPorts(const std::function<void()>& handler) override;
   void Open(std::int32_t number, std::int32_t baud) override;
   void Close() noexcept override;
   void SetReceiveThreshold(std::int32_t bytes) override;

@@ -15,7 +15,7 @@ std::string RangeOf(const BoundedValue& limits) {
 
 std::string TypedNumberHint(std::optional<long long> typed, const BoundedValue& limits, NumberMeaning meaning,
                             int origin) {
-  const std::string range = RangeOf(limits);
+  std::string range = RangeOf(limits);
   if (!typed) return "A whole number, " + range;
   if (*typed < kMinPulseWidth || *typed > kMaxPulseWidth) return range;
   const bool half = meaning == NumberMeaning::kHalfWidth;
