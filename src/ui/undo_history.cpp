@@ -7,8 +7,8 @@ namespace tendril {
 namespace {
 
 constexpr int kMostSteps = 100;
-static_assert(static_cast<std::size_t>(kMostSteps) * sizeof(EditedConfiguration::Snapshot) < 512 * 1024,
-              "the history stays small");
+constexpr std::size_t kMostBytes = std::size_t{512} * 1024;
+static_assert(std::size_t{kMostSteps} * sizeof(EditedConfiguration::Snapshot) < kMostBytes);
 
 std::vector<std::size_t> ChannelsThatDiffer(const ChannelTable& a, const ChannelTable& b) {
   std::vector<std::size_t> channels;
