@@ -8,6 +8,8 @@ namespace {
 
 // Eight of them fit into a window 910 wide, and all of a window 700 high.
 constexpr QSize kSmallestSimulator(80, 72);
+constexpr char kServoTip[] = "Chooses channel %1, to edit it and to move its servo (Ctrl+%1).";
+constexpr char kOutputTip[] = "Chooses channel %1, to edit it (Ctrl+%1).";
 
 }  // namespace
 
@@ -26,12 +28,10 @@ QWidget* ChannelStrip::MakeCell(std::size_t channel) {
   simulator->DisplaySize(kSmallSimulator);
   const QString caption = QStringLiteral("CHAN %1").arg(channel + 1);
   simulator->DisplayCaption(caption);
-  Describe(
-      simulator,
-      QStringLiteral("Chooses channel %1, to edit it and to move its servo (Ctrl+%1).").arg(channel + 1));
+  Describe(simulator, QString::fromUtf8(kServoTip).arg(channel + 1));
 
   auto* output = cmdDigitalOutput_[channel] = Named(new OutputButton(caption), "cmdDigitalOutput", channel);
-  Describe(output, QStringLiteral("Chooses channel %1, to edit it (Ctrl+%1).").arg(channel + 1));
+  Describe(output, QString::fromUtf8(kOutputTip).arg(channel + 1));
 
   connect(simulator, &ServoSimulator::Resized, this, [this, simulator, channel](Microseconds arm) {
     RefeedResizedSimulator(*simulator, working_.At(channel), arm);
@@ -94,15 +94,15 @@ void ChannelStrip::ShowChanged(const std::vector<std::size_t>& channels) {
 }
 
 void ChannelStrip::MarkChanged(std::size_t channel, bool changed) {
-  const auto show = [changed](auto& picture) {
-    const QString what_it_does = picture.toolTip().section(QLatin1Char('\n'), 0, 0);
+  const auto show = [changed, channel](auto& picture, const char* tip) {
+    const QString what_it_does = QString::fromUtf8(tip).arg(channel + 1);
     const QString meaning = QStringLiteral("Changed since it was read, sent or taken from a preset");
     picture.Mark(changed);
     picture.setAccessibleDescription(changed ? meaning : QString());
-    picture.setToolTip(changed ? what_it_does + QStringLiteral("\n• ") + meaning : what_it_does);
+    Describe(&picture, changed ? what_it_does + QStringLiteral("\n• ") + meaning : what_it_does);
   };
-  show(*ServoSimulator2_[channel]);
-  show(*cmdDigitalOutput_[channel]);
+  show(*ServoSimulator2_[channel], kServoTip);
+  show(*cmdDigitalOutput_[channel], kOutputTip);
 }
 
 void ChannelStrip::MoveArm(std::size_t channel, Microseconds arm) {

@@ -104,6 +104,8 @@ TEST_F(Moving, Pictures_AreMarkedWhenTheirRecordsHaveChanged) {
   const auto before = Find("ServoSimulator2_2").grab().toImage();
   Press("optLostComm_0");  // which no servo shows otherwise
   EXPECT_EQ(dots(), "011");
+  for (int press = 0; press < 2; ++press) Press("cmdTest_0");  // disables and enables controls
+  EXPECT_THAT(ToolTip("ServoSimulator2_2"), testing::HasSubstr("Changed since"));
   EXPECT_NE(Find("ServoSimulator2_2").grab().toImage(), before);
   Press("optLostComm_3");
   EXPECT_EQ(dots(), "000");
