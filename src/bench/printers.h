@@ -8,7 +8,7 @@
 
 #include "bench/virtual_control_panel.h"
 #include "bench/virtual_line.h"
-#include "platform/bytes.h"
+#include "trace/packet_meaning.h"
 
 namespace tendril {
 
@@ -30,10 +30,9 @@ class LinePrinter {
  private:
   std::function<void(const std::string&)> print_;
   LineSide from_ = LineSide::kProgram;
-  Bytes bytes_;  // of the packet that is coming in
+  PacketSplitter packet_;
   std::uint64_t last_us_ = 0;
   bool garbled_ = false;
-  bool has_content_ = false;  // one of bytes_ is not zero
 };
 
 // One line of text about a frame on a connection to the Control Panel, in the same columns.

@@ -4,6 +4,7 @@
 
 #include "platform/hex_text.h"
 #include "platform/rounding.h"
+#include "platform/runtime_error.h"
 #include "serial/packets.h"
 
 namespace tendril {
@@ -43,8 +44,36 @@ HalfDuplexLine::HalfDuplexLine(SerialDevice& device, TimerFactory& timers, Clock
       PollTimer_(timers.CreateTimer([this] { OnPollTimer(); })) {}
 
 void HalfDuplexLine::SetRts(bool asserted) {
-  device_.SetRts(asserted);
+  Drive(asserted);
   line_released_ = false;  // the line is as the owner wants it
+}
+
+void HalfDuplexLine::Drive(bool asserted) {
+  try {
+    device_.SetRts(asserted);
+  } catch (...) {
+    Report({.kind = LineEvent::Kind::kFault, .text = "RTS is not set: " + DescribeCurrentFault()});
+    throw;
+  }
+  Report({.kind = asserted ? LineEvent::Kind::kRtsOn : LineEvent::Kind::kRtsOff});
+}
+
+void HalfDuplexLine::Send(std::span<const std::uint8_t> bytes, LineEvent::Kind kind) {
+  try {
+    device_.Write(bytes);
+  } catch (...) {
+    Report({.kind = LineEvent::Kind::kFault, .text = "nothing is sent: " + DescribeCurrentFault()});
+    throw;
+  }
+  Report({.kind = kind, .bytes = bytes});
+}
+
+// What is about to be dropped, for those who watch the line: echoes, and replies that came too late.
+void HalfDuplexLine::ReportInput() {
+  if (!observer_) return;
+  Bytes received;
+  IgnoreFailure([&] { received = device_.ReadAll(); });
+  if (!received.empty()) Report({.kind = LineEvent::Kind::kReceived, .bytes = received});
 }
 
 void HalfDuplexLine::TakeLineBack() noexcept {
@@ -57,6 +86,7 @@ void HalfDuplexLine::OnClosed() noexcept {
 }
 
 void HalfDuplexLine::DiscardInput() noexcept {
+  ReportInput();
   IgnoreFailure([&] { device_.ClearInput(); });
 }
 
@@ -68,7 +98,7 @@ void HalfDuplexLine::Write(std::span<const std::uint8_t> packet) {
     return;
   }
   if (line_released_) TakeLineBack();
-  device_.Write(packet);
+  Send(packet);
   Trace([&] { return "Write[" + std::to_string(clock_.NowMs()) + "](" + HexList(packet, ',') + ")"; });
 }
 
@@ -76,11 +106,12 @@ void HalfDuplexLine::StartPoll(std::uint8_t unit, std::uint8_t kind, std::uint8_
   poll_ = Poll{.unit = unit, .kind = kind, .start_ms = clock_.NowMs(), .time_out_ms = 0};
   parser_.Start(unit);
   try {
+    ReportInput();
     device_.ClearInput();
     device_.SetReceiveThreshold(kPollReceiveThreshold);
     const Bytes packet = PollPacket(unit, kind, pads);
     if (line_released_) TakeLineBack();
-    device_.Write(packet);
+    Send(packet, LineEvent::Kind::kPollSent);
     Trace([&] { return "POLL[" + std::to_string(poll_->start_ms) + "](" + HexList(packet, ',') + ")"; });
     poll_->time_out_ms = PollTimeOutMs(kind, pads, baud);
   } catch (...) {
@@ -121,19 +152,25 @@ bool HalfDuplexLine::TakeReply() {
   Trace([&] {
     return "Poll read " + std::to_string(received.size()) + " bytes (" + HexList(received, ',') + ")";
   });
-  for (const std::uint8_t byte : received) {
-    switch (parser_.Push(byte)) {
+  std::span<const std::uint8_t> unreported = received;
+  bool complete = false;
+  for (std::size_t i = 0; i < received.size() && !complete; ++i) {
+    switch (parser_.Push(received[i])) {
       case ReplyParser::Verdict::kNeedMore:
         break;
       case ReplyParser::Verdict::kEchoSeen:
+        Report({.kind = LineEvent::Kind::kReceived, .bytes = std::span(received).first(i + 1)});
+        unreported = std::span(received).subspan(i + 1);
         line_released_ = true;
-        IgnoreFailure([&] { device_.SetRts(false); });
+        IgnoreFailure([&] { Drive(false); });
         break;
       case ReplyParser::Verdict::kReplyComplete:
-        return true;
+        complete = true;
+        break;
     }
   }
-  return false;
+  if (!unreported.empty()) Report({.kind = LineEvent::Kind::kReceived, .bytes = unreported});
+  return complete;
 }
 
 void HalfDuplexLine::EndPoll(bool replied) {
@@ -144,11 +181,12 @@ void HalfDuplexLine::EndPoll(bool replied) {
     });
   }
   if (PollOnLine()) {
+    if (!replied) Report({.kind = LineEvent::Kind::kTimeOut});
     TakeLineBack();
-    if (replied) IgnoreFailure([&] { device_.Write(std::array{kFrameByte, kFrameByte}); });
+    if (replied) IgnoreFailure([&] { Send(std::array{kFrameByte, kFrameByte}); });
     WriteHeldBack();
     // Before the host is notified: it may poll again, and this byte must not land in the middle of that.
-    if (!replied) IgnoreFailure([&] { device_.Write(std::array{kFrameByte}); });
+    if (!replied) IgnoreFailure([&] { Send(std::array{kFrameByte}); });
   }
   PollTimer_->SetEnabled(false);
   const Poll poll = *std::exchange(poll_, std::nullopt);
@@ -159,8 +197,8 @@ void HalfDuplexLine::EndPoll(bool replied) {
 void HalfDuplexLine::WriteHeldBack() {
   if (held_back_.size() == 1) return;
   const Bytes held_back = std::exchange(held_back_, Bytes{kFrameByte});
-  IgnoreFailure([&] { device_.Write(held_back); });
-  IgnoreFailure([&] { device_.Write(std::array{kFrameByte}); });
+  IgnoreFailure([&] { Send(held_back); });
+  IgnoreFailure([&] { Send(std::array{kFrameByte}); });
 }
 
 std::uint32_t HalfDuplexLine::LastPollPads() {

@@ -14,6 +14,7 @@
 #include "platform/clock.h"
 #include "platform/serial_device.h"
 #include "platform/timer.h"
+#include "serial/line_event.h"
 #include "serial/reply_parser.h"
 
 namespace tendril {
@@ -68,6 +69,11 @@ class HalfDuplexLine {
   // again.
   std::uint32_t LastPollPads();
 
+  // Reports all that happens on the line.
+  void SetObserver(LineObserver observer) { observer_ = std::move(observer); }
+  void Report(const LineEvent& event) const {
+    if (observer_) observer_(event);
+  }
   // `sink` gets a line for each transmission and each poll's reply while the trace is on.
   void SetTraceSink(std::function<void(const std::string&)> sink) { trace_sink_ = std::move(sink); }
   bool TraceOutput() const { return trace_output_; }
@@ -91,6 +97,9 @@ class HalfDuplexLine {
   std::uint32_t PollTimeOutMs(std::uint8_t kind, std::uint8_t pads, std::int32_t baud) const;
   void OnPollTimer();
   bool TakeReply();
+  void Send(std::span<const std::uint8_t> bytes, LineEvent::Kind kind = LineEvent::Kind::kSent);
+  void Drive(bool asserted);
+  void ReportInput();
   void EndPoll(bool replied);
   void WriteHeldBack();
   // Asserts RTS again after a reply, or before the next packet when the adapter refused it then.
@@ -102,6 +111,7 @@ class HalfDuplexLine {
   Clock& clock_;
   std::function<void(PollResult)> on_poll_end_;
   std::unique_ptr<Timer> PollTimer_;
+  LineObserver observer_;
   std::function<void(const std::string&)> trace_sink_;
   bool trace_output_ = false;
 

@@ -89,12 +89,15 @@ void HwSerial::OpenPort() {
     device_.SetReceiveThreshold(HalfDuplexLine::kIdleReceiveThreshold);
     stage = "Executing Port Open Property";
     device_.Open(opened_port_, opened_speed_);
+    line_.Report({.kind = LineEvent::Kind::kOpened,
+                  .text = CommName(opened_port_) + " at " + std::to_string(opened_speed_) + " bit/s"});
     stage = "Setting RTS on";
     line_.SetRts(true);
     port_open_ = true;
   } catch (...) {
     const RuntimeError fault = CurrentFault();
     ClosePort();
+    line_.Report({.kind = LineEvent::Kind::kOpenFailed, .text = fault.description()});
     throw RuntimeError(fault.number(), "Open of serial port " + port + " has failed\r\n\r\nError: (" +
                                            std::to_string(fault.number()) + ") " + fault.description() +
                                            "\r\nWhile: " + stage);
@@ -102,10 +105,11 @@ void HwSerial::OpenPort() {
   if (port_handler_) port_handler_(true);
 }
 
-void HwSerial::ClosePort() noexcept {
+void HwSerial::ClosePort(LineEvent::Kind why) noexcept {
   device_.Close();
   const bool was_open = std::exchange(port_open_, false);
   line_.OnClosed();
+  if (was_open) line_.Report({.kind = why});
   if (was_open && port_handler_) port_handler_(false);
 }
 
@@ -116,7 +120,7 @@ void HwSerial::OnDeviceEvent(SerialEvent event) {
     case SerialEvent::kReceiveOverflow:
       return line_.DiscardInput();
     case SerialEvent::kDeviceLost:
-      return ClosePort();
+      return ClosePort(LineEvent::Kind::kLost);
   }
 }
 

@@ -58,6 +58,8 @@ class HwSerial {
   // `handler` is called whenever the port has been opened (true) or the open port closed (false). It raises nothing,
   // and only asks the link.
   void SetPortHandler(std::function<void(bool open)> handler) { port_handler_ = std::move(handler); }
+  // `observer` gets all that happens on the line; nullptr ends that.
+  void SetLineObserver(LineObserver observer) { line_.SetObserver(std::move(observer)); }
   // `sink` gets the trace lines while TraceOutput is on.
   void SetTraceSink(std::function<void(const std::string&)> sink) { line_.SetTraceSink(std::move(sink)); }
 
@@ -187,7 +189,7 @@ class HwSerial {
   static constexpr std::uint8_t kNoIntensity = 255;
 
   void OpenPort();
-  void ClosePort() noexcept;
+  void ClosePort(LineEvent::Kind why = LineEvent::Kind::kClosed) noexcept;
   void OnDeviceEvent(SerialEvent event);
   void OnHeartbeatTimer();
   void OnPollEnd(HalfDuplexLine::PollResult result);

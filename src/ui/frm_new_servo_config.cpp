@@ -1,6 +1,7 @@
 #include "ui/frm_new_servo_config.h"
 
 #include <QCloseEvent>
+#include <QDateTime>
 #include <QHBoxLayout>
 #include <QScreen>
 #include <QScrollArea>
@@ -57,6 +58,7 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
 
 frmNewServoConfig::~frmNewServoConfig() {
   hide();  // typed text takes effect now, while all parts of the window exist
+  link_.SetLineObserver(nullptr);
   link_.SetPortHandler(nullptr);
 }
 
@@ -150,6 +152,8 @@ void frmNewServoConfig::ConnectOperations() {
   commands_.running.SetObserver(
       [this] { command_focus_.Follow(commands_.running.Active(), [this] { EnableControls(); }); });
   commands_.running.SetReporter([this](const CommandReport& report) { OnReport(report); });
+  link_.SetLineObserver(
+      [this](const LineEvent& event) { trace_.Note(event, QDateTime::currentMSecsSinceEpoch()); });
   link_.SetPortHandler([this](bool open) {
     const bool swept = live_test_area_->Sweeps();
     if (!open) live_test_.OnPortClosed();

@@ -13,6 +13,7 @@
 #include "platform/message_boxes.h"
 #include "platform/timer.h"
 #include "serial/hw_serial.h"
+#include "trace/line_trace.h"
 #include "ui/actuals_frame.h"
 #include "ui/apply_boxes.h"
 #include "ui/channel_choices.h"
@@ -102,6 +103,7 @@ class frmNewServoConfig : public QMainWindow {
   MessageBoxes& boxes_;
   ControlPanel& control_panel_;
   const ProgramInfo info_;
+  LineTrace trace_;
   EditedConfiguration config_;
   UndoHistory history_{config_};
   Readings readings_;

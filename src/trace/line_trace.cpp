@@ -1,0 +1,251 @@
+#include "trace/line_trace.h"
+
+#include <algorithm>
+
+#include "platform/hex_text.h"
+#include "serial/packets.h"
+
+namespace tendril {
+namespace {
+
+// More than the input buffer has room for: while nothing is polled, nothing takes the echoes out of it.
+constexpr std::size_t kMaxUnechoed = 2048;
+// Packets that one exchange can have: a configuration command with its unlock, the poll, and what was held back.
+constexpr std::size_t kPacketsOfExchange = 8;
+// What arrives without any end is cut here.
+constexpr std::size_t kLongestPiece = ReplyParser::kMaxData;
+
+static_assert(LineTrace::kMaxEntries * (sizeof(TraceEntry) + TraceEntry::kMaxBytes + 2 * sizeof(void*)) <
+              4 * 1024 * 1024);
+
+Bytes WithoutZeros(std::span<const std::uint8_t> bytes) {
+  Bytes rest;
+  std::copy_if(bytes.begin(), bytes.end(), std::back_inserter(rest),
+               [](std::uint8_t byte) { return byte != kFrameByte; });
+  return rest;
+}
+
+// Kinds below stand for several replies.
+bool NamesItsReply(std::uint8_t kind) { return kind > ' ' && kind < 100; }
+
+}  // namespace
+
+std::string TraceEntry::Direction() const {
+  switch (kind) {
+    case Kind::kSent:
+    case Kind::kEcho:
+      return "program";
+    case Kind::kReply:
+    case Kind::kNoise:
+      return "unit";
+    case Kind::kOpened:
+    case Kind::kOpenFailed:
+    case Kind::kClosed:
+    case Kind::kLost:
+    case Kind::kRtsOn:
+    case Kind::kRtsOff:
+    case Kind::kFault:
+    case Kind::kTimeOut:
+      break;
+  }
+  return {};
+}
+
+std::string TraceEntry::Meaning() const {
+  switch (kind) {
+    case Kind::kOpened:
+      return text + " is open";
+    case Kind::kOpenFailed:
+      return "the port cannot be opened: " + text;
+    case Kind::kClosed:
+      return "the port is closed";
+    case Kind::kLost:
+      return "the adapter was unplugged: the port is closed";
+    case Kind::kRtsOn:
+      return "RTS on: the program has the line";
+    case Kind::kRtsOff:
+      return "RTS off: the line is free for the reply";
+    case Kind::kFault:
+      return text;
+    case Kind::kSent:
+      return DescribeSent(bytes);
+    case Kind::kEcho:
+      return "echo: " + DescribeSent(bytes);
+    case Kind::kReply:
+      return DescribeReceived(bytes);
+    case Kind::kNoise: {
+      const std::string meaning = DescribeReceived(bytes);
+      return meaning.starts_with("reply") ? meaning + ", not waited for" : meaning;
+    }
+    case Kind::kTimeOut:
+      return "no reply in time";
+  }
+  return {};
+}
+
+void LineTrace::Note(const LineEvent& event, std::int64_t time_ms) {
+  now_ms_ = time_ms;
+  switch (event.kind) {
+    case LineEvent::Kind::kOpened:
+      return NoteOpened(event.text);
+    case LineEvent::Kind::kOpenFailed:
+      return NoteClosed(PortSeen::kOpenFailed, TraceEntry::Kind::kOpenFailed, event.text);
+    case LineEvent::Kind::kClosed:
+      return NoteClosed(PortSeen::kClosed, TraceEntry::Kind::kClosed);
+    case LineEvent::Kind::kLost:
+      return NoteClosed(PortSeen::kLost, TraceEntry::Kind::kLost);
+    case LineEvent::Kind::kRtsOn:
+      return Add(TraceEntry::Kind::kRtsOn);
+    case LineEvent::Kind::kRtsOff:
+      return Add(TraceEntry::Kind::kRtsOff);
+    case LineEvent::Kind::kFault:
+      return Add(TraceEntry::Kind::kFault, {}, event.text);
+    case LineEvent::Kind::kSent:
+      return NoteSent(event.bytes);
+    case LineEvent::Kind::kPollSent:
+      return NotePoll(event.bytes);
+    case LineEvent::Kind::kReceived:
+      return NoteReceived(event.bytes);
+    case LineEvent::Kind::kTimeOut:
+      return NoteTimeOut();
+  }
+}
+
+void LineTrace::Clear() {
+  entries_.clear();
+  if (changed_) changed_();
+}
+
+void LineTrace::Add(TraceEntry::Kind kind, std::span<const std::uint8_t> bytes, std::string_view text) {
+  const auto kept = bytes.first(std::min(bytes.size(), TraceEntry::kMaxBytes));
+  entries_.push_back({.number = next_number_++,
+                      .time_ms = now_ms_,
+                      .kind = kind,
+                      .size = static_cast<std::uint32_t>(bytes.size()),
+                      .bytes = {kept.begin(), kept.end()},
+                      .text = std::string(text.substr(0, TraceEntry::kMaxBytes))});
+  if (entries_.size() > kMaxEntries) entries_.pop_front();
+  if (changed_) changed_();
+}
+
+void LineTrace::NoteOpened(std::string_view text) {
+  port_ = PortSeen::kOpen;
+  no_echo_ = false;
+  polls_.clear();
+  unechoed_.clear();
+  Add(TraceEntry::Kind::kOpened, {}, text);
+}
+
+void LineTrace::NoteClosed(PortSeen port, TraceEntry::Kind kind, std::string_view text) {
+  port_ = port;
+  poll_.reset();
+  received_.Take();
+  Add(kind, {}, text);
+}
+
+// Packets that were held back during a poll come in one piece.
+void LineTrace::NoteSent(std::span<const std::uint8_t> bytes) {
+  PacketSplitter sent;
+  const auto add = [&] {
+    const Bytes packet = sent.Take();
+    Add(TraceEntry::Kind::kSent, packet);
+    if (Bytes content = WithoutZeros(packet); !content.empty()) unechoed_.push_back(std::move(content));
+    if (unechoed_.size() > kMaxUnechoed) unechoed_.pop_front();
+  };
+  for (const std::uint8_t byte : bytes) {
+    if (sent.Push(byte)) add();
+  }
+  if (!sent.Empty()) add();
+}
+
+void LineTrace::NotePoll(std::span<const std::uint8_t> packet) {
+  received_.Take();
+  poll_ = WaitingPoll{.unit = packet[1], .kind = packet[3]};
+  parser_.Start(packet[1]);
+  NoteSent(packet);
+}
+
+void LineTrace::NoteReceived(std::span<const std::uint8_t> bytes) {
+  for (const std::uint8_t byte : bytes) {
+    if (poll_) {
+      poll_->arrived = true;
+      if (!poll_->echoed && byte != kFrameByte && poll_->before_echo.size() < TraceEntry::kMaxBytes)
+        poll_->before_echo.push_back(byte);
+    }
+    const auto verdict = poll_ ? parser_.Push(byte) : ReplyParser::Verdict::kNeedMore;
+    if (received_.Push(byte) || received_.Size() >= kLongestPiece) NotePacket(received_.Take(), verdict);
+  }
+}
+
+void LineTrace::NotePacket(const Bytes& packet, ReplyParser::Verdict verdict) {
+  if (verdict == ReplyParser::Verdict::kReplyComplete) {
+    Add(TraceEntry::Kind::kReply, packet);
+    return EndPoll(true);
+  }
+  const Bytes content = WithoutZeros(packet);
+  const auto sent = std::find(unechoed_.begin(), unechoed_.end(), content);
+  const bool echo = verdict == ReplyParser::Verdict::kEchoSeen || sent != unechoed_.end();
+  if (sent != unechoed_.end()) unechoed_.erase(unechoed_.begin(), sent + 1);
+  Add(echo ? TraceEntry::Kind::kEcho : TraceEntry::Kind::kNoise, packet);
+  if (!poll_) {
+    const bool reply = content.size() > 1 && content[0] == kProgramAddress;
+    if (reply && !polls_.empty() && polls_.back().outcome != PollOutcome::kAnswered)
+      polls_.back().outcome = PollOutcome::kTooLate;
+    return;
+  }
+  if (verdict == ReplyParser::Verdict::kEchoSeen) {
+    poll_->echoed = true;
+  } else if (poll_->echoed && !content.empty()) {
+    poll_->strays = true;
+    const bool ended = packet.back() == kFrameByte;
+    poll_->other_answer = ended && content.size() > 1 && content[1] == poll_->kind;  // under another address
+  }
+}
+
+void LineTrace::NoteTimeOut() {
+  if (!poll_) return;
+  if (!received_.Empty()) NotePacket(received_.Take(), ReplyParser::Verdict::kNeedMore);
+  Add(TraceEntry::Kind::kTimeOut);
+  EndPoll(false);
+}
+
+void LineTrace::EndPoll(bool replied) {
+  polls_.push_back({poll_->unit, poll_->kind, Judge(replied)});
+  if (polls_.size() > kMaxPolls) polls_.pop_front();
+  if (replied) no_echo_ = !poll_->echoed;
+  poll_.reset();
+  unechoed_.clear();
+  if (changed_) changed_();
+}
+
+PollOutcome LineTrace::Judge(bool replied) const {
+  if (replied) {
+    const bool meant = !NamesItsReply(poll_->kind) || parser_.code() == poll_->kind;
+    return meant ? PollOutcome::kAnswered : PollOutcome::kOtherAnswer;
+  }
+  if (!poll_->arrived) return no_echo_ ? PollOutcome::kEchoOnly : PollOutcome::kSilence;
+  if (!poll_->echoed)
+    return MostlyEcho(poll_->before_echo) ? PollOutcome::kEchoDamaged : PollOutcome::kNoReply;
+  if (poll_->other_answer) return PollOutcome::kOtherAnswer;
+  return poll_->strays ? PollOutcome::kNoReply : PollOutcome::kEchoOnly;
+}
+
+// Whether at least half of what was sent last is in `received`, in order.
+bool LineTrace::MostlyEcho(const Bytes& received) const {
+  std::size_t sent = 0;
+  std::size_t found = 0;
+  auto next = received.begin();
+  const std::size_t older = unechoed_.size() - std::min(unechoed_.size(), kPacketsOfExchange);
+  for (std::size_t i = older; i < unechoed_.size(); ++i) {
+    for (const std::uint8_t byte : unechoed_[i]) {
+      ++sent;
+      const auto match = std::find(next, received.end(), byte);
+      if (match == received.end()) continue;
+      ++found;
+      next = match + 1;
+    }
+  }
+  return found > 0 && 2 * found >= sent;
+}
+
+}  // namespace tendril

@@ -1,0 +1,132 @@
+// LineTrace: what happened on the line to the network, and how the last polls ended.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <deque>
+#include <functional>
+#include <optional>
+#include <span>
+#include <string>
+#include <string_view>
+#include <utility>
+
+#include "platform/bytes.h"
+#include "serial/line_event.h"
+#include "serial/reply_parser.h"
+#include "trace/packet_meaning.h"
+
+namespace tendril {
+
+// One packet or event.
+struct TraceEntry {
+  enum class Kind {
+    kOpened,
+    kOpenFailed,
+    kClosed,
+    kLost,
+    kRtsOn,
+    kRtsOff,
+    kFault,
+    kSent,
+    kEcho,   // what the program sent, as the adapter returns it
+    kReply,  // the reply to the poll
+    kNoise,  // anything else that arrived; also a reply that no poll waits for
+    kTimeOut
+  };
+  // Bytes that an entry keeps.
+  static constexpr std::size_t kMaxBytes = 256;
+
+  std::uint64_t number;  // counted from 0; never given again
+  std::int64_t time_ms;  // since 1970, UTC
+  Kind kind;
+  std::uint32_t size = 0;  // of the packet; bytes has the first ones
+  Bytes bytes = {};
+  std::string text = {};  // what the event says
+
+  // Who sent it: "program", "unit", or "" for what is no packet. An echo is the program's.
+  std::string Direction() const;
+  // "poll unit 01, kind 'n'"; for an echo "echo: ..."; for an event what happened: "no reply", "RTS off: the line is free for the reply".
+  std::string Meaning() const;
+};
+
+// How a poll ended.
+enum class PollOutcome {
+  kAnswered,
+  kSilence,      // nothing arrived, not even the echo
+  kEchoOnly,     // no unit answers
+  kTooLate,      // no reply, and then one came; an adapter that switches its driver by itself hears that
+  kEchoDamaged,  // the echo came with bytes missing or changed
+  kNoReply,      // bytes came that make no reply
+  kOtherAnswer   // a packet came that is no answer to this poll
+};
+
+struct PollSeen {
+  std::uint8_t unit = 0;
+  std::uint8_t kind = 0;
+  PollOutcome outcome = PollOutcome::kSilence;
+};
+
+// Where the port is.
+enum class PortSeen { kNeverOpened, kOpen, kOpenFailed, kClosed, kLost };
+
+// Keeps the last entries, in some 1 MiB, at most 4. Follows the line with a parser of its own, as the link does.
+class LineTrace {
+ public:
+  static constexpr std::size_t kMaxEntries = 10'000;
+  // Polls that are kept in short, since the port was opened.
+  static constexpr std::size_t kMaxPolls = 20;
+
+  // The next event, as from HwSerial::SetLineObserver(), at `time_ms` (see TraceEntry).
+  void Note(const LineEvent& event, std::int64_t time_ms);
+  // Forgets the entries; how the last polls ended stays.
+  void Clear();
+  // `handler` is called after each change of the entries. It only asks the trace.
+  void SetChangedHandler(std::function<void()> handler) { changed_ = std::move(handler); }
+
+  // In order; the numbers are consecutive.
+  const std::deque<TraceEntry>& Entries() const { return entries_; }
+  // How the polls ended, the last one last. A poll that waits for its end is not among them.
+  const std::deque<PollSeen>& Polls() const { return polls_; }
+  PortSeen Port() const { return port_; }
+
+ private:
+  // The poll that waits for its end.
+  struct WaitingPoll {
+    std::uint8_t unit = 0;
+    std::uint8_t kind = 0;
+    bool arrived = false;       // anything has
+    bool echoed = false;        // its echo is complete
+    bool strays = false;        // bytes after the echo that make no reply
+    bool other_answer = false;  // a packet that replies to something else, or to someone else
+    Bytes before_echo = {};     // what arrived until the echo was complete, without zero bytes
+  };
+
+  void Add(TraceEntry::Kind kind, std::span<const std::uint8_t> bytes = {}, std::string_view text = {});
+  void NoteOpened(std::string_view text);
+  void NoteClosed(PortSeen port, TraceEntry::Kind kind, std::string_view text = {});
+  void NoteSent(std::span<const std::uint8_t> bytes);
+  void NotePoll(std::span<const std::uint8_t> packet);
+  void NoteReceived(std::span<const std::uint8_t> bytes);
+  void NotePacket(const Bytes& packet, ReplyParser::Verdict verdict);
+  void NoteTimeOut();
+  void EndPoll(bool replied);
+  PollOutcome Judge(bool replied) const;
+  bool MostlyEcho(const Bytes& received) const;
+
+  std::deque<TraceEntry> entries_;
+  std::deque<PollSeen> polls_;
+  std::uint64_t next_number_ = 0;
+  std::int64_t now_ms_ = 0;
+  PortSeen port_ = PortSeen::kNeverOpened;
+  bool no_echo_ = false;  // the last reply came without an echo: the adapter hears nothing while it sends
+
+  std::optional<WaitingPoll> poll_;
+  ReplyParser parser_;
+  PacketSplitter received_;
+  std::deque<Bytes>
+      unechoed_;  // what was sent since the last poll ended, without zero bytes; the last packets of it
+  std::function<void()> changed_;
+};
+
+}  // namespace tendril

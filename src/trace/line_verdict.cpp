@@ -1,0 +1,102 @@
+#include "trace/line_verdict.h"
+
+#include <algorithm>
+#include <vector>
+
+#include "platform/hex_text.h"
+#include "serial/packets.h"
+
+namespace tendril {
+namespace {
+
+using Verdict = LineVerdict::Kind;
+
+// As many in a row say how it is now, whatever was before.
+constexpr std::size_t kMissesInARow = 3;
+constexpr std::size_t kAnswersInARow = 10;
+
+// Whether each of the last polls of a unit was answered, since its first answer.
+std::vector<bool> AnswersOf(std::uint8_t unit, const std::deque<PollSeen>& polls) {
+  std::vector<bool> answers;
+  for (const PollSeen& poll : polls) {
+    const bool answered = poll.outcome == PollOutcome::kAnswered;
+    if (poll.unit == unit && (answered || !answers.empty())) answers.push_back(answered);
+  }
+  return answers;
+}
+
+// The last poll; the one before it when a reply to that came too late: whether one to the last comes is not known yet.
+const PollSeen& DecisivePoll(const std::deque<PollSeen>& polls) {
+  const PollSeen& last = polls.back();
+  if (polls.size() < 2 || last.outcome == PollOutcome::kAnswered) return last;
+  const PollSeen& before = polls[polls.size() - 2];
+  return before.outcome == PollOutcome::kTooLate && before.unit == last.unit ? before : last;
+}
+
+bool EndsWith(const std::vector<bool>& answers, bool answered, std::size_t count) {
+  return answers.size() >= count && std::all_of(answers.end() - static_cast<std::ptrdiff_t>(count),
+                                                answers.end(), [=](bool each) { return each == answered; });
+}
+
+LineVerdict JudgeLastPoll(const PollSeen& poll, const std::string& unit) {
+  switch (poll.outcome) {
+    case PollOutcome::kAnswered:
+      return {Verdict::kAnswers, unit + " answers."};
+    case PollOutcome::kSilence:
+      return {Verdict::kSilence,
+              "Nothing comes back, not even what the program sends: check the adapter and its wire, and "
+              "whether this "
+              "is the right port."};
+    case PollOutcome::kEchoOnly:
+      return {Verdict::kEchoOnly, "Only what the program sends comes back. " + unit +
+                                      " does not answer: check its power, its ID and the wiring."};
+    case PollOutcome::kTooLate:
+      return {
+          Verdict::kTooLate,
+          unit + " answers, but too late: connect the adapter without a hub, and set its latency to 1 ms."};
+    case PollOutcome::kEchoDamaged:
+      return {Verdict::kEchoDamaged,
+              "What the program sends comes back damaged: check the adapter, its wire and its driver."};
+    case PollOutcome::kNoReply:
+      return {Verdict::kNoReply,
+              "Bytes come that make no reply: perhaps several units have the ID " + HexByte(poll.unit) +
+                  ", or a unit has another speed, or the wiring picks up noise. Connect one unit alone."};
+    case PollOutcome::kOtherAnswer:
+      return {Verdict::kOtherAnswer, "An answer comes, but not the one to this question: connect " + unit +
+                                         " alone, and check that the device is a Tendril unit."};
+  }
+  return {};
+}
+
+}  // namespace
+
+LineVerdict JudgeLine(const LineTrace& trace) {
+  switch (trace.Port()) {
+    case PortSeen::kNeverOpened:
+      return {Verdict::kNotOpened, "No port has been opened yet: choose a comm port."};
+    case PortSeen::kOpenFailed:
+      return {Verdict::kCannotOpen, "The port cannot be opened: see the last line below."};
+    case PortSeen::kClosed:
+      return {Verdict::kClosed, "The port is closed. The next command opens it."};
+    case PortSeen::kLost:
+      return {Verdict::kPortGone, "The port went away: plug the adapter in again, and choose the port."};
+    case PortSeen::kOpen:
+      break;
+  }
+  if (trace.Polls().empty())
+    return {Verdict::kNothingAsked,
+            "The port is open. Nothing has been asked yet: read a unit, or find units."};
+  const PollSeen& last = DecisivePoll(trace.Polls());
+  const std::string unit = last.unit == kAllUnits ? "The unit" : "Unit " + HexByte(last.unit);
+  const std::vector<bool> answers = AnswersOf(last.unit, trace.Polls());
+  const auto missed = static_cast<std::size_t>(std::count(answers.begin(), answers.end(), false));
+  const bool settled = EndsWith(answers, true, kAnswersInARow) || EndsWith(answers, false, kMissesInARow);
+  const bool of_unit = last.outcome == PollOutcome::kAnswered || last.outcome == PollOutcome::kEchoOnly ||
+                       last.outcome == PollOutcome::kNoReply;
+  if (missed == 0 || settled || !of_unit) return JudgeLastPoll(last, unit);
+  return {Verdict::kAnswersSometimes, unit + " answers, but not always: " + std::to_string(missed) +
+                                          " of the last " + std::to_string(answers.size()) +
+                                          " polls brought no reply. Check the wiring and its power."};
+}
+
+}  // namespace tendril

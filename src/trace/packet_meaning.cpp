@@ -1,0 +1,106 @@
+#include "trace/packet_meaning.h"
+
+#include <algorithm>
+
+#include "platform/hex_text.h"
+#include "serial/packets.h"
+
+namespace tendril {
+namespace {
+
+constexpr std::size_t kShownZeros = 4;  // in a row at the beginning
+// The option of a unit that holds its servo ports, and what stands in place of a port's number for a live position.
+constexpr std::uint8_t kServoPortOption = 17;
+constexpr std::uint8_t kLivePositionSelector = 137;
+constexpr std::uint8_t kAccepted = 10;
+
+std::string PollKind(std::uint8_t kind) {
+  if (kind > ' ' && kind < 0x7F) return std::string("'") + static_cast<char>(kind) + "'";
+  return std::to_string(kind);
+}
+
+std::string UnitInWords(std::uint8_t id) { return id == kAllUnits ? "all units" : "unit " + HexByte(id); }
+
+std::string DescribeOption(std::span<const std::uint8_t> packet, const std::string& unit) {
+  if (packet.size() < 6) return "set option of " + unit + ", too short";
+  const std::uint8_t option = packet[2];
+  const std::uint8_t selector = packet[3];
+  if (option == kServoPortOption && selector == kLivePositionSelector) {
+    return "live position of " + unit + ": ports mask " + HexByte(packet[4]) + ", " +
+           std::to_string(packet[5] * 10) + " us";
+  }
+  if (option == kServoPortOption) return "set options of port " + std::to_string(selector) + " of " + unit;
+  return "set option " + std::to_string(option) + " of " + unit;
+}
+
+std::string DescribeCommand(std::span<const std::uint8_t> packet) {
+  if (packet.size() < 2) return "no packet";
+  const std::string unit = UnitInWords(packet[0]);
+  switch (packet[1]) {
+    case kCodeSetOption:
+      return DescribeOption(packet, unit);
+    case kCodeSetAddress:
+      return packet.size() > 2 ? "set ID of " + unit + " to " + HexByte(packet[2])
+                               : "set ID of " + unit + ", too short";
+    case kCodeHeartbeat:
+      return "heartbeat to " + unit;
+    case kCodePoll:
+      return packet.size() > 2 ? "poll " + unit + ", kind " + PollKind(packet[2])
+                               : "poll " + unit + ", too short";
+    case kCodeUnlock:
+      return "unlock " + unit;
+    default:
+      return "command " + HexByte(packet[1]) + " to " + unit;
+  }
+}
+
+std::string DescribeReply(std::span<const std::uint8_t> packet) {
+  if (packet.size() < 2 || packet[0] != kProgramAddress) return "noise";
+  const std::uint8_t kind = packet[1];
+  const auto data = packet.subspan(2);
+  const std::string reply = "reply to " + PollKind(kind) + ": ";
+  if (kind == '0' && data.size() >= 2)
+    return reply + (data[1] == kAccepted ? "acknowledged" : "nothing accepted");
+  if (kind == 'n' && data.size() >= 10) return reply + "options of port " + std::to_string(data[0]);
+  if ((kind == '*' || kind == '+') && !data.empty()) return reply + "here is unit " + HexByte(data[0]);
+  return reply + std::to_string(data.size()) + " data bytes";
+}
+
+template <typename Describe>
+std::string DescribePacket(std::span<const std::uint8_t> bytes, Describe describe) {
+  const auto rest = bytes.subspan(LeadingZeros(bytes));
+  if (rest.empty()) return bytes.size() == 1 ? "1 zero byte" : std::to_string(bytes.size()) + " zero bytes";
+  const auto end = std::find(rest.begin(), rest.end(), kFrameByte);
+  return describe(rest.first(static_cast<std::size_t>(end - rest.begin())));
+}
+
+}  // namespace
+
+std::string DescribeSent(std::span<const std::uint8_t> bytes) {
+  return DescribePacket(bytes, DescribeCommand);
+}
+
+std::string DescribeReceived(std::span<const std::uint8_t> bytes) {
+  return DescribePacket(bytes, DescribeReply);
+}
+
+std::size_t LeadingZeros(std::span<const std::uint8_t> bytes) {
+  const auto begin = std::find_if(bytes.begin(), bytes.end(), [](std::uint8_t byte) { return byte != 0; });
+  return static_cast<std::size_t>(begin - bytes.begin());
+}
+
+std::string ShownBytes(std::span<const std::uint8_t> bytes, std::size_t shown, std::size_t all) {
+  const std::size_t zeros = LeadingZeros(bytes);
+  std::size_t size = all;
+  std::string text;
+  if (zeros > kShownZeros) {
+    bytes = bytes.subspan(zeros);
+    size -= zeros;
+    text = std::to_string(zeros) + " x 00" + (bytes.empty() ? "" : " ");
+  }
+  text += HexBytes(bytes.first(std::min(bytes.size(), shown)));
+  if (size > shown) text += " ... (" + std::to_string(all) + " bytes)";
+  return text;
+}
+
+}  // namespace tendril
