@@ -10,11 +10,10 @@
 namespace tendril {
 namespace {
 
-constexpr int kKindBits = 0x03;
 // The flags of each PowerUPOpt and of each LostCommOption, from option 1. The last option is no action.
-constexpr std::array<int, kPowerUpFirstCommand> kPowerUpFlags = {kFlagPowerUp | kFlagPowerUpDefault,
+constexpr std::array<int, kPowerUpFirstCommand> kPowerUpTable = {kFlagPowerUp | kFlagPowerUpDefault,
                                                                  kFlagPowerUp | kFlagPowerUpNeutral, 0};
-constexpr std::array<int, kLostCommStopPulse> kLostCommFlags = {
+constexpr std::array<int, kLostCommStopPulse> kLostCommTable = {
     kFlagLostComm, kFlagLostComm | kFlagLostCommDefault, kFlagLostComm | kFlagLostCommNeutral, 0};
 
 // The option whose flags are exactly those that `flags` and its table share; the last if no option has them.
@@ -24,27 +23,36 @@ std::int32_t OptionOf(std::span<const int> table, int flags) {
   return static_cast<std::int32_t>(found - table.begin()) + 1;
 }
 
+std::optional<std::uint8_t> FlagsOf(std::span<const int> table, std::int32_t option) {
+  if (option < 1 || option > static_cast<std::int32_t>(table.size())) return std::nullopt;
+  return static_cast<std::uint8_t>(table[static_cast<std::size_t>(option) - 1]);
+}
+
 InvalidRecord Invalid(std::string_view name, std::int32_t value, std::string field) {
   return {"Internal Error - Invalid " + std::string(name) + "=" + std::to_string(value), std::move(field)};
 }
 
 }  // namespace
 
+std::optional<std::uint8_t> FlagsOfPowerUp(std::int32_t option) { return FlagsOf(kPowerUpTable, option); }
+
+std::optional<std::uint8_t> FlagsOfLostComm(std::int32_t option) { return FlagsOf(kLostCommTable, option); }
+
 std::variant<OptionBytes, InvalidRecord> EncodeOptions(const ChannelConfig& record) {
   if (record.PortType < kPortServo || record.PortType > kPortPwm)
     return Invalid("PortType", record.PortType, "output kind " + std::to_string(record.PortType));
   int flags = record.PortType + 1;
 
-  if (record.PowerUPOpt < kPowerUpDefault || record.PowerUPOpt > kPowerUpFirstCommand) {
+  const auto power_up = FlagsOfPowerUp(record.PowerUPOpt);
+  if (!power_up) {
     return Invalid("PowerUPOpt", record.PowerUPOpt, "power-up option " + std::to_string(record.PowerUPOpt));
   }
-  flags |= kPowerUpFlags[static_cast<std::size_t>(record.PowerUPOpt) - 1];
-
-  if (record.LostCommOption < kLostCommHold || record.LostCommOption > kLostCommStopPulse) {
+  const auto lost_comm = FlagsOfLostComm(record.LostCommOption);
+  if (!lost_comm) {
     return Invalid("LostCommOption", record.LostCommOption,
                    "lost communications option " + std::to_string(record.LostCommOption));
   }
-  flags |= kLostCommFlags[static_cast<std::size_t>(record.LostCommOption) - 1];
+  flags |= *power_up | *lost_comm;
 
   struct Width {
     std::string_view name;
@@ -77,14 +85,14 @@ ChannelConfig DecodeOptions(std::span<const std::uint8_t, kOptionByteCount> opti
   const int flags = options[0];
   const auto width = [&](std::size_t i) { return options[i] * kPulseResolution; };
   ChannelConfig record;
-  record.PortType = static_cast<std::int16_t>((flags & kKindBits) - 1);
+  record.PortType = static_cast<std::int16_t>((flags & kKindFlags) - 1);
   record.ActualRange = {width(1), width(2)};
   record.VirtualRange = {width(3), width(4)};
   record.VirtualStops = {width(5), width(6)};
   record.DefaultPosition = width(7);
   record.NeutralPosition = width(8);
-  record.PowerUPOpt = OptionOf(kPowerUpFlags, flags);
-  record.LostCommOption = OptionOf(kLostCommFlags, flags);
+  record.PowerUPOpt = OptionOf(kPowerUpTable, flags);
+  record.LostCommOption = OptionOf(kLostCommTable, flags);
   record.Received = true;
   return record;
 }

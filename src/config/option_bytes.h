@@ -15,6 +15,7 @@
 
 #include <array>
 #include <cstdint>
+#include <optional>
 #include <span>
 #include <string>
 #include <variant>
@@ -25,6 +26,8 @@ namespace tendril {
 
 inline constexpr std::size_t kOptionByteCount = 9;
 using OptionBytes = std::array<std::uint8_t, kOptionByteCount>;
+// The option bytes of ports 1 to 8.
+using OptionTable = std::array<OptionBytes, kPortCount>;
 
 inline constexpr std::uint8_t kFlagLostComm = 0x04;
 inline constexpr std::uint8_t kFlagPowerUp = 0x08;
@@ -32,6 +35,11 @@ inline constexpr std::uint8_t kFlagLostCommNeutral = 0x10;
 inline constexpr std::uint8_t kFlagLostCommDefault = 0x20;
 inline constexpr std::uint8_t kFlagPowerUpNeutral = 0x40;
 inline constexpr std::uint8_t kFlagPowerUpDefault = 0x80;
+
+// The bits of the flag byte that each choice has.
+inline constexpr std::uint8_t kKindFlags = 0x03;
+inline constexpr std::uint8_t kPowerUpFlags = kFlagPowerUp | kFlagPowerUpNeutral | kFlagPowerUpDefault;
+inline constexpr std::uint8_t kLostCommFlags = kFlagLostComm | kFlagLostCommNeutral | kFlagLostCommDefault;
 
 // The option of a unit that holds its servo ports. A port's number and its option bytes follow, or kLivePosition.
 inline constexpr std::uint8_t kOptionServoPort = 17;
@@ -48,7 +56,11 @@ struct InvalidRecord {
 // between fields: the editor does that.
 std::variant<OptionBytes, InvalidRecord> EncodeOptions(const ChannelConfig& record);
 
-// The inverse, except for the last digit of each pulse width. Sets `Received`. Takes any bytes: flag combinations that
+// The flags of a PowerUPOpt and of a LostCommOption; nothing for a value that EncodeOptions rejects.
+std::optional<std::uint8_t> FlagsOfPowerUp(std::int32_t option);
+std::optional<std::uint8_t> FlagsOfLostComm(std::int32_t option);
+
+// The inverse of EncodeOptions, except for the last digit of each pulse width. Sets `Received`. Takes any bytes: flag combinations that
 // no option has are read as no action, and without an output kind PortType is -1, which EncodeOptions rejects.
 ChannelConfig DecodeOptions(std::span<const std::uint8_t, kOptionByteCount> options);
 

@@ -11,6 +11,7 @@ UnitCommands::UnitCommands(HwSerial& link, TimerFactory& timers, MessageBoxes& b
       context{link, timers, boxes, running, target, std::move(events.starting)},
       send(context, working, std::move(events.sent)),
       get(context, working, std::move(events.replaced)),
+      compare(context, std::move(events.compared)),
       change_id(context) {
   link.SetPollReplyHandler([this, polled = std::move(events.polled)](bool replied, std::uint8_t unit,
                                                                      std::uint8_t kind, Bytes& data) {

@@ -9,6 +9,7 @@
 #include "platform/timer.h"
 #include "serial/hw_serial.h"
 #include "unitops/change_id_operation.h"
+#include "unitops/compare_operation.h"
 #include "unitops/get_operation.h"
 #include "unitops/running_command.h"
 #include "unitops/send_operation.h"
@@ -30,6 +31,8 @@ struct UnitCommands {
     std::function<void(std::uint8_t unit)> replaced = nullptr;
     // A send has just written the working configuration into `unit`, all of it, and still runs.
     std::function<void(std::uint8_t unit)> sent = nullptr;
+    // A compare has just read what `unit` holds, all of it, and still runs.
+    std::function<void(std::uint8_t unit, const OptionTable& held)> compared = nullptr;
   };
 
   // Takes the link's poll replies. Everything handed in must outlive it.
@@ -47,6 +50,7 @@ struct UnitCommands {
   CommandContext context;
   SendOperation send;           // "SEND(write) Configuration"
   GetOperation get;             // "GET(read) Configuration"
+  CompareOperation compare;     // "Compare"
   ChangeIdOperation change_id;  // "UPDATE Unit_ID"
 };
 

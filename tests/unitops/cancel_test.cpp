@@ -38,7 +38,8 @@ TEST_F(Outcomes, SayHowTheUnitIsLeft) {
     int cancel_ms;
     const char* said;
   };
-  UnitOperation &send = commands_.send, &get = commands_.get, &change = commands_.change_id;
+  UnitOperation &send = commands_.send, &get = commands_.get, &compare = commands_.compare,
+                &change = commands_.change_id;
   const ChannelTable before = working_;
   for (const Case& c :
        {Case{send, "", kNever, "SUCCESS: Send Complete! Ports 1 to 8 are written."},
@@ -49,14 +50,16 @@ TEST_F(Outcomes, SayHowTheUnitIsLeft) {
         {send, "", 2050, "Cancelled: COMMAND FAILED! Ports 1 to 7 are written, 8 is not."},
         {get, "mute", kNever, "COMMAND FAILED! Nothing has changed."},
         {get, "", 100, "Cancelled: COMMAND FAILED! Nothing has changed."},
+        {compare, "", 100, "Cancelled: COMMAND FAILED! No record has changed."},
         {change, "mute", kNever, "COMMAND FAILED! No ID has changed."},
         {change, "stubborn", kNever, "COMMAND FAILED! The unit may be at 0A already."},
         {change, "", 410, "Cancelled: COMMAND FAILED! The unit may be at 0A already."},
         {change, "", 700, "Cancelled: COMMAND FAILED! The unit answers at 0A."},
         {change, "", kNever, "SUCCESS: UnitID set to '0A'. The unit answers at 0A."}}) {
-    const std::string what = &c.operation == &send  ? "Sending to unit 01"
-                             : &c.operation == &get ? "Reading unit 01"
-                                                    : "Giving the unit the ID 0A";
+    const std::string what = &c.operation == &send      ? "Sending to unit 01"
+                             : &c.operation == &get     ? "Reading unit 01"
+                             : &c.operation == &compare ? "Comparing unit 01"
+                                                        : "Giving the unit the ID 0A";
     EXPECT_EQ(Said(c.operation, c.fault, c.cancel_ms), what + " at 14:05: " + c.said);
     EXPECT_EQ(working_, before);
   }

@@ -97,6 +97,7 @@ class CommandTest : public testing::Test {
   ChannelTable working_;
   std::function<bool()> on_starting_ = [] { return true; };
   std::function<void()> on_replaced_ = [] {};
+  OptionTable held_{};  // by the unit that was compared last
   std::string
       noted_;  // by events: "01+ 01- sent 01 " when a unit has replied to a poll, then not, and was sent to
   UnitCommands::Events events_{
@@ -108,7 +109,12 @@ class CommandTest : public testing::Test {
             noted_ += "replaced " + HexByte(unit) + " ";
             on_replaced_();
           },
-      .sent = [this](std::uint8_t unit) { noted_ += "sent " + HexByte(unit) + " "; }};
+      .sent = [this](std::uint8_t unit) { noted_ += "sent " + HexByte(unit) + " "; },
+      .compared =
+          [this](std::uint8_t unit, const OptionTable& held) {
+            noted_ += "compared " + HexByte(unit) + " ";
+            held_ = held;
+          }};
 
   UnitCommands commands_{link_, world_.time, world_.boxes, progress_, target_, working_, events_};
 };

@@ -16,8 +16,9 @@ class Get : public CommandTest {};
 
 TEST_F(Get, Units_EndAsTheyReportTheirPorts) {
   target_.unit = 0x05;
-  const auto expect = [&](const std::string& fault, std::size_t polls, bool success) {
+  const auto run = [&](UnitOperation& operation, const std::string& fault, std::size_t polls, bool success) {
     SCOPED_TRACE(fault);
+    const bool get = &operation == &commands_.get;
     for (std::size_t slot = 0; slot < kPortCount; ++slot) SetFromPreset(kPresets[0], working_.At(slot));
     const ChannelTable before = working_;
     ChannelTable of_the_unit = before;
@@ -31,23 +32,33 @@ TEST_F(Get, Units_EndAsTheyReportTheirPorts) {
       record.Received = false;
     }
     on_replaced_ = [&] { EXPECT_TRUE(commands_.running.Active()); };
-    commands_.get.Start();
-    EXPECT_EQ(commands_.running.What(), "Reading unit 05");
+    noted_.clear();
+    held_ = {};
+    operation.Start();
+    EXPECT_EQ(commands_.running.What(), get ? "Reading unit 05" : "Comparing unit 05");
     const auto ended = [&] {
       // All at one moment, or not at all.
-      EXPECT_TRUE(working_ == before || working_ == of_the_unit);
+      EXPECT_TRUE(working_ == before || (get && working_ == of_the_unit));
       return !commands_.running.Active();
     };
     ASSERT_TRUE(world_.time.AdvanceUntil(ended, 12000));
     EXPECT_EQ(unit.polls_heard(), polls);
     if (success) {
-      ExpectSuccess(kGetSuccess);
+      ExpectSuccess(get ? kGetSuccess : "SUCCESS: Compare Complete");
     } else {
-      ExpectFailure(kNotAllPorts);
+      ExpectFailure({kNotAllPorts.text, get ? "Send Error" : "Compare", BoxIcon::kCritical});
     }
-    EXPECT_EQ(working_, success ? of_the_unit : before);
+    EXPECT_EQ(working_, get && success ? of_the_unit : before);
+    EXPECT_EQ(commands_.compare.TakeFailure(), !get && !success);
+    EXPECT_EQ(noted_.ends_with(get ? "replaced 05 " : "compared 05 "), success);
+    for (std::uint8_t port = 1; !get && success && port <= kPortCount; ++port)
+      EXPECT_EQ(held_[port - 1u], unit.PortOptions(port));
     world_.bench.Detach(1, unit);
     world_.time.Advance(3000);
+  };
+  const auto expect = [&](const std::string& fault, std::size_t polls, bool success) {
+    run(commands_.get, fault, polls, success);
+    run(commands_.compare, fault, polls, success);
   };
   for (const char* fault : {"", "scrambled", "rambling", "slow", "ninth-port"}) expect(fault, 8, true);
   expect("repeating", 15, true);
@@ -68,6 +79,8 @@ TEST_F(Get, PortBeyondTheEighth_EndsItAtOnce) {
   Run(commands_.get);
   ExpectFailure({"Upload error: Invalid Port Index Received = 8", "Error", BoxIcon::kExclamation});
   EXPECT_EQ(unit.polls_heard(), 1u);
+  Run(commands_.compare);
+  ExpectFailure({"Upload error: Invalid Port Index Received = 8", "Compare", BoxIcon::kExclamation});
   // A port 0 cannot come over the line, where a zero byte ends the reply.
   commands_.get.Start();
   commands_.running.Operation()->OnPollReply(true, 0x01, 'n', Bytes(10, 0));
@@ -104,6 +117,10 @@ TEST_F(Get, Unplugged_IsAFaultAndChangesNothing) {
   EXPECT_THAT(world_.boxes.Take(),
               ElementsAre(Fault("Comm Error!", "Upload Failed\r\nOpen of serial port 1 has failed\r\n")));
   EXPECT_EQ(said_, "Reading unit 01 at 14:05: Stopped. Nothing has changed.");
+  commands_.compare.Start();
+  EXPECT_THAT(world_.boxes.Take(),
+              ElementsAre(Fault("Comm Error!", "Compare Failed\r\nOpen of serial port 1 has failed\r\n")));
+  EXPECT_TRUE(commands_.compare.TakeFailure());
   EXPECT_EQ(working_, before);
 }
 
