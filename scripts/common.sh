@@ -9,7 +9,7 @@ build_packages=(g++ cmake ninja-build qt6-base-dev qt6-serialport-dev libgl-dev 
 test_packages=(xvfb dbus at-spi2-core xdotool)
 # What building and testing for Windows needs; GoogleTest is compiled along.
 windows_packages=(cmake ninja-build g++-mingw-w64-x86-64-posix googletest wine64)
-fuzz_packages=(clang-14 libclang-rt-14-dev llvm-14 cmake ninja-build)
+fuzz_packages=(clang-14 libclang-rt-14-dev llvm-14 cmake ninja-build qt6-base-dev libgl-dev)
 coverage_packages=(gcovr)
 check_packages=(clang-format-14 clang-tidy-14)
 icon_packages=(librsvg2-bin optipng)

@@ -1,0 +1,87 @@
+#include "exchange/strict_json.h"
+
+#include <QJsonArray>
+#include <QSet>
+#include <vector>
+
+namespace tendril::exchange {
+namespace {
+
+bool IsDigit(char c) { return c >= '0' && c <= '9'; }
+
+// Goes through a text that Qt's parser has accepted.
+class StrictScan {
+ public:
+  explicit StrictScan(const QByteArray& text) : text_(text) {}
+
+  void Run() {
+    for (; at_ < text_.size(); ++at_) {
+      const char c = text_[at_];
+      if (c == '{' || c == '[') names_.emplace_back();
+      if (c == '}' || c == ']') names_.pop_back();
+      if (c == '"') ScanString();
+      if (c == '.' && !(IsDigit(text_[at_ - 1]) && IsDigit(text_[at_ + 1])))
+        Refuse(QStringLiteral("a number has digits on both sides of its point"));
+    }
+  }
+
+ private:
+  [[noreturn]] void Refuse(const QString& reason) const;
+
+  // Ends at the closing quotation mark.
+  void ScanString() {
+    const qsizetype begin = at_;
+    for (++at_; text_[at_] != '"'; ++at_) {
+      if (static_cast<unsigned char>(text_[at_]) < ' ')
+        Refuse(QStringLiteral("a text contains a line break or another control character"));
+      if (text_[at_] == '\\' && !QByteArrayView("\"\\/bfnrtu").contains(text_[++at_]))
+        Refuse(QStringLiteral("a text contains an unknown escape sequence"));
+    }
+    if (IsName()) NoteName(text_.sliced(begin, at_ + 1 - begin));
+  }
+
+  // Whether the string that ends here is the name of a member.
+  bool IsName() const {
+    qsizetype next = at_ + 1;
+    while (QByteArrayView(" \t\r\n").contains(text_[next])) ++next;
+    return text_[next] == ':';
+  }
+
+  // Two names can be the same with different escapes.
+  void NoteName(const QByteArray& json) {
+    const QString name = QJsonDocument::fromJson('[' + json + ']')[0].toString();
+    if (names_.back().contains(name))
+      Refuse(QString::fromUtf8(json) + QStringLiteral(" stands there a second time"));
+    names_.back().insert(name);
+  }
+
+  const QByteArray& text_;
+  qsizetype at_ = 0;
+  std::vector<QSet<QString>> names_;  // of each object that is open; arrays have none
+};
+
+[[noreturn]] void RefuseAt(const QByteArray& text, qsizetype offset, const QString& reason) {
+  throw Refusal{QStringLiteral("line %1").arg(text.first(offset).count('\n') + 1), reason};
+}
+
+void StrictScan::Refuse(const QString& reason) const { RefuseAt(text_, at_, reason); }
+
+}  // namespace
+
+QJsonDocument ParseStrictly(const QByteArray& text) {
+  QJsonParseError error;
+  QJsonDocument document = QJsonDocument::fromJson(text, &error);
+  if (error.error != QJsonParseError::NoError) {
+    const auto offset = std::min<qsizetype>(error.offset, text.size());
+    RefuseAt(text, offset, QStringLiteral("this is not JSON (%1)").arg(error.errorString()));
+  }
+  StrictScan(text).Run();
+  return document;
+}
+
+QByteArray JsonText(const QJsonValue& value) {
+  const QByteArray array = QJsonDocument(QJsonArray{value}).toJson(QJsonDocument::Compact);
+  return array.sliced(1, array.size() - 2);
+}
+
+}  // namespace tendril::exchange
