@@ -14,14 +14,7 @@ namespace tendril {
 namespace exchange {
 namespace {
 
-constexpr qsizetype kLongestQuote = 40;
-
 [[noreturn]] void Refuse(const QString& place, const QString& reason) { throw Refusal{place, reason}; }
-
-QString Quoted(const QJsonValue& value) {
-  const QString text = QString::fromUtf8(JsonText(value));
-  return text.size() <= kLongestQuote ? text : text.first(kLongestQuote) + QStringLiteral("...");
-}
 
 // "5 is not a port".
 [[noreturn]] void RefuseValue(const QString& place, const QJsonValue& value, const QString& wanted) {

@@ -7,6 +7,8 @@
 namespace tendril::exchange {
 namespace {
 
+constexpr qsizetype kLongestQuote = 40;
+
 bool IsDigit(char c) { return c >= '0' && c <= '9'; }
 
 // Goes through a text that Qt's parser has accepted.
@@ -51,7 +53,7 @@ class StrictScan {
   void NoteName(const QByteArray& json) {
     const QString name = QJsonDocument::fromJson('[' + json + ']')[0].toString();
     if (names_.back().contains(name))
-      Refuse(QString::fromUtf8(json) + QStringLiteral(" stands there a second time"));
+      Refuse(Quoted(name) + QStringLiteral(" stands there a second time"));
     names_.back().insert(name);
   }
 
@@ -82,6 +84,11 @@ QJsonDocument ParseStrictly(const QByteArray& text) {
 QByteArray JsonText(const QJsonValue& value) {
   const QByteArray array = QJsonDocument(QJsonArray{value}).toJson(QJsonDocument::Compact);
   return array.sliced(1, array.size() - 2);
+}
+
+QString Quoted(const QJsonValue& value) {
+  const QString text = QString::fromUtf8(JsonText(value));
+  return text.size() <= kLongestQuote ? text : text.first(kLongestQuote) + QStringLiteral("...");
 }
 
 }  // namespace tendril::exchange

@@ -17,4 +17,7 @@ QJsonDocument ParseStrictly(const QByteArray& text);
 // A value, or a string as a JSON string: in one line, ASCII control characters escaped.
 QByteArray JsonText(const QJsonValue& value);
 
+// The beginning of that, for a sentence.
+QString Quoted(const QJsonValue& value);
+
 }  // namespace tendril::exchange
