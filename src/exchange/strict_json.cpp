@@ -52,8 +52,7 @@ class StrictScan {
   // Two names can be the same with different escapes.
   void NoteName(const QByteArray& json) {
     const QString name = QJsonDocument::fromJson('[' + json + ']')[0].toString();
-    if (names_.back().contains(name))
-      Refuse(Quoted(name) + QStringLiteral(" stands there a second time"));
+    if (names_.back().contains(name)) Refuse(Quoted(name) + QStringLiteral(" stands there a second time"));
     names_.back().insert(name);
   }
 
