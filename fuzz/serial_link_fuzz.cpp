@@ -6,6 +6,8 @@
 #include "support/memory_log.h"
 #include "support/recording_device.h"
 #include "support/simulated_time.h"
+#include "trace/line_trace.h"
+#include "trace/line_verdict.h"
 
 namespace tendril::fuzz {
 namespace {
@@ -16,14 +18,15 @@ constexpr std::uint32_t kMaxPollMs = 498;
 class Run {
  public:
   Run() {
-    link_.SetPollReplyHandler(
-        [this](bool /*success*/, std::uint8_t unit, std::uint8_t /*code*/, Bytes& data) {
-          Check(std::exchange(reply_due_, false) && unit == unit_,
-                "a poll has one reply, with the unit that was polled");
-          Check(data.size() <= ReplyParser::kMaxData, "a reply has no more data than the limit");
-          if (std::exchange(polls_again_, false)) Try([&] { Poll(unit, 'n'); });
-        });
+    link_.SetPollReplyHandler([this](bool success, std::uint8_t unit, std::uint8_t /*code*/, Bytes& data) {
+      Check(std::exchange(reply_due_, false) && unit == unit_,
+            "a poll has one reply, with the unit that was polled");
+      Check(data.size() <= ReplyParser::kMaxData, "a reply has no more data than the limit");
+      if (on_line_) CheckTrace(success);
+      if (std::exchange(polls_again_, false)) Try([&] { Poll(unit, 'n'); });
+    });
     link_.SetPortHandler([this](bool open) { on_line_ = on_line_ && open; });
+    link_.SetLineObserver([this](const LineEvent& event) { trace_.Note(event, time_.NowMs()); });
     link_.SetCommPort(1);
     link_.SetBaudRate(19200);
   }
@@ -101,6 +104,12 @@ class Run {
   void Arrive(const Bytes& bytes, bool report = true) {
     if (device_.open) device_.Receive(bytes, report);
   }
+  void CheckTrace(bool success) const {
+    Check(!trace_.Polls().empty() && trace_.Polls().back().unit == unit_, "the trace knows the poll");
+    const PollSeen& poll = trace_.Polls().back();
+    // Kind 100 takes some replies only.
+    Check(poll.kind == 100 || poll.replied == success, "the trace and the link agree on replies");
+  }
   // The only timer is that of a poll.
   bool Outstanding() const { return time_.RunningTimers() > 0; }
   void CheckState() const {
@@ -110,11 +119,14 @@ class Run {
     Check(!device_.open || waits || device_.rts, "RTS is asserted whenever no poll is out");
     Check(!device_.open || device_.receive_threshold == (waits ? 1 : 4000),
           "bytes are reported while a poll is out");
+    Check(trace_.Entries().size() <= LineTrace::kMaxEntries && !JudgeLine(trace_).sentence.empty(),
+          "the trace has its limits and a verdict");
   }
 
   test::SimulatedTime time_{0xFFFF'FE00};  // soon wraps
   test::RecordingDevice device_;
   test::MemoryLog log_;
+  LineTrace trace_;
   HwSerial link_{device_, time_, time_, log_};
   Bytes echo_;  // of the last poll
   std::uint8_t unit_ = 0;

@@ -73,7 +73,7 @@ void HalfDuplexLine::ReportInput() {
   if (!observer_) return;
   Bytes received;
   IgnoreFailure([&] { received = device_.ReadAll(); });
-  if (!received.empty()) Report({.kind = LineEvent::Kind::kReceived, .bytes = received});
+  if (!received.empty()) Report({.kind = LineEvent::Kind::kDropped, .bytes = received});
 }
 
 void HalfDuplexLine::TakeLineBack() noexcept {

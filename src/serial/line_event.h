@@ -20,6 +20,7 @@ struct LineEvent {
     kSent,      // bytes
     kPollSent,  // bytes: the poll
     kReceived,  // bytes: what has arrived, in pieces of any size
+    kDropped,   // bytes: the same, and no poll takes it
     kTimeOut    // of the poll, after everything that has arrived
   };
 

@@ -106,6 +106,8 @@ void LineTrace::Note(const LineEvent& event, std::int64_t time_ms) {
       return NotePoll(event.bytes);
     case LineEvent::Kind::kReceived:
       return NoteReceived(event.bytes);
+    case LineEvent::Kind::kDropped:
+      return NoteDropped(event.bytes);
     case LineEvent::Kind::kTimeOut:
       return NoteTimeOut();
   }
@@ -173,7 +175,15 @@ void LineTrace::NoteReceived(std::span<const std::uint8_t> bytes) {
         poll_->before_echo.push_back(byte);
     }
     const auto verdict = poll_ ? parser_.Push(byte) : ReplyParser::Verdict::kNeedMore;
-    if (received_.Push(byte) || received_.Size() >= kLongestPiece) NotePacket(received_.Take(), verdict);
+    const bool ended = received_.Push(byte) || verdict != ReplyParser::Verdict::kNeedMore;
+    if (ended || received_.Size() >= kLongestPiece) NotePacket(received_.Take(), verdict);
+  }
+}
+
+void LineTrace::NoteDropped(std::span<const std::uint8_t> bytes) {
+  for (const std::uint8_t byte : bytes) {
+    if (received_.Push(byte) || received_.Size() >= kLongestPiece)
+      NotePacket(received_.Take(), ReplyParser::Verdict::kNeedMore);
   }
 }
 
@@ -189,8 +199,7 @@ void LineTrace::NotePacket(const Bytes& packet, ReplyParser::Verdict verdict) {
   Add(echo ? TraceEntry::Kind::kEcho : TraceEntry::Kind::kNoise, packet);
   if (!poll_) {
     const bool reply = content.size() > 1 && content[0] == kProgramAddress;
-    if (reply && !polls_.empty() && polls_.back().outcome != PollOutcome::kAnswered)
-      polls_.back().outcome = PollOutcome::kTooLate;
+    if (reply && !polls_.empty() && !polls_.back().replied) polls_.back().outcome = PollOutcome::kTooLate;
     return;
   }
   if (verdict == ReplyParser::Verdict::kEchoSeen) {
@@ -210,7 +219,7 @@ void LineTrace::NoteTimeOut() {
 }
 
 void LineTrace::EndPoll(bool replied) {
-  polls_.push_back({poll_->unit, poll_->kind, Judge(replied)});
+  polls_.push_back({poll_->unit, poll_->kind, replied, Judge(replied)});
   if (polls_.size() > kMaxPolls) polls_.pop_front();
   if (replied) no_echo_ = !poll_->echoed;
   poll_.reset();

@@ -64,6 +64,7 @@ enum class PollOutcome {
 struct PollSeen {
   std::uint8_t unit = 0;
   std::uint8_t kind = 0;
+  bool replied = false;  // the link took a reply
   PollOutcome outcome = PollOutcome::kSilence;
 };
 
@@ -108,6 +109,7 @@ class LineTrace {
   void NoteSent(std::span<const std::uint8_t> bytes);
   void NotePoll(std::span<const std::uint8_t> packet);
   void NoteReceived(std::span<const std::uint8_t> bytes);
+  void NoteDropped(std::span<const std::uint8_t> bytes);
   void NotePacket(const Bytes& packet, ReplyParser::Verdict verdict);
   void NoteTimeOut();
   void EndPoll(bool replied);
