@@ -1,5 +1,5 @@
 // How close the program comes, over a paced pseudo-terminal, to the times that the protocol itself sets: a
-// send, a get, and the steps of a test sweep.
+// send, a get, a search for units, and the steps of a test sweep.
 #include <QAbstractButton>
 #include <cstddef>
 #include <cstdint>
@@ -74,6 +74,20 @@ bool MeasureGet(MeasuredWindow& window) {
   return Median(excess_ms) <= kMaxExcessMs;
 }
 
+// The floor: the time-outs of the 252 IDs without a unit, which grow by the bytes that wait when they begin.
+bool MeasureFind(MeasuredWindow& window) {
+  constexpr double kTimeOutBytes = 38 + 45;
+  constexpr int kUnanswered = 252;
+  constexpr double kMaxRatio = 1.02;
+
+  const double measured_ms = window.RunCommand("cmdFindUnits", "Search complete");
+  const double floor_ms =
+      2 * kWireMsPerByte * (kUnanswered * kTimeOutBytes + static_cast<double>(window.device.pended));
+  std::printf("find: measured %.1f ms, floor %.1f ms, ratio %.4f (at most %.2f)\n", measured_ms, floor_ms,
+              measured_ms / floor_ms, kMaxRatio);
+  return measured_ms / floor_ms <= kMaxRatio;
+}
+
 // A live command, when it was written.
 struct LiveStep {
   double ms;
@@ -135,7 +149,8 @@ bool MeasureSweep(MeasuredWindow& window) {
 bool MeasureAll() {
   MeasuredWindow window;
   bool within_bounds = true;
-  for (const auto measure : {MeasureSend, MeasureGet, MeasureSweep}) within_bounds &= measure(window);
+  for (const auto measure : {MeasureSend, MeasureGet, MeasureFind, MeasureSweep})
+    within_bounds &= measure(window);
   return within_bounds;
 }
 

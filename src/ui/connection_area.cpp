@@ -11,9 +11,6 @@ namespace tendril {
 namespace {
 
 constexpr int kDigits = 16;
-// Every ID in between can be given to a unit and be polled.
-constexpr int kFirstId = 0x01;
-constexpr int kLastId = 0xFD;
 constexpr int kLongestPortLine = 7;  // "Comm 25"
 constexpr char kWhatItDoes[] =
     "The serial port that the units are connected to. Choosing it opens it at once.";
@@ -21,7 +18,9 @@ constexpr char kWhatItDoes[] =
 }  // namespace
 
 ConnectionArea::ConnectionArea(PortSelection& ports)
-    : ports_(ports), cmbNYX_(Named(new ListComboBox(ListComboBox::Enter::kChoosesAgain), "cmbNYX")) {
+    : ports_(ports),
+      cmbNYX_(Named(new ListComboBox(ListComboBox::Enter::kChoosesAgain), "cmbNYX")),
+      cmdFindUnits_(Named(new QPushButton(QStringLiteral("&Find...")), "cmdFindUnits")) {
   auto* port_label = new QLabel(QStringLiteral("&Comm Port"));
   port_label->setBuddy(cmbNYX_);
   cmbNYX_->setSizeAdjustPolicy(QComboBox::AdjustToContents);
@@ -38,6 +37,9 @@ ConnectionArea::ConnectionArea(PortSelection& ports)
   auto* id_label = new QLabel(QStringLiteral("Select Unit &ID"));
   id_label->setBuddy(CmbUnitID_[0]);
 
+  Describe(cmdFindUnits_, "Asks every ID from 01 to FD who is there, and lists the units that answer.");
+  connect(cmdFindUnits_, &QAbstractButton::clicked, this, &ConnectionArea::FindPressed);
+
   auto* group = new QGroupBox(QStringLiteral("Connection"));
   auto* row = AddLayout<QHBoxLayout>(group, {7, 4, 7, 6}, 5);
   row->addWidget(port_label);
@@ -45,6 +47,7 @@ ConnectionArea::ConnectionArea(PortSelection& ports)
   row->addSpacing(6);
   row->addWidget(id_label);
   for (CalmComboBox* digit : CmbUnitID_) row->addWidget(digit);
+  row->addWidget(cmdFindUnits_);
   row->addStretch();
   AddLayout<QHBoxLayout>(this, {})->addWidget(group);
 }
@@ -104,17 +107,21 @@ void ConnectionArea::DescribePorts() {
 }
 
 void ConnectionArea::StepUnitId(int by) {
-  int id = UnitId() + by;
-  if (id < kFirstId || (id > kLastId && by < 0)) {
-    id = kLastId;
-  } else if (id > kLastId) {
-    id = kFirstId;
+  const int id = UnitId() + by;
+  if (id < kFirstUnitId || (id > kLastUnitId && by < 0)) {
+    ChooseUnitId(kLastUnitId);
+  } else {
+    ChooseUnitId(id > kLastUnitId ? kFirstUnitId : static_cast<std::uint8_t>(id));
   }
+}
+
+void ConnectionArea::ChooseUnitId(std::uint8_t id) {
   CmbUnitID_[0]->setCurrentIndex(id / kDigits);
   CmbUnitID_[1]->setCurrentIndex(id % kDigits);
 }
 
-void ConnectionArea::EnableControls(const QString& running_command) {
+void ConnectionArea::EnableControls(const QString& running_command, bool finding) {
+  EnableUnless(finding ? QString() : running_command, cmdFindUnits_);
   EnableUnless(running_command, cmbNYX_);
   for (CalmComboBox* digit : CmbUnitID_) EnableUnless(running_command, digit);
 }

@@ -1,6 +1,7 @@
 // ConnectionArea: which comm port, and which unit.
 #pragma once
 
+#include <QPushButton>
 #include <QString>
 #include <QWidget>
 #include <array>
@@ -30,14 +31,17 @@ class ConnectionArea : public QWidget, public UnitTarget {
   void WatchCommPorts();
   // Chooses the next ID (`by` = 1) or the previous one (-1), from 01 to FD; the last one and the first one are neighbours.
   void StepUnitId(int by);
-  // Enables the controls. `running_command` is what runs; empty when nothing does.
-  void EnableControls(const QString& running_command);
+  void ChooseUnitId(std::uint8_t id);
+  // Enables the controls. `running_command` is what runs; empty when nothing does. `finding`: it finds units, and the
+  // button shows them.
+  void EnableControls(const QString& running_command, bool finding);
 
   bool PortChosen() const override;
   std::uint8_t UnitId() const override;
 
  Q_SIGNALS:
   void UnitIdChanged();
+  void FindPressed();
 
  private:
   CalmComboBox* MakeDigit(std::size_t index, const char* which);
@@ -47,6 +51,7 @@ class ConnectionArea : public QWidget, public UnitTarget {
 
   PortSelection& ports_;
   ListComboBox* cmbNYX_;
+  QPushButton* cmdFindUnits_;
   std::vector<std::string> lines_;            // of the list
   std::array<CalmComboBox*, 2> CmbUnitID_{};  // the high digit, then the low one
 };

@@ -43,7 +43,11 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
                 {.starting = [this] { return MakeWayForCommand(); },
                  .polled = [this](std::uint8_t unit, bool replied) { facts_.NotePoll(unit, replied); },
                  .replaced = [this](std::uint8_t unit) { OnRead(unit); },
-                 .sent = [this](std::uint8_t unit) { OnSent(unit); }}),
+                 .sent = [this](std::uint8_t unit) { OnSent(unit); },
+                 .searched =
+                     [this] {
+                       if (found_units_ != nullptr) found_units_->ShowSearch();
+                     }}),
       live_test_(link, timers, boxes, commands_.running, *connection_, *servo_, *live_test_area_,
                  simulators_),
       tmrSummaryScreen_(timers.CreateTimer([this] { OnSummaryScreen(); })),
@@ -102,6 +106,7 @@ void frmNewServoConfig::LayOut() {
 void frmNewServoConfig::ConnectAreas() {
   QObject* const c = &connections_;
   connect(connection_, &ConnectionArea::UnitIdChanged, c, [this] { EnableControls(); });
+  connect(connection_, &ConnectionArea::FindPressed, c, [this] { FindUnits(); });
   connect(command_area_, &CommandArea::SendPressed, c, [this] { commands_.send.Start(); });
   connect(command_area_, &CommandArea::GetPressed, c, [this] { commands_.get.Start(); });
   connect(command_area_, &CommandArea::ChangeIdPressed, c, [this] { commands_.change_id.Start(); });
@@ -171,8 +176,9 @@ void frmNewServoConfig::ConnectMenu() {
   connect(menu_, &MainMenu::CopyStatusChosen, c, [this] { status_->Copy(); });
   connect(menu_, &MainMenu::IdStepped, c, [this](int by) {
     connection_->StepUnitId(by);
-    status_->Say(QStringLiteral("Unit ID ") + QString::fromStdString(HexByte(connection_->UnitId())));
+    SayUnitId();
   });
+  connect(menu_, &MainMenu::FindChosen, c, [this] { FindUnits(); });
   connect(menu_, &MainMenu::UndoChosen, c, [this] { Undo(); });
   connect(menu_, &MainMenu::RedoChosen, c, [this] { Redo(); });
   connect(menu_, &MainMenu::RestoreChosen, c, [this] { RestoreReading(); });
@@ -207,7 +213,8 @@ void frmNewServoConfig::StartUp() {
 void frmNewServoConfig::EnableControls() {
   const RunningCommand& running = commands_.running;
   const QString running_command = QString::fromStdString(running.What());
-  connection_->EnableControls(running_command);
+  const bool finding = running.Operation() == &commands_.find;
+  connection_->EnableControls(running_command, finding);
   command_area_->EnableCommands(running_command, connection_->UnitId(), SummaryShown());
   live_test_area_->EnableControls(running_command);
   apply_boxes_->EnableControls(running_command, SummaryShown());
@@ -216,11 +223,14 @@ void frmNewServoConfig::EnableControls() {
   choices_->EnableControls(running_command);
   if (summary_ != nullptr) summary_->EnableControls(running_command);
   menu_->EnableIdSteps(!running.Active() && !live_test_area_->Moves());
+  menu_->EnableFind(finding || !running.Active());
   menu_->ShowView(SummaryShown(), running.Active());
   progress_->EnableCancel(!running.Active() ? QStringLiteral("No command runs.")
                           : running.Cancelled()
                               ? QStringLiteral("The command ends with the unit's last reply.")
                               : QString());
+  if (found_units_ != nullptr)
+    found_units_->EnableControls(running_command, finding, running.Cancelled(), live_test_area_->Moves());
   ShowUndo();
   menu_->EnableStop(live_test_area_->Sweeps());
   facts_.Show();
@@ -258,6 +268,29 @@ void frmNewServoConfig::MakeSummary() {
     ShowRemarks();
     NoteStep(QStringLiteral("Edit"), summary_->Repeats());
   });
+}
+
+// A search that runs goes on: only its list is shown again.
+void frmNewServoConfig::FindUnits() {
+  if (isEnabled() && !commands_.running.Active()) commands_.find.Start();
+  if (commands_.running.Operation() != &commands_.find) return;
+  if (found_units_ == nullptr) {
+    found_units_ = new FoundUnits(commands_.find.Search(), *this);
+    connect(found_units_, &FoundUnits::UnitChosen, &connections_, [this](std::uint8_t id) {
+      connection_->ChooseUnitId(id);
+      SayUnitId();
+    });
+    connect(found_units_, &FoundUnits::CancelPressed, &connections_, [this] { commands_.Cancel(); });
+    connect(found_units_, &FoundUnits::FindPressed, &connections_, [this] { FindUnits(); });
+    EnableControls();
+  }
+  found_units_->show();
+  found_units_->raise();
+  found_units_->activateWindow();
+}
+
+void frmNewServoConfig::SayUnitId() {
+  status_->Say(QStringLiteral("Unit ID ") + QString::fromStdString(HexByte(connection_->UnitId())));
 }
 
 void frmNewServoConfig::closeEvent(QCloseEvent* event) {

@@ -22,6 +22,7 @@
 #include "ui/command_area.h"
 #include "ui/command_focus.h"
 #include "ui/connection_area.h"
+#include "ui/found_units.h"
 #include "ui/live_test_area.h"
 #include "ui/main_menu.h"
 #include "ui/model/edited_configuration.h"
@@ -91,6 +92,8 @@ class frmNewServoConfig : public QMainWindow {
   void ForgetDropped();
   void NoteOutcome(const QString& sentence) { outcome_note_ += QLatin1Char(' ') + sentence; }
   bool MakeWayForCommand();
+  void FindUnits();
+  void SayUnitId();
   void MakeSummary();
   void ShowSummary();
   void OnSummaryScreen();
@@ -125,7 +128,8 @@ class frmNewServoConfig : public QMainWindow {
   StatusLine* status_ = new StatusLine;
   MainMenu* menu_ = nullptr;
   ActualsFrame* actuals_;
-  SummaryArea* summary_ = nullptr;  // made after the first paint, or when it is first needed
+  FoundUnits* found_units_ = nullptr;  // made when it is first needed
+  SummaryArea* summary_ = nullptr;     // made after the first paint, or when it is first needed
 
   UnitCommands commands_;
   Simulators simulators_{*channels_, *servo_, parameters_->Scale(), config_.Editor()};

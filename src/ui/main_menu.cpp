@@ -78,6 +78,7 @@ void MainMenu::AddUnitMenu(QWidget& window) {
   for (const ControlItem& item : kTargetItems) AddItem(menu, window, item);
   id_steps_ = {AddItem(menu, "&Next Unit ID", "Ctrl+PgUp", this, [this] { Q_EMIT IdStepped(1); }),
                AddItem(menu, "P&revious Unit ID", "Ctrl+PgDown", this, [this] { Q_EMIT IdStepped(-1); })};
+  find_ = AddItem(menu, "&Find Units...", "Ctrl+F", this, &MainMenu::FindChosen);
   menu.addSeparator();
   for (const ControlItem& item : kCommandItems) AddItem(menu, window, item);
   AddItem(menu, window, kCancelItem);

@@ -29,12 +29,15 @@ class MainMenu : public QMenuBar {
   void EnableStop(bool enabled) { stop_->setEnabled(enabled); }
   // Enables the steps through the unit IDs.
   void EnableIdSteps(bool enabled);
+  void EnableFind(bool enabled) { find_->setEnabled(enabled); }
 
  Q_SIGNALS:
   // Choose channel 0 to 7.
   void ChannelChosen(std::size_t channel);
   // Choose the next (+1) or the previous (-1) unit ID.
   void IdStepped(int by);
+  // Find the units on the line, or show the search that runs.
+  void FindChosen();
   void SimulatorChosen();
   void UndoChosen();
   void RedoChosen();
@@ -58,6 +61,7 @@ class MainMenu : public QMenuBar {
   void AddHelpMenu();
 
   std::array<QAction*, 2> id_steps_{};
+  QAction* find_ = nullptr;
   std::array<QAction*, kPortCount> channels_{};
   QAction* simulator_ = nullptr;
   QAction* undo_ = nullptr;

@@ -12,7 +12,8 @@ UnitCommands::UnitCommands(HwSerial& link, TimerFactory& timers, MessageBoxes& b
       send(context, working, std::move(events.sent)),
       get(context, working, std::move(events.replaced)),
       compare(context, std::move(events.compared)),
-      change_id(context) {
+      change_id(context),
+      find(context, nullptr, std::move(events.searched)) {
   link.SetPollReplyHandler([this, polled = std::move(events.polled)](bool replied, std::uint8_t unit,
                                                                      std::uint8_t kind, Bytes& data) {
     if (polled) polled(unit, replied);

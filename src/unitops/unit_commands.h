@@ -10,6 +10,7 @@
 #include "serial/hw_serial.h"
 #include "unitops/change_id_operation.h"
 #include "unitops/compare_operation.h"
+#include "unitops/find_operation.h"
 #include "unitops/get_operation.h"
 #include "unitops/running_command.h"
 #include "unitops/send_operation.h"
@@ -33,6 +34,8 @@ struct UnitCommands {
     std::function<void(std::uint8_t unit)> sent = nullptr;
     // A compare has just read what `unit` holds, all of it, and still runs.
     std::function<void(std::uint8_t unit, const OptionTable& held)> compared = nullptr;
+    // A search for units begins, or has polled one more ID, and still runs.
+    std::function<void()> searched = nullptr;
   };
 
   // Takes the link's poll replies. Everything handed in must outlive it.
@@ -52,6 +55,7 @@ struct UnitCommands {
   GetOperation get;             // "GET(read) Configuration"
   CompareOperation compare;     // "Compare"
   ChangeIdOperation change_id;  // "UPDATE Unit_ID"
+  FindOperation find;           // "Find Units"
 };
 
 }  // namespace tendril

@@ -5,6 +5,10 @@
 
 namespace tendril {
 
+// Every ID in between can be given to a unit and be polled.
+inline constexpr std::uint8_t kFirstUnitId = 0x01;
+inline constexpr std::uint8_t kLastUnitId = 0xFD;
+
 // The connection area of the window; the unit commands read it for every packet that they send.
 class UnitTarget {
  public:

@@ -39,10 +39,15 @@ class CountingDevice final : public SerialDevice {
     return bytes;
   }
   void ClearInput() override { received += device_.ReadAll().size(); }
-  std::size_t PendingOutput() const override { return device_.PendingOutput(); }
+  std::size_t PendingOutput() const override {
+    const std::size_t pending = device_.PendingOutput();
+    pended += pending;
+    return pending;
+  }
 
   std::size_t sent = 0;
   std::size_t received = 0;
+  mutable std::size_t pended = 0;  // the sum of what PendingOutput() has returned
   std::function<void(std::span<const std::uint8_t>)>
       on_write;  // called with each packet before it is written
 

@@ -95,8 +95,8 @@ TEST_F(Window, Send_ByMouse_WritesTheRecordsIntoTheUnit) {
 TEST_F(Window, Send_ByKeyboardAlone_LeavesTheFocusWhereItWas) {
   Activate();
   ConnectUnit();
-  // To the button, past the two digits of the ID.
-  for (const Qt::Key key : {Qt::Key_Tab, Qt::Key_Tab, Qt::Key_Tab, Qt::Key_Space}) Key(key);
+  // To the button, past the two digits of the ID and the button that finds units.
+  for (const Qt::Key key : {Qt::Key_Tab, Qt::Key_Tab, Qt::Key_Tab, Qt::Key_Tab, Qt::Key_Space}) Key(key);
   EXPECT_EQ(QApplication::focusWidget(), window_.get()) << "on nothing that a key could trigger";
   RunToTheEnd();
   EXPECT_EQ(Text("lblProgress"), "SUCCESS: Send Complete!");
