@@ -195,7 +195,8 @@ void LineTrace::NotePacket(const Bytes& packet, ReplyParser::Verdict verdict) {
   const Bytes content = WithoutZeros(packet);
   const auto sent = std::find(unechoed_.begin(), unechoed_.end(), content);
   const bool echo = verdict == ReplyParser::Verdict::kEchoSeen || sent != unechoed_.end();
-  if (sent != unechoed_.end()) unechoed_.erase(unechoed_.begin(), sent + 1);
+  const bool ended = packet.back() == kFrameByte;
+  if (sent != unechoed_.end() && ended) unechoed_.erase(unechoed_.begin(), sent + 1);
   Add(echo ? TraceEntry::Kind::kEcho : TraceEntry::Kind::kNoise, packet);
   if (!poll_) {
     const bool reply = content.size() > 1 && content[0] == kProgramAddress;
@@ -206,7 +207,6 @@ void LineTrace::NotePacket(const Bytes& packet, ReplyParser::Verdict verdict) {
     poll_->echoed = true;
   } else if (poll_->echoed && !content.empty()) {
     poll_->strays = true;
-    const bool ended = packet.back() == kFrameByte;
     poll_->other_answer = ended && content.size() > 1 && content[1] == poll_->kind;  // under another address
   }
 }
@@ -239,22 +239,21 @@ PollOutcome LineTrace::Judge(bool replied) const {
   return poll_->strays ? PollOutcome::kNoReply : PollOutcome::kEchoOnly;
 }
 
-// Whether at least half of what was sent last is in `received`, in order.
+// Whether at least half of what was sent last is in `received`, in order: a damaged echo lacks bytes.
 bool LineTrace::MostlyEcho(const Bytes& received) const {
-  std::size_t sent = 0;
-  std::size_t found = 0;
-  auto next = received.begin();
+  Bytes sent;
   const std::size_t older = unechoed_.size() - std::min(unechoed_.size(), kPacketsOfExchange);
-  for (std::size_t i = older; i < unechoed_.size(); ++i) {
-    for (const std::uint8_t byte : unechoed_[i]) {
-      ++sent;
-      const auto match = std::find(next, received.end(), byte);
-      if (match == received.end()) continue;
-      ++found;
-      next = match + 1;
-    }
+  for (std::size_t i = older; i < unechoed_.size(); ++i)
+    sent.insert(sent.end(), unechoed_[i].begin(), unechoed_[i].end());
+  std::size_t found = 0;
+  auto next = sent.begin();
+  for (const std::uint8_t byte : received) {
+    const auto match = std::find(next, sent.end(), byte);
+    if (match == sent.end()) continue;
+    ++found;
+    next = match + 1;
   }
-  return found > 0 && 2 * found >= sent;
+  return found > 0 && 2 * found >= sent.size();
 }
 
 }  // namespace tendril
