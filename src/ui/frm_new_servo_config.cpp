@@ -39,7 +39,7 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
       info_(info),
       ports_(link, boxes, control_panel),
       actuals_(new ActualsFrame(timers, *this)),
-      commands_(link, timers, boxes, *progress_, *connection_, config_.Records(),
+      commands_(link, trace_, timers, boxes, *progress_, *connection_, config_.Records(),
                 {.starting = [this] { return MakeWayForCommand(); },
                  .polled = [this](std::uint8_t unit, bool replied) { facts_.NotePoll(unit, replied); },
                  .replaced = [this](std::uint8_t unit) { OnRead(unit); },

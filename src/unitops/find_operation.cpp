@@ -2,6 +2,8 @@
 
 #include <utility>
 
+#include "trace/line_verdict.h"
+
 namespace tendril {
 namespace {
 
@@ -10,10 +12,10 @@ constexpr char kCannotSearch[] = "Error finding units, Please retry";
 
 }  // namespace
 
-FindOperation::FindOperation(CommandContext& context, std::function<bool()> bytes_came,
+FindOperation::FindOperation(CommandContext& context, const LineTrace& trace,
                              std::function<void()> on_searched)
     : UnitOperation(context, "*", "Finding Units Failed"),
-      bytes_came_(std::move(bytes_came)),
+      trace_(trace),
       on_searched_(std::move(on_searched)) {}
 
 std::string FindOperation::Prepare() {
@@ -43,12 +45,17 @@ void FindOperation::OnReply(bool replied, std::uint8_t /*unit*/, const Bytes& da
 void FindOperation::OnLastReply(bool replied, const Bytes& data) {
   if (!Link().PortOpen()) return;
   const std::uint8_t id = Id();
-  if (replied) {
-    search_.found.push_back({id, data.empty() ? id : data[0], false});
-  } else if (bytes_came_ && bytes_came_()) {
-    search_.found.push_back({id, id, true});
+  const PollOutcome outcome = trace_.Polls().empty() ? PollOutcome::kSilence : trace_.Polls().back().outcome;
+  if (outcome == PollOutcome::kOtherAnswer) {
+    search_.found.push_back({id, FoundUnit::What::kOtherAnswer, id});
+  } else if (replied) {
+    search_.found.push_back({id, FoundUnit::What::kAnswers, data.empty() ? id : data[0]});
+  } else if (PerhapsSeveralUnits(trace_)) {
+    search_.found.push_back({id, FoundUnit::What::kPerhapsSeveral, id});
   }
   ++search_.polled;
+  const bool adapter = outcome == PollOutcome::kSilence || outcome == PollOutcome::kEchoDamaged;
+  if (search_.polled == UnitSearch::kIds && adapter) search_.fault = JudgeLine(trace_).sentence;
 }
 
 void FindOperation::ShowSearch() {

@@ -5,6 +5,7 @@
 #include <functional>
 #include <string>
 
+#include "trace/line_trace.h"
 #include "unitops/unit_operation.h"
 #include "unitops/unit_search.h"
 
@@ -19,9 +20,9 @@ namespace tendril {
 //   Polling --the port is closed, or a fault--> Idle (failed; what was found stays)
 class FindOperation final : public UnitOperation {
  public:
-  // `bytes_came` returns whether bytes came after the last poll that make no reply. `on_searched` is called when a search
-  // begins and after each poll. Both may be empty, and raise nothing. The context must outlive the operation.
-  FindOperation(CommandContext& context, std::function<bool()> bytes_came, std::function<void()> on_searched);
+  // `trace` follows the link, and judges the polls that have no reply. `on_searched` (may be empty; raises nothing) is
+  // called when a search begins and after each poll. Context and trace must outlive the operation.
+  FindOperation(CommandContext& context, const LineTrace& trace, std::function<void()> on_searched);
 
   // The search that runs, or the last one.
   const UnitSearch& Search() const { return search_; }
@@ -38,7 +39,7 @@ class FindOperation final : public UnitOperation {
   std::uint8_t Id() const { return static_cast<std::uint8_t>(kFirstUnitId + search_.polled); }
   void ShowSearch();
 
-  std::function<bool()> bytes_came_;
+  const LineTrace& trace_;
   std::function<void()> on_searched_;
   UnitSearch search_;
 };

@@ -4,7 +4,7 @@
 
 namespace tendril {
 
-UnitCommands::UnitCommands(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes,
+UnitCommands::UnitCommands(HwSerial& link, const LineTrace& trace, TimerFactory& timers, MessageBoxes& boxes,
                            CommandProgressView& progress_view, const UnitTarget& target,
                            ChannelTable& working, Events events)
     : running(timers, progress_view),
@@ -13,7 +13,7 @@ UnitCommands::UnitCommands(HwSerial& link, TimerFactory& timers, MessageBoxes& b
       get(context, working, std::move(events.replaced)),
       compare(context, std::move(events.compared)),
       change_id(context),
-      find(context, nullptr, std::move(events.searched)) {
+      find(context, trace, std::move(events.searched)) {
   link.SetPollReplyHandler([this, polled = std::move(events.polled)](bool replied, std::uint8_t unit,
                                                                      std::uint8_t kind, Bytes& data) {
     if (polled) polled(unit, replied);

@@ -8,6 +8,7 @@
 #include "platform/message_boxes.h"
 #include "platform/timer.h"
 #include "serial/hw_serial.h"
+#include "trace/line_trace.h"
 #include "unitops/change_id_operation.h"
 #include "unitops/compare_operation.h"
 #include "unitops/find_operation.h"
@@ -38,9 +39,10 @@ struct UnitCommands {
     std::function<void()> searched = nullptr;
   };
 
-  // Takes the link's poll replies. Everything handed in must outlive it.
-  UnitCommands(HwSerial& link, TimerFactory& timers, MessageBoxes& boxes, CommandProgressView& progress_view,
-               const UnitTarget& target, ChannelTable& working, Events events);
+  // Takes the link's poll replies. `trace` follows the link. Everything handed in must outlive it.
+  UnitCommands(HwSerial& link, const LineTrace& trace, TimerFactory& timers, MessageBoxes& boxes,
+               CommandProgressView& progress_view, const UnitTarget& target, ChannelTable& working,
+               Events events);
   ~UnitCommands();
 
   // Stops the running command and shows nothing: the window is closing.

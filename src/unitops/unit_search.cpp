@@ -1,6 +1,5 @@
 #include "unitops/unit_search.h"
 
-#include <algorithm>
 #include <cstddef>
 
 #include "platform/hex_text.h"
@@ -24,23 +23,36 @@ std::string Listed(const std::vector<std::string>& ids) {
 }  // namespace
 
 std::string FoundUnit::Words() const {
-  if (perhaps_several) return "perhaps several units";
-  return named == id ? "answers" : "answers as " + HexByte(named);
+  switch (what) {
+    case What::kAnswers:
+      return named == id ? "answers" : "answers as " + HexByte(named);
+    case What::kOtherAnswer:
+      return "answers something else";
+    case What::kPerhapsSeveral:
+      return "perhaps several units";
+  }
+  return {};
+}
+
+std::vector<std::string> UnitSearch::Ids(FoundUnit::What what) const {
+  std::vector<std::string> ids;
+  for (const FoundUnit& unit : found) {
+    if (unit.what != what) continue;
+    ids.push_back(HexByte(unit.id) + (unit.named == unit.id ? "" : " (as " + HexByte(unit.named) + ")"));
+  }
+  return ids;
 }
 
 std::string UnitSearch::Step() const {
-  const auto units =
-      std::count_if(found.begin(), found.end(), [](const FoundUnit& unit) { return !unit.perhaps_several; });
-  return std::to_string(polled) + " of " + std::to_string(kIds) + ", " + std::to_string(units) + " found";
+  return std::to_string(polled) + " of " + std::to_string(kIds) + ", " +
+         std::to_string(Ids(FoundUnit::What::kAnswers).size()) + " found";
 }
 
 std::string UnitSearch::Sentence() const {
   if (polled == 0) return "No ID was polled.";
-  std::vector<std::string> units, shared;
-  for (const FoundUnit& unit : found) {
-    (unit.perhaps_several ? shared : units)
-        .push_back(HexByte(unit.id) + (unit.named == unit.id ? "" : " (as " + HexByte(unit.named) + ")"));
-  }
+  const auto units = Ids(FoundUnit::What::kAnswers);
+  const auto others = Ids(FoundUnit::What::kOtherAnswer);
+  const auto shared = Ids(FoundUnit::What::kPerhapsSeveral);
   std::string text;
   if (polled < kIds)
     text +=
@@ -52,12 +64,16 @@ std::string UnitSearch::Sentence() const {
         std::to_string(units.size()) + (units.size() == 1 ? " unit" : " units") + " found: " + Listed(units);
   }
   if (!shared.empty()) text += "; perhaps several at " + Listed(shared);
-  text += ".";
-  if (shared.size() > kMostShared) return text + " So many suggest noise on the line, or a faulty adapter.";
-  if (!shared.empty()) return text + " Connect units that share an ID one at a time, and give each its own.";
-  if (units.empty() && polled == kIds)
-    text += " Check power, wiring and port. A unit fresh from the factory has FF, which is not searched.";
-  return text;
+  if (!others.empty()) text += "; an answer to something else at " + Listed(others);
+  return text + "." + (polled == kIds ? WhatNext(shared.size()) : "");
+}
+
+std::string UnitSearch::WhatNext(std::size_t shared) const {
+  if (shared > kMostShared) return " So many suggest noise on the line, or a faulty adapter.";
+  if (shared > 0) return " Connect units that share an ID one at a time, and give each its own.";
+  if (!found.empty()) return {};
+  if (!fault.empty()) return " " + fault;
+  return " Check power, wiring and port. A unit fresh from the factory has FF, which is not searched.";
 }
 
 }  // namespace tendril

@@ -1,6 +1,7 @@
 // UnitSearch: what a search for units has found.
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 #include <string>
 #include <vector>
@@ -11,11 +12,17 @@ namespace tendril {
 
 // Something answers at an ID.
 struct FoundUnit {
-  std::uint8_t id;
-  std::uint8_t named;    // the ID that its reply names; another one when a unit answers late
-  bool perhaps_several;  // bytes came that make no reply
+  enum class What {
+    kAnswers,
+    kOtherAnswer,    // an answer to something else
+    kPerhapsSeveral  // bytes that make no reply
+  };
 
-  // "answers", "answers as 05", "perhaps several units".
+  std::uint8_t id;
+  What what;
+  std::uint8_t named;  // the ID that its reply names; another one when a unit answers late
+
+  // "answers", "answers as 05", "answers something else", "perhaps several units".
   std::string Words() const;
 };
 
@@ -26,10 +33,16 @@ struct UnitSearch {
   int polled = 0;                // IDs that have been polled
   std::vector<FoundUnit> found;  // in order of ID
 
+  std::string fault = {};  // what the last poll says about the adapter: a sentence; empty for nothing
+
   // "57 of 253, 3 found".
   std::string Step() const;
   // The result, and what to do next: "3 units found: 01, 0A and 7F; perhaps several at 20."
   std::string Sentence() const;
+
+ private:
+  std::vector<std::string> Ids(FoundUnit::What what) const;
+  std::string WhatNext(std::size_t shared) const;
 };
 
 }  // namespace tendril

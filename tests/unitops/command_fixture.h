@@ -40,6 +40,7 @@ class ScriptedUnit final : public VirtualUnit {
 class CommandTest : public testing::Test {
  protected:
   CommandTest() {
+    link_.SetLineObserver([this](const LineEvent& event) { trace_.Note(event, 0); });
     link_.SetCommPort(1);
     link_.SetBaudRate(19200);
     for (std::size_t slot = 0; slot < kPortCount; ++slot)
@@ -89,6 +90,7 @@ class CommandTest : public testing::Test {
   }
 
   SimulatedWorld world_;
+  LineTrace trace_;
   HwSerial link_{*world_.device, world_.time, world_.time, world_.log};
   RecordedProgress progress_;
   bool settled_at_the_box_ = false;
@@ -116,7 +118,7 @@ class CommandTest : public testing::Test {
             held_ = held;
           }};
 
-  UnitCommands commands_{link_, world_.time, world_.boxes, progress_, target_, working_, events_};
+  UnitCommands commands_{link_, trace_, world_.time, world_.boxes, progress_, target_, working_, events_};
 };
 
 }  // namespace tendril::test

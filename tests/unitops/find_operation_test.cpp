@@ -38,8 +38,10 @@ TEST_F(Find, TakesNoLongerThanBytesAndTimeOuts) {
   for (int id = 1; id <= 0xFD; ++id)
     each_once += HexByte(static_cast<std::uint8_t>(id)) + (id == 1 || id == 10 || id == 0x7F ? "+ " : "- ");
   EXPECT_EQ(noted_, each_once);
-  EXPECT_EQ(Found(), "01 answers, 0A answers, 7F answers");
-  EXPECT_EQ(said_, "Finding units at 14:05: Search complete. 3 units found: 01, 0A and 7F.");
+  EXPECT_EQ(Found(), "01 answers, 0A answers, 20 perhaps several units, 7F answers");
+  EXPECT_EQ(said_,
+            "Finding units at 14:05: Search complete. 3 units found: 01, 0A and 7F; perhaps several at 20. "
+            "Connect units that share an ID one at a time, and give each its own.");
   ExpectSuccess("Search complete");
 }
 
@@ -94,12 +96,36 @@ TEST_F(Find, SaysWhatIsAtAnId) {
   }
 }
 
-TEST(UnitSearch, SaysWhatToDoNext) {
-  UnitSearch search{.polled = 253, .found = {}};
-  EXPECT_THAT(search.Sentence(), HasSubstr("No unit answered. Check power, wiring and port."));
-  for (std::uint8_t id = 1; id <= 30; ++id) search.found.push_back({id, id, true});
+// A damaged echo is no sign of units.
+TEST_F(Find, SaysWhatToDoWhenNoUnitAnswers) {
+  struct Case {
+    VirtualLineOptions options;
+    const char* said;
+  };
+  for (const Case& c : {Case{{}, "Check power, wiring and port. A unit fresh from the factory has FF"},
+                        {{.echo = false}, "Nothing comes back"},
+                        {{.echo_loses_every = 5}, "What the program sends comes back damaged"}}) {
+    VirtualPorts bench{world_.time, world_.time};
+    bench.AddPort(1, c.options);
+    const auto device = bench.CreateDevice();
+    HwSerial link{*device, world_.time, world_.time, world_.log};
+    link.SetCommPort(1);
+    link.SetBaudRate(19200);
+    link.SetLineObserver([this](const LineEvent& event) { trace_.Note(event, 0); });
+    UnitCommands commands{link, trace_, world_.time, world_.boxes, progress_, target_, working_, events_};
+    commands.find.Start();
+    world_.time.Advance(25'000);
+    EXPECT_THAT(commands.find.Search().Sentence(),
+                testing::StartsWith(std::string("No unit answered. ") + c.said));
+  }
+}
+
+TEST(UnitSearch, ManySharedIds_AreNoise) {
+  UnitSearch search{.polled = UnitSearch::kIds, .found = {}};
+  for (std::uint8_t id = 1; id <= 30; ++id)
+    search.found.push_back({id, FoundUnit::What::kPerhapsSeveral, id});
   EXPECT_THAT(search.Sentence(),
-              testing::AllOf(HasSubstr("0C and 18 more. "), HasSubstr("noise on the line")));
+              HasSubstr("at 01, 02, 03, 04, 05, 06, 07, 08, 09, 0A, 0B, 0C and 18 more. So many"));
 }
 
 }  // namespace
