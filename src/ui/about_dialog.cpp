@@ -7,11 +7,11 @@
 #include <QLabel>
 #include <QLineEdit>
 #include <QPushButton>
-#include <QSysInfo>
 #include <QVBoxLayout>
 #include <algorithm>
 
 #include "ui/controls.h"
+#include "ui/system_info.h"
 
 namespace tendril {
 namespace {
@@ -19,12 +19,6 @@ namespace {
 constexpr int kIconSize = 64;
 // A longer fact scrolls in its field.
 constexpr int kWidestFact = 480;
-
-QString DescribeSystem() {
-  return QStringLiteral("%1, %2 %3, %4")
-      .arg(QSysInfo::prettyProductName(), QSysInfo::kernelType(), QSysInfo::kernelVersion(),
-           QSysInfo::currentCpuArchitecture());
-}
 
 // A line edit and no label: it can be read and selected by keyboard, also by a screen reader.
 QLineEdit* FactField(const QString& value) {
@@ -54,8 +48,7 @@ AboutDialog::AboutDialog(const ProgramInfo& info, QWidget& window)
   column->addLayout(heading);
   column->addLayout(facts_);
   AddFact(QStringLiteral("Version"), info.version.Text());
-  AddFact(QStringLiteral("Qt"), QStringLiteral("%1, built with %2")
-                                    .arg(QString::fromLatin1(qVersion()), QStringLiteral(QT_VERSION_STR)));
+  AddFact(QStringLiteral("Qt"), DescribeQt());
   AddFact(QStringLiteral("Licence of Qt"),
           QStringLiteral("GNU LGPL version 3, https://www.gnu.org/licenses/lgpl-3.0.html"));
   AddFact(QStringLiteral("System"), DescribeSystem());

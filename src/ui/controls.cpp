@@ -5,6 +5,7 @@
 #include <QGuiApplication>
 #include <QKeyEvent>
 #include <QScrollArea>
+#include <QTableView>
 #include <algorithm>
 
 #include "config/channel_config.h"
@@ -118,6 +119,19 @@ int LowButtonHeight(const QWidget& button) { return button.fontMetrics().height(
 
 void MoveFocusToWindow(QWidget& widget) {
   if (widget.hasFocus()) widget.window()->setFocus();
+}
+
+QString SelectedRows(const QTableView& table) {
+  QModelIndexList rows = table.selectionModel()->selectedRows();
+  std::sort(rows.begin(), rows.end());
+  QString text;
+  for (const QModelIndex& row : rows) {
+    QStringList cells;
+    for (int column = 0; column < table.model()->columnCount(); ++column)
+      cells += row.siblingAtColumn(column).data().toString();
+    text += cells.join(QLatin1Char('\t')) + QLatin1Char('\n');
+  }
+  return text;
 }
 
 void Reveal(QWidget& widget) {

@@ -14,6 +14,8 @@
 #include <cstddef>
 #include <cstdint>
 
+class QTableView;
+
 namespace tendril {
 
 // A combo box that the mouse wheel does not change: the wheel scrolls what lies around it.
@@ -110,6 +112,9 @@ int LowButtonHeight(const QWidget& button);
 
 // Scrolls what contains `widget`, if that scrolls, until it is visible.
 void Reveal(QWidget& widget);
+
+// The selected rows of the table in their order, a line each, with tabs between the columns.
+QString SelectedRows(const QTableView& table);
 
 // If `widget` has the focus, its window gets it. Called before the widget is hidden or disabled: Qt would give the focus
 // to the next control, and scroll there.

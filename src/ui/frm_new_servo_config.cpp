@@ -174,6 +174,8 @@ void frmNewServoConfig::ConnectMenu() {
   QObject* const c = &connections_;
   connect(menu_, &MainMenu::ChannelChosen, c, [this](std::size_t channel) { ChooseChannel(channel); });
   connect(menu_, &MainMenu::CopyStatusChosen, c, [this] { status_->Copy(); });
+  connect(menu_, &MainMenu::CopyLineChosen, c, [this] { Line().CopyReport(); });
+  connect(menu_, &MainMenu::LineToggled, c, [this](bool shown) { shown ? Line().Open() : Line().hide(); });
   connect(menu_, &MainMenu::IdStepped, c, [this](int by) {
     connection_->StepUnitId(by);
     SayUnitId();
@@ -247,6 +249,18 @@ bool frmNewServoConfig::eventFilter(QObject* object, QEvent* event) {
     });
   }
   return QMainWindow::eventFilter(object, event);
+}
+
+LinePane& frmNewServoConfig::Line() {
+  if (line_ == nullptr) {
+    line_ = new LinePane(trace_, timers_, link_, *connection_, info_);
+    addDockWidget(Qt::BottomDockWidgetArea, line_);
+    connect(line_, &LinePane::Said, &connections_,
+            [this](const QString& sentence) { status_->Say(sentence); });
+    connect(line_, &LinePane::visibilityChanged, &connections_,
+            [this](bool shown) { menu_->ShowLine(shown); });
+  }
+  return *line_;
 }
 
 void frmNewServoConfig::MakeSummary() {

@@ -23,6 +23,7 @@
 #include "ui/command_focus.h"
 #include "ui/connection_area.h"
 #include "ui/found_units.h"
+#include "ui/line_pane.h"
 #include "ui/live_test_area.h"
 #include "ui/main_menu.h"
 #include "ui/model/edited_configuration.h"
@@ -94,6 +95,7 @@ class frmNewServoConfig : public QMainWindow {
   bool MakeWayForCommand();
   void FindUnits();
   void SayUnitId();
+  LinePane& Line();
   void MakeSummary();
   void ShowSummary();
   void OnSummaryScreen();
@@ -129,6 +131,7 @@ class frmNewServoConfig : public QMainWindow {
   MainMenu* menu_ = nullptr;
   ActualsFrame* actuals_;
   FoundUnits* found_units_ = nullptr;  // made when it is first needed
+  LinePane* line_ = nullptr;           // made when it is first needed
   SummaryArea* summary_ = nullptr;     // made after the first paint, or when it is first needed
 
   UnitCommands commands_;

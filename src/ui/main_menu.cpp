@@ -7,6 +7,7 @@
 #include <QLabel>
 #include <QLineEdit>
 #include <QSlider>
+#include <QTableView>
 
 #include "ui/appearance.h"
 #include "ui/control_action.h"
@@ -113,6 +114,7 @@ void MainMenu::AddEditMenu(QWidget& window) {
   menu.addSeparator();
   AddItem(menu, "&Copy", "Ctrl+C", this, [] { CopyFocused(); });
   AddItem(menu, "Copy &Status", "Ctrl+Shift+S", this, &MainMenu::CopyStatusChosen);
+  AddItem(menu, "Copy &Line for Support", "Ctrl+Shift+L", this, &MainMenu::CopyLineChosen);
   menu.addSeparator();
   AddItem(menu, window, kStoreItem);
   AddItem(menu, window, kPresetsItem);
@@ -129,6 +131,9 @@ void MainMenu::AddViewMenu(QWidget& window) {
                                  [this, channel] { Q_EMIT ChannelChosen(channel); });
   }
   menu.addSeparator();
+  line_ = AddItem(menu, "&Line", "F12", this, &MainMenu::LineToggled);
+  line_->setObjectName("actLine");
+  line_->setCheckable(true);
   dark_ = AddItem(menu, "&Dark", "Ctrl+Shift+D", this, [](bool on) { SetDarkAppearance(on); });
   dark_->setCheckable(true);
   dark_->setChecked(DarkAppearance());
@@ -177,6 +182,7 @@ void CopyFocused() {
   QString text = QAccessible::queryAccessibleInterface(focused)->text(QAccessible::Value);
   if (const auto* label = qobject_cast<QLabel*>(focused)) text = label->selectedText();
   if (qobject_cast<QSlider*>(focused) != nullptr) text = focused->accessibleDescription();
+  if (const auto* table = qobject_cast<QTableView*>(focused)) text = SelectedRows(*table);
   if (const auto* field = focused->findChild<QLineEdit*>(); field != nullptr && field->hasSelectedText())
     text = field->selectedText();
   if (!text.isEmpty()) QGuiApplication::clipboard()->setText(text);

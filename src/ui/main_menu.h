@@ -27,6 +27,8 @@ class MainMenu : public QMenuBar {
   void ShowWayBack(bool enabled, const QString& what);
   // Enables "Stop" while a sweep runs.
   void EnableStop(bool enabled) { stop_->setEnabled(enabled); }
+  // Whether the pane of the line is shown.
+  void ShowLine(bool shown) { line_->setChecked(shown); }
   // Enables the steps through the unit IDs.
   void EnableIdSteps(bool enabled);
   void EnableFind(bool enabled) { find_->setEnabled(enabled); }
@@ -46,6 +48,10 @@ class MainMenu : public QMenuBar {
   void StopChosen();
   // Put the status bar's text on the clipboard.
   void CopyStatusChosen();
+  // Put the report about the line on the clipboard.
+  void CopyLineChosen();
+  // Show or hide the pane of the line.
+  void LineToggled(bool shown);
   void ManualChosen();
   void KeysChosen();
   void AboutChosen();
@@ -68,6 +74,7 @@ class MainMenu : public QMenuBar {
   QAction* redo_ = nullptr;
   QAction* restore_ = nullptr;
   QAction* dark_ = nullptr;
+  QAction* line_ = nullptr;
   QAction* stop_ = nullptr;
 };
 
