@@ -72,7 +72,8 @@ class Show {
   }
 
   // Pictures of the window at the start, of the editor with a servo, a digital and a PWM channel, of a send, of the
-  // summary, of a number entry open in it, of the question for a port, and of what the help menu shows.
+  // summary, of a number entry open in it, of what crossed the line, of the question for a port, and of what the help menu
+  // shows.
   void TakePictures() {
     SavePicture("start.png");
     user_.ChoosePort(1);
@@ -98,6 +99,10 @@ class Show {
     Press("cmdShowConfig");
     Press("ServoSimulator2_2");
     Send();
+    Trigger("&Line");
+    QApplication::processEvents();  // the content makes way, and scrolls
+    SavePicture("line.png");
+    Trigger("&Line");
     SavePictureOfQuestion();
     SavePictureOfDialog("&About", "AboutDialog", "about.png");
     SavePictureOfDialog("&Keys", "KeysDialog", "keys.png");
@@ -140,10 +145,13 @@ class Show {
     Require(saved, "No question for Comm 3");
   }
 
-  void SavePictureOfDialog(const char* menu_item, const char* dialog, const char* name) const {
+  void Trigger(const char* menu_item) const {
     for (auto* action : program_.window.findChildren<QAction*>()) {
       if (action->text() == QString::fromUtf8(menu_item)) action->trigger();
     }
+  }
+  void SavePictureOfDialog(const char* menu_item, const char* dialog, const char* name) const {
+    Trigger(menu_item);
     auto& shown = user_.Find(dialog);
     QApplication::processEvents();
     SavePicture(shown, name);

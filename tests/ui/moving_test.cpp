@@ -25,6 +25,7 @@ class Moving : public Window {
 TEST_F(Moving, Sweep_EndsFromEveryControlByEscapeAndByItsButton) {
   const auto& unit = ConnectUnit();
   Click("ServoSimulator2_2");
+  Find<QAction>("actLine").trigger();
   for (QWidget* control : window_->findChildren<QWidget*>()) {
     if (!control->isVisible() || !control->isEnabled() || control->focusPolicy() == Qt::NoFocus) continue;
     EXPECT_TRUE(Ends(unit, [&] {
