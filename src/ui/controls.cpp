@@ -1,8 +1,6 @@
 #include "ui/controls.h"
 
 #include <QAbstractButton>
-#include <QClipboard>
-#include <QGuiApplication>
 #include <QKeyEvent>
 #include <QScrollArea>
 #include <QTableView>
@@ -41,6 +39,13 @@ void PressableText::Press() {
   if (isEnabled()) Q_EMIT Pressed();
 }
 
+bool PressableText::event(QEvent* event) {
+  const bool copy = event->type() == QEvent::ShortcutOverride &&
+                    static_cast<QKeyEvent*>(event)->matches(QKeySequence::Copy);
+  if (copy) event->ignore();
+  return !copy && QLineEdit::event(event);
+}
+
 void PressableText::mousePressEvent(QMouseEvent* event) {
   if (event->button() == Qt::LeftButton) {
     Press();
@@ -53,8 +58,6 @@ void PressableText::keyPressEvent(QKeyEvent* event) {
   const int key = event->key();
   if (key == Qt::Key_Return || key == Qt::Key_Enter || key == Qt::Key_Space) {
     Press();
-  } else if (event->matches(QKeySequence::Copy)) {
-    QGuiApplication::clipboard()->setText(text());
   } else {
     QLineEdit::keyPressEvent(event);
   }

@@ -38,8 +38,8 @@ class CalmComboBox : public QComboBox {
   void wheelEvent(QWheelEvent* event) override { event->ignore(); }
 };
 
-// A read-only text that can be pressed: with the left mouse button, Enter or the space bar. Ctrl+C copies it; no part of
-// it can be selected.
+// A read-only text that can be pressed: with the left mouse button, Enter or the space bar. No part of it can be selected,
+// and Ctrl+C is left to the window.
 class PressableText : public QLineEdit {
   Q_OBJECT
 
@@ -53,6 +53,7 @@ class PressableText : public QLineEdit {
   void Pressed();
 
  protected:
+  bool event(QEvent* event) override;
   void mousePressEvent(QMouseEvent* event) override;
   void mouseDoubleClickEvent(QMouseEvent* event) override { mousePressEvent(event); }
   void keyPressEvent(QKeyEvent* event) override;

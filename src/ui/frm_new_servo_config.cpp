@@ -173,6 +173,9 @@ void frmNewServoConfig::ConnectOperations() {
 void frmNewServoConfig::ConnectMenu() {
   QObject* const c = &connections_;
   connect(menu_, &MainMenu::ChannelChosen, c, [this](std::size_t channel) { ChooseChannel(channel); });
+  connect(menu_, &MainMenu::CopyChosen, c, [this] { Copy(); });
+  connect(menu_, &MainMenu::CopyConfigurationChosen, c, [this] { CopyConfiguration(); });
+  connect(menu_, &MainMenu::PasteConfigurationChosen, c, [this] { PasteConfiguration(); });
   connect(menu_, &MainMenu::CopyStatusChosen, c, [this] { status_->Copy(); });
   connect(menu_, &MainMenu::CopyLineChosen, c, [this] { Line().CopyReport(); });
   connect(menu_, &MainMenu::LineToggled, c, [this](bool shown) { shown ? Line().Open() : Line().hide(); });

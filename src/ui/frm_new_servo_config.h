@@ -81,6 +81,9 @@ class frmNewServoConfig : public QMainWindow {
   void OnReport(const CommandReport& report);
   void OnBegun();
   void RestoreReading();
+  void Copy();
+  void CopyConfiguration();
+  void PasteConfiguration();
   void NoteStep(const QString& what, bool goes_on = false);
   void ShowOrigin();
   void ShowUndo();

@@ -1,9 +1,11 @@
 // The window's edits and views: what the user's acts do to the records, and how that is shown.
+#include <QClipboard>
 #include <QGuiApplication>
 #include <utility>
 
 #include "platform/hex_text.h"
 #include "ui/calm_spin_box.h"
+#include "ui/configuration_clipboard.h"
 #include "ui/freeze.h"
 #include "ui/frm_new_servo_config.h"
 #include "ui/time_of_day.h"
@@ -16,7 +18,7 @@ constexpr std::int32_t kSummaryScreenMs = 20;
 
 QString UnitHeld(std::uint8_t unit, const Readings::Reading& reading, const char* text) {
   return QString::fromLatin1(text).arg(QString::fromStdString(HexByte(unit)),
-                                       QString::fromStdString(reading.time));
+                                       QString::fromStdString(ClockTime(reading.time)));
 }
 
 }  // namespace
@@ -123,7 +125,7 @@ void frmNewServoConfig::OnReplaced(const QString& what) {
 }
 
 void frmNewServoConfig::OnRead(std::uint8_t unit) {
-  const std::string time = TimeOfDay();
+  const std::string time = IsoTime();
   readings_.Keep(link_.CommPort(), unit, config_.Records(), time);
   config_.ReadFrom(unit, time);
   OnReplaced(QStringLiteral("Get from unit ") + QString::fromStdString(HexByte(unit)));
@@ -166,6 +168,33 @@ void frmNewServoConfig::RestoreReading() {
   status_->Say(QStringLiteral("Shown now: %1. Nothing is sent yet.").arg(what));
 }
 
+void frmNewServoConfig::Copy() {
+  if (CopySelection()) return;
+  if (!SummaryShown()) return CopyFocused();
+  QGuiApplication::clipboard()->setText(summary_->TableText());
+  status_->Say(QStringLiteral("Copied the table: %1 channels").arg(kPortCount));
+}
+
+void frmNewServoConfig::CopyConfiguration() {
+  CommitTyping();
+  status_->Say(CopyAsText(config_));
+}
+
+void frmNewServoConfig::PasteConfiguration() {
+  CommitTyping();
+  if (!MayUndo()) return;
+  const ChannelTable before = config_.Records();
+  const QString refusal = PasteText(config_);
+  if (!refusal.isEmpty()) return status_->Say(refusal);
+  ForgetDropped();
+  if (SummaryShown()) summary_->ShowRecords();
+  ShowRecords();
+  NoteStep(QStringLiteral("Paste"));
+  const auto changed = ChannelsThatDiffer(before, config_.Records());
+  const QString channels = QString::fromStdString(changed.empty() ? "no channel" : ChannelsInWords(changed));
+  status_->SayOfChange(QStringLiteral("Paste: %1 changed").arg(channels));
+}
+
 // Called after everything that may have changed the configuration.
 void frmNewServoConfig::NoteStep(const QString& what, bool goes_on) {
   const auto changed = history_.Note(what, goes_on);
@@ -190,6 +219,7 @@ void frmNewServoConfig::ShowOrigin() {
 void frmNewServoConfig::ShowUndo() {
   const bool may = MayUndo();
   status_->EnableUndo(may);
+  menu_->EnablePaste(may);
   menu_->ShowUndo(may && history_.CanUndo(), history_.UndoText(), may && history_.CanRedo(),
                   history_.RedoText());
   const std::uint8_t unit = connection_->UnitId();

@@ -112,9 +112,12 @@ void MainMenu::AddEditMenu(QWidget& window) {
   redo_->setShortcuts({Key("Ctrl+Shift+Z"), Key("Ctrl+Y")});
   ShowUndo(false, {}, false, {});
   menu.addSeparator();
-  AddItem(menu, "&Copy", "Ctrl+C", this, [] { CopyFocused(); });
+  AddItem(menu, "&Copy", "Ctrl+C", this, &MainMenu::CopyChosen);
   AddItem(menu, "Copy &Status", "Ctrl+Shift+S", this, &MainMenu::CopyStatusChosen);
   AddItem(menu, "Copy &Line for Support", "Ctrl+Shift+L", this, &MainMenu::CopyLineChosen);
+  menu.addSeparator();
+  AddItem(menu, "Copy Confi&guration", "Ctrl+Shift+C", this, &MainMenu::CopyConfigurationChosen);
+  paste_ = AddItem(menu, "P&aste Configuration", "Ctrl+Shift+V", this, &MainMenu::PasteConfigurationChosen);
   menu.addSeparator();
   AddItem(menu, window, kStoreItem);
   AddItem(menu, window, kPresetsItem);
@@ -176,15 +179,25 @@ void MainMenu::EnableIdSteps(bool enabled) {
   for (QAction* step : id_steps_) step->setEnabled(enabled);
 }
 
+bool CopySelection() {
+  const QWidget* const focused = QApplication::focusWidget();
+  if (focused == nullptr) return false;
+  QString text;
+  if (const auto* label = qobject_cast<const QLabel*>(focused)) text = label->selectedText();
+  if (const auto* table = qobject_cast<const QTableView*>(focused)) text = SelectedRows(*table);
+  const auto* field = qobject_cast<const QLineEdit*>(focused);
+  if (field == nullptr) field = focused->findChild<QLineEdit*>();
+  if (field != nullptr) text = field->selectedText();
+  if (!text.isEmpty()) QGuiApplication::clipboard()->setText(text);
+  return !text.isEmpty();
+}
+
 void CopyFocused() {
   QWidget* const focused = QApplication::focusWidget();
-  if (focused == nullptr) return;
-  QString text = QAccessible::queryAccessibleInterface(focused)->text(QAccessible::Value);
-  if (const auto* label = qobject_cast<QLabel*>(focused)) text = label->selectedText();
-  if (qobject_cast<QSlider*>(focused) != nullptr) text = focused->accessibleDescription();
-  if (const auto* table = qobject_cast<QTableView*>(focused)) text = SelectedRows(*table);
-  if (const auto* field = focused->findChild<QLineEdit*>(); field != nullptr && field->hasSelectedText())
-    text = field->selectedText();
+  if (focused == nullptr || qobject_cast<QLabel*>(focused) != nullptr) return;
+  const QString text = qobject_cast<QSlider*>(focused) != nullptr
+                           ? focused->accessibleDescription()
+                           : QAccessible::queryAccessibleInterface(focused)->text(QAccessible::Value);
   if (!text.isEmpty()) QGuiApplication::clipboard()->setText(text);
 }
 

@@ -29,6 +29,8 @@ class MainMenu : public QMenuBar {
   void EnableStop(bool enabled) { stop_->setEnabled(enabled); }
   // Whether the pane of the line is shown.
   void ShowLine(bool shown) { line_->setChecked(shown); }
+  // Enables "Paste Configuration".
+  void EnablePaste(bool enabled) { paste_->setEnabled(enabled); }
   // Enables the steps through the unit IDs.
   void EnableIdSteps(bool enabled);
   void EnableFind(bool enabled) { find_->setEnabled(enabled); }
@@ -46,6 +48,10 @@ class MainMenu : public QMenuBar {
   void RestoreChosen();
   // End the sweep.
   void StopChosen();
+  // Copy what is selected, the table of the summary, or the value that has the focus.
+  void CopyChosen();
+  void CopyConfigurationChosen();
+  void PasteConfigurationChosen();
   // Put the status bar's text on the clipboard.
   void CopyStatusChosen();
   // Put the report about the line on the clipboard.
@@ -73,12 +79,15 @@ class MainMenu : public QMenuBar {
   QAction* undo_ = nullptr;
   QAction* redo_ = nullptr;
   QAction* restore_ = nullptr;
+  QAction* paste_ = nullptr;
   QAction* dark_ = nullptr;
   QAction* line_ = nullptr;
   QAction* stop_ = nullptr;
 };
 
-// Puts the selected text of the focused control on the clipboard, or else its value. Does nothing when it has neither.
+// Puts the selected text of the focused control on the clipboard. False: nothing is selected.
+bool CopySelection();
+// Puts the value of the focused control on the clipboard. Does nothing when it has none.
 void CopyFocused();
 
 }  // namespace tendril

@@ -41,6 +41,7 @@ constexpr std::array<Value, 5> kValues{
      {"Virtual\nStops", "txtSumStopRange", SummaryField::kStops, "1000--2000"},
      {"Neutral\nPosition", "txtSumNeutralPosition", SummaryField::kNeutralTrim, ""},
      {"Default\nPosition", "txtSumDefaultPosition", SummaryField::kDefaultPosition, ""}}};
+constexpr std::size_t kPairs = 3;  // the first of them have a low and a high end
 struct Option {
   const char* caption;
   const char* name;
@@ -274,6 +275,38 @@ void SummaryArea::ShowTexts(std::size_t channel) {
                                           QString::number(record.DefaultPosition)};
   for (std::size_t value = 0; value < texts.size(); ++value)
     rows_[channel].texts[value]->setText(texts[value]);
+}
+
+QString SummaryArea::TableText() const {
+  QStringList captions{QStringLiteral("Channel"), QStringLiteral("Output")};
+  for (std::size_t value = 0; value < kValues.size(); ++value) {
+    const QString caption = OnOneLine(kValues[value].caption);
+    captions += value < kPairs
+                    ? QStringList{caption + QStringLiteral(" low"), caption + QStringLiteral(" high")}
+                    : QStringList{caption};
+  }
+  captions += {QStringLiteral("Power Up"), QStringLiteral("Lost Comm")};
+  QStringList lines{captions.join(QLatin1Char('\t'))};
+  const auto chosen = [](const QButtonGroup& group, int column) {
+    const int option = column - kPowerUpColumn + group.checkedId() - 1;
+    return group.checkedId() < 0 ? QString() : OnOneLine(kOptions[static_cast<std::size_t>(option)].caption);
+  };
+  for (std::size_t channel = 0; channel < kPortCount; ++channel) {
+    const ChannelConfig& record = working_.At(channel);
+    const Row& row = rows_[channel];
+    const bool servo = record.PortType == kPortServo;
+    QStringList cells{QString::number(channel + 1),
+                      servo ? QStringLiteral("Servo") : row.lblSumDIOPWM->text()};
+    if (servo) {
+      for (const PulsePair& pair : {record.ActualRange, record.VirtualRange, record.VirtualStops})
+        cells += {QString::number(pair[0]), QString::number(pair[1])};
+      cells += {QString::number(record.NeutralPosition), QString::number(record.DefaultPosition),
+                chosen(*row.power_up, kPowerUpColumn), chosen(*row.lost_comm, kLostCommColumn)};
+    }
+    cells.resize(captions.size());
+    lines += cells.join(QLatin1Char('\t'));
+  }
+  return lines.join(QLatin1Char('\n')) + QLatin1Char('\n');
 }
 
 void SummaryArea::TakeFocus() {

@@ -38,6 +38,8 @@ class SummaryArea : public QWidget {
   void ShowRemarks(const std::vector<std::string>& sentences) { remarks_->ShowRemarks(sentences); }
   // Enables the unit commands, and what changes records. `running_command` is what runs; empty when nothing does.
   void EnableControls(const QString& running_command);
+  // The table with its captions, separated by tabs: each number in a column of its own.
+  QString TableText() const;
   // Gives the focus to the first value, if there is one.
   void TakeFocus();
   // Closes the number entry. False: it is not open.

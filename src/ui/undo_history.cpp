@@ -10,14 +10,6 @@ constexpr int kMostSteps = 100;
 constexpr std::size_t kMostBytes = std::size_t{512} * 1024;
 static_assert(std::size_t{kMostSteps} * sizeof(EditedConfiguration::Snapshot) < kMostBytes);
 
-std::vector<std::size_t> ChannelsThatDiffer(const ChannelTable& a, const ChannelTable& b) {
-  std::vector<std::size_t> channels;
-  for (std::size_t channel = 0; channel < kPortCount; ++channel) {
-    if (a.At(channel) != b.At(channel)) channels.push_back(channel);
-  }
-  return channels;
-}
-
 }  // namespace
 
 class UndoHistory::Step : public QUndoCommand {

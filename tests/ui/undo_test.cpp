@@ -171,6 +171,8 @@ TEST_F(Undoing, StepsOfTheSummaryLeaveNothingToStore) {
 
 TEST_F(Undoing, IsOffWhileSomethingMovesOrACommandRuns) {
   ConnectUnit();
+  const auto with_shift = Qt::ControlModifier | Qt::ShiftModifier;
+  QTest::keyClick(window_.get(), Qt::Key_C, with_shift);
   Click("ServoSimulator2_1");
   ArrowUp("spnDefaultPos");
   const ChannelTable edited = Records();
@@ -179,6 +181,7 @@ TEST_F(Undoing, IsOffWhileSomethingMovesOrACommandRuns) {
                                     {"Command3_0", ""}}) {
     Press(button);
     Undo();
+    QTest::keyClick(window_.get(), Qt::Key_V, with_shift);  // paste
     EXPECT_TRUE(Records() == edited) << button;
     if (*end != '\0') {
       Press(end);

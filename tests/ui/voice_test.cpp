@@ -2,7 +2,6 @@
 // bus: this platform has none.
 #include <QClipboard>
 #include <QGuiApplication>
-#include <QShortcut>
 
 #include "ui/status_line.h"
 #include "window_fixture.h"
@@ -35,15 +34,6 @@ TEST_F(Window, OutputButton_IsSelectedAsAServoIs) {
   Click("ServoSimulator2_3");
   EXPECT_FALSE(Accessible("cmdDigitalOutput_2").state().selected);
   EXPECT_TRUE(Accessible("ServoSimulator2_3").state().selected);
-}
-
-TEST_F(Window, CellOfTheSummary_CopiesItsText) {
-  Activate();
-  Press("cmdShowSummary");
-  world_.time.Advance(20);
-  const QShortcut of_a_menu(QKeySequence::Copy, window_.get());
-  QTest::keyClick(&Find("txtSumStopRange_4"), Qt::Key_C, Qt::ControlModifier);
-  EXPECT_EQ(Copied(), Text("txtSumStopRange_4"));
 }
 
 }  // namespace

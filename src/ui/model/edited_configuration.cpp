@@ -28,6 +28,12 @@ void EditedConfiguration::Load(const ChannelTable& read, std::uint8_t unit, cons
   ReadFrom(unit, time);
 }
 
+void EditedConfiguration::TakeOver(const ChannelTable& records) {
+  records_ = records;
+  remarks_.AcceptRecords();
+  editor_.ReloadChannel();
+}
+
 EditedConfiguration::Snapshot EditedConfiguration::Take() const {
   return {records_, remarks_.Given(), editor_.Current(), origin_.Current(), preset_};
 }

@@ -40,10 +40,12 @@ class EditedConfiguration {
 
   // Stores this row of kPresets in all records.
   void ApplyPreset(std::size_t preset);
-  // `unit` has just given all records, at `time` ("14:02").
+  // `unit` has just given all records, at `time` ("2026-11-22T14:02:31+01:00").
   void ReadFrom(std::uint8_t unit, const std::string& time);
   // What `unit` held when it was read at `time` becomes the configuration.
   void Load(const ChannelTable& read, std::uint8_t unit, const std::string& time);
+  // Replaces all records by those of a text. The origin stays: what differs has changed since.
+  void TakeOver(const ChannelTable& records);
   // `unit` has just taken all records.
   void SentTo(std::uint8_t unit, const std::string& time) { origin_.SentTo(unit, time); }
 

@@ -16,8 +16,19 @@ std::string ChannelsInWords(const std::vector<std::size_t>& channels) {
   return text;
 }
 
+std::vector<std::size_t> ChannelsThatDiffer(const ChannelTable& a, const ChannelTable& b) {
+  std::vector<std::size_t> channels;
+  for (std::size_t channel = 0; channel < kPortCount; ++channel) {
+    if (a.At(channel) != b.At(channel)) channels.push_back(channel);
+  }
+  return channels;
+}
+
+std::string ClockTime(const std::string& iso_time) { return iso_time.substr(11, 5); }
+
 void Provenance::ReadFrom(std::uint8_t unit, const std::string& time) {
-  Begin("Read from " + HexByte(unit) + " at " + time);
+  Begin("Read from " + HexByte(unit) + " at " + ClockTime(time));
+  state_.reading = {unit, time};
 }
 
 void Provenance::SentTo(std::uint8_t unit, const std::string& time) {
@@ -27,15 +38,16 @@ void Provenance::SentTo(std::uint8_t unit, const std::string& time) {
 
 void Provenance::Begin(std::string origin) {
   state_.origin = std::move(origin);
+  state_.reading.reset();
   state_.records = working_;
 }
 
+std::optional<Provenance::Reading> Provenance::UnchangedReading() const {
+  return ChangedChannels().empty() ? state_.reading : std::nullopt;
+}
+
 std::vector<std::size_t> Provenance::ChangedChannels() const {
-  std::vector<std::size_t> changed;
-  for (std::size_t channel = 0; channel < kPortCount; ++channel) {
-    if (working_.At(channel) != state_.records.At(channel)) changed.push_back(channel);
-  }
-  return changed;
+  return ChannelsThatDiffer(working_, state_.records);
 }
 
 std::string Provenance::Sentence() const {

@@ -16,7 +16,7 @@ class Readings {
  public:
   struct Reading {
     ChannelTable records;
-    std::string time;  // "14:02"
+    std::string time;  // "2026-11-22T14:02:31+01:00"
   };
 
   // `unit` on comm port `port` has given `records`.

@@ -21,8 +21,9 @@ TEST(Provenance, NamesTheOriginAndWhatChangedSince) {
   EXPECT_EQ(provenance.Sentence(), "Preset Medium Range (default); channels 3 and 8 changed since");
   provenance.SentTo(0x0A, "14:02");
   EXPECT_EQ(provenance.Sentence(), "Sent to 0A at 14:02");
-  provenance.ReadFrom(0x01, "14:05");
+  provenance.ReadFrom(0x01, "2026-11-22T14:05:31+01:00");
   EXPECT_EQ(provenance.Sentence(), "Read from 01 at 14:05");
+  EXPECT_EQ(provenance.UnchangedReading()->time, "2026-11-22T14:05:31+01:00");
 }
 
 TEST(Readings, SendToEveryUnit_KeepsTheWayBackOfEach) {
