@@ -8,7 +8,8 @@
 namespace tendril {
 
 QString CopyAsText(const EditedConfiguration& configuration) {
-  ConfigurationText content{.records = configuration.Records()};
+  ConfigurationText content;
+  content.records = configuration.Records();
   if (const auto reading = configuration.Origin().UnchangedReading()) {
     content.unit = reading->unit;
     content.read = QString::fromStdString(reading->time);
