@@ -145,7 +145,7 @@ void TakePorts(const QJsonValue& ports, ConfigurationText& configuration) {
 
 std::optional<QString> TakeTime(Members& members, const char* name) {
   constexpr char kWanted[] = "a time like \"2026-11-22T14:02:31+01:00\"";
-  const auto text =
+  auto text =
       members.TakeText(name, R"(\d{4}-\d\d-\d\dT\d\d:\d\d:\d\d(\.\d{1,9})?(Z|[+-]\d\d:\d\d))", kWanted);
   if (text && !QDateTime::fromString(*text, Qt::ISODate).isValid())
     RefuseValue(members.PlaceOf(name), *text, QString::fromLatin1(kWanted));
