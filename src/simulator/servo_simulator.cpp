@@ -10,6 +10,8 @@
 #include <cmath>
 #include <exception>
 
+#include "simulator/marks.h"
+
 namespace tendril {
 namespace {
 
@@ -22,7 +24,6 @@ constexpr int kLeastLightness = 152;  // of a window to which the blue of the se
 constexpr double kSelectionOutline = 1;
 constexpr double kMarkSize = 12;  // of the check mark of the selection
 constexpr double kMarkLine = 1.6;
-constexpr double kDotSize = 7;            // of the mark
 constexpr double kAngleTextScale = 0.75;  // of the control's font
 constexpr double kMinTextScale = 0.8;     // of a text's full size
 constexpr double kMinTextPixels = 7;
@@ -244,14 +245,6 @@ void PaintSelection(QPainter& painter, const QRectF& rect, const QPalette& palet
   if (focus) PaintFocus(painter, rect, Qt::white);
 }
 
-void PaintMark(QPainter& painter, const QRectF& rect, const QColor& colour) {
-  painter.setRenderHint(QPainter::Antialiasing);
-  painter.setPen(Qt::NoPen);
-  painter.setBrush(colour);
-  const double left = rect.center().x() - std::min(rect.width(), rect.height()) / 2;
-  painter.drawEllipse(QRectF(left + kDotSize, rect.top() + kDotSize, kDotSize, kDotSize));
-}
-
 QString DescribeSelected(const QString& more) {
   return QStringLiteral("Selected") + (more.isEmpty() ? QString() : QStringLiteral(". ") + more);
 }
@@ -335,6 +328,12 @@ void ServoSimulator::Mark(bool marked) {
   update();
 }
 
+void ServoSimulator::MarkDiffers(bool differs) {
+  if (differs == differs_) return;
+  differs_ = differs;
+  update();
+}
+
 void ServoSimulator::AnnounceArm() {
   if (dial_.arm_pulse() == announced_pulse_) return;
   announced_pulse_ = dial_.arm_pulse();
@@ -374,7 +373,9 @@ void ServoSimulator::PaintBackground(QPainter& painter) const {
   } else if (hasFocus()) {
     PaintFocus(painter, whole, palette().color(QPalette::WindowText));
   }
-  if (marked_) PaintMark(painter, whole, palette().color(QPalette::ButtonText));
+  const QColor text = palette().color(QPalette::ButtonText);
+  if (marked_) PaintMark(painter, whole, text);
+  if (differs_) PaintDiffersMark(painter, whole, text);
 }
 
 void ServoSimulator::resizeEvent(QResizeEvent* event) {

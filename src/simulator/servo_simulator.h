@@ -21,8 +21,6 @@ QColor ToColour(DialColour colour);
 // check mark in the corner, and `inside` where the picture lies. Adds the line that shows the focus.
 void PaintSelection(QPainter& painter, const QRectF& rect, const QPalette& palette, const QColor& inside,
                     bool focus);
-// Paints the mark of a servo into `rect`: a dot at the top left of the picture, where no arc reaches.
-void PaintMark(QPainter& painter, const QRectF& rect, const QColor& colour);
 
 // The accessible description of a selected servo. `more` is what else is to be said of it.
 QString DescribeSelected(const QString& more);
@@ -77,6 +75,8 @@ class ServoSimulator : public QAbstractButton {
   void SelectServo(bool selected);
   // Shows the mark, or hides it. The accessible description has to say what it means.
   void Mark(bool marked);
+  // The same for the sign of what differs from a unit.
+  void MarkDiffers(bool differs);
 
   // What the control shows.
   const ServoDial& dial() const { return dial_; }
@@ -104,6 +104,7 @@ class ServoSimulator : public QAbstractButton {
 
   ServoDial dial_;
   bool marked_ = false;
+  bool differs_ = false;
   std::int64_t announced_pulse_;  // the pulse width of the arm that assistive technology was notified of
 };
 

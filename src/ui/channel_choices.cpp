@@ -7,8 +7,9 @@
 
 namespace tendril {
 
-ChannelChoices::ChannelChoices(ChannelEditor& editor, const ChannelTable& working)
-    : editor_(editor), working_(working) {
+ChannelChoices::ChannelChoices(ChannelEditor& editor, const ChannelTable& working,
+                               const Comparison& comparison)
+    : editor_(editor), working_(working), comparison_(comparison) {
   auto* column = AddLayout<QVBoxLayout>(this, {}, 3);
   column->addWidget(MakePresets());
   optChannelType_ = AddOptions(
@@ -92,7 +93,25 @@ void ChannelChoices::ShowChoices() {
   CheckOnly(*optChannelType_, record.PortType + 1);
   CheckOnly(*optPowerUp_, record.PowerUPOpt);
   CheckOnly(*optLostComm_, record.LostCommOption);
+  ShowDifferences();
   EnableOptions();
+}
+
+// The title has room for the sign: the options below it are wider.
+void ChannelChoices::ShowDifferences() {
+  const auto channel = editor_.Channel();
+  const auto show = [&](const QButtonGroup& group, ComparedPart part) {
+    const QString words = channel ? QString::fromStdString(comparison_.InWords(*channel, part)) : QString();
+    auto& frame = *static_cast<QGroupBox*>(group.buttons().constFirst()->parentWidget());
+    const QString sign = QStringLiteral("≠ ");
+    if (frame.title().startsWith(sign) == words.isEmpty())
+      frame.setTitle(words.isEmpty() ? frame.title().mid(sign.size()) : sign + frame.title());
+    DescribeDifference(&frame, words);
+    for (QAbstractButton* option : group.buttons()) DescribeDifference(option, words);
+  };
+  show(*optChannelType_, ComparedPart::kOutput);
+  show(*optPowerUp_, ComparedPart::kPowerUp);
+  show(*optLostComm_, ComparedPart::kLostComm);
 }
 
 void ChannelChoices::EnableControls(const QString& running_command) {

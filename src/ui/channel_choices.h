@@ -12,6 +12,7 @@
 #include "config/channel_config.h"
 #include "ui/controls.h"
 #include "ui/model/channel_editor.h"
+#include "ui/model/comparison.h"
 
 namespace tendril {
 
@@ -19,14 +20,16 @@ class ChannelChoices : public QWidget {
   Q_OBJECT
 
  public:
-  // `editor` and `working`, its records, must outlive the area. The preset that the records start from is selected,
+  // `editor`, `working`, its records, and what compares them must outlive the area. The preset that the records start from is selected,
   // but not applied.
-  ChannelChoices(ChannelEditor& editor, const ChannelTable& working);
+  ChannelChoices(ChannelEditor& editor, const ChannelTable& working, const Comparison& comparison);
 
   // Selects this row of kPresets, and applies nothing.
   void ShowPreset(std::size_t preset) { cmbPresets_->setCurrentIndex(static_cast<int>(preset)); }
   // Checks what the edited channel's record holds; nothing for unknown values, or while no channel is edited.
   void ShowChoices();
+  // Signs what differs from the unit that is compared. ShowChoices() does it, too.
+  void ShowDifferences();
   // Enables presets and choices. `running_command` is what runs; empty when nothing does.
   void EnableControls(const QString& running_command);
 
@@ -52,6 +55,7 @@ class ChannelChoices : public QWidget {
 
   ChannelEditor& editor_;
   const ChannelTable& working_;
+  const Comparison& comparison_;
   QString running_command_;
   CalmComboBox* cmbPresets_ = nullptr;
   // The buttons' ids are the record's values; those of the output kind are one more.

@@ -88,18 +88,32 @@ void ChannelStrip::ShowChanged(const std::vector<std::size_t>& channels) {
   std::array<bool, kPortCount> changed{};
   for (const std::size_t channel : channels) changed.at(channel) = true;
   for (std::size_t channel = 0; channel < kPortCount; ++channel) {
-    if (changed_[channel] != changed[channel]) MarkChanged(channel, changed[channel]);
+    if (changed_[channel] == changed[channel]) continue;
+    changed_[channel] = changed[channel];
+    ShowMarks(channel);
   }
-  changed_ = changed;
 }
 
-void ChannelStrip::MarkChanged(std::size_t channel, bool changed) {
-  const auto show = [changed, channel](auto& picture, const char* tip) {
-    const QString what_it_does = QString::fromUtf8(tip).arg(channel + 1);
-    const QString meaning = QStringLiteral("Changed since it was read, sent or taken from a preset");
-    picture.Mark(changed);
-    picture.setAccessibleDescription(changed ? meaning : QString());
-    Describe(&picture, changed ? what_it_does + QStringLiteral("\n• ") + meaning : what_it_does);
+void ChannelStrip::ShowDiffers(std::size_t channel, const QString& how) {
+  if (differs_.at(channel) == how) return;
+  differs_[channel] = how;
+  ShowMarks(channel);
+}
+
+void ChannelStrip::ShowMarks(std::size_t channel) {
+  const QString& differs = differs_[channel];
+  QString meaning = changed_[channel]
+                        ? QStringLiteral("Changed since it was read, sent or taken from a preset")
+                        : QString();
+  const QString dot = meaning.isEmpty() ? QString() : QStringLiteral("\n• ") + meaning;
+  if (!meaning.isEmpty() && !differs.isEmpty()) meaning += QStringLiteral(". ");
+  meaning += differs;
+  const auto show = [&](auto& picture, const char* tip) {
+    picture.Mark(changed_[channel]);
+    picture.MarkDiffers(!differs.isEmpty());
+    picture.setAccessibleDescription(meaning);
+    Describe(&picture, QString::fromUtf8(tip).arg(channel + 1) + dot);
+    DescribeDifference(&picture, differs);
   };
   show(*ServoSimulator2_[channel], kServoTip);
   show(*cmdDigitalOutput_[channel], kOutputTip);

@@ -32,6 +32,8 @@ class ChannelStrip : public QGroupBox {
   void EnableControls(const QString& running_command);
   // Marks these channels, and no other, as changed since the configuration was read, sent or taken from a preset.
   void ShowChanged(const std::vector<std::size_t>& channels);
+  // Marks `channel` as one that differs from a unit, as `how` says; empty: it does not.
+  void ShowDiffers(std::size_t channel, const QString& how);
   // Moves the arm alone.
   void MoveArm(std::size_t channel, Microseconds arm);
 
@@ -40,7 +42,7 @@ class ChannelStrip : public QGroupBox {
   void ChannelChosen(std::size_t channel);
 
  private:
-  void MarkChanged(std::size_t channel, bool changed);
+  void ShowMarks(std::size_t channel);
   QWidget* MakeCell(std::size_t channel);
   void ShowKind(std::size_t channel);
 
@@ -50,6 +52,7 @@ class ChannelStrip : public QGroupBox {
   std::array<ServoSimulator*, kPortCount> ServoSimulator2_{};
   std::array<OutputButton*, kPortCount> cmdDigitalOutput_{};
   std::array<bool, kPortCount> changed_{};
+  std::array<QString, kPortCount> differs_{};  // how; empty: not
 };
 
 }  // namespace tendril

@@ -11,6 +11,8 @@ namespace tendril {
 // The tool tips of the commands that the summary has too.
 inline constexpr char kSendTip[] = "Writes the configuration of all eight ports into the chosen unit.";
 inline constexpr char kGetTip[] = "Reads the configuration of all eight ports out of the chosen unit.";
+inline constexpr char kCompareTip[] =
+    "Reads the chosen unit, and signs what differs from the records here. It changes no record.";
 
 class CommandArea : public QWidget {
   Q_OBJECT
@@ -25,12 +27,14 @@ class CommandArea : public QWidget {
  Q_SIGNALS:
   void SendPressed();
   void GetPressed();
+  void ComparePressed();
   void ChangeIdPressed();
   void SummaryPressed();
 
  private:
   QPushButton* cmdSend_;
   QPushButton* cmdGet_;
+  QPushButton* cmdCompare_;
   QPushButton* cmdChangeId_;
   QPushButton* cmdShowSummary_;
 };

@@ -13,7 +13,24 @@ namespace tendril {
 namespace {
 
 constexpr char kDescription[] = "description";  // the property that keeps a control's description
+constexpr char kDifference[] = "difference";    // and that how it differs from a unit
 constexpr int kFormUnitsPerPixel = 15;
+
+// The tool tip of an enabled control.
+QString DescriptionOf(const QWidget& widget) {
+  const QString description = widget.property(kDescription).toString();
+  const QString difference = widget.property(kDifference).toString();
+  if (difference.isEmpty()) return description;
+  return description + (description.isEmpty() ? QString() : QStringLiteral("\n")) + QStringLiteral("≠ ") +
+         difference;
+}
+
+// Sets one of the two. A reason why the control is disabled stays; see EnableUnless().
+void SetDescription(QWidget& widget, const char* property, const QString& text) {
+  const bool gives_reason = widget.toolTip() != DescriptionOf(widget);
+  widget.setProperty(property, text);
+  if (!gives_reason) widget.setToolTip(DescriptionOf(widget));
+}
 
 }  // namespace
 
@@ -81,15 +98,16 @@ void PopUp::OpenBeside(const QWidget& widget, int right, int below) {
 }
 
 void Describe(QWidget* widget, QAnyStringView what_it_does) {
-  const bool gives_reason =
-      widget->toolTip() != widget->property(kDescription).toString();  // see EnableUnless()
-  widget->setProperty(kDescription, what_it_does.toString());
-  if (!gives_reason) widget->setToolTip(what_it_does.toString());
+  SetDescription(*widget, kDescription, what_it_does.toString());
+}
+
+void DescribeDifference(QWidget* widget, const QString& words) {
+  if (widget->property(kDifference).toString() != words) SetDescription(*widget, kDifference, words);
 }
 
 void EnableUnless(const QString& why_not, QWidget* widget) {
   widget->setEnabled(why_not.isEmpty());
-  widget->setToolTip(why_not.isEmpty() ? widget->property(kDescription).toString() : why_not);
+  widget->setToolTip(why_not.isEmpty() ? DescriptionOf(*widget) : why_not);
 }
 
 void CheckOnly(QButtonGroup& group, int id) {

@@ -97,6 +97,9 @@ Layout* AddLayout(QWidget* parent, const QMargins& margins, int spacing = -1) {
 // reason stays.
 void Describe(QWidget* widget, QAnyStringView what_it_does);
 
+// Adds "≠ here 1100, unit 1000" below what Describe() says; `words` are without the sign. Empty: takes that away.
+void DescribeDifference(QWidget* widget, const QString& words);
+
 // Enables the control when `why_not` is empty. Otherwise disables it, and its tool tip gives the reason in the place
 // of the description.
 void EnableUnless(const QString& why_not, QWidget* widget);

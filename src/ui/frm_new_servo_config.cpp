@@ -44,6 +44,7 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
                  .polled = [this](std::uint8_t unit, bool replied) { facts_.NotePoll(unit, replied); },
                  .replaced = [this](std::uint8_t unit) { OnRead(unit); },
                  .sent = [this](std::uint8_t unit) { OnSent(unit); },
+                 .compared = [this](std::uint8_t unit, const OptionTable& held) { OnCompared(unit, held); },
                  .searched =
                      [this] {
                        if (found_units_ != nullptr) found_units_->ShowSearch();
@@ -101,6 +102,7 @@ void frmNewServoConfig::LayOut() {
   simulator_column->addWidget(editor, 3);
   simulator_column->addWidget(live_test_area_);
   setMenuBar(menu_ = new MainMenu(*this));
+  compared_.SetMenu(*menu_);
 }
 
 void frmNewServoConfig::ConnectAreas() {
@@ -109,6 +111,7 @@ void frmNewServoConfig::ConnectAreas() {
   connect(connection_, &ConnectionArea::FindPressed, c, [this] { FindUnits(); });
   connect(command_area_, &CommandArea::SendPressed, c, [this] { commands_.send.Start(); });
   connect(command_area_, &CommandArea::GetPressed, c, [this] { commands_.get.Start(); });
+  connect(command_area_, &CommandArea::ComparePressed, c, [this] { commands_.compare.Start(); });
   connect(command_area_, &CommandArea::ChangeIdPressed, c, [this] { commands_.change_id.Start(); });
   connect(command_area_, &CommandArea::SummaryPressed, c, [this] { ShowSummary(); });
   connect(apply_boxes_, &ApplyBoxes::Applied, c, [this] { OnApplied(); });
@@ -145,6 +148,8 @@ void frmNewServoConfig::ConnectAreas() {
                                            : QStringLiteral("Servo test stopped"));
   });
   connect(status_, &StatusLine::UndoPressed, c, [this] { Undo(); });
+  connect(&status_->Compared(), &ComparisonLine::ComparePressed, c, [this] { commands_.compare.Start(); });
+  connect(&status_->Compared(), &ComparisonLine::DismissPressed, c, [this] { compared_.Dismiss(); });
   connect(&status_->Moving(), &MovingLine::StopPressed, c, [this] {
     if (!live_test_.EndSweep()) live_test_area_->ClearSliderSends();
   });
@@ -187,6 +192,7 @@ void frmNewServoConfig::ConnectMenu() {
   connect(menu_, &MainMenu::UndoChosen, c, [this] { Undo(); });
   connect(menu_, &MainMenu::RedoChosen, c, [this] { Redo(); });
   connect(menu_, &MainMenu::RestoreChosen, c, [this] { RestoreReading(); });
+  connect(menu_, &MainMenu::DismissChosen, c, [this] { compared_.Dismiss(); });
   connect(menu_, &MainMenu::SimulatorChosen, c, [this] { ShowConfig(); });
   connect(menu_, &MainMenu::KeysChosen, c, [this] { ShowKeys(*this, *menu_); });
   connect(menu_, &MainMenu::ManualChosen, c, [this] {
@@ -203,6 +209,7 @@ void frmNewServoConfig::ShowPort() {
   status_->ShowBorrowed(QString::fromStdString(BorrowedPortSentence(facts)));
   facts_.Show();
   ShowUndo();  // each port has a way back of its own
+  compared_.Show();
 }
 
 void frmNewServoConfig::StartUp() {
@@ -238,6 +245,8 @@ void frmNewServoConfig::EnableControls() {
     found_units_->EnableControls(running_command, finding, running.Cancelled(), live_test_area_->Moves());
   ShowUndo();
   menu_->EnableStop(live_test_area_->Sweeps());
+  status_->Compared().EnableOffer(running_command);
+  compared_.Show();  // another unit may be chosen
   facts_.Show();
 }
 
@@ -268,11 +277,13 @@ LinePane& frmNewServoConfig::Line() {
 
 void frmNewServoConfig::MakeSummary() {
   if (summary_ != nullptr) return;
-  summary_ = new SummaryArea(timers_, config_.Records(), views_);
+  summary_ = new SummaryArea(timers_, config_.Records(), comparison_, views_);
+  compared_.SetSummary(*summary_);
   views_->addWidget(summary_);
   EnableControls();
   connect(summary_, &SummaryArea::SendPressed, &connections_, [this] { commands_.send.Start(); });
   connect(summary_, &SummaryArea::GetPressed, &connections_, [this] { commands_.get.Start(); });
+  connect(summary_, &SummaryArea::ComparePressed, &connections_, [this] { commands_.compare.Start(); });
   connect(summary_, &SummaryArea::OptionChosen, &connections_,
           [this] { NoteStep(QStringLiteral("Option")); });
   connect(summary_, &SummaryArea::SimulatorPressed, &connections_, [this] { ShowConfig(); });

@@ -21,6 +21,7 @@
 #include "ui/chosen_servo.h"
 #include "ui/command_area.h"
 #include "ui/command_focus.h"
+#include "ui/comparison_signs.h"
 #include "ui/connection_area.h"
 #include "ui/found_units.h"
 #include "ui/line_pane.h"
@@ -79,6 +80,7 @@ class frmNewServoConfig : public QMainWindow {
   void OnRead(std::uint8_t unit);
   void OnSent(std::uint8_t unit);
   void OnReport(const CommandReport& report);
+  void OnCompared(std::uint8_t unit, const OptionTable& held);
   void OnBegun();
   void RestoreReading();
   void Copy();
@@ -115,8 +117,10 @@ class frmNewServoConfig : public QMainWindow {
   EditedConfiguration config_;
   UndoHistory history_{config_};
   Readings readings_;
-  QString dropped_;       // what was typed last and could not be taken, until the next edit
-  QString outcome_note_;  // what the status bar says after the outcome of the running command
+  Comparison comparison_{config_.Records()};
+  QString dropped_;         // what was typed last and could not be taken, until the next edit
+  QString outcome_note_;    // what the status bar says after the outcome of the running command
+  QString outcome_spoken_;  // what is read out after that
   PortSelection ports_;
 
   // Owned by the window, as its child widgets.
@@ -126,8 +130,8 @@ class frmNewServoConfig : public QMainWindow {
   ApplyBoxes* apply_boxes_ = new ApplyBoxes(config_.Editor());
   ChannelStrip* channels_ = new ChannelStrip(config_.Records());
   ChosenServo* servo_ = new ChosenServo(config_.Editor(), config_.Records());
-  MotionParameters* parameters_ = new MotionParameters(config_.Editor(), config_.Records());
-  ChannelChoices* choices_ = new ChannelChoices(config_.Editor(), config_.Records());
+  MotionParameters* parameters_ = new MotionParameters(config_.Editor(), config_.Records(), comparison_);
+  ChannelChoices* choices_ = new ChannelChoices(config_.Editor(), config_.Records(), comparison_);
   LiveTestArea* live_test_area_ = new LiveTestArea(*parameters_);
   QStackedWidget* views_ = new QStackedWidget;
   StatusLine* status_ = new StatusLine;
@@ -141,6 +145,7 @@ class frmNewServoConfig : public QMainWindow {
   Simulators simulators_{*channels_, *servo_, parameters_->Scale(), config_.Editor()};
   LiveTest live_test_;
   CommandFocus command_focus_{*this};
+  ComparisonSigns compared_{comparison_, link_, *connection_, *channels_, *parameters_, *choices_, *status_};
   WindowFacts facts_{link_, *connection_, *servo_, commands_.running, *live_test_area_, *status_};
   QPointer<QWidget> focus_before_summary_;
 

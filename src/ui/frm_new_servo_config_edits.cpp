@@ -126,6 +126,7 @@ void frmNewServoConfig::OnReplaced(const QString& what) {
 
 void frmNewServoConfig::OnRead(std::uint8_t unit) {
   const std::string time = IsoTime();
+  compared_.NoteRead(unit);
   readings_.Keep(link_.CommPort(), unit, config_.Records(), time);
   config_.ReadFrom(unit, time);
   OnReplaced(QStringLiteral("Get from unit ") + QString::fromStdString(HexByte(unit)));
@@ -134,6 +135,12 @@ void frmNewServoConfig::OnRead(std::uint8_t unit) {
 void frmNewServoConfig::OnSent(std::uint8_t unit) {
   config_.SentTo(unit, TimeOfDay());
   NoteStep({});
+  compared_.NoteSent(unit);
+}
+
+void frmNewServoConfig::OnCompared(std::uint8_t unit, const OptionTable& held) {
+  compared_.NoteCompared(unit, held);
+  outcome_spoken_ = QString::fromStdString(comparison_.Sentence());
 }
 
 void frmNewServoConfig::OnReport(const CommandReport& report) {
@@ -142,14 +149,17 @@ void frmNewServoConfig::OnReport(const CommandReport& report) {
     OnBegun();
   } else {
     sentence += std::exchange(outcome_note_, {});
+    if (commands_.compare.TakeFailure()) compared_.NoteFailure();
   }
-  status_->Say(sentence);
+  status_->Say(sentence, std::exchange(outcome_spoken_, {}));
 }
 
 // Keeps what the status bar says beside the command's outcome.
 void frmNewServoConfig::OnBegun() {
   status_->OfferUndo({});  // it is off while a command runs
-  if (commands_.running.Operation() != &commands_.send) return;
+  const UnitOperation* const command = commands_.running.Operation();
+  compared_.NoteBegun(command == &commands_.send, command == &commands_.change_id);
+  if (command != &commands_.send) return;
   if (!dropped_.isEmpty())
     NoteOutcome(QStringLiteral("Sent without the %1 that was typed.").arg(std::exchange(dropped_, {})));
   const std::uint8_t unit = connection_->UnitId();
@@ -199,7 +209,10 @@ void frmNewServoConfig::PasteConfiguration() {
 void frmNewServoConfig::NoteStep(const QString& what, bool goes_on) {
   const auto changed = history_.Note(what, goes_on);
   const bool many = changed.size() > 1;
-  if (!changed.empty()) status_->OfferUndo(many ? history_.UndoText() : QString());
+  if (!changed.empty()) {
+    status_->OfferUndo(many ? history_.UndoText() : QString());
+    compared_.NoteEdit();
+  }
   if (!changed.empty() && !goes_on) {  // a held arrow says it once
     status_->ForgetChange();
     if (many) {
@@ -209,6 +222,7 @@ void frmNewServoConfig::NoteStep(const QString& what, bool goes_on) {
   }
   ShowOrigin();
   ShowUndo();
+  compared_.Show();
 }
 
 void frmNewServoConfig::ShowOrigin() {
@@ -257,6 +271,8 @@ void frmNewServoConfig::ShowRestored(const QString& said) {
   status_->OfferUndo({});
   ShowOrigin();
   ShowUndo();
+  compared_.NoteEdit();
+  compared_.Show();
   status_->SayOfChange(said);
 }
 

@@ -22,9 +22,10 @@ struct ControlItem {
 };
 constexpr std::array<ControlItem, 2> kTargetItems{
     {{"Comm &Port", "Ctrl+P", "cmbNYX"}, {"Unit &ID", "Ctrl+I", "CmbUnitID_0"}}};
-constexpr std::array<ControlItem, 2> kCommandItems{
+constexpr std::array<ControlItem, 3> kCommandItems{
     {{"&SEND(write) Configuration", "Ctrl+Return", "Command3_0"},
-     {"&GET(read) Configuration", "Ctrl+G", "Command3_1"}}};
+     {"&GET(read) Configuration", "Ctrl+G", "Command3_1"},
+     {"Comp&are", "Ctrl+M", "cmdCompare_0"}}};
 constexpr ControlItem kCancelItem{"&Cancel Command\tEsc", "", "cmdCancel"};
 constexpr ControlItem kChangeIdItem{"UPDATE Unit_ID", "", "Command3_2"};
 constexpr std::array<ControlItem, 2> kFileItems{
@@ -82,6 +83,8 @@ void MainMenu::AddUnitMenu(QWidget& window) {
   find_ = AddItem(menu, "&Find Units...", "Ctrl+F", this, &MainMenu::FindChosen);
   menu.addSeparator();
   for (const ControlItem& item : kCommandItems) AddItem(menu, window, item);
+  dismiss_ = AddItem(menu, "&Dismiss Comparison", "", this, &MainMenu::DismissChosen);
+  dismiss_->setEnabled(false);
   AddItem(menu, window, kCancelItem);
   restore_ = AddItem(menu, "", "", this, &MainMenu::RestoreChosen);
   ShowWayBack(false, {});

@@ -25,6 +25,8 @@ class MainMenu : public QMenuBar {
   void ShowUndo(bool may_undo, const QString& undo, bool may_redo, const QString& redo);
   // Names the reading that can be restored ("Unit 01 Held at 14:02"), and enables it when it may be.
   void ShowWayBack(bool enabled, const QString& what);
+  // Enables "Dismiss Comparison" while there is one.
+  void EnableDismiss(bool enabled) { dismiss_->setEnabled(enabled); }
   // Enables "Stop" while a sweep runs.
   void EnableStop(bool enabled) { stop_->setEnabled(enabled); }
   // Whether the pane of the line is shown.
@@ -46,6 +48,7 @@ class MainMenu : public QMenuBar {
   void UndoChosen();
   void RedoChosen();
   void RestoreChosen();
+  void DismissChosen();
   // End the sweep.
   void StopChosen();
   // Copy what is selected, the table of the summary, or the value that has the focus.
@@ -80,6 +83,7 @@ class MainMenu : public QMenuBar {
   QAction* redo_ = nullptr;
   QAction* restore_ = nullptr;
   QAction* paste_ = nullptr;
+  QAction* dismiss_ = nullptr;
   QAction* dark_ = nullptr;
   QAction* line_ = nullptr;
   QAction* stop_ = nullptr;

@@ -33,14 +33,19 @@ constexpr std::array<Row, kParameterCount> kRows{
       "The longest pulse that intensities can give, relative to the neutral position"},
      {6, "Default Position", "spnDefaultPos", "lblDefaultPos",
       "Where the servo rests, relative to the neutral position"}}};
+// What is compared of each parameter, in the same order.
+constexpr std::array kComparedParts{ComparedPart::kActualRange,     ComparedPart::kVirtualRange,
+                                    ComparedPart::kNeutralPosition, ComparedPart::kLeftStop,
+                                    ComparedPart::kRightStop,       ComparedPart::kDefaultPosition};
 constexpr int kHeadingRow = 3;  // of those that are measured from the neutral position
 constexpr int kGapRow = 7;
 constexpr int kScaleRow = 8;
 constexpr int kNotesRow = 9;
 constexpr int kRestRow = 10;
 constexpr int kGap = 12;  // between two columns
-constexpr int kMinGap = 4;
-constexpr int kCaptionGap = 2;
+constexpr int kMinGap = 2;
+constexpr int kGapOfPulseWidth = 4;  // which keeps room for its sign
+constexpr int kCaptionGap = 1;
 constexpr int kIconGap = 4;  // between icon and text of a button
 
 // Each test stands beside the parameter that it tries; that of the stops beside both.
@@ -130,10 +135,12 @@ QLabel* CaptionLabel(QAnyStringView text = {}) {
 
 }  // namespace
 
-MotionParameters::MotionParameters(ChannelEditor& editor, const ChannelTable& working)
+MotionParameters::MotionParameters(ChannelEditor& editor, const ChannelTable& working,
+                                   const Comparison& comparison)
     : QGroupBox(QStringLiteral("Motion Parameters")),
       editor_(editor),
       working_(working),
+      comparison_(comparison),
       lblActPulseLeft_(Named(CaptionLabel(), "lblActPulseLeft")),
       heading_(DimLabel("Relative to Neutral")),
       typed_(Named(new NoticeLabel(1), "lblTyped")),
@@ -231,10 +238,12 @@ void MotionParameters::AddTests(QGridLayout& grid) {
 
 // What is left of the width goes to the right of the test buttons. No text that changes moves anything.
 void MotionParameters::AddSpacing(QGridLayout& grid) {
-  for (const int gap : {kGap1, kGap2, kGap3, kGap4}) {
+  grid.addItem(new QSpacerItem(kGapOfPulseWidth, 0, QSizePolicy::Preferred), 0, kGap3);
+  for (const int gap : {kGap1, kGap2, kGap4}) {
     grid.addItem(new QSpacerItem(kGap, 0, QSizePolicy::Preferred), 0, gap);
     grid.setColumnMinimumWidth(gap, kMinGap);
   }
+  grid.setColumnMinimumWidth(kGap2, kMinGap + 1);
   const QFontMetrics metrics = fontMetrics();
   grid.setColumnMinimumWidth(kLeftValue, metrics.horizontalAdvance(QStringLiteral("[ +/-")) + kCaptionGap);
   grid.setColumnMinimumWidth(kRightValue, metrics.horizontalAdvance(QStringLiteral("-0000]")) + 1);
@@ -307,16 +316,34 @@ void MotionParameters::ShowValues() {
     spins_[i]->Show(value);
     captions_[i]->setText(CaptionOf(parameter, value.Value()));
     ShowPhysicalValue(parameter, values, *pulse_widths_[i]);
-    const QString unless_stored = unstored.Has(parameter) ? QStringLiteral(", not stored yet") : QString();
-    pulse_widths_[i]->ShowStored(unless_stored.isEmpty());
-    pulse_widths_[i]->setAccessibleName(names_[i]->text() + QStringLiteral(": ") +
-                                        pulse_widths_[i]->InFull() + unless_stored);
-    Describe(spins_[i], QStringLiteral("%1. From %2 to %3 µs; now %4.")
-                            .arg(QString::fromUtf8(kRows[i].what))
-                            .arg(value.Minimum())
-                            .arg(value.Maximum())
-                            .arg(pulse_widths_[i]->InFull() + unless_stored));
+    DescribeValue(i, unstored);
   }
+}
+
+void MotionParameters::ShowDifferences() {
+  const Unstored unstored(editor_, working_);
+  for (std::size_t i = 0; i < kRows.size(); ++i) DescribeValue(i, unstored);
+}
+
+void MotionParameters::DescribeValue(std::size_t index, const Unstored& unstored) {
+  const auto parameter = static_cast<Parameter>(index);
+  PulseWidthLabel& pulse_width = *pulse_widths_[index];
+  const QString unless_stored = unstored.Has(parameter) ? QStringLiteral(", not stored yet") : QString();
+  const auto channel = editor_.Channel();
+  const QString differs =
+      channel ? QString::fromStdString(comparison_.InWords(*channel, kComparedParts[index])) : QString();
+  const QString spoken = pulse_width.InFull() + unless_stored;
+  pulse_width.ShowStored(unless_stored.isEmpty());
+  pulse_width.ShowDiffers(differs);
+  pulse_width.setAccessibleName(names_[index]->text() + QStringLiteral(": ") + spoken +
+                                (differs.isEmpty() ? QString() : QStringLiteral(", ") + differs));
+  const BoundedValue& value = editor_.Spin(parameter);
+  Describe(spins_[index], QStringLiteral("%1. From %2 to %3 µs; now %4.")
+                              .arg(QString::fromUtf8(kRows[index].what))
+                              .arg(value.Minimum())
+                              .arg(value.Maximum())
+                              .arg(spoken));
+  DescribeDifference(spins_[index], differs);
 }
 
 }  // namespace tendril

@@ -14,6 +14,7 @@
 #include "ui/controls.h"
 #include "ui/editor_notes.h"
 #include "ui/model/channel_editor.h"
+#include "ui/model/comparison.h"
 #include "ui/notice_label.h"
 #include "ui/pulse_scale.h"
 #include "ui/pulse_width_label.h"
@@ -26,11 +27,13 @@ class MotionParameters : public QGroupBox {
   Q_OBJECT
 
  public:
-  // `working` are the records that `editor` edits. Both must outlive the area.
-  MotionParameters(ChannelEditor& editor, const ChannelTable& working);
+  // `working` are the records that `editor` edits, and `comparison` compares. All must outlive the area.
+  MotionParameters(ChannelEditor& editor, const ChannelTable& working, const Comparison& comparison);
 
   // Shows values, limits and captions, and whether there is a channel to edit. Emits no signal.
   void ShowValues();
+  // Signs what differs from the unit that is compared. ShowValues() does it, too.
+  void ShowDifferences();
   // Shows remarks on the records.
   void ShowRemarks(const std::vector<std::string>& sentences) { notes_->ShowRemarks(sentences); }
   // Captions test button `button`, 0 to 4: "Stop" while its sweep runs, else "Test".
@@ -66,10 +69,12 @@ class MotionParameters : public QGroupBox {
   void AddSpacing(QGridLayout& grid);
   void MakePressable(QLabel* label);
   void ShowHasChannel();
+  void DescribeValue(std::size_t index, const Unstored& unstored);
   void OnStore();
 
   ChannelEditor& editor_;
   const ChannelTable& working_;
+  const Comparison& comparison_;
   std::array<CalmSpinBox*, kParameterCount> spins_{};
   std::array<QLabel*, kParameterCount> names_{};
   std::array<QLabel*, kParameterCount> captions_{};

@@ -3,6 +3,7 @@
 #include <QAccessible>
 #include <QPainter>
 
+#include "simulator/marks.h"
 #include "simulator/servo_simulator.h"
 
 namespace tendril {
@@ -33,6 +34,12 @@ void OutputButton::Mark(bool marked) {
   update();
 }
 
+void OutputButton::MarkDiffers(bool differs) {
+  if (differs == differs_) return;
+  differs_ = differs;
+  update();
+}
+
 void OutputButton::paintEvent(QPaintEvent* event) {
   if (!selected_) QPushButton::paintEvent(event);
   QPainter painter(this);
@@ -43,6 +50,7 @@ void OutputButton::paintEvent(QPaintEvent* event) {
     painter.drawText(rect(), Qt::AlignCenter, text());
   }
   if (marked_) PaintMark(painter, rect(), colour);
+  if (differs_) PaintDiffersMark(painter, QRectF(0, 0, height(), height()), colour);  // beside the caption
   QFont regular = font();
   regular.setBold(false);
   painter.setFont(regular);

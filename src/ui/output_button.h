@@ -17,8 +17,9 @@ class OutputButton : public QPushButton {
   bool Selected() const { return selected_; }
   // Assistive technology is notified of a change.
   void Select(bool selected);
-  // See ServoSimulator::Mark().
+  // See ServoSimulator.
   void Mark(bool marked);
+  void MarkDiffers(bool differs);
 
  protected:
   void paintEvent(QPaintEvent* event) override;
@@ -27,6 +28,7 @@ class OutputButton : public QPushButton {
   const QString caption_;
   bool selected_ = false;
   bool marked_ = false;
+  bool differs_ = false;
 };
 
 }  // namespace tendril

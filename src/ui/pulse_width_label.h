@@ -8,8 +8,8 @@
 
 namespace tendril {
 
-// Shows "600 to 2400 µs" or "1600 µs" in bold; where that is too wide, "600–2400". Its size does not depend on what it
-// shows.
+// Shows "600 to 2400 µs" or "1600 µs" in bold; where that is too wide, "600–2400". The sign of what differs has a place
+// before it. Its size does not depend on what it shows.
 class PulseWidthLabel : public QLabel {
  public:
   PulseWidthLabel();
@@ -20,6 +20,9 @@ class PulseWidthLabel : public QLabel {
 
   // Hatches it from below unless the record holds it.
   void ShowStored(bool stored);
+
+  // Signs it as different from what a unit holds, as `words` say; empty: it is not.
+  void ShowDiffers(const QString& words);
 
   // What it shows, in full.
   const QString& InFull() const { return full_; }
@@ -38,6 +41,7 @@ class PulseWidthLabel : public QLabel {
   QString full_;
   QString brief_;
   bool stored_ = true;
+  bool differs_ = false;
 };
 
 }  // namespace tendril

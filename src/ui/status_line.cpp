@@ -59,6 +59,7 @@ StatusLine::StatusLine()
   column->addLayout(facts_);
   auto* sentence = new QHBoxLayout;
   sentence->addWidget(lblStatus_, 1);
+  sentence->addWidget(compared_);
   sentence->addWidget(cmdUndo_);
   sentence->addItem(new QSpacerItem(0, cmdUndo_->height()));
   column->addLayout(sentence);
@@ -92,12 +93,12 @@ void StatusLine::ArrangeFacts() {
   facts_->setSpacing(direction == QBoxLayout::TopToBottom ? 1 : kApart);
 }
 
-void StatusLine::Say(const QString& sentence) {
+void StatusLine::Say(const QString& sentence, const QString& spoken) {
   const QString both = earlier_.isEmpty() ? sentence : sentence + QStringLiteral(". ") + earlier_;
   earlier_.clear();
   lblStatus_->setText(both);
   lblStatus_->setToolTip(both);
-  lblStatus_->Announce(both);
+  lblStatus_->Announce(spoken.isEmpty() ? both : both + QLatin1Char(' ') + spoken);
 }
 
 void StatusLine::SayTwice(const QString& sentence) {

@@ -7,6 +7,7 @@
 #include <QString>
 
 #include "ui/announcement.h"
+#include "ui/comparison_line.h"
 #include "ui/elided_label.h"
 #include "ui/moving_line.h"
 
@@ -20,8 +21,8 @@ class StatusLine : public QStatusBar {
  public:
   StatusLine();
 
-  // Shows `sentence`, and has it read out.
-  void Say(const QString& sentence);
+  // Shows `sentence`, and has it read out with `spoken`, which something else shows.
+  void Say(const QString& sentence, const QString& spoken = {});
   // The same, and shows `sentence` beside the next one, too: what the user just did may say something itself.
   void SayTwice(const QString& sentence);
   // What SayTwice() said is no longer so: takes it away, and shows it beside no other sentence.
@@ -40,6 +41,8 @@ class StatusLine : public QStatusBar {
   void EnableUndo(bool enabled);
   // The line that shows what moves.
   MovingLine& Moving() { return *moving_; }
+  // What is shown of a comparison, beside the sentence.
+  ComparisonLine& Compared() { return *compared_; }
   // Puts the sentence and the facts on the clipboard, each in a line of its own.
   void Copy() const;
 
@@ -66,6 +69,7 @@ class StatusLine : public QStatusBar {
   QString said_twice_;
   QString of_change_;
   QString earlier_;  // shown beside the next sentence
+  ComparisonLine* compared_ = new ComparisonLine;
   QPushButton* cmdUndo_;
 };
 

@@ -4,6 +4,7 @@
 #include <QPainter>
 #include <QRadioButton>
 #include <QVBoxLayout>
+#include <utility>
 
 #include "ui/command_area.h"
 
@@ -33,14 +34,19 @@ struct Value {
   const char* caption;
   const char* name;
   SummaryField field;
+  ComparedPart part;
   const char* first_text;
 };
 constexpr std::array<Value, 5> kValues{
-    {{"Actual\nRange", "txtSumActualRange", SummaryField::kActualRange, "1000--2000"},
-     {"Virtual\nRange", "txtSumVirtualRange", SummaryField::kVirtualRange, "1000--2000"},
-     {"Virtual\nStops", "txtSumStopRange", SummaryField::kStops, "1000--2000"},
-     {"Neutral\nPosition", "txtSumNeutralPosition", SummaryField::kNeutralTrim, ""},
-     {"Default\nPosition", "txtSumDefaultPosition", SummaryField::kDefaultPosition, ""}}};
+    {{"Actual\nRange", "txtSumActualRange", SummaryField::kActualRange, ComparedPart::kActualRange,
+      "1000--2000"},
+     {"Virtual\nRange", "txtSumVirtualRange", SummaryField::kVirtualRange, ComparedPart::kVirtualRange,
+      "1000--2000"},
+     {"Virtual\nStops", "txtSumStopRange", SummaryField::kStops, ComparedPart::kStops, "1000--2000"},
+     {"Neutral\nPosition", "txtSumNeutralPosition", SummaryField::kNeutralTrim,
+      ComparedPart::kNeutralPosition, ""},
+     {"Default\nPosition", "txtSumDefaultPosition", SummaryField::kDefaultPosition,
+      ComparedPart::kDefaultPosition, ""}}};
 constexpr std::size_t kPairs = 3;  // the first of them have a low and a high end
 struct Option {
   const char* caption;
@@ -70,16 +76,6 @@ void SetUpColumns(QGridLayout& table) {
     table.setColumnStretch(column, 1);
   }
 }
-
-// A thin outline. Keeps away from the edge, which is cut off where a pixel is not a whole number of device pixels.
-class Outline : public QFrame {
- protected:
-  void paintEvent(QPaintEvent* /*event*/) override {
-    QPainter painter(this);
-    painter.setPen(QPen(palette().color(QPalette::Mid), 0));
-    painter.drawRect(rect().adjusted(1, 1, -2, -2));
-  }
-};
 
 // Adds the frame of one or more lines, behind their controls.
 void AddFrame(QGridLayout& table, QFrame* frame, int line, int lines) {
@@ -120,8 +116,9 @@ std::array<QLabel*, kOptions.size()> AddOptionCaptions(QGridLayout& table, int l
 
 }  // namespace
 
-SummaryArea::SummaryArea(TimerFactory& timers, ChannelTable& working, QWidget* parent)
-    : QWidget(parent), working_(working), editor_(working) {
+SummaryArea::SummaryArea(TimerFactory& timers, ChannelTable& working, const Comparison& comparison,
+                         QWidget* parent)
+    : QWidget(parent), working_(working), comparison_(comparison), editor_(working) {
   auto* column = AddLayout<QVBoxLayout>(this, {});
   auto* table_area = new QWidget;
   table_area->setMaximumHeight(kTallestTable);
@@ -144,16 +141,19 @@ SummaryArea::SummaryArea(TimerFactory& timers, ChannelTable& working, QWidget* p
 QLayout* SummaryArea::MakeButtons() {
   cmdSend_ = Named(new QPushButton(QStringLiteral("Send to Tendril")), "Command3_3");
   cmdGet_ = Named(new QPushButton(QStringLiteral("Get from Tendril")), "Command3_4");
+  cmdCompare_ = Named(new QPushButton(QStringLiteral("Compare with Tendril")), "cmdCompare", 1);
   auto* simulator = Named(new QPushButton(QStringLiteral("Si&mulator")), "cmdShowConfig");
   Describe(cmdSend_, QString::fromUtf8(kSendTip) + QStringLiteral(" (Ctrl+Return)"));
   Describe(cmdGet_, QString::fromUtf8(kGetTip) + QStringLiteral(" (Ctrl+G)"));
+  Describe(cmdCompare_, QString::fromUtf8(kCompareTip) + QStringLiteral(" (Ctrl+M)"));
   Describe(simulator, "Shows the servos and the editor again. (F6)");
   connect(cmdSend_, &QAbstractButton::clicked, this, &SummaryArea::SendPressed);
   connect(cmdGet_, &QAbstractButton::clicked, this, &SummaryArea::GetPressed);
+  connect(cmdCompare_, &QAbstractButton::clicked, this, &SummaryArea::ComparePressed);
   connect(simulator, &QAbstractButton::clicked, this, &SummaryArea::SimulatorPressed);
   auto* row = new QHBoxLayout;
   row->addStretch();
-  for (QPushButton* button : {cmdSend_, cmdGet_, simulator}) row->addWidget(button);
+  for (QPushButton* button : {cmdSend_, cmdGet_, cmdCompare_, simulator}) row->addWidget(button);
   return row;
 }
 
@@ -171,12 +171,12 @@ void SummaryArea::AddHeader(QGridLayout& table) {
 void SummaryArea::AddRow(QGridLayout& table, std::size_t channel) {
   Row& row = rows_[channel];
   const int line = kHeaderLines + static_cast<int>(channel);
-  auto* frame = Named(new Outline, "frmSumTable", channel);
-  frame->setSizePolicy(QSizePolicy::Preferred, QSizePolicy::Expanding);
-  AddFrame(table, frame, line, 1);
+  row.frame = Named(new SummaryRowFrame, "frmSumTable", channel);
+  row.frame->setSizePolicy(QSizePolicy::Preferred, QSizePolicy::Expanding);
+  AddFrame(table, row.frame, line, 1);
   const QString name = QStringLiteral("Channel %1").arg(channel + 1);
-  table.addWidget(Named(BoldLabel(QStringLiteral("CHAN %1").arg(channel + 1)), "lblSumChannel", channel),
-                  line, kChannelColumn);
+  row.lblSumChannel = Named(BoldLabel(QStringLiteral("CHAN %1").arg(channel + 1)), "lblSumChannel", channel);
+  table.addWidget(row.lblSumChannel, line, kChannelColumn);
   for (std::size_t value = 0; value < kValues.size(); ++value) {
     const QString caption = OnOneLine(kValues[value].caption);
     auto* text = row.texts[value] = Named(new PressableText, kValues[value].name, channel);
@@ -232,6 +232,7 @@ void SummaryArea::AddOptions(QGridLayout& table, std::size_t channel, const QStr
 void SummaryArea::EnableControls(const QString& running_command) {
   EnableUnless(running_command, cmdSend_);
   EnableUnless(running_command, cmdGet_);
+  EnableUnless(running_command, cmdCompare_);
   for (const Row& row : rows_) {
     for (PressableText* text : row.texts) EnableUnless(running_command, text);
     for (const QButtonGroup* group : {row.power_up, row.lost_comm}) {
@@ -275,6 +276,40 @@ void SummaryArea::ShowTexts(std::size_t channel) {
                                           QString::number(record.DefaultPosition)};
   for (std::size_t value = 0; value < texts.size(); ++value)
     rows_[channel].texts[value]->setText(texts[value]);
+  ShowDifferences(channel);
+}
+
+void SummaryArea::ShowDifferences() {
+  for (std::size_t channel = 0; channel < kPortCount; ++channel) ShowDifferences(channel);
+}
+
+// A row without values and options is signed as a whole, whatever differs.
+void SummaryArea::ShowDifferences(std::size_t channel) {
+  const Row& row = rows_[channel];
+  const bool servo = working_.At(channel).PortType == kPortServo;
+  std::vector<const QWidget*> signed_controls;
+  const auto words = [&](ComparedPart part) {
+    return QString::fromStdString(comparison_.InWords(channel, part));
+  };
+  const auto sign = [&](const QWidget* control, const QString& differs) {
+    if (servo && !differs.isEmpty()) signed_controls.push_back(control);
+  };
+  for (std::size_t value = 0; value < kValues.size(); ++value) {
+    const QString differs = words(kValues[value].part);
+    DescribeDifference(row.texts[value], differs);
+    sign(row.texts[value], differs);
+  }
+  for (const auto& [group, part] :
+       {std::pair(row.power_up, ComparedPart::kPowerUp), {row.lost_comm, ComparedPart::kLostComm}}) {
+    const QString differs = words(part);
+    const auto options = group->buttons();
+    for (QAbstractButton* option : options) DescribeDifference(option, differs);
+    sign(group->checkedButton() != nullptr ? group->checkedButton() : options.constFirst(), differs);
+  }
+  const QString row_differs =
+      servo ? words(ComparedPart::kOutput) : QString::fromStdString(comparison_.InWords(channel));
+  row.frame->ShowDiffers(!row_differs.isEmpty(), signed_controls);
+  for (QLabel* label : {row.lblSumChannel, row.lblSumDIOPWM}) DescribeDifference(label, row_differs);
 }
 
 QString SummaryArea::TableText() const {

@@ -14,9 +14,11 @@
 
 #include "config/channel_config.h"
 #include "platform/timer.h"
+#include "ui/model/comparison.h"
 #include "ui/model/summary_editor.h"
 #include "ui/number_entry.h"
 #include "ui/remarks_label.h"
+#include "ui/summary_row_frame.h"
 
 namespace tendril {
 
@@ -26,14 +28,16 @@ class SummaryArea : public QWidget {
   Q_OBJECT
 
  public:
-  // `working` are the records that are shown; they must outlive the area. `parent` is in the window already, which owns
+  // `working` are the records that are shown, and `comparison` compares. Both must outlive the area. `parent` is in the window already, which owns
   // the number entry.
-  SummaryArea(TimerFactory& timers, ChannelTable& working, QWidget* parent);
+  SummaryArea(TimerFactory& timers, ChannelTable& working, const Comparison& comparison, QWidget* parent);
 
   // Shows all records as they are.
   void ShowRecords();
   // Brings all records into their bounds, and shows them.
   void NormaliseAndShowRecords();
+  // Signs what differs from the unit that is compared. What shows records does it, too.
+  void ShowDifferences();
   // Shows remarks on the records.
   void ShowRemarks(const std::vector<std::string>& sentences) { remarks_->ShowRemarks(sentences); }
   // Enables the unit commands, and what changes records. `running_command` is what runs; empty when nothing does.
@@ -50,6 +54,7 @@ class SummaryArea : public QWidget {
  Q_SIGNALS:
   void SendPressed();
   void GetPressed();
+  void ComparePressed();
   void SimulatorPressed();
   // The number entry has changed this channel's record.
   void Edited(std::size_t channel);
@@ -62,6 +67,8 @@ class SummaryArea : public QWidget {
   static constexpr std::size_t kTexts = 5;
 
   struct Row {
+    SummaryRowFrame* frame = nullptr;
+    QLabel* lblSumChannel = nullptr;
     std::array<PressableText*, kTexts> texts{};
     QButtonGroup* power_up = nullptr;  // the buttons' ids are the record's values
     QButtonGroup* lost_comm = nullptr;
@@ -75,13 +82,16 @@ class SummaryArea : public QWidget {
   void AddTrailer(QGridLayout& table);
   void ShowRow(std::size_t channel);
   void ShowTexts(std::size_t channel);
+  void ShowDifferences(std::size_t channel);
 
   ChannelTable& working_;
+  const Comparison& comparison_;
   SummaryEditor editor_;
   NumberEntry* entry_ = nullptr;
   std::array<Row, kPortCount> rows_;
   QPushButton* cmdSend_ = nullptr;
   QPushButton* cmdGet_ = nullptr;
+  QPushButton* cmdCompare_ = nullptr;
   RemarksLabel* remarks_ = nullptr;
 };
 

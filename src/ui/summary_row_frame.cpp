@@ -1,0 +1,52 @@
+#include "ui/summary_row_frame.h"
+
+#include <QAbstractButton>
+#include <QPainter>
+
+#include "simulator/marks.h"
+
+namespace tendril {
+namespace {
+
+constexpr QSizeF kBadge(13, 9);
+constexpr double kBadgeSign = 7;
+constexpr double kOptionSign = 10;
+constexpr double kOptionGap = 3;
+
+void PaintBadge(QPainter& painter, const QPointF& corner, const QPalette& palette) {
+  const QRectF badge(corner, kBadge);
+  painter.fillRect(badge, palette.color(QPalette::WindowText));
+  QRectF sign(0, 0, kBadgeSign, kBadgeSign);
+  sign.moveCenter(badge.center());
+  PaintDiffers(painter, sign, palette.color(QPalette::Window));
+}
+
+}  // namespace
+
+void SummaryRowFrame::ShowDiffers(bool row, const std::vector<const QWidget*>& controls) {
+  if (row == row_differs_ && controls == controls_) return;
+  row_differs_ = row;
+  controls_ = controls;
+  update();
+}
+
+// The outline keeps away from the edge, which is cut off where a pixel is not a whole number of device pixels.
+void SummaryRowFrame::paintEvent(QPaintEvent* /*event*/) {
+  QPainter painter(this);
+  painter.setPen(QPen(palette().color(QPalette::Mid), 0));
+  painter.drawRect(rect().adjusted(1, 1, -2, -2));
+  if (row_differs_) PaintBadge(painter, {1, 1}, palette());
+  for (const QWidget* control : controls_) {
+    const QRectF place = control->geometry().translated(-pos());
+    if (qobject_cast<const QAbstractButton*>(control) != nullptr) {
+      PaintDiffers(
+          painter,
+          QRectF(place.right() + kOptionGap, place.center().y() - kOptionSign / 2, kOptionSign, kOptionSign),
+          palette().color(QPalette::WindowText));
+    } else {
+      PaintBadge(painter, {place.left() + 1, place.top() - kBadge.height() + 2}, palette());
+    }
+  }
+}
+
+}  // namespace tendril
