@@ -1,0 +1,126 @@
+// The comparison with a unit in the real window.
+#include <functional>
+
+#include "window_fixture.h"
+
+namespace tendril::test {
+namespace {
+
+using testing::EndsWith;
+using testing::HasSubstr;
+using testing::Not;
+
+class Compared : public Window {
+ protected:
+  Compared() { Activate(); }
+
+  void Run(const char* button) {
+    Find<QLabel>("lblProgress").clear();
+    Press(button);
+    RunToTheEnd();
+  }
+  std::string Said(const char* control) {
+    return Accessible(control).text(QAccessible::Description).toStdString();
+  }
+
+  VirtualUnit& unit_ = ConnectUnit();
+};
+
+TEST_F(Compared, EveryPlaceSignsWhatDiffers) {
+  unit_.SetPortOptions(3, {1, 60, 240, 100, 200, 100, 200, 150, 151});
+  unit_.SetPortOptions(5, {1 | kFlagLostComm, 60, 240, 100, 200, 100, 200, 150, 150});
+  unit_.SetPortOptions(6, {2, 60, 240, 100, 190, 100, 200, 150, 150});
+  const ChannelTable before = window_->WorkingConfiguration();
+  Click("ServoSimulator2_4");
+  const QPoint test = PlaceOf("cmdTest_0");
+  Run("cmdCompare_0");
+  QTest::qWait(0);
+  EXPECT_TRUE(window_->WorkingConfiguration() == before);
+  EXPECT_EQ(PlaceOf("cmdTest_0"), test) << "the window jumps";
+  EXPECT_EQ(Text("lblCompared"), "Unit 01 differs: 4 values of 3 channels");
+  EXPECT_THAT(
+      Accessible("lblStatus").text(QAccessible::Name).toStdString(),
+      EndsWith("SUCCESS: Compare Complete. No record has changed. Unit 01 differs: 4 values of 3 channels"));
+  const char* lost_comm = "\n≠ here Stop Pulse / Start on First Command, unit Hold at Current Position";
+  EXPECT_THAT(Said("optLostComm_2"), EndsWith(lost_comm));
+  EXPECT_THAT(Said("spnNeutralTrim"), Not(HasSubstr("≠")));
+  EXPECT_EQ(Accessible("ServoSimulator2_5").text(QAccessible::Description).toStdString(),
+            "Differs from unit 01: 2 values");
+  const QImage signed_picture = Find("ServoSimulator2_2").grab().toImage();
+  Click("ServoSimulator2_2");
+  EXPECT_THAT(Said("spnNeutralTrim"), EndsWith("now 1500 µs.\n≠ here 1500, unit 1510"));
+
+  Press("cmdShowSummary");
+  world_.time.Advance(20);
+  const QImage row = Find("frmSumTable_2").grab().toImage();
+  EXPECT_THAT(Said("txtSumNeutralPosition_2"), EndsWith("\n≠ here 1500, unit 1510"));
+  EXPECT_THAT(Said("optSumLCfirstcmd_4"), EndsWith(lost_comm));
+  EXPECT_EQ(Said("lblSumChannel_5"), "≠ here Servo, unit Digital");
+  Click("txtSumNeutralPosition_2");
+  QTest::keyClick(&Spin("spnSumValue_0"), Qt::Key_Up);  // takes the virtual range and the stops with it
+  EXPECT_EQ(Text("lblCompared"), "Unit 01 differs: 6 values of 3 channels");
+  EXPECT_THAT(Said("txtSumNeutralPosition_2"), Not(HasSubstr("≠")));
+  QTest::keyClick(window_.get(), Qt::Key_Z, Qt::ControlModifier);
+  EXPECT_EQ(Text("lblCompared"), "Unit 01 differs: 4 values of 3 channels");
+  EXPECT_EQ(Find("frmSumTable_2").grab().toImage(), row);
+
+  Press("cmdDismiss");
+  EXPECT_FALSE(Visible("cmdDismiss") || Visible("lblCompared"));
+  EXPECT_NE(Find("frmSumTable_2").grab().toImage(), row);
+  Press("cmdShowConfig");
+  Click("ServoSimulator2_0");
+  EXPECT_NE(Find("ServoSimulator2_2").grab().toImage(), signed_picture);
+  for (const char* control : {"optSumLCfirstcmd_4", "lblSumChannel_5", "spnNeutralTrim", "ServoSimulator2_5"})
+    EXPECT_THAT(ToolTip(control), Not(HasSubstr("≠"))) << control;
+}
+
+TEST_F(Compared, AfterASendItIsOfferedAndEqual) {
+  Click("ServoSimulator2_2");
+  TypeOver("spnActPulseRange", "905");
+  Key(Qt::Key_Return);
+  ASSERT_EQ(Record(2).ActualRange, (PulsePair{595, 2405}));
+  Run("Command3_0");
+  Run("cmdCompareSent");
+  EXPECT_EQ(Text("lblCompared"), "Unit 01 holds exactly this");
+  Run("Command3_0");
+  EXPECT_FALSE(Visible("lblCompared")) << "it was sent to since";
+  struct Case {
+    const char* what;
+    std::function<void()> act;
+  };
+  for (const auto& [what, act] : std::initializer_list<Case>{
+           {"an edit", [&] { QTest::keyClick(&Spin("spnDefaultPos"), Qt::Key_Up); }},
+           {"undo", [&] { QTest::keyClick(window_.get(), Qt::Key_Z, Qt::ControlModifier); }},
+           {"another unit", [&] { ChooseByKeys("CmbUnitID_1", 2); }},
+           {"a command", [&] { Run("Command3_1"); }}}) {
+    ChooseByKeys("CmbUnitID_1", 1);
+    Run("Command3_0");
+    EXPECT_EQ(Text("cmdCompareSent"), "Sent to 01: compare?");
+    EXPECT_TRUE(Visible("cmdCompareSent")) << what;
+    act();
+    EXPECT_FALSE(Visible("cmdCompareSent")) << what;
+  }
+}
+
+TEST_F(Compared, StaysAboutItsUnitUntilThatIsReadAnew) {
+  world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x02});
+  Run("cmdCompare_0");
+  ChooseByKeys("CmbUnitID_1", 2);
+  Run("Command3_1");
+  EXPECT_EQ(Text("lblCompared"), "Unit 01, not the chosen one, holds exactly this");
+  ChooseByKeys("CmbUnitID_1", 3);
+  Run("cmdCompare_0");  // no device
+  EXPECT_EQ(world_.boxes.Take().at(0).title, "Compare");
+  EXPECT_EQ(Text("lblCompared"), "Unit 01, not the chosen one, holds exactly this");
+  ChooseByKeys("CmbUnitID_1", 1);
+  world_.bench.Detach(1, unit_);
+  Run("cmdCompare_0");
+  EXPECT_THAT(Text("lblCompared"),
+              testing::MatchesRegex("Unit 01 held exactly this at .*; reading it again failed"));
+  ConnectUnit();
+  Run("Command3_1");
+  EXPECT_FALSE(Visible("lblCompared"));
+}
+
+}  // namespace
+}  // namespace tendril::test
