@@ -29,7 +29,7 @@ double WireMs(std::size_t bytes) { return static_cast<double>(bytes) * kWireMsPe
 bool MeasureSend(MeasuredWindow& window) {
   constexpr int kRuns = 5;
   constexpr double kStepsMs = 8 * 300.0;
-  constexpr double kMaxRatio = 1.05;
+  constexpr double kMaxRatio = 1.02;
 
   std::vector<double> measured_ms, floor_ms, ratio;
   for (int run = 0; run < kRuns; ++run) {
@@ -151,6 +151,9 @@ bool MeasureAll() {
   bool within_bounds = true;
   for (const auto measure : {MeasureSend, MeasureGet, MeasureFind, MeasureSweep})
     within_bounds &= measure(window);
+  window.ShowFullLine();
+  std::puts("with the line shown, and its trace full:");
+  for (const auto measure : {MeasureSend, MeasureGet, MeasureSweep}) within_bounds &= measure(window);
   return within_bounds;
 }
 

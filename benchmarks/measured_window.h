@@ -2,18 +2,21 @@
 #pragma once
 
 #include <QAbstractButton>
+#include <QAction>
 #include <QApplication>
 #include <QComboBox>
 #include <QEventLoop>
 #include <QLabel>
 #include <QString>
 #include <QTimer>
+#include <cstddef>
 #include <memory>
 #include <stdexcept>
 #include <string>
 
 #include "app/qt_platform.h"
 #include "measuring.h"
+#include "platform/bytes.h"
 #include "platform/paths.h"
 #include "platform/qt/qt_serial_device.h"
 #include "platform/qt/qt_tcp_socket.h"
@@ -25,6 +28,7 @@
 #include "support/bench_process.h"
 #include "support/counting_device.h"
 #include "support/find_control.h"
+#include "trace/line_trace.h"
 #include "ui/frm_new_servo_config.h"
 #include "unitops/control_panel.h"
 
@@ -66,6 +70,18 @@ class MeasuredWindow {
       throw std::runtime_error("The command failed: " + outcome.text().toStdString());
     }
     return taken_ms;
+  }
+
+  // Shows the pane of the line, with a full trace.
+  void ShowFullLine() {
+    constexpr std::size_t kPacketsAtOnce = 200;  // each in the trace once as sent, and once as echo
+    Bytes packets;
+    for (std::size_t i = 0; i < kPacketsAtOnce; ++i) packets.insert(packets.end(), {1, 0});
+    Child<QAction>("actLine").trigger();
+    for (std::size_t i = 0; i < LineTrace::kMaxEntries / 2 / kPacketsAtOnce; ++i) {
+      link_.RawOutput(packets);
+      RunFor(kSettleMs + 50);  // they take that long on the line
+    }
   }
 
   // Runs the event loop for `ms` milliseconds.

@@ -15,12 +15,13 @@
 namespace tendril {
 namespace {
 
-constexpr std::int32_t kUpdateMs = 50;
+constexpr std::int32_t kUpdateMs = 100;  // painting takes more than a millisecond
 constexpr int kRowsAtFirst = 7;
 constexpr int kLeastRows = 2;
 constexpr int kCellMargin = 12;
 
-// The Home and End keys go to the first and the last line, also when that is the current one out of view.
+// The Home and End keys go to the first and the last line, also when that is the current one out of view. Without a
+// current line the keys start at the last one in view.
 class LinesView : public QTableView {
  public:
   QSize sizeHint() const override { return {0, HeightOf(kRowsAtFirst)}; }
@@ -29,10 +30,18 @@ class LinesView : public QTableView {
  protected:
   QModelIndex moveCursor(CursorAction action, Qt::KeyboardModifiers modifiers) override {
     const int last = model()->rowCount() - 1;
-    if (last < 0 || (action != MoveHome && action != MoveEnd))
-      return QTableView::moveCursor(action, modifiers);
-    action == MoveHome ? scrollToTop() : scrollToBottom();
-    return model()->index(action == MoveHome ? 0 : last, std::max(0, currentIndex().column()));
+    const int column = std::max(0, currentIndex().column());
+    if (action == MoveHome) {
+      scrollToTop();
+      return model()->index(0, column);
+    }
+    if (action == MoveEnd) {
+      scrollToBottom();
+      return model()->index(last, column);
+    }
+    if (currentIndex().isValid()) return QTableView::moveCursor(action, modifiers);
+    const int in_view = rowAt(viewport()->height() - 1);
+    return model()->index(in_view < 0 ? last : in_view, column);
   }
 
  private:
@@ -134,7 +143,12 @@ QLayout* LinePane::MakeHeader() {
 
 // All columns and rows have sizes that do not depend on what they contain.
 void LinePane::SetUpTable() {
-  lines_->setModel(&model_);
+  // A current line that drops out has no successor: the next one would be read out, and shown, again and again.
+  connect(&model_, &QAbstractItemModel::rowsAboutToBeRemoved, this,
+          [this](const QModelIndex& /*parent*/, int /*first*/, int last) {
+            if (lines_->currentIndex().row() <= last) lines_->selectionModel()->clearCurrentIndex();
+          });
+  lines_->setModel(&model_);  // its own connections come after that one
   lines_->setAccessibleName(QStringLiteral("What crosses the line"));
   lines_->setSelectionBehavior(QAbstractItemView::SelectRows);
   lines_->setEditTriggers(QAbstractItemView::NoEditTriggers);
@@ -169,11 +183,6 @@ void LinePane::SetUpTable() {
 void LinePane::Open() {
   focus_before_ = window()->focusWidget();
   show();
-  // The keys start from the newest line.
-  if (!lines_->currentIndex().isValid()) {
-    lines_->selectionModel()->setCurrentIndex(model_.index(model_.rowCount() - 1, 0),
-                                              QItemSelectionModel::NoUpdate);
-  }
   lines_->setFocus();
 }
 
@@ -186,7 +195,7 @@ void LinePane::showEvent(QShowEvent* event) {
 void LinePane::hideEvent(QHideEvent* event) {
   trace_.SetChangedHandler(nullptr);
   tmrUpdate_->SetEnabled(false);
-  if (isAncestorOf(window()->focusWidget())) {
+  if (!event->spontaneous() && isAncestorOf(window()->focusWidget())) {
     QWidget* const next = focus_before_ != nullptr ? focus_before_.data() : window();
     next->setFocus();
   }
@@ -204,9 +213,7 @@ void LinePane::Update() {
   QScrollBar& bar = *lines_->verticalScrollBar();
   const int top = bar.value();
   updating_ = true;
-  lines_->setAutoScroll(false);  // the current row may drop out
   const int removed = model_.Update();
-  lines_->setAutoScroll(true);
   if (chkFollow_->isChecked()) {
     lines_->scrollToBottom();
   } else {

@@ -24,7 +24,7 @@
 
 namespace tendril {
 
-// The verdict about the line, and below it the trace. It follows the trace while its end is shown: at most some 20 times a
+// The verdict about the line, and below it the trace. It follows the trace while its end is shown: at most ten times a
 // second, and only when the trace has changed. Costs nothing while it is hidden.
 class LinePane : public QDockWidget {
   Q_OBJECT
