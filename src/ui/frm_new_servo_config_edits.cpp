@@ -139,6 +139,12 @@ void frmNewServoConfig::OnSent(std::uint8_t unit) {
 }
 
 void frmNewServoConfig::OnCompared(std::uint8_t unit, const OptionTable& held) {
+  ChannelTable records;
+  for (std::size_t slot = 0; slot < kPortCount; ++slot) {
+    records.At(slot) = DecodeOptions(held[slot]);
+    records.At(slot).Received = false;
+  }
+  readings_.Keep(link_.CommPort(), unit, records, IsoTime());  // known, should a send follow
   compared_.NoteCompared(unit, held);
   outcome_spoken_ = QString::fromStdString(comparison_.Sentence());
 }

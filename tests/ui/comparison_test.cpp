@@ -105,6 +105,9 @@ TEST_F(Compared, AfterASendItIsOfferedAndEqual) {
 TEST_F(Compared, StaysAboutItsUnitUntilThatIsReadAnew) {
   world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x02});
   Run("cmdCompare_0");
+  Run("Command3_0");
+  EXPECT_THAT(Text("lblStatus"), EndsWith("Ports 1 to 8 are written.")) << "what it held before is known";
+  Run("cmdCompare_0");
   ChooseByKeys("CmbUnitID_1", 2);
   Run("Command3_1");
   EXPECT_EQ(Text("lblCompared"), "Unit 01, not the chosen one, holds exactly this");
