@@ -310,6 +310,10 @@ void frmNewServoConfig::FindUnits() {
     });
     connect(found_units_, &FoundUnits::CancelPressed, &connections_, [this] { commands_.Cancel(); });
     connect(found_units_, &FoundUnits::FindPressed, &connections_, [this] { FindUnits(); });
+    connect(found_units_, &QDialog::finished, &connections_, [this] {
+      if (commands_.running.Operation() == &commands_.find)
+        status_->Say(QStringLiteral("Finding units goes on: Find shows the list again, Cancel ends it"));
+    });
     EnableControls();
   }
   found_units_->show();

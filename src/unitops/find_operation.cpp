@@ -8,6 +8,9 @@ namespace tendril {
 namespace {
 
 constexpr std::uint8_t kSearchPoll = '*';
+// A unit's reply is lost while the program is too busy to release the line for it. This is time enough to paint the
+// window with its controls disabled, and the list.
+constexpr std::int32_t kFirstPollMs = 200;
 constexpr char kCannotSearch[] = "Error finding units, Please retry";
 
 }  // namespace
@@ -16,34 +19,49 @@ FindOperation::FindOperation(CommandContext& context, const LineTrace& trace,
                              std::function<void()> on_searched)
     : UnitOperation(context, "*", "Finding Units Failed"),
       trace_(trace),
-      on_searched_(std::move(on_searched)) {}
+      on_searched_(std::move(on_searched)),
+      tmrFirstPoll_(MakeTimer(kFirstPollMs, [this] {
+        tmrFirstPoll_.SetEnabled(false);
+        Poll();
+      })) {}
 
 std::string FindOperation::Prepare() {
   search_ = {};
+  again_ = false;
   return "Finding units";
 }
 
 void FindOperation::Begin() {
-  if (!Link().cmdPollStation(Id(), kSearchPoll)) return Refuse(SendError(kCannotSearch));
+  if (!Link().PortOpen()) Link().SetPortOpen(true);
+  tmrFirstPoll_.SetEnabled(true);
   Run();
   ShowSearch();
 }
 
 void FindOperation::OnReply(bool replied, std::uint8_t /*unit*/, const Bytes& data) {
+  // Units that answer at once do so again; noise, or a line that was released too late, does not.
+  if (!replied && !again_ && PerhapsSeveralUnits(trace_)) {
+    again_ = true;
+    return Poll();
+  }
+  OnLastReply(replied, data);
+  ShowSearch();
+  if (search_.polled == UnitSearch::kIds) return Succeed("Search complete");
+  Poll();
+}
+
+void FindOperation::Poll() {
   // A poll would open the port again, and the line behind it may be another one.
   if (!Link().PortOpen()) {
     return Fail(
         {"The serial port was closed while units were searched for.", "Comm Error!", BoxIcon::kCritical});
   }
-  OnLastReply(replied, data);
-  const bool over = search_.polled == UnitSearch::kIds;
-  if (!over && !Link().cmdPollStation(Id(), kSearchPoll)) return Fail(SendError(kCannotSearch));
-  ShowSearch();  // takes its time while the poll is out
-  if (over) Succeed("Search complete");
+  if (!Link().cmdPollStation(Id(), kSearchPoll)) Fail(SendError(kCannotSearch));
 }
 
 void FindOperation::OnLastReply(bool replied, const Bytes& data) {
   if (!Link().PortOpen()) return;
+  again_ = false;
   const std::uint8_t id = Id();
   const PollOutcome outcome = trace_.Polls().empty() ? PollOutcome::kSilence : trace_.Polls().back().outcome;
   if (outcome == PollOutcome::kOtherAnswer) {

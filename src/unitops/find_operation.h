@@ -11,13 +11,14 @@
 
 namespace tendril {
 
-// Polls each ID once, in order. The next poll follows the reply or the time-out at once. The chosen unit ID plays no
-// part.
+// Polls the IDs in order. The next poll follows the reply or the time-out at once. The chosen unit ID plays no part.
 //
-//   Idle --Start: poll of the first ID out--> Polling
-//   Polling --a reply, or a time-out: poll of the next ID--> Polling
+//   Idle --Start: the window disables its controls meanwhile--> Waiting
+//   Waiting --tick: poll of the first ID out--> Polling
+//   Polling --bytes that make no reply, for the first time: the same ID again--> Polling
+//   Polling --otherwise, a reply or a time-out: poll of the next ID--> Polling
 //   Polling --the last ID was polled--> Idle (success)
-//   Polling --the port is closed, or a fault--> Idle (failed; what was found stays)
+//   Waiting, Polling --the port is closed, or a fault--> Idle (failed; what was found stays)
 class FindOperation final : public UnitOperation {
  public:
   // `trace` follows the link, and judges the polls that have no reply. `on_searched` (may be empty; raises nothing) is
@@ -37,11 +38,14 @@ class FindOperation final : public UnitOperation {
  private:
   // The ID that is polled next, or whose poll is outstanding.
   std::uint8_t Id() const { return static_cast<std::uint8_t>(kFirstUnitId + search_.polled); }
+  void Poll();
   void ShowSearch();
 
   const LineTrace& trace_;
   std::function<void()> on_searched_;
+  Timer& tmrFirstPoll_;
   UnitSearch search_;
+  bool again_ = false;  // the outstanding poll is the second one of its ID
 };
 
 }  // namespace tendril

@@ -22,6 +22,10 @@ TEST_F(FindUnits, Line_ChoosesItsIdWhileTheSearchRuns) {
       Find<QComboBox>("CmbUnitID_0").currentIndex() * 16 + Find<QComboBox>("CmbUnitID_1").currentIndex(),
       0x0C);
   EXPECT_EQ(Text("lblStatus"), "Unit ID 0C");
+  QTest::keyClick(&list, Qt::Key_Escape);
+  EXPECT_THAT(Text("lblStatus"), testing::StartsWith("Finding units goes on"));
+  Press("cmdFindUnits");
+  EXPECT_TRUE(Visible("FoundUnits"));
   Press("cmdCancelFind");
   RunToTheEnd();
   EXPECT_THAT(Text("lblFound"), testing::HasSubstr("2 units found: 01 and 0C."));
