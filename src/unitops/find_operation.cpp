@@ -10,7 +10,7 @@ namespace {
 constexpr std::uint8_t kSearchPoll = '*';
 // A unit's reply is lost while the program is too busy to release the line for it. This is time enough to paint the
 // window with its controls disabled, and the list.
-constexpr std::int32_t kFirstPollMs = 200;
+constexpr std::int32_t kFirstPollMs = 100;
 constexpr char kCannotSearch[] = "Error finding units, Please retry";
 
 }  // namespace

@@ -25,7 +25,7 @@ TEST_F(Find, TakesNoLongerThanBytesAndTimeOuts) {
   for (const int id : {0x01, 0x0A, 0x7F, 0x20, 0x20}) Attach("", static_cast<std::uint8_t>(id));
   const std::uint64_t start_ms = world_.time.ElapsedMs();
   commands_.find.Start();
-  world_.time.Advance(1200);
+  world_.time.Advance(1100);
   EXPECT_EQ(progress_.title, "Finding units: 12 of 253, 2 found");
   ASSERT_TRUE(world_.time.AdvanceUntil([&] { return !commands_.running.Active(); }, 60'000));
   constexpr double kTimeOutMs = (6 + 38 + 45) * 20 * 1000.0 / 19200;
@@ -67,7 +67,7 @@ TEST_F(Find, EndsBeforeTheLastId) {
          "COMMAND FAILED! Only IDs up to 0C"}}) {
     noted_.clear();
     commands_.find.Start();
-    world_.time.Advance(1300);
+    world_.time.Advance(1200);
     const std::size_t polls = Polls();
     c.act();
     world_.time.Advance(200);
