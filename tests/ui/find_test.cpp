@@ -10,7 +10,7 @@ using FindUnits = Window;
 
 TEST_F(FindUnits, Line_ChoosesItsIdWhileTheSearchRuns) {
   Activate();
-  ConnectUnit(0x01);
+  ConnectUnit();
   world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x0C});
   QTest::keySequence(window_.get(), QKeySequence(QStringLiteral("Ctrl+F")));
   world_.time.Advance(1300);
@@ -18,9 +18,7 @@ TEST_F(FindUnits, Line_ChoosesItsIdWhileTheSearchRuns) {
   ASSERT_EQ(list.topLevelItemCount(), 2);
   list.setCurrentItem(list.topLevelItem(1));
   QTest::keyClick(&list, Qt::Key_Return);
-  EXPECT_EQ(
-      Find<QComboBox>("CmbUnitID_0").currentIndex() * 16 + Find<QComboBox>("CmbUnitID_1").currentIndex(),
-      0x0C);
+  EXPECT_EQ(Find<QComboBox>("CmbUnitID_1").currentIndex(), 0x0C);
   EXPECT_EQ(Text("lblStatus"), "Unit ID 0C");
   QTest::keyClick(&list, Qt::Key_Escape);
   EXPECT_THAT(Text("lblStatus"), testing::StartsWith("Finding units goes on"));
