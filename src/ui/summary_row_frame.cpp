@@ -9,16 +9,15 @@ namespace tendril {
 namespace {
 
 constexpr QSizeF kBadge(13, 9);
-constexpr double kBadgeSign = 7;
+constexpr double kBadgeSign = 7;  // in whole pixels its lines are crisp
 constexpr double kOptionSign = 10;
 constexpr double kOptionGap = 3;
 
 void PaintBadge(QPainter& painter, const QPointF& corner, const QPalette& palette) {
   const QRectF badge(corner, kBadge);
   painter.fillRect(badge, palette.color(QPalette::WindowText));
-  QRectF sign(0, 0, kBadgeSign, kBadgeSign);
-  sign.moveCenter(badge.center());
-  PaintDiffers(painter, sign, palette.color(QPalette::Window));
+  PaintDiffers(painter, QRectF(corner + QPointF(3, 1), QSizeF(kBadgeSign, kBadgeSign)),
+               palette.color(QPalette::Window));
 }
 
 }  // namespace
@@ -44,7 +43,7 @@ void SummaryRowFrame::paintEvent(QPaintEvent* /*event*/) {
           QRectF(place.right() + kOptionGap, place.center().y() - kOptionSign / 2, kOptionSign, kOptionSign),
           palette().color(QPalette::WindowText));
     } else {
-      PaintBadge(painter, {place.left() + 1, place.top() - kBadge.height() + 2}, palette());
+      PaintBadge(painter, {place.left() + 1, place.top() - kBadge.height() + 1}, palette());
     }
   }
 }
