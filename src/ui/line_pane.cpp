@@ -274,8 +274,7 @@ void LinePane::OnScrollRange(int last) {
 }
 
 void LinePane::CopyReport() {
-  Update();
-  ShowVerdict();
+  Update();  // paused, it is what is shown
   const auto lines = std::min(model_.Entries().size(), kReportedLines);
   QGuiApplication::clipboard()->setText(
       LineReport(info_, link_, target_.UnitId(), verdict_->sentence, model_.Entries()));
