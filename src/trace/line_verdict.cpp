@@ -44,9 +44,9 @@ LineVerdict JudgeLastPoll(const PollSeen& poll, const std::string& unit) {
       return {Verdict::kAnswers, unit + " answers."};
     case PollOutcome::kSilence:
       return {Verdict::kSilence,
-              "Nothing comes back, not even what the program sends: check the adapter and its wire, and "
-              "whether this "
-              "is the right port."};
+              "Nothing comes back, not even what the program sends: check the port, the adapter and its "
+              "wire. If the "
+              "adapter never returns what is sent, check the unit's power, its ID and the wiring."};
     case PollOutcome::kEchoOnly:
       return {Verdict::kEchoOnly, "Only what the program sends comes back. " + unit +
                                       " does not answer: check its power, its ID and the wiring."};
