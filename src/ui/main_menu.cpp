@@ -119,8 +119,10 @@ void MainMenu::AddEditMenu(QWidget& window) {
   AddItem(menu, "Copy &Status", "Ctrl+Shift+S", this, &MainMenu::CopyStatusChosen);
   AddItem(menu, "Copy &Line for Support", "Ctrl+Shift+L", this, &MainMenu::CopyLineChosen);
   menu.addSeparator();
-  AddItem(menu, "Copy Confi&guration", "Ctrl+Shift+C", this, &MainMenu::CopyConfigurationChosen);
+  AddItem(menu, "Copy Confi&guration", "Ctrl+Shift+C", this, &MainMenu::CopyConfigurationChosen)
+      ->setObjectName("actCopyConfiguration");
   paste_ = AddItem(menu, "P&aste Configuration", "Ctrl+Shift+V", this, &MainMenu::PasteConfigurationChosen);
+  paste_->setObjectName("actPasteConfiguration");
   menu.addSeparator();
   AddItem(menu, window, kStoreItem);
   AddItem(menu, window, kPresetsItem);

@@ -129,7 +129,7 @@ bool Simulation::AllRecordsValid() const {
 
 void Simulation::OnWritten(std::span<const std::uint8_t> bytes) {
   Require(!closed_, "a closed window sends nothing");
-  Require(!undoing_, "undo sends nothing");
+  Require(!undoing_, "undo, copy and paste send nothing");
   for (const Bytes& packet : SplitPackets(bytes)) OnPacket(packet);
 }
 
@@ -140,7 +140,11 @@ void Simulation::OnPacket(const Bytes& packet) {
   if (code != kPoll && code != kSetAddress && code != kSetOption) return;
   if (code == kSetOption && packet[3] == kLivePosition) return OnPositionSent(packet);
   const bool to_any = code == kSetAddress || (code == kPoll && packet[2] == '*');
-  Require(packet[0] == (to_any ? 0xFF : operation_.unit), "a command addresses the unit that was chosen");
+  Require(operation_.what == "FIND" || packet[0] == (to_any ? 0xFF : operation_.unit),
+          "a command addresses the unit that was chosen");
+  Require(operation_.what != "FIND" || (code == kPoll && packet[2] == '*'),
+          "a search only asks who is there");
+  Require(operation_.what != "COMPARE" || (code == kPoll && packet[2] == 'n'), "a comparison only reads");
   if (code != kPoll) {
     operation_.polls_of_step = 0;
     if (code == kSetOption) OnOptionsSent(packet);
@@ -230,10 +234,11 @@ void Simulation::EndOperation() {
     return;
   }
   if (operation_.what == "GET") records_ = window_->WorkingConfiguration();
+  if (operation_.what == "FIND") return;
   if (operation_.what == "UPDATE") {
     Require(operation_.last_poll == '+' && operation_.last_poll_answered,
             "SUCCESS of a change of the ID: a unit has answered by the new one");
-  } else if (plain_) {
+  } else if (plain_ && operation_.what != "COMPARE") {
     CheckData();
   }
 }

@@ -6,6 +6,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <memory>
+#include <optional>
 #include <set>
 #include <span>
 #include <string>
@@ -82,6 +83,7 @@ class Simulation {
   void TypeAnything();
   void PressEscape();
   void UndoOrRedo();
+  void CopyOrPaste();
   void Use(QWidget& control);
   void RunCommand(QAbstractButton& button);
   void Close();
@@ -139,9 +141,10 @@ class Simulation {
   int boxes_open_ = 0;
   std::size_t boxes_on_boxes_ = 0;
   Operation operation_;
+  std::optional<ChannelTable> copied_;
   ChannelTable records_;  // as the user left them, or a get that succeeded
   bool using_test_button_ = false;
-  bool undoing_ = false;
+  bool undoing_ = false;  // or copying, or pasting
   bool calm_ = false;  // nothing goes wrong any more
   bool closed_ = false;
   std::uint64_t polls_ = 0;

@@ -18,6 +18,23 @@ namespace {
 
 constexpr int kMaxBoxesAtOnce = 3;
 
+struct Command {
+  const char* button;  // its name, or the beginning of it
+  const char* what;
+  int max_polls;  // of one step
+};
+constexpr std::array kCommands{
+    Command{"Command3_0", "SEND", 3},         Command{"Command3_3", "SEND", 3},
+    Command{"Command3_1", "GET", 33},         Command{"Command3_4", "GET", 33},
+    Command{"Command3_2", "UPDATE", 15},      Command{"cmdCompare", "COMPARE", 33},
+    Command{"cmdFindUnits", "FIND", 3 * 253}, Command{"cmdFindAgain", "FIND", 3 * 253}};
+
+const Command* FindCommand(const std::string& button) {
+  const auto command = std::find_if(kCommands.begin(), kCommands.end(),
+                                    [&](const Command& each) { return button.starts_with(each.button); });
+  return command == kCommands.end() ? nullptr : &*command;
+}
+
 // Units whose replies may come too late or together with something else.
 bool TalksOutOfTurn(const FaultKind& kind) {
   constexpr std::array<std::string_view, 4> kNames{"flooding", "too-slow", "late", "unfinished"};
@@ -182,8 +199,8 @@ void Simulation::ActAsUser() {
   const std::size_t boxes_before = BoxesShown();
   const int act = random_.Between(1, 100);
   if (act <= 25) {
-    RunCommand(Find<QAbstractButton>(
-        random_.Pick(std::array{"Command3_0", "Command3_0", "Command3_1", "Command3_2"})));
+    RunCommand(Find<QAbstractButton>(random_.Pick(
+        std::array{"Command3_0", "Command3_0", "Command3_1", "Command3_2", "cmdCompare", "cmdFindUnits"})));
   } else if (act <= 35) {
     ChoosePort(static_cast<int>(random_.Below(7)));
   } else if (act <= 40) {
@@ -196,8 +213,10 @@ void Simulation::ActAsUser() {
     TypeAnything();
   } else if (act <= 68) {
     PressEscape();
-  } else if (act <= 76) {
+  } else if (act <= 74) {
     UndoOrRedo();
+  } else if (act <= 76) {
+    CopyOrPaste();
   } else {
     UseAnyControl();
   }
@@ -248,11 +267,11 @@ void Simulation::UseAnyControl() {
 void Simulation::Use(QWidget& control) {
   const std::string name = control.objectName().toStdString();
   if (!Usable(control) || name == "cmbNYX") return;
-  if (name == "cmdCancel") operation_.cancelled = true;
+  if (name.starts_with("cmdCancel")) operation_.cancelled = true;
   const bool locked = CommandRuns();
   Note("the user uses " + name);
   if (auto* button = qobject_cast<QAbstractButton*>(&control)) {
-    if (name.starts_with("Command3_")) return RunCommand(*button);
+    if (FindCommand(name) != nullptr) return RunCommand(*button);
     using_test_button_ = name.starts_with("cmdTest_") || name == "cmdStop";
     button->click();
     using_test_button_ = false;
@@ -330,16 +349,34 @@ void Simulation::UndoOrRedo() {
   }
 }
 
+// A copy that was refused leaves the text of the one before.
+void Simulation::CopyOrPaste() {
+  auto* copy = window_->findChild<QAction*>(QStringLiteral("actCopyConfiguration"));
+  auto* paste = window_->findChild<QAction*>(QStringLiteral("actPasteConfiguration"));
+  undoing_ = true;
+  if (random_.Chance(50)) {
+    Note("the user copies the configuration");
+    copy->trigger();
+    if (AllRecordsValid()) copied_ = window_->WorkingConfiguration();
+  } else if (paste->isEnabled() && copied_) {
+    Note("the user pastes the configuration");
+    paste->trigger();
+    records_ = window_->WorkingConfiguration();
+    for (std::size_t slot = 0; slot < kPortCount; ++slot) {
+      ChannelConfig& expected = copied_->At(slot);
+      expected.Received = records_.At(slot).Received;  // no part of the text
+      Require(records_.At(slot) == expected, "what is pasted is what was copied");
+    }
+  }
+  undoing_ = false;
+}
+
 void Simulation::RunCommand(QAbstractButton& button) {
   if (!button.isEnabledTo(window_.get())) return;
-  const int number = button.objectName().back().digitValue();  // 3 and 4 are those of the summary
-  const bool send = number % 3 == 0, get = number % 3 == 1;
-  operation_ = {.what = send  ? "SEND"
-                        : get ? "GET"
-                              : "UPDATE",
-                .max_polls = send  ? 3
-                             : get ? 33
-                                   : 15,
+  if (CommandRuns()) return button.click();  // shows the list of the units that are being found
+  const Command& command = *FindCommand(button.objectName().toStdString());
+  operation_ = {.what = command.what,
+                .max_polls = command.max_polls,
                 .comm_port = link_.CommPort(),
                 .swept = SweepRuns(),
                 .unit = static_cast<std::uint8_t>(Find<QComboBox>("CmbUnitID_0").currentIndex() * 16 +
