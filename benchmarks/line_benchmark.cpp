@@ -80,7 +80,7 @@ bool MeasureFind(MeasuredWindow& window) {
   constexpr int kUnanswered = 252;
   constexpr double kMaxRatio = 1.02;
 
-  const double measured_ms = window.RunCommand("cmdFindUnits", "Search complete");
+  const double measured_ms = window.RunCommand("cmdFindUnits", "SUCCESS: Search Complete");
   const double floor_ms =
       2 * kWireMsPerByte * (kUnanswered * kTimeOutBytes + static_cast<double>(window.device.pended));
   std::printf("find: measured %.1f ms, floor %.1f ms, ratio %.4f (at most %.2f)\n", measured_ms, floor_ms,

@@ -46,7 +46,7 @@ void FindOperation::OnReply(bool replied, std::uint8_t /*unit*/, const Bytes& da
   }
   OnLastReply(replied, data);
   ShowSearch();
-  if (search_.polled == UnitSearch::kIds) return Succeed("Search complete");
+  if (search_.polled == UnitSearch::kIds) return Succeed("SUCCESS: Search Complete");
   Poll();
 }
 

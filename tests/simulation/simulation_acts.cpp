@@ -200,7 +200,7 @@ void Simulation::ActAsUser() {
   const int act = random_.Between(1, 100);
   if (act <= 25) {
     RunCommand(Find<QAbstractButton>(random_.Pick(
-        std::array{"Command3_0", "Command3_0", "Command3_1", "Command3_2", "cmdCompare", "cmdFindUnits"})));
+        std::array{"Command3_0", "Command3_0", "Command3_1", "Command3_2", "cmdCompare_0", "cmdFindUnits"})));
   } else if (act <= 35) {
     ChoosePort(static_cast<int>(random_.Below(7)));
   } else if (act <= 40) {
@@ -215,8 +215,10 @@ void Simulation::ActAsUser() {
     PressEscape();
   } else if (act <= 74) {
     UndoOrRedo();
-  } else if (act <= 76) {
+  } else if (act <= 75) {
     CopyOrPaste();
+  } else if (act <= 76) {
+    window_->findChild<QAction*>(QStringLiteral("actLine"))->trigger();
   } else {
     UseAnyControl();
   }
