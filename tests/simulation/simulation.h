@@ -145,7 +145,7 @@ class Simulation {
   ChannelTable records_;  // as the user left them, or a get that succeeded
   bool using_test_button_ = false;
   bool undoing_ = false;  // or copying, or pasting
-  bool calm_ = false;  // nothing goes wrong any more
+  bool calm_ = false;     // nothing goes wrong any more
   bool closed_ = false;
   std::uint64_t polls_ = 0;
   std::uint64_t poll_replies_ = 0;

@@ -36,7 +36,8 @@ TEST_F(Find, TakesNoLongerThanBytesAndTimeOuts) {
   EXPECT_EQ(noted_, polls);
   EXPECT_EQ(Found(), "01 answers, 0A answers, 20 perhaps several units, 7F answers");
   EXPECT_EQ(said_,
-            "Finding units at 14:05: SUCCESS: Search Complete. 3 units found: 01, 0A and 7F; perhaps several at 20. "
+            "Finding units at 14:05: SUCCESS: Search Complete. 3 units found: 01, 0A and 7F; perhaps several "
+            "at 20. "
             "Connect units that share an ID one at a time, and give each its own.");
   ExpectSuccess("SUCCESS: Search Complete");
 }
