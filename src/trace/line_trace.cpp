@@ -140,6 +140,7 @@ void LineTrace::NoteOpened(std::string_view text) {
 
 void LineTrace::NoteClosed(PortSeen port, TraceEntry::Kind kind, std::string_view text) {
   port_ = port;
+  port_fault_ = text;
   poll_.reset();
   received_.Take();
   Add(kind, {}, text);

@@ -90,6 +90,8 @@ class LineTrace {
   // How the polls ended, the last one last. A poll that waits for its end is not among them.
   const std::deque<PollSeen>& Polls() const { return polls_; }
   PortSeen Port() const { return port_; }
+  // Why the port could not be opened, in the system's words.
+  const std::string& PortFault() const { return port_fault_; }
 
  private:
   // The poll that waits for its end.
@@ -121,6 +123,7 @@ class LineTrace {
   std::uint64_t next_number_ = 0;
   std::int64_t now_ms_ = 0;
   PortSeen port_ = PortSeen::kNeverOpened;
+  std::string port_fault_;
   bool no_echo_ = false;  // the last reply came without an echo: the adapter hears nothing while it sends
 
   std::optional<WaitingPoll> poll_;

@@ -75,7 +75,7 @@ LineVerdict JudgeLine(const LineTrace& trace) {
     case PortSeen::kNeverOpened:
       return {Verdict::kNotOpened, "No port has been opened yet: choose a comm port."};
     case PortSeen::kOpenFailed:
-      return {Verdict::kCannotOpen, "The port cannot be opened: see the last line below."};
+      return {Verdict::kCannotOpen, "The port cannot be opened: " + trace.PortFault()};
     case PortSeen::kClosed:
       return {Verdict::kClosed, "The port is closed. The next command opens it."};
     case PortSeen::kLost:

@@ -27,7 +27,7 @@ std::string DescribeOption(std::span<const std::uint8_t> packet, const std::stri
   const std::uint8_t selector = packet[3];
   if (option == kServoPortOption && selector == kLivePositionSelector) {
     return "live position of " + unit + ": ports mask " + HexByte(packet[4]) + ", " +
-           std::to_string(packet[5] * 10) + " us";
+           std::to_string(packet[5] * 10) + " µs";
   }
   if (option == kServoPortOption) return "set options of port " + std::to_string(selector) + " of " + unit;
   return "set option " + std::to_string(option) + " of " + unit;

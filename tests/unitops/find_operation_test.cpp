@@ -96,7 +96,7 @@ TEST_F(Find, SaysWhatToDoWhenNoUnitAnswers) {
     link_.SetCommPort(port++);
     commands_.find.Start();
     world_.time.Advance(25'000);
-    EXPECT_THAT(said_, testing::HasSubstr("complete. No unit answered. " + what_next));
+    EXPECT_THAT(said_, testing::HasSubstr("Complete. No unit answered. " + what_next));
   }
 }
 
