@@ -16,7 +16,7 @@ constexpr std::size_t kPacketsOfExchange = 8;
 constexpr std::size_t kLongestPiece = ReplyParser::kMaxData;
 
 static_assert(LineTrace::kMaxEntries * (sizeof(TraceEntry) + TraceEntry::kMaxBytes + 2 * sizeof(void*)) <
-              4 * 1024 * 1024);
+              std::size_t{4} * 1024 * 1024);
 
 Bytes WithoutZeros(std::span<const std::uint8_t> bytes) {
   Bytes rest;

@@ -83,9 +83,10 @@ LineVerdict JudgeLine(const LineTrace& trace) {
     case PortSeen::kOpen:
       break;
   }
-  if (trace.Polls().empty())
+  if (trace.Polls().empty()) {
     return {Verdict::kNothingAsked,
             "The port is open. Nothing has been asked yet: read a unit, or find units."};
+  }
   const PollSeen& last = DecisivePoll(trace.Polls());
   const std::string unit = last.unit == kAllUnits ? "The unit" : "Unit " + HexByte(last.unit);
   const std::vector<bool> answers = AnswersOf(last.unit, trace.Polls());

@@ -18,11 +18,11 @@ constexpr int kFormUnitsPerPixel = 15;
 
 // The tool tip of an enabled control.
 QString DescriptionOf(const QWidget& widget) {
-  const QString description = widget.property(kDescription).toString();
+  QString text = widget.property(kDescription).toString();
   const QString difference = widget.property(kDifference).toString();
-  if (difference.isEmpty()) return description;
-  return description + (description.isEmpty() ? QString() : QStringLiteral("\n")) + QStringLiteral("≠ ") +
-         difference;
+  if (difference.isEmpty()) return text;
+  if (!text.isEmpty()) text += QLatin1Char('\n');
+  return text + QStringLiteral("≠ ") + difference;
 }
 
 // Sets one of the two. A reason why the control is disabled stays; see EnableUnless().

@@ -54,9 +54,10 @@ std::string UnitSearch::Sentence() const {
   const auto others = Ids(FoundUnit::What::kOtherAnswer);
   const auto shared = Ids(FoundUnit::What::kPerhapsSeveral);
   std::string text;
-  if (polled < kIds)
+  if (polled < kIds) {
     text +=
         "Only IDs up to " + HexByte(static_cast<std::uint8_t>(kFirstUnitId + polled - 1)) + " were polled. ";
+  }
   if (units.empty()) {
     text += "No unit answered";
   } else {
