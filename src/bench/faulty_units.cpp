@@ -61,6 +61,19 @@ class RamblingUnit final : public VirtualUnit {
   int noise_bytes_;
 };
 
+// No byte of its replies arrives as it was sent.
+class GarblingUnit final : public VirtualUnit {
+ public:
+  using VirtualUnit::VirtualUnit;
+
+ protected:
+  Transmission Reply(std::uint8_t kind, const Bytes& data, std::uint64_t poll_end_us) override {
+    Transmission reply = VirtualUnit::Reply(kind, data, poll_end_us);
+    for (std::uint8_t& byte : reply.bytes) byte ^= 0x55;
+    return reply;
+  }
+};
+
 // Sends one byte at a time with a silence of `gap_us` between them.
 class SlowUnit final : public VirtualUnit {
  public:
@@ -172,6 +185,7 @@ constexpr FaultKind kFaultKinds[] = {
     {"wrong-answer", "never acknowledges", Make<WrongAnswerUnit>},
     {"locked", "refuses every configuration command", Make<LockedUnit>},
     {"deaf", "does not hear every second poll", Make<DeafUnit>},
+    {"garbling", "garbles every byte of its replies", Make<GarblingUnit>},
     {"rambling", "sends noise before its reply", Make<RamblingUnit, 5>},
     // More than an input buffer holds, for some 2.7 s.
     {"flooding", "sends 5200 bytes of noise before its reply", Make<RamblingUnit, 5200>},

@@ -27,6 +27,9 @@ inline constexpr std::uint8_t kCodeHeartbeat = 0x81;
 inline constexpr std::uint8_t kCodePoll = 0x88;
 inline constexpr std::uint8_t kCodeUnlock = 0x8A;
 
+// The second data byte of a reply to a poll of kind '0': the unit has accepted a configuration command.
+inline constexpr std::uint8_t kReplyAccepted = 10;
+
 // A packet without a checksum.
 Bytes BuildPacket(std::uint8_t unit, std::uint8_t code, std::span<const std::uint8_t> body);
 // A configuration command: the body, then its checksum.

@@ -25,8 +25,11 @@ Bytes WithoutZeros(std::span<const std::uint8_t> bytes) {
   return rest;
 }
 
-// Kinds below stand for several replies.
-bool NamesItsReply(std::uint8_t kind) { return kind > ' ' && kind < 100; }
+// Whether the code of a reply is the kind of its poll. The others are no letters, or have replies of several codes.
+bool NamesItsReply(std::uint8_t kind) { return kind > ' ' && kind != 100 && kind != 111 && kind < 200; }
+
+// Whether a reply to this kind begins with the unit's ID.
+bool NamesTheUnit(std::uint8_t kind) { return kind == '*' || kind == '+'; }
 
 }  // namespace
 
@@ -73,10 +76,8 @@ std::string TraceEntry::Meaning() const {
       return "echo: " + DescribeSent(bytes);
     case Kind::kReply:
       return DescribeReceived(bytes);
-    case Kind::kNoise: {
-      const std::string meaning = DescribeReceived(bytes);
-      return meaning.starts_with("reply") ? meaning + ", not waited for" : meaning;
-    }
+    case Kind::kNoise:
+      return DescribeReceived(bytes) + (IsReply(bytes) ? ", not waited for" : "");
     case Kind::kTimeOut:
       return "no reply in time";
   }
@@ -142,7 +143,7 @@ void LineTrace::NoteClosed(PortSeen port, TraceEntry::Kind kind, std::string_vie
   port_ = port;
   port_fault_ = text;
   poll_.reset();
-  received_.Take();
+  FlushReceived();
   Add(kind, {}, text);
 }
 
@@ -162,7 +163,7 @@ void LineTrace::NoteSent(std::span<const std::uint8_t> bytes) {
 }
 
 void LineTrace::NotePoll(std::span<const std::uint8_t> packet) {
-  received_.Take();
+  FlushReceived();
   poll_ = WaitingPoll{.unit = packet[1], .kind = packet[3]};
   parser_.Start(packet[1]);
   NoteSent(packet);
@@ -170,11 +171,8 @@ void LineTrace::NotePoll(std::span<const std::uint8_t> packet) {
 
 void LineTrace::NoteReceived(std::span<const std::uint8_t> bytes) {
   for (const std::uint8_t byte : bytes) {
-    if (poll_) {
-      poll_->arrived = true;
-      if (!poll_->echoed && byte != kFrameByte && poll_->before_echo.size() < TraceEntry::kMaxBytes)
-        poll_->before_echo.push_back(byte);
-    }
+    if (poll_ && !poll_->echoed && byte != kFrameByte && poll_->before_echo.size() < TraceEntry::kMaxBytes)
+      poll_->before_echo.push_back(byte);
     const auto verdict = poll_ ? parser_.Push(byte) : ReplyParser::Verdict::kNeedMore;
     const bool ended = received_.Push(byte) || verdict != ReplyParser::Verdict::kNeedMore;
     if (ended || received_.Size() >= kLongestPiece) NotePacket(received_.Take(), verdict);
@@ -200,16 +198,31 @@ void LineTrace::NotePacket(const Bytes& packet, ReplyParser::Verdict verdict) {
   if (sent != unechoed_.end() && ended) unechoed_.erase(unechoed_.begin(), sent + 1);
   Add(echo ? TraceEntry::Kind::kEcho : TraceEntry::Kind::kNoise, packet);
   if (!poll_) {
-    const bool reply = content.size() > 1 && content[0] == kProgramAddress;
-    if (reply && !polls_.empty() && !polls_.back().replied) polls_.back().outcome = PollOutcome::kTooLate;
+    if (ended && IsReply(packet)) NoteLateReply(content[1]);
     return;
   }
   if (verdict == ReplyParser::Verdict::kEchoSeen) {
     poll_->echoed = true;
   } else if (poll_->echoed && !content.empty()) {
     poll_->strays = true;
-    poll_->other_answer = ended && content.size() > 1 && content[1] == poll_->kind;  // under another address
+    const bool of_other_address = ended && content.size() > 1 && content[1] == poll_->kind;
+    poll_->other_answer = poll_->other_answer || of_other_address;
   }
+}
+
+// `code`: of a reply that no poll waits for.
+void LineTrace::NoteLateReply(std::uint8_t code) {
+  if (polls_.empty()) return;
+  PollSeen& poll = polls_.back();
+  const bool none_came = poll.outcome == PollOutcome::kSilence || poll.outcome == PollOutcome::kEchoOnly ||
+                         poll.outcome == PollOutcome::kNoAnswer;
+  if (none_came && code == poll.kind) poll.outcome = PollOutcome::kTooLate;
+}
+
+// What came without an end is shown, too.
+void LineTrace::FlushReceived() {
+  if (received_.HasContent()) return NotePacket(received_.Take(), ReplyParser::Verdict::kNeedMore);
+  received_.Take();
 }
 
 void LineTrace::NoteTimeOut() {
@@ -220,22 +233,27 @@ void LineTrace::NoteTimeOut() {
 }
 
 void LineTrace::EndPoll(bool replied) {
-  polls_.push_back({poll_->unit, poll_->kind, replied, Judge(replied)});
+  polls_.push_back({poll_->unit, poll_->kind, replied, replied ? JudgeReply() : JudgeTimeOut()});
   if (polls_.size() > kMaxPolls) polls_.pop_front();
-  if (replied) no_echo_ = !poll_->echoed;
+  // A damaged echo is one, too.
+  if (replied) no_echo_ = !poll_->echoed && poll_->before_echo.front() == kProgramAddress;
   poll_.reset();
   unechoed_.clear();
   if (changed_) changed_();
 }
 
-PollOutcome LineTrace::Judge(bool replied) const {
-  if (replied) {
-    const bool meant = !NamesItsReply(poll_->kind) || parser_.code() == poll_->kind;
-    return meant ? PollOutcome::kAnswered : PollOutcome::kOtherAnswer;
-  }
-  if (!poll_->arrived) return no_echo_ ? PollOutcome::kEchoOnly : PollOutcome::kSilence;
-  if (!poll_->echoed)
+PollOutcome LineTrace::JudgeReply() const {
+  if (NamesItsReply(poll_->kind) && parser_.code() != poll_->kind) return PollOutcome::kOtherAnswer;
+  const bool names_other = NamesTheUnit(poll_->kind) && poll_->unit != kAllUnits && !parser_.data().empty() &&
+                           parser_.data()[0] != poll_->unit;
+  return names_other ? PollOutcome::kOtherUnit : PollOutcome::kAnswered;
+}
+
+PollOutcome LineTrace::JudgeTimeOut() const {
+  if (!poll_->echoed) {
+    if (poll_->before_echo.empty()) return no_echo_ ? PollOutcome::kNoAnswer : PollOutcome::kSilence;
     return MostlyEcho(poll_->before_echo) ? PollOutcome::kEchoDamaged : PollOutcome::kNoReply;
+  }
   if (poll_->other_answer) return PollOutcome::kOtherAnswer;
   return poll_->strays ? PollOutcome::kNoReply : PollOutcome::kEchoOnly;
 }

@@ -55,10 +55,12 @@ enum class PollOutcome {
   kAnswered,
   kSilence,      // nothing arrived, not even the echo
   kEchoOnly,     // no unit answers
+  kNoAnswer,     // nothing arrived, but the adapter never returns what is sent
   kTooLate,      // no reply, and then one came; an adapter that switches its driver by itself hears that
   kEchoDamaged,  // the echo came with bytes missing or changed
   kNoReply,      // bytes came that make no reply
-  kOtherAnswer   // a packet came that is no answer to this poll
+  kOtherAnswer,  // a packet came that is no answer to this poll
+  kOtherUnit     // the reply names another unit
 };
 
 struct PollSeen {
@@ -98,7 +100,6 @@ class LineTrace {
   struct WaitingPoll {
     std::uint8_t unit = 0;
     std::uint8_t kind = 0;
-    bool arrived = false;       // anything has
     bool echoed = false;        // its echo is complete
     bool strays = false;        // bytes after the echo that make no reply
     bool other_answer = false;  // a packet that replies to something else, or to someone else
@@ -114,8 +115,11 @@ class LineTrace {
   void NoteDropped(std::span<const std::uint8_t> bytes);
   void NotePacket(const Bytes& packet, ReplyParser::Verdict verdict);
   void NoteTimeOut();
+  void NoteLateReply(std::uint8_t code);
+  void FlushReceived();
   void EndPoll(bool replied);
-  PollOutcome Judge(bool replied) const;
+  PollOutcome JudgeReply() const;
+  PollOutcome JudgeTimeOut() const;
   bool MostlyEcho(const Bytes& received) const;
 
   std::deque<TraceEntry> entries_;
@@ -129,8 +133,8 @@ class LineTrace {
   std::optional<WaitingPoll> poll_;
   ReplyParser parser_;
   PacketSplitter received_;
-  std::deque<Bytes>
-      unechoed_;  // what was sent since the last poll ended, without zero bytes; the last packets of it
+  // The last packets that were sent since the last poll ended, without zero bytes.
+  std::deque<Bytes> unechoed_;
   std::function<void()> changed_;
 };
 

@@ -43,13 +43,16 @@ LineVerdict JudgeLastPoll(const PollSeen& poll, const std::string& unit) {
     case PollOutcome::kAnswered:
       return {Verdict::kAnswers, unit + " answers."};
     case PollOutcome::kSilence:
-      return {Verdict::kSilence,
-              "Nothing comes back, not even what the program sends: check the port, the adapter and its "
-              "wire. If the "
-              "adapter never returns what is sent, check the unit's power, its ID and the wiring."};
+      return {
+          Verdict::kSilence,
+          "Nothing comes back, not even what the program sends: check the port, the adapter and its wire. "
+          "Some adapters never return what is sent: then check the unit's power, its ID and the wiring."};
     case PollOutcome::kEchoOnly:
       return {Verdict::kEchoOnly, "Only what the program sends comes back. " + unit +
                                       " does not answer: check its power, its ID and the wiring."};
+    case PollOutcome::kNoAnswer:
+      return {Verdict::kNoAnswer,
+              unit + " does not answer: check its power, its ID, the wiring and the adapter."};
     case PollOutcome::kTooLate:
       return {
           Verdict::kTooLate,
@@ -62,8 +65,14 @@ LineVerdict JudgeLastPoll(const PollSeen& poll, const std::string& unit) {
               "Bytes come that make no reply: perhaps several units have the ID " + HexByte(poll.unit) +
                   ", or a unit has another speed, or the wiring picks up noise. Connect one unit alone."};
     case PollOutcome::kOtherAnswer:
-      return {Verdict::kOtherAnswer, "An answer comes, but not the one to this question: connect " + unit +
-                                         " alone, and check that the device is a Tendril unit."};
+      return {
+          Verdict::kOtherAnswer,
+          "An answer comes, but not the one to this question. Connect one unit alone, and check that it is "
+          "a Tendril unit."};
+    case PollOutcome::kOtherUnit:
+      return {Verdict::kOtherUnit,
+              "Another unit answers than the one that was asked: perhaps it answers too "
+              "late. Connect one unit alone."};
   }
   return {};
 }
@@ -75,7 +84,7 @@ LineVerdict JudgeLine(const LineTrace& trace) {
     case PortSeen::kNeverOpened:
       return {Verdict::kNotOpened, "No port has been opened yet: choose a comm port."};
     case PortSeen::kOpenFailed:
-      return {Verdict::kCannotOpen, "The port cannot be opened: " + trace.PortFault()};
+      return {Verdict::kCannotOpen, "The port could not be opened: " + trace.PortFault()};
     case PortSeen::kClosed:
       return {Verdict::kClosed, "The port is closed. The next command opens it."};
     case PortSeen::kLost:
@@ -93,7 +102,7 @@ LineVerdict JudgeLine(const LineTrace& trace) {
   const auto missed = static_cast<std::size_t>(std::count(answers.begin(), answers.end(), false));
   const bool settled = EndsWith(answers, true, kAnswersInARow) || EndsWith(answers, false, kMissesInARow);
   const bool of_unit = last.outcome == PollOutcome::kAnswered || last.outcome == PollOutcome::kEchoOnly ||
-                       last.outcome == PollOutcome::kNoReply;
+                       last.outcome == PollOutcome::kNoAnswer || last.outcome == PollOutcome::kNoReply;
   if (missed == 0 || settled || !of_unit) return JudgeLastPoll(last, unit);
   return {Verdict::kAnswersSometimes, unit + " answers, but not always: " + std::to_string(missed) +
                                           " of the last " + std::to_string(answers.size()) +

@@ -16,10 +16,12 @@ struct LineVerdict {
     kNothingAsked,
     kSilence,
     kEchoOnly,
+    kNoAnswer,
     kTooLate,
     kEchoDamaged,
     kNoReply,
     kOtherAnswer,
+    kOtherUnit,
     kAnswersSometimes,  // some of the last polls of this unit had a reply
     kAnswers
   };

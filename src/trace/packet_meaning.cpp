@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "config/option_bytes.h"
 #include "platform/hex_text.h"
 #include "serial/packets.h"
 
@@ -9,10 +10,6 @@ namespace tendril {
 namespace {
 
 constexpr std::size_t kShownZeros = 4;  // in a row at the beginning
-// The option of a unit that holds its servo ports, and what stands in place of a port's number for a live position.
-constexpr std::uint8_t kServoPortOption = 17;
-constexpr std::uint8_t kLivePositionSelector = 137;
-constexpr std::uint8_t kAccepted = 10;
 
 std::string PollKind(std::uint8_t kind) {
   if (kind > ' ' && kind < 0x7F) return std::string("'") + static_cast<char>(kind) + "'";
@@ -25,11 +22,11 @@ std::string DescribeOption(std::span<const std::uint8_t> packet, const std::stri
   if (packet.size() < 6) return "set option of " + unit + ", too short";
   const std::uint8_t option = packet[2];
   const std::uint8_t selector = packet[3];
-  if (option == kServoPortOption && selector == kLivePositionSelector) {
+  if (option == kOptionServoPort && selector == kLivePosition) {
     return "live position of " + unit + ": ports mask " + HexByte(packet[4]) + ", " +
            std::to_string(packet[5] * 10) + " µs";
   }
-  if (option == kServoPortOption) return "set options of port " + std::to_string(selector) + " of " + unit;
+  if (option == kOptionServoPort) return "set options of port " + std::to_string(selector) + " of " + unit;
   return "set option " + std::to_string(option) + " of " + unit;
 }
 
@@ -55,12 +52,12 @@ std::string DescribeCommand(std::span<const std::uint8_t> packet) {
 }
 
 std::string DescribeReply(std::span<const std::uint8_t> packet) {
-  if (packet.size() < 2 || packet[0] != kProgramAddress) return "noise";
+  if (!IsReply(packet)) return "noise";
   const std::uint8_t kind = packet[1];
   const auto data = packet.subspan(2);
   const std::string reply = "reply to " + PollKind(kind) + ": ";
   if (kind == '0' && data.size() >= 2)
-    return reply + (data[1] == kAccepted ? "acknowledged" : "nothing accepted");
+    return reply + (data[1] == kReplyAccepted ? "acknowledged" : "nothing accepted");
   if (kind == 'n' && data.size() >= 10) return reply + "options of port " + std::to_string(data[0]);
   if ((kind == '*' || kind == '+') && !data.empty()) return reply + "here is unit " + HexByte(data[0]);
   return reply + std::to_string(data.size()) + " data bytes";
@@ -82,6 +79,11 @@ std::string DescribeSent(std::span<const std::uint8_t> bytes) {
 
 std::string DescribeReceived(std::span<const std::uint8_t> bytes) {
   return DescribePacket(bytes, DescribeReply);
+}
+
+bool IsReply(std::span<const std::uint8_t> bytes) {
+  const auto packet = bytes.subspan(LeadingZeros(bytes));
+  return packet.size() > 1 && packet[0] == kProgramAddress && packet[1] != kFrameByte;
 }
 
 std::size_t LeadingZeros(std::span<const std::uint8_t> bytes) {

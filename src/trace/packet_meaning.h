@@ -16,6 +16,9 @@ std::string DescribeSent(std::span<const std::uint8_t> bytes);
 // The same of a packet that arrived: "reply to '0': acknowledged", "noise".
 std::string DescribeReceived(std::span<const std::uint8_t> bytes);
 
+// Whether this is a reply to the program, whatever it answers.
+bool IsReply(std::span<const std::uint8_t> bytes);
+
 // Zero bytes at the beginning of `bytes`: the rest of the line's frame, or the pads of a patient unit.
 std::size_t LeadingZeros(std::span<const std::uint8_t> bytes);
 

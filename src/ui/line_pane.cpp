@@ -63,10 +63,12 @@ std::optional<SignKind> SignOf(LineVerdict::Kind verdict) {
     case LineVerdict::Kind::kPortGone:
     case LineVerdict::Kind::kSilence:
     case LineVerdict::Kind::kEchoOnly:
+    case LineVerdict::Kind::kNoAnswer:
     case LineVerdict::Kind::kTooLate:
     case LineVerdict::Kind::kEchoDamaged:
     case LineVerdict::Kind::kNoReply:
     case LineVerdict::Kind::kOtherAnswer:
+    case LineVerdict::Kind::kOtherUnit:
     case LineVerdict::Kind::kAnswersSometimes:
       return SignKind::kWarning;
   }

@@ -32,6 +32,7 @@ std::string FindOperation::Prepare() {
 }
 
 void FindOperation::Begin() {
+  if (on_searched_) on_searched_();  // what was found before is gone, even if the search cannot begin
   if (!Link().PortOpen()) Link().SetPortOpen(true);
   tmrFirstPoll_.SetEnabled(true);
   Run();
@@ -61,14 +62,14 @@ void FindOperation::Poll() {
 
 void FindOperation::OnLastReply(bool replied, const Bytes& data) {
   if (!Link().PortOpen()) return;
-  again_ = false;
+  const bool polled_again = std::exchange(again_, false);
   const std::uint8_t id = Id();
   const PollOutcome outcome = trace_.Polls().empty() ? PollOutcome::kSilence : trace_.Polls().back().outcome;
   if (outcome == PollOutcome::kOtherAnswer) {
     search_.found.push_back({id, FoundUnit::What::kOtherAnswer, id});
   } else if (replied) {
     search_.found.push_back({id, FoundUnit::What::kAnswers, data.empty() ? id : data[0]});
-  } else if (PerhapsSeveralUnits(trace_)) {
+  } else if (polled_again && PerhapsSeveralUnits(trace_)) {
     search_.found.push_back({id, FoundUnit::What::kPerhapsSeveral, id});
   }
   ++search_.polled;

@@ -6,6 +6,7 @@
 
 #include "config/option_bytes.h"
 #include "platform/hex_text.h"
+#include "serial/packets.h"
 
 namespace tendril {
 namespace {
@@ -13,8 +14,6 @@ namespace {
 constexpr std::uint8_t kAcknowledgePoll = '0';
 constexpr std::int32_t kNextPortMs = 300;
 constexpr std::int32_t kMaxSendPolls = 3;
-// The second byte of a reply that accepts the options.
-constexpr std::uint8_t kAccepted = 10;
 constexpr char kCannotPoll[] = "Error sending configuration, Please retry";
 
 }  // namespace
@@ -58,7 +57,7 @@ void SendOperation::OnReply(bool replied, std::uint8_t unit, const Bytes& data) 
 }
 
 void SendOperation::OnLastReply(bool replied, const Bytes& data) {
-  if (!replied || data.size() < 2 || data[1] != kAccepted) return;
+  if (!replied || data.size() < 2 || data[1] != kReplyAccepted) return;
   ++written_;
   perhaps_written_ = false;
 }

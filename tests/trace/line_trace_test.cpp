@@ -11,6 +11,7 @@
 #include "bench/faulty_units.h"
 #include "bench/virtual_ports.h"
 #include "serial/hw_serial.h"
+#include "serial/packets.h"
 #include "support/memory_log.h"
 #include "support/simulated_time.h"
 #include "trace/line_verdict.h"
@@ -114,6 +115,7 @@ TEST(LineVerdict, Verdict_IsThatOfTheLastPolls) {
                {"none", half_echo, Kind::kEchoDamaged},
                {"mute", {}, Kind::kEchoOnly},
                {"deaf", {}, Kind::kAnswersSometimes},
+               {"garbling", {}, Kind::kNoReply},
                {"rambling", {}, Kind::kAnswers},
                {"late", {}, Kind::kEchoOnly},
                {"late", no_echo, Kind::kTooLate},
@@ -126,6 +128,46 @@ TEST(LineVerdict, Verdict_IsThatOfTheLastPolls) {
     line.Poll('*', 4);
     EXPECT_EQ(line.Verdict(), each.verdict) << JudgeLine(line.trace).sentence;
   }
+}
+
+TEST(LineVerdict, OddReplies_AreNoAnswers) {
+  const Bytes kNoEcho{};
+  const Bytes kEcho = PollPacket(0x05, '*', 45);
+  const Bytes kEchoOfRead = PollPacket(0x05, 'n', 45);
+  const struct {
+    Bytes poll, before, after, dropped;
+    Kind verdict;
+  } cases[] = {{kEchoOfRead, kEchoOfRead, {0xFE, '0', 1, 10, 0}, {}, Kind::kOtherAnswer},
+               {kEcho, kEcho, {0xFE, '*', 4, 0}, {}, Kind::kOtherUnit},
+               {kEcho, kNoEcho, {0}, {}, Kind::kSilence},
+               {kEcho, kEcho, {0, 0, 0}, {}, Kind::kEchoOnly},
+               {kEcho, kEcho, {0, 5, '*', 5, 0, 7}, {}, Kind::kOtherAnswer},
+               {kEcho, kEcho, {}, {0xFE, 7, 9, 0}, Kind::kEchoOnly},
+               {kEcho, kEcho, {}, {0xFE, '*', 5, 0}, Kind::kTooLate}};
+  for (const auto& each : cases) {
+    LineTrace trace;
+    const auto note = [&](LineEvent::Kind kind, const Bytes& bytes) {
+      trace.Note({.kind = kind, .bytes = bytes}, 0);
+    };
+    note(LineEvent::Kind::kOpened, {});
+    note(LineEvent::Kind::kPollSent, each.poll);
+    note(LineEvent::Kind::kReceived, each.before);
+    note(LineEvent::Kind::kReceived, each.after);
+    note(LineEvent::Kind::kTimeOut, {});
+    note(LineEvent::Kind::kDropped, each.dropped);
+    const LineVerdict verdict = JudgeLine(trace);
+    EXPECT_EQ(verdict.kind, each.verdict) << verdict.sentence;
+  }
+}
+
+TEST(LineVerdict, AdapterWithoutEcho_IsKnownByAReply) {
+  TracedLine line("", {.echo = false});
+  line.Poll('*');
+  for (int poll = 0; poll < 3; ++poll) {
+    ASSERT_TRUE(line.link.cmdPollStation(0x06, '*'));
+    line.time.Advance(300);
+  }
+  EXPECT_EQ(line.Verdict(), Kind::kNoAnswer);
 }
 
 TEST(LineVerdict, Changes_AreSeen) {
