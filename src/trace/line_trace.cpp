@@ -28,8 +28,11 @@ Bytes WithoutZeros(std::span<const std::uint8_t> bytes) {
 // Whether the code of a reply is the kind of its poll. The others are no letters, or have replies of several codes.
 bool NamesItsReply(std::uint8_t kind) { return kind > ' ' && kind != 100 && kind != 111 && kind < 200; }
 
+constexpr std::uint8_t kKindAcknowledge = '0';
+constexpr std::uint8_t kKindSearch = '*';
+
 // Whether a reply to this kind begins with the unit's ID.
-bool NamesTheUnit(std::uint8_t kind) { return kind == '*' || kind == '+'; }
+bool NamesTheUnit(std::uint8_t kind) { return kind == kKindSearch || kind == '+'; }
 
 }  // namespace
 
@@ -77,7 +80,9 @@ std::string TraceEntry::Meaning() const {
     case Kind::kReply:
       return DescribeReceived(bytes);
     case Kind::kNoise:
-      return DescribeReceived(bytes) + (IsReply(bytes) ? ", not waited for" : "");
+      if (!IsReply(bytes)) return DescribeReceived(bytes);
+      return DescribeReceived(bytes) +
+             (bytes.back() == kFrameByte ? ", not waited for" : ", without its end");
     case Kind::kTimeOut:
       return "no reply in time";
   }
@@ -120,9 +125,14 @@ void LineTrace::Clear() {
 }
 
 void LineTrace::Add(TraceEntry::Kind kind, std::span<const std::uint8_t> bytes, std::string_view text) {
+  AddAt(now_ms_, kind, bytes, text);
+}
+
+void LineTrace::AddAt(std::int64_t time_ms, TraceEntry::Kind kind, std::span<const std::uint8_t> bytes,
+                      std::string_view text) {
   const auto kept = bytes.first(std::min(bytes.size(), TraceEntry::kMaxBytes));
   entries_.push_back({.number = next_number_++,
-                      .time_ms = now_ms_,
+                      .time_ms = time_ms,
                       .kind = kind,
                       .size = static_cast<std::uint32_t>(bytes.size()),
                       .bytes = {kept.begin(), kept.end()},
@@ -170,6 +180,7 @@ void LineTrace::NotePoll(std::span<const std::uint8_t> packet) {
 }
 
 void LineTrace::NoteReceived(std::span<const std::uint8_t> bytes) {
+  received_ms_ = now_ms_;
   for (const std::uint8_t byte : bytes) {
     if (poll_ && !poll_->echoed && byte != kFrameByte && poll_->before_echo.size() < TraceEntry::kMaxBytes)
       poll_->before_echo.push_back(byte);
@@ -180,6 +191,7 @@ void LineTrace::NoteReceived(std::span<const std::uint8_t> bytes) {
 }
 
 void LineTrace::NoteDropped(std::span<const std::uint8_t> bytes) {
+  received_ms_ = now_ms_;
   for (const std::uint8_t byte : bytes) {
     if (received_.Push(byte) || received_.Size() >= kLongestPiece)
       NotePacket(received_.Take(), ReplyParser::Verdict::kNeedMore);
@@ -188,7 +200,7 @@ void LineTrace::NoteDropped(std::span<const std::uint8_t> bytes) {
 
 void LineTrace::NotePacket(const Bytes& packet, ReplyParser::Verdict verdict) {
   if (verdict == ReplyParser::Verdict::kReplyComplete) {
-    Add(TraceEntry::Kind::kReply, packet);
+    AddAt(received_ms_, TraceEntry::Kind::kReply, packet);
     return EndPoll(true);
   }
   const Bytes content = WithoutZeros(packet);
@@ -196,7 +208,7 @@ void LineTrace::NotePacket(const Bytes& packet, ReplyParser::Verdict verdict) {
   const bool echo = verdict == ReplyParser::Verdict::kEchoSeen || sent != unechoed_.end();
   const bool ended = packet.back() == kFrameByte;
   if (sent != unechoed_.end() && ended) unechoed_.erase(unechoed_.begin(), sent + 1);
-  Add(echo ? TraceEntry::Kind::kEcho : TraceEntry::Kind::kNoise, packet);
+  AddAt(received_ms_, echo ? TraceEntry::Kind::kEcho : TraceEntry::Kind::kNoise, packet);
   if (!poll_) {
     if (ended && IsReply(packet)) NoteLateReply(content[1]);
     return;
@@ -233,6 +245,7 @@ void LineTrace::NoteTimeOut() {
 }
 
 void LineTrace::EndPoll(bool replied) {
+  NoteSearch(replied);
   polls_.push_back({poll_->unit, poll_->kind, replied, replied ? JudgeReply() : JudgeTimeOut()});
   if (polls_.size() > kMaxPolls) polls_.pop_front();
   // A damaged echo is one, too.
@@ -242,11 +255,26 @@ void LineTrace::EndPoll(bool replied) {
   if (changed_) changed_();
 }
 
+// A search polls one ID after the other, and some of them twice.
+void LineTrace::NoteSearch(bool replied) {
+  const bool of_search = poll_->kind == kKindSearch && poll_->unit != kAllUnits;
+  const std::uint8_t before = polls_.empty() ? kAllUnits : polls_.back().unit;
+  if (!of_search || poll_->unit < before) search_ = {};
+  if (!of_search) return;
+  const bool again = search_.polled > 0 && poll_->unit == before;
+  if (!again) ++search_.polled;
+  if (replied && !(again && polls_.back().replied)) ++search_.answered;
+}
+
 PollOutcome LineTrace::JudgeReply() const {
   if (NamesItsReply(poll_->kind) && parser_.code() != poll_->kind) return PollOutcome::kOtherAnswer;
   const bool names_other = NamesTheUnit(poll_->kind) && poll_->unit != kAllUnits && !parser_.data().empty() &&
                            parser_.data()[0] != poll_->unit;
-  return names_other ? PollOutcome::kOtherUnit : PollOutcome::kAnswered;
+  if (names_other) return PollOutcome::kOtherUnit;
+  const bool refused =
+      poll_->kind == kKindAcknowledge && parser_.data().size() > 1 && parser_.data()[1] != kReplyAccepted;
+  if (refused) return PollOutcome::kNotAccepted;
+  return poll_->strays ? PollOutcome::kAnsweredInNoise : PollOutcome::kAnswered;
 }
 
 PollOutcome LineTrace::JudgeTimeOut() const {

@@ -53,14 +53,16 @@ struct TraceEntry {
 // How a poll ended.
 enum class PollOutcome {
   kAnswered,
-  kSilence,      // nothing arrived, not even the echo
-  kEchoOnly,     // no unit answers
-  kNoAnswer,     // nothing arrived, but the adapter never returns what is sent
-  kTooLate,      // no reply, and then one came; an adapter that switches its driver by itself hears that
-  kEchoDamaged,  // the echo came with bytes missing or changed
-  kNoReply,      // bytes came that make no reply
-  kOtherAnswer,  // a packet came that is no answer to this poll
-  kOtherUnit     // the reply names another unit
+  kAnsweredInNoise,  // and bytes before the reply that belong to nothing
+  kNotAccepted,      // an answer: the unit has not accepted a configuration command since the last such poll
+  kSilence,          // nothing arrived, not even the echo
+  kEchoOnly,         // no unit answers
+  kNoAnswer,         // nothing arrived, but the adapter never returns what is sent
+  kTooLate,          // no reply, and then one came; an adapter that switches its driver by itself hears that
+  kEchoDamaged,      // the echo came with bytes missing or changed
+  kNoReply,          // bytes came that make no reply
+  kOtherAnswer,      // a packet came that is no answer to this poll
+  kOtherUnit         // the reply names another unit
 };
 
 struct PollSeen {
@@ -68,6 +70,12 @@ struct PollSeen {
   std::uint8_t kind = 0;
   bool replied = false;  // the link took a reply
   PollOutcome outcome = PollOutcome::kSilence;
+};
+
+// IDs that were polled one after the other, to find units.
+struct SearchSeen {
+  int polled = 0;
+  int answered = 0;
 };
 
 // Where the port is.
@@ -91,6 +99,10 @@ class LineTrace {
   const std::deque<TraceEntry>& Entries() const { return entries_; }
   // How the polls ended, the last one last. A poll that waits for its end is not among them.
   const std::deque<PollSeen>& Polls() const { return polls_; }
+  // The search that the last poll belongs to; nothing polled when it belongs to none.
+  const SearchSeen& Search() const { return search_; }
+  // Whether something was sent since the last poll: a live position, which nothing answers.
+  bool SentSincePoll() const { return !poll_ && !unechoed_.empty(); }
   PortSeen Port() const { return port_; }
   // Why the port could not be opened, in the system's words.
   const std::string& PortFault() const { return port_fault_; }
@@ -107,6 +119,8 @@ class LineTrace {
   };
 
   void Add(TraceEntry::Kind kind, std::span<const std::uint8_t> bytes = {}, std::string_view text = {});
+  void AddAt(std::int64_t time_ms, TraceEntry::Kind kind, std::span<const std::uint8_t> bytes,
+             std::string_view text = {});
   void NoteOpened(std::string_view text);
   void NoteClosed(PortSeen port, TraceEntry::Kind kind, std::string_view text = {});
   void NoteSent(std::span<const std::uint8_t> bytes);
@@ -118,14 +132,17 @@ class LineTrace {
   void NoteLateReply(std::uint8_t code);
   void FlushReceived();
   void EndPoll(bool replied);
+  void NoteSearch(bool replied);
   PollOutcome JudgeReply() const;
   PollOutcome JudgeTimeOut() const;
   bool MostlyEcho(const Bytes& received) const;
 
   std::deque<TraceEntry> entries_;
   std::deque<PollSeen> polls_;
+  SearchSeen search_;
   std::uint64_t next_number_ = 0;
   std::int64_t now_ms_ = 0;
+  std::int64_t received_ms_ = 0;  // when the last byte came
   PortSeen port_ = PortSeen::kNeverOpened;
   std::string port_fault_;
   bool no_echo_ = false;  // the last reply came without an echo: the adapter hears nothing while it sends

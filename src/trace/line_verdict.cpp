@@ -1,6 +1,7 @@
 #include "trace/line_verdict.h"
 
 #include <algorithm>
+#include <optional>
 #include <vector>
 
 #include "platform/hex_text.h"
@@ -15,11 +16,16 @@ using Verdict = LineVerdict::Kind;
 constexpr std::size_t kMissesInARow = 3;
 constexpr std::size_t kAnswersInARow = 10;
 
+bool IsAnswer(PollOutcome outcome) {
+  return outcome == PollOutcome::kAnswered || outcome == PollOutcome::kAnsweredInNoise ||
+         outcome == PollOutcome::kNotAccepted;
+}
+
 // Whether each of the last polls of a unit was answered, since its first answer.
 std::vector<bool> AnswersOf(std::uint8_t unit, const std::deque<PollSeen>& polls) {
   std::vector<bool> answers;
   for (const PollSeen& poll : polls) {
-    const bool answered = poll.outcome == PollOutcome::kAnswered;
+    const bool answered = IsAnswer(poll.outcome);
     if (poll.unit == unit && (answered || !answers.empty())) answers.push_back(answered);
   }
   return answers;
@@ -28,7 +34,7 @@ std::vector<bool> AnswersOf(std::uint8_t unit, const std::deque<PollSeen>& polls
 // The last poll; the one before it when a reply to that came too late: whether one to the last comes is not known yet.
 const PollSeen& DecisivePoll(const std::deque<PollSeen>& polls) {
   const PollSeen& last = polls.back();
-  if (polls.size() < 2 || last.outcome == PollOutcome::kAnswered) return last;
+  if (polls.size() < 2 || IsAnswer(last.outcome)) return last;
   const PollSeen& before = polls[polls.size() - 2];
   return before.outcome == PollOutcome::kTooLate && before.unit == last.unit ? before : last;
 }
@@ -42,6 +48,14 @@ LineVerdict JudgeLastPoll(const PollSeen& poll, const std::string& unit) {
   switch (poll.outcome) {
     case PollOutcome::kAnswered:
       return {Verdict::kAnswers, unit + " answers."};
+    case PollOutcome::kAnsweredInNoise:
+      return {Verdict::kAnswersInNoise,
+              unit + " answers, after bytes that belong to nothing: check the wiring and the adapter."};
+    case PollOutcome::kNotAccepted:
+      return {Verdict::kNotAccepted,
+              unit +
+                  " answers, but has not accepted what was sent. Send again; if that fails, too, the unit "
+                  "or the line is faulty."};
     case PollOutcome::kSilence:
       return {
           Verdict::kSilence,
@@ -77,6 +91,24 @@ LineVerdict JudgeLastPoll(const PollSeen& poll, const std::string& unit) {
   return {};
 }
 
+// An ID without a unit is no fault while units are searched for.
+std::optional<LineVerdict> JudgeSearch(const SearchSeen& search, PollOutcome last) {
+  if (search.polled < 2) return std::nullopt;
+  const std::string asked = std::to_string(search.polled) + " IDs were asked, and ";
+  if (search.answered == 1) return LineVerdict{Verdict::kAnswers, asked + "one unit answers."};
+  if (search.answered > 1)
+    return LineVerdict{Verdict::kAnswers, asked + std::to_string(search.answered) + " units answer."};
+  if (last == PollOutcome::kEchoOnly) {
+    return LineVerdict{Verdict::kEchoOnly, "Only what the program sends comes back. " + asked +
+                                               "no unit answers: check power and wiring."};
+  }
+  if (last == PollOutcome::kNoAnswer) {
+    return LineVerdict{Verdict::kNoAnswer,
+                       asked + "no unit answers: check power, the wiring and the adapter."};
+  }
+  return std::nullopt;
+}
+
 }  // namespace
 
 LineVerdict JudgeLine(const LineTrace& trace) {
@@ -96,7 +128,10 @@ LineVerdict JudgeLine(const LineTrace& trace) {
     return {Verdict::kNothingAsked,
             "The port is open. Nothing has been asked yet: read a unit, or find units."};
   }
+  if (trace.SentSincePoll())
+    return {Verdict::kNothingAsked, "What is sent now gets no answer. To check the line, read the unit."};
   const PollSeen& last = DecisivePoll(trace.Polls());
+  if (auto verdict = JudgeSearch(trace.Search(), last.outcome)) return *verdict;
   const std::string unit = last.unit == kAllUnits ? "The unit" : "Unit " + HexByte(last.unit);
   const std::vector<bool> answers = AnswersOf(last.unit, trace.Polls());
   const auto missed = static_cast<std::size_t>(std::count(answers.begin(), answers.end(), false));

@@ -22,6 +22,8 @@ struct LineVerdict {
     kNoReply,
     kOtherAnswer,
     kOtherUnit,
+    kNotAccepted,
+    kAnswersInNoise,
     kAnswersSometimes,  // some of the last polls of this unit had a reply
     kAnswers
   };
@@ -37,6 +39,11 @@ LineVerdict JudgeLine(const LineTrace& trace);
 // Whether the last poll brought bytes that make no reply, as when several units answer at once.
 inline bool PerhapsSeveralUnits(const LineTrace& trace) {
   return !trace.Polls().empty() && trace.Polls().back().outcome == PollOutcome::kNoReply;
+}
+
+// Whether the reply to the last poll came from another unit.
+inline bool AnotherUnitAnswered(const LineTrace& trace) {
+  return !trace.Polls().empty() && trace.Polls().back().outcome == PollOutcome::kOtherUnit;
 }
 
 }  // namespace tendril

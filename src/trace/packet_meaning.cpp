@@ -1,6 +1,7 @@
 #include "trace/packet_meaning.h"
 
 #include <algorithm>
+#include <bit>
 
 #include "config/option_bytes.h"
 #include "platform/hex_text.h"
@@ -18,13 +19,22 @@ std::string PollKind(std::uint8_t kind) {
 
 std::string UnitInWords(std::uint8_t id) { return id == kAllUnits ? "all units" : "unit " + HexByte(id); }
 
+// "port 3", "ports 1 2 8".
+std::string PortsInWords(std::uint8_t mask) {
+  std::string ports;
+  for (int port = 1; port <= 8; ++port) {
+    if ((mask >> (port - 1)) % 2 != 0) ports += " " + std::to_string(port);
+  }
+  return (std::has_single_bit(mask) ? "port" : "ports") + (ports.empty() ? " none" : ports);
+}
+
 std::string DescribeOption(std::span<const std::uint8_t> packet, const std::string& unit) {
   if (packet.size() < 6) return "set option of " + unit + ", too short";
   const std::uint8_t option = packet[2];
   const std::uint8_t selector = packet[3];
   if (option == kOptionServoPort && selector == kLivePosition) {
-    return "live position of " + unit + ": ports mask " + HexByte(packet[4]) + ", " +
-           std::to_string(packet[5] * 10) + " µs";
+    return "live position of " + unit + ": " + PortsInWords(packet[4]) + ", " +
+           std::to_string(packet[5] * kPulseResolution) + " µs";
   }
   if (option == kOptionServoPort) return "set options of port " + std::to_string(selector) + " of " + unit;
   return "set option " + std::to_string(option) + " of " + unit;
@@ -60,7 +70,7 @@ std::string DescribeReply(std::span<const std::uint8_t> packet) {
     return reply + (data[1] == kReplyAccepted ? "acknowledged" : "nothing accepted");
   if (kind == 'n' && data.size() >= 10) return reply + "options of port " + std::to_string(data[0]);
   if ((kind == '*' || kind == '+') && !data.empty()) return reply + "here is unit " + HexByte(data[0]);
-  return reply + std::to_string(data.size()) + " data bytes";
+  return reply + std::to_string(data.size()) + (data.size() == 1 ? " data byte" : " data bytes");
 }
 
 template <typename Describe>

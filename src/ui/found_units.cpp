@@ -77,7 +77,7 @@ void FoundUnits::AddUnit(const FoundUnit& unit) {
 }
 
 void FoundUnits::ChooseUnit(QTreeWidgetItem* line) {
-  Q_EMIT UnitChosen(search_.found.at(static_cast<std::size_t>(lstUnits_->indexOfTopLevelItem(line))).named);
+  Q_EMIT UnitChosen(search_.found.at(static_cast<std::size_t>(lstUnits_->indexOfTopLevelItem(line))).id);
 }
 
 void FoundUnits::EnableControls(const QString& running_command, bool finding, bool cancelled, bool moves) {

@@ -10,6 +10,7 @@
 #include <utility>
 
 #include "platform/hex_text.h"
+#include "trace/line_verdict.h"
 #include "ui/about_dialog.h"
 #include "ui/accessible_controls.h"
 #include "ui/appearance.h"
@@ -39,16 +40,18 @@ frmNewServoConfig::frmNewServoConfig(HwSerial& link, TimerFactory& timers, Messa
       info_(info),
       ports_(link, boxes, control_panel),
       actuals_(new ActualsFrame(timers, *this)),
-      commands_(link, trace_, timers, boxes, *progress_, *connection_, config_.Records(),
-                {.starting = [this] { return MakeWayForCommand(); },
-                 .polled = [this](std::uint8_t unit, bool replied) { facts_.NotePoll(unit, replied); },
-                 .replaced = [this](std::uint8_t unit) { OnRead(unit); },
-                 .sent = [this](std::uint8_t unit) { OnSent(unit); },
-                 .compared = [this](std::uint8_t unit, const OptionTable& held) { OnCompared(unit, held); },
-                 .searched =
-                     [this] {
-                       if (found_units_ != nullptr) found_units_->ShowSearch();
-                     }}),
+      commands_(
+          link, trace_, timers, boxes, *progress_, *connection_, config_.Records(),
+          {.starting = [this] { return MakeWayForCommand(); },
+           .polled = [this](std::uint8_t unit,
+                            bool replied) { facts_.NotePoll(unit, replied && !AnotherUnitAnswered(trace_)); },
+           .replaced = [this](std::uint8_t unit) { OnRead(unit); },
+           .sent = [this](std::uint8_t unit) { OnSent(unit); },
+           .compared = [this](std::uint8_t unit, const OptionTable& held) { OnCompared(unit, held); },
+           .searched =
+               [this] {
+                 if (found_units_ != nullptr) found_units_->ShowSearch();
+               }}),
       live_test_(link, timers, boxes, commands_.running, *connection_, *servo_, *live_test_area_,
                  simulators_),
       tmrSummaryScreen_(timers.CreateTimer([this] { OnSummaryScreen(); })),

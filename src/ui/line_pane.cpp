@@ -69,6 +69,8 @@ std::optional<SignKind> SignOf(LineVerdict::Kind verdict) {
     case LineVerdict::Kind::kNoReply:
     case LineVerdict::Kind::kOtherAnswer:
     case LineVerdict::Kind::kOtherUnit:
+    case LineVerdict::Kind::kNotAccepted:
+    case LineVerdict::Kind::kAnswersInNoise:
     case LineVerdict::Kind::kAnswersSometimes:
       return SignKind::kWarning;
   }

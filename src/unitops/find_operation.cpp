@@ -65,12 +65,14 @@ void FindOperation::OnLastReply(bool replied, const Bytes& data) {
   const bool polled_again = std::exchange(again_, false);
   const std::uint8_t id = Id();
   const PollOutcome outcome = trace_.Polls().empty() ? PollOutcome::kSilence : trace_.Polls().back().outcome;
-  if (outcome == PollOutcome::kOtherAnswer) {
-    search_.found.push_back({id, FoundUnit::What::kOtherAnswer, id});
+  if (outcome == PollOutcome::kOtherUnit) {
+    search_.Add(data[0], FoundUnit::What::kAnswersLate);
+  } else if (outcome == PollOutcome::kOtherAnswer) {
+    search_.Add(id, FoundUnit::What::kOtherAnswer);
   } else if (replied) {
-    search_.found.push_back({id, FoundUnit::What::kAnswers, data.empty() ? id : data[0]});
+    search_.Add(id, FoundUnit::What::kAnswers);
   } else if (polled_again && PerhapsSeveralUnits(trace_)) {
-    search_.found.push_back({id, FoundUnit::What::kPerhapsSeveral, id});
+    search_.Add(id, FoundUnit::What::kPerhapsSeveral);
   }
   ++search_.polled;
   const bool adapter = outcome == PollOutcome::kSilence || outcome == PollOutcome::kEchoDamaged;

@@ -1,5 +1,6 @@
 #include "unitops/unit_search.h"
 
+#include <algorithm>
 #include <cstddef>
 
 #include "platform/hex_text.h"
@@ -25,7 +26,9 @@ std::string Listed(const std::vector<std::string>& ids) {
 std::string FoundUnit::Words() const {
   switch (what) {
     case What::kAnswers:
-      return named == id ? "answers" : "answers as " + HexByte(named);
+      return "answers";
+    case What::kAnswersLate:
+      return "answers too late";
     case What::kOtherAnswer:
       return "answers something else";
     case What::kPerhapsSeveral:
@@ -34,11 +37,17 @@ std::string FoundUnit::Words() const {
   return {};
 }
 
+void UnitSearch::Add(std::uint8_t id, FoundUnit::What what) {
+  const bool known =
+      std::any_of(found.begin(), found.end(), [id](const FoundUnit& unit) { return unit.id == id; });
+  if (!known) found.push_back({id, what});
+}
+
 std::vector<std::string> UnitSearch::Ids(FoundUnit::What what) const {
   std::vector<std::string> ids;
   for (const FoundUnit& unit : found) {
     if (unit.what != what) continue;
-    ids.push_back(HexByte(unit.id) + (unit.named == unit.id ? "" : " (as " + HexByte(unit.named) + ")"));
+    ids.push_back(HexByte(unit.id));
   }
   return ids;
 }
@@ -51,6 +60,7 @@ std::string UnitSearch::Step() const {
 std::string UnitSearch::Sentence() const {
   if (polled == 0) return "No ID was polled.";
   const auto units = Ids(FoundUnit::What::kAnswers);
+  const auto late = Ids(FoundUnit::What::kAnswersLate);
   const auto others = Ids(FoundUnit::What::kOtherAnswer);
   const auto shared = Ids(FoundUnit::What::kPerhapsSeveral);
   std::string text;
@@ -64,6 +74,7 @@ std::string UnitSearch::Sentence() const {
     text +=
         std::to_string(units.size()) + (units.size() == 1 ? " unit" : " units") + " found: " + Listed(units);
   }
+  if (!late.empty()) text += "; too late: " + Listed(late);
   if (!shared.empty()) text += "; perhaps several at " + Listed(shared);
   if (!others.empty()) text += "; an answer to something else at " + Listed(others);
   return text + "." + (polled == kIds ? WhatNext(shared.size()) : "");

@@ -14,15 +14,15 @@ namespace tendril {
 struct FoundUnit {
   enum class What {
     kAnswers,
+    kAnswersLate,    // its reply came to the poll of another ID
     kOtherAnswer,    // an answer to something else
     kPerhapsSeveral  // bytes that make no reply
   };
 
   std::uint8_t id;
   What what;
-  std::uint8_t named;  // the ID that its reply names; another one when a unit answers late
 
-  // "answers", "answers as 05", "answers something else", "perhaps several units".
+  // "answers", "answers too late", "answers something else", "perhaps several units".
   std::string Words() const;
 };
 
@@ -32,9 +32,10 @@ struct UnitSearch {
 
   int polled = 0;                // IDs that have been polled
   std::vector<FoundUnit> found;  // in order of ID
+  std::string fault = {};        // what the last poll says about the adapter: a sentence; empty for nothing
 
-  std::string fault = {};  // what the last poll says about the adapter: a sentence; empty for nothing
-
+  // Adds what was found at `id`, unless there is something already.
+  void Add(std::uint8_t id, FoundUnit::What what);
   // "57 of 253, 3 found".
   std::string Step() const;
   // The result, and what to do next: "3 units found: 01, 0A and 7F; perhaps several at 20."

@@ -35,7 +35,7 @@ TEST(LinePrinter, Packet_IsPrintedWithItsMeaning) {
       {LineSide::kProgram, {0, 1, 0x0A, 17, 3, 1, 60, 0}, "set options of port 3 of unit 01"},
       {LineSide::kProgram,
        {0, 1, 0x0A, 17, 137, 4, 150, 255, 1, 0},
-       "live position of unit 01: ports mask 04, 1500 µs"},
+       "live position of unit 01: port 3, 1500 µs"},
       {LineSide::kUnit, {0, 0xFE, '0', 1, 10, 0}, "reply to '0': acknowledged"},
       {LineSide::kUnit, {0, 0xFE, '0', 1, 1, 0}, "reply to '0': nothing accepted"},
       {LineSide::kUnit, {0xFE, 'n', 3, 1, 1, 1, 1, 1, 1, 1, 1, 1, 0}, "reply to 'n': options of port 3"},

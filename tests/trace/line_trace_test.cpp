@@ -116,7 +116,7 @@ TEST(LineVerdict, Verdict_IsThatOfTheLastPolls) {
                {"mute", {}, Kind::kEchoOnly},
                {"deaf", {}, Kind::kAnswersSometimes},
                {"garbling", {}, Kind::kNoReply},
-               {"rambling", {}, Kind::kAnswers},
+               {"rambling", {}, Kind::kAnswersInNoise},
                {"late", {}, Kind::kEchoOnly},
                {"late", no_echo, Kind::kTooLate},
                {"unfinished", {}, Kind::kNoReply},
@@ -160,11 +160,24 @@ TEST(LineVerdict, OddReplies_AreNoAnswers) {
   }
 }
 
+TEST(LineVerdict, UnitThatRefuses_IsNotCalledWell) {
+  TracedLine line("locked");
+  line.link.cmdSetoption(0x05, 0, 17, 3, 1, 60, 240);
+  EXPECT_EQ(line.Verdict(), Kind::kNothingAsked);
+  line.Poll('0');
+  EXPECT_EQ(line.Verdict(), Kind::kNotAccepted);
+}
+
 TEST(LineVerdict, AdapterWithoutEcho_IsKnownByAReply) {
   TracedLine line("", {.echo = false});
   line.Poll('*');
   for (int poll = 0; poll < 3; ++poll) {
     ASSERT_TRUE(line.link.cmdPollStation(0x06, '*'));
+    line.time.Advance(300);
+  }
+  EXPECT_EQ(line.Verdict(), Kind::kAnswers);  // a search has found a unit
+  for (int poll = 0; poll < 3; ++poll) {
+    ASSERT_TRUE(line.link.cmdPollStation(0x06, 'n'));
     line.time.Advance(300);
   }
   EXPECT_EQ(line.Verdict(), Kind::kNoAnswer);

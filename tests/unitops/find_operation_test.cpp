@@ -72,7 +72,7 @@ TEST_F(Find, SaysWhatIsAtAnId) {
                                                        {"deaf", "02 answers"},
                                                        {"wrong-address", "02 answers something else"},
                                                        {"unfinished", "02 perhaps several units"},
-                                                       {"late", "03 answers as 02"}};
+                                                       {"late", "02 answers too late"}};
   for (const auto& [fault, found] : cases) {
     VirtualUnit& unit = Attach(fault, 0x02);
     commands_.find.Start();
