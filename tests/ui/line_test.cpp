@@ -97,6 +97,8 @@ TEST_F(Line, Pause_KeepsWhatIsShownAndClearForgetsIt) {
   Press("chkPauseLine");
   EXPECT_EQ(Rows(), 1);
   EXPECT_EQ(Find("LinePane").windowTitle().toStdString(), "Line");
+  EXPECT_THAT(Text("lblVerdict"), StartsWith("What is sent now gets no answer."));
+  Get();
   EXPECT_EQ(Text("lblVerdict"), "Unit 01 answers.");
 }
 
@@ -107,7 +109,8 @@ TEST_F(Line, Copy_IsWhatSupportNeeds) {
   const std::string copied = QGuiApplication::clipboard()->text().toStdString();
   EXPECT_THAT(copied, AllOf(StartsWith("Tendril Configuration Utility 3.2.1\nSystem: "),
                             HasSubstr("\nPort: Comm 1, Virtual serial line 1, open\nUnit: 01\n"
-                                      "Verdict: Unit 01 answers.\nLines: the last 200 of "),
+                                      "Verdict: What is sent now gets no answer. To check the line, read the "
+                                      "unit.\nLines: the last 200 of "),
                             HasSubstr("\n\nTime\tFrom\tBytes\tMeaning\n"),
                             ContainsRegex("\n[0-9:]+\\.[0-9]+\tprogram\t00 2C 8A 56 00\tunlock unit 2C\n$")));
   EXPECT_EQ(std::count(copied.begin(), copied.end(), '\n'), 210);
