@@ -60,8 +60,9 @@ std::variant<OptionBytes, InvalidRecord> EncodeOptions(const ChannelConfig& reco
 std::optional<std::uint8_t> FlagsOfPowerUp(std::int32_t option);
 std::optional<std::uint8_t> FlagsOfLostComm(std::int32_t option);
 
-// The inverse of EncodeOptions, except for the last digit of each pulse width. Sets `Received`. Takes any bytes: flag combinations that
-// no option has are read as no action, and without an output kind PortType is -1, which EncodeOptions rejects.
+// The inverse of EncodeOptions, except for the last digit of each pulse width. Sets `Received`. Takes any bytes: flag
+// combinations that no option has are read as no action, and without an output kind PortType is -1, which EncodeOptions
+// rejects.
 ChannelConfig DecodeOptions(std::span<const std::uint8_t, kOptionByteCount> options);
 
 }  // namespace tendril

@@ -2,6 +2,7 @@
 #include <QJsonArray>
 #include <QJsonObject>
 #include <QRegularExpression>
+#include <algorithm>
 #include <span>
 #include <utility>
 
@@ -164,7 +165,7 @@ ConfigurationText TakeConfiguration(const QByteArray& text) {
     RefuseValue(QStringLiteral("version"), version, QStringLiteral("%1, the one known here").arg(kVersion));
 
   ConfigurationText configuration;
-  if (const auto unit = top.TakeText("unit", "[0-9A-Fa-f]{2}", "a text of two hexadecimal digits"))
+  if (const auto unit = top.TakeText("unit", "(?!00)[0-9A-Fa-f]{2}", "a unit ID from \"01\" to \"FF\""))
     configuration.unit = static_cast<std::uint8_t>(unit->toUInt(nullptr, 16));
   configuration.read = TakeTime(top, "read");
   configuration.note = top.TakeText("note");

@@ -18,7 +18,7 @@ inline constexpr qsizetype kMaxConfigurationText = qsizetype{1024} * 1024;
 
 // What a text holds. All strings are valid Unicode.
 struct ConfigurationText {
-  std::optional<std::uint8_t> unit;  // the records were read from it
+  std::optional<std::uint8_t> unit;  // 01 to FF: the records were read from it
   std::optional<QString> read;       // when: "2026-11-22T14:02:31+01:00", or with Z
   std::optional<QString> note;
   std::array<std::optional<QString>, kPortCount> names;  // of the ports: "jaw, left"

@@ -2,12 +2,15 @@
 
 #include <QJsonArray>
 #include <QSet>
+#include <algorithm>
 #include <vector>
 
 namespace tendril::exchange {
 namespace {
 
 constexpr qsizetype kLongestQuote = 40;
+// A double keeps so many: what is beyond them gets lost.
+constexpr int kMostDigits = 15;
 
 bool IsDigit(char c) { return c >= '0' && c <= '9'; }
 
@@ -17,6 +20,7 @@ class StrictScan {
   explicit StrictScan(const QByteArray& text) : text_(text) {}
 
   void Run() {
+    int digits = 0;  // of the number so far
     for (; at_ < text_.size(); ++at_) {
       const char c = text_[at_];
       if (c == '{' || c == '[') names_.emplace_back();
@@ -24,6 +28,8 @@ class StrictScan {
       if (c == '"') ScanString();
       if (c == '.' && !(IsDigit(text_[at_ - 1]) && IsDigit(text_[at_ + 1])))
         Refuse(QStringLiteral("a number has digits on both sides of its point"));
+      if (c != '.') digits = IsDigit(c) ? digits + 1 : 0;
+      if (digits > kMostDigits) Refuse(QStringLiteral("a number has more than %1 digits").arg(kMostDigits));
     }
   }
 
@@ -67,6 +73,14 @@ class StrictScan {
 
 void StrictScan::Refuse(const QString& reason) const { RefuseAt(text_, at_, reason); }
 
+// Qt calls a missing comma or bracket an unterminated object, wherever that ends.
+QString WhyNotJson(const QJsonParseError& error) {
+  using Error = QJsonParseError;
+  const bool missing = error.error == Error::UnterminatedObject || error.error == Error::UnterminatedArray ||
+                       error.error == Error::MissingValueSeparator;
+  return missing ? QStringLiteral("a comma or a bracket is missing") : error.errorString();
+}
+
 }  // namespace
 
 QJsonDocument ParseStrictly(const QByteArray& text) {
@@ -74,7 +88,7 @@ QJsonDocument ParseStrictly(const QByteArray& text) {
   QJsonDocument document = QJsonDocument::fromJson(text, &error);
   if (error.error != QJsonParseError::NoError) {
     const auto offset = std::min<qsizetype>(error.offset, text.size());
-    RefuseAt(text, offset, QStringLiteral("this is not JSON (%1)").arg(error.errorString()));
+    RefuseAt(text, offset, QStringLiteral("this is not JSON (%1)").arg(WhyNotJson(error)));
   }
   StrictScan(text).Run();
   return document;
@@ -86,8 +100,11 @@ QByteArray JsonText(const QJsonValue& value) {
 }
 
 QString Quoted(const QJsonValue& value) {
-  const QString text = QString::fromUtf8(JsonText(value));
-  return text.size() <= kLongestQuote ? text : text.first(kLongestQuote) + QStringLiteral("...");
+  QString text = QString::fromUtf8(JsonText(value));
+  if (text.size() <= kLongestQuote) return text;
+  text.truncate(kLongestQuote);
+  if (text.back().isHighSurrogate()) text.chop(1);
+  return text + QLatin1StringView(value.isString() ? "...\"" : "...");
 }
 
 }  // namespace tendril::exchange

@@ -4,6 +4,7 @@
 #include <QRadioButton>
 
 #include "ui/list_combo_box.h"
+#include "ui/model/option_texts.h"
 
 namespace tendril {
 
@@ -12,22 +13,18 @@ ChannelChoices::ChannelChoices(ChannelEditor& editor, const ChannelTable& workin
     : editor_(editor), working_(working), comparison_(comparison) {
   auto* column = AddLayout<QVBoxLayout>(this, {}, 3);
   column->addWidget(MakePresets());
-  optChannelType_ = AddOptions(
-      QStringLiteral("Output"), "optChannelType",
-      {{QStringLiteral("Servo"), QStringLiteral("The port drives a hobby servo.")},
-       {QStringLiteral("Digital"), QStringLiteral("The port is switched on and off.")},
-       {QStringLiteral("PWM"), QStringLiteral("The port gives out a pulse-width modulated signal.")}},
-      QBoxLayout::LeftToRight);
-  optPowerUp_ = AddOptions(
-      QStringLiteral("Power Up Parameters"), "optPowerUp",
-      Choices({"Move to Default Position", "Move to Neutral Position", "Start Pulse on First Command"},
-              " when the unit is switched on."),
-      QBoxLayout::TopToBottom);
-  optLostComm_ = AddOptions(QStringLiteral("Lost Communications Parameters"), "optLostComm",
-                            Choices({"Hold at Current Position", "Move to Default Position",
-                                     "Move to Neutral Position", "Stop Pulse / Start on First Command"},
-                                    " when the unit hears nothing any more."),
-                            QBoxLayout::TopToBottom);
+  optChannelType_ =
+      AddOptions(QStringLiteral("Output"), "optChannelType",
+                 {{QLatin1StringView(kOutputTexts[0]), QStringLiteral("The port drives a hobby servo.")},
+                  {QLatin1StringView(kOutputTexts[1]), QStringLiteral("The port is switched on and off.")},
+                  {QLatin1StringView(kOutputTexts[2]),
+                   QStringLiteral("The port gives out a pulse-width modulated signal.")}},
+                 QBoxLayout::LeftToRight);
+  optPowerUp_ = AddOptions(QStringLiteral("Power Up Parameters"), "optPowerUp",
+                           Choices(kPowerUpTexts, " when the unit is switched on."), QBoxLayout::TopToBottom);
+  optLostComm_ =
+      AddOptions(QStringLiteral("Lost Communications Parameters"), "optLostComm",
+                 Choices(kLostCommTexts, " when the unit hears nothing any more."), QBoxLayout::TopToBottom);
   column->addStretch();
   connect(optChannelType_, &QButtonGroup::idClicked, this,
           [this](int id) { Q_EMIT KindChosen(static_cast<std::int16_t>(id - 1)); });
@@ -41,7 +38,7 @@ ChannelChoices::ChannelChoices(ChannelEditor& editor, const ChannelTable& workin
   });
 }
 
-std::vector<ChannelChoices::Choice> ChannelChoices::Choices(std::initializer_list<const char*> captions,
+std::vector<ChannelChoices::Choice> ChannelChoices::Choices(std::span<const char* const> captions,
                                                             const char* when) {
   std::vector<Choice> choices;
   for (const char* text : captions) {

@@ -7,6 +7,7 @@
 #include <QWidget>
 #include <cstddef>
 #include <cstdint>
+#include <span>
 #include <vector>
 
 #include "config/channel_config.h"
@@ -20,8 +21,8 @@ class ChannelChoices : public QWidget {
   Q_OBJECT
 
  public:
-  // `editor`, `working`, its records, and what compares them must outlive the area. The preset that the records start from is selected,
-  // but not applied.
+  // `editor`, `working`, its records, and what compares them must outlive the area. The preset that the records start
+  // from is selected, but not applied.
   ChannelChoices(ChannelEditor& editor, const ChannelTable& working, const Comparison& comparison);
 
   // Selects this row of kPresets, and applies nothing.
@@ -47,7 +48,7 @@ class ChannelChoices : public QWidget {
     QString tip;
   };
 
-  static std::vector<Choice> Choices(std::initializer_list<const char*> captions, const char* when);
+  static std::vector<Choice> Choices(std::span<const char* const> captions, const char* when);
   QWidget* MakePresets();
   void EnableOptions();
   QButtonGroup* AddOptions(const QString& title, const char* array, const std::vector<Choice>& choices,

@@ -1,7 +1,6 @@
 #include "ui/comparison_signs.h"
 
 #include "platform/hex_text.h"
-#include "serial/packets.h"
 #include "ui/time_of_day.h"
 
 namespace tendril {
@@ -37,27 +36,30 @@ void ComparisonSigns::NoteCompared(std::uint8_t unit, const OptionTable& held) {
   Show();
 }
 
-void ComparisonSigns::NoteFailure() {
-  comparison_.ReadingFailed(Chosen());
+void ComparisonSigns::NoteFailure(bool cancelled) {
+  comparison_.ReadingFailed(Chosen(), cancelled);
   Show();
 }
 
-void ComparisonSigns::NoteBegun(bool writes, bool changes_id) {
+void ComparisonSigns::NoteWriting() {
+  comparison_.WritingBegins(Chosen());
+  Show();
+}
+
+void ComparisonSigns::NoteBegun(bool changes_id) {
   Offer(std::nullopt);
-  if (writes) comparison_.WritingBegins(Chosen());
   // The unit may be found at another ID from now on.
   if (changes_id && comparison_.Place().port == link_.CommPort()) comparison_.End();
   Show();
 }
 
 void ComparisonSigns::NoteRead(std::uint8_t unit) {
-  if (comparison_.Place() == UnitPlace{link_.CommPort(), unit}) comparison_.End();
+  if (MayBeSameUnit(comparison_.Place(), {link_.CommPort(), unit})) comparison_.End();
 }
 
 void ComparisonSigns::NoteSent(std::uint8_t unit) {
   const UnitPlace sent{link_.CommPort(), unit};
-  const UnitPlace& place = comparison_.Place();
-  if (place == sent || (place.port == sent.port && unit == kAllUnits)) Dismiss();
+  if (MayBeSameUnit(comparison_.Place(), sent)) Dismiss();
   Offer(sent);
 }
 

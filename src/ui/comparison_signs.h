@@ -35,10 +35,12 @@ class ComparisonSigns {
   void Show();
   // A compare has read `unit`, which held this.
   void NoteCompared(std::uint8_t unit, const OptionTable& held);
-  // The compare that runs, or was to run, has failed or was cancelled.
-  void NoteFailure();
-  // A command begins. `writes`: it is a send. `changes_id`: it gives a unit another ID.
-  void NoteBegun(bool writes, bool changes_id);
+  // The compare that ran, or was to run, has failed or was `cancelled`.
+  void NoteFailure(bool cancelled);
+  // A send has begun to write into the chosen unit.
+  void NoteWriting();
+  // A command begins. `changes_id`: it gives a unit another ID.
+  void NoteBegun(bool changes_id);
   // The records were just read from `unit`, or sent to it.
   void NoteRead(std::uint8_t unit);
   void NoteSent(std::uint8_t unit);

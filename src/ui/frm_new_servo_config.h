@@ -82,6 +82,7 @@ class frmNewServoConfig : public QMainWindow {
   void OnReport(const CommandReport& report);
   void OnCompared(std::uint8_t unit, const OptionTable& held);
   void OnBegun();
+  void OnWriting();
   void RestoreReading();
   void Copy();
   void CopyConfiguration();

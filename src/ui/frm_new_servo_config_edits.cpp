@@ -144,28 +144,31 @@ void frmNewServoConfig::OnCompared(std::uint8_t unit, const OptionTable& held) {
     records.At(slot) = DecodeOptions(held[slot]);
     records.At(slot).Received = false;
   }
-  readings_.Keep(link_.CommPort(), unit, records, IsoTime());  // known, should a send follow
+  readings_.KeepCompared(link_.CommPort(), unit, records, IsoTime());  // known, should a send follow
   compared_.NoteCompared(unit, held);
   outcome_spoken_ = QString::fromStdString(comparison_.Sentence());
 }
 
 void frmNewServoConfig::OnReport(const CommandReport& report) {
   QString sentence = QString::fromStdString(report.Sentence(TimeOfDay()));
+  if (commands_.send.TakeWriting()) OnWriting();
   if (report.outcome.empty()) {
     OnBegun();
   } else {
     sentence += std::exchange(outcome_note_, {});
-    if (commands_.compare.TakeFailure()) compared_.NoteFailure();
+    if (commands_.compare.TakeFailure()) compared_.NoteFailure(report.cancelled);
   }
   status_->Say(sentence, std::exchange(outcome_spoken_, {}));
 }
 
-// Keeps what the status bar says beside the command's outcome.
 void frmNewServoConfig::OnBegun() {
   status_->OfferUndo({});  // it is off while a command runs
-  const UnitOperation* const command = commands_.running.Operation();
-  compared_.NoteBegun(command == &commands_.send, command == &commands_.change_id);
-  if (command != &commands_.send) return;
+  compared_.NoteBegun(commands_.running.Operation() == &commands_.change_id);
+}
+
+// A send has begun to write, before it runs. Keeps what the status bar says beside its outcome.
+void frmNewServoConfig::OnWriting() {
+  compared_.NoteWriting();
   if (!dropped_.isEmpty())
     NoteOutcome(QStringLiteral("Sent without the %1 that was typed.").arg(std::exchange(dropped_, {})));
   const std::uint8_t unit = connection_->UnitId();

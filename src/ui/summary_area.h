@@ -28,8 +28,8 @@ class SummaryArea : public QWidget {
   Q_OBJECT
 
  public:
-  // `working` are the records that are shown, and `comparison` compares. Both must outlive the area. `parent` is in the window already, which owns
-  // the number entry.
+  // `working` are the records that are shown, and `comparison` compares. Both must outlive the area. `parent` is in the
+  // window already, which owns the number entry.
   SummaryArea(TimerFactory& timers, ChannelTable& working, const Comparison& comparison, QWidget* parent);
 
   // Shows all records as they are.

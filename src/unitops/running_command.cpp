@@ -43,7 +43,7 @@ void RunningCommand::EndCommandProgress(Outcome outcome, const std::string& text
   value_ = kEnded;
   tmrProgress_->SetInterval(kShowOutcomeMs);
   tmrProgress_->SetEnabled(true);
-  Report({what, (cancelled_ ? "Cancelled: " : "") + text, std::move(aftermath)});
+  Report({what, text, std::move(aftermath), cancelled_});
 }
 
 void RunningCommand::Stop() {

@@ -30,6 +30,7 @@ std::string SendOperation::Prepare() {
   unanswered_ = 0;
   written_ = 0;
   perhaps_written_ = false;
+  writing_taken_ = false;
   unit_ = UnitId();
   return "Sending to unit " + HexByte(unit_);
 }

@@ -4,6 +4,7 @@
 #include <cstdint>
 #include <functional>
 #include <string>
+#include <utility>
 
 #include "config/channel_config.h"
 #include "unitops/unit_operation.h"
@@ -26,6 +27,10 @@ class SendOperation final : public UnitOperation {
   // last of them, while the command still runs. Context and records must outlive the operation.
   SendOperation(CommandContext& context, const ChannelTable& working,
                 std::function<void(std::uint8_t unit)> on_sent);
+
+  // Whether a send has begun to write into its unit, or perhaps has, since the last call. A send can do so and then not
+  // be able to run.
+  bool TakeWriting() { return (written_ > 0 || perhaps_written_) && !std::exchange(writing_taken_, true); }
 
   // Encodes the record of slot `port_index` and sends it as options to the chosen unit. False: a field is invalid,
   // which has been shown, and nothing was sent. Raises what the link raises, and kErrOutOfRange for an index above 8.
@@ -51,7 +56,8 @@ class SendOperation final : public UnitOperation {
   std::uint8_t port_index_ = 0;
   std::int32_t written_ = 0;      // ports whose options the unit has accepted
   bool perhaps_written_ = false;  // the next port's options may have gone out
-  std::int32_t unanswered_ = 0;   // polls of the current port without a reply
+  bool writing_taken_ = false;
+  std::int32_t unanswered_ = 0;  // polls of the current port without a reply
 };
 
 }  // namespace tendril

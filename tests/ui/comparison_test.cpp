@@ -125,5 +125,41 @@ TEST_F(Compared, StaysAboutItsUnitUntilThatIsReadAnew) {
   EXPECT_FALSE(Visible("lblCompared"));
 }
 
+TEST_F(Compared, UnitAtFF_IsAnyUnitThatIsSentToOrRead) {
+  const auto choose = [&](int id) {
+    ChooseByKeys("CmbUnitID_0", id / 16);
+    ChooseByKeys("CmbUnitID_1", id % 16);
+  };
+  const std::string fresh = "Unit FF, not the chosen one, holds exactly this";
+  for (const char* button : {"Command3_0", "Command3_1"}) {
+    choose(0xFF);
+    Run("cmdCompare_0");
+    choose(0x01);
+    EXPECT_EQ(Text("lblCompared"), fresh);
+    Run(button);
+    EXPECT_FALSE(Visible("lblCompared")) << button;
+  }
+  choose(0xFF);
+  Run("cmdCompare_0");
+  choose(0x01);
+  world_.bench.Unplug(1);
+  world_.time.Advance(1000);
+  Press("Command3_0");
+  EXPECT_THAT(Text("lblStatus"), EndsWith("Nothing is written."));
+  EXPECT_EQ(Text("lblCompared"), fresh);
+  world_.bench.Replug(1);
+  link_.cmdPollStation(0x02, '*');  // a send cannot poll now
+  Press("Command3_0");
+  EXPECT_THAT(Text("lblStatus"), HasSubstr("Stopped. Port 1 is perhaps written, 2 to 8 are not."));
+  EXPECT_THAT(Text("lblCompared"), EndsWith("; sent to since"));
+  world_.time.Advance(1000);
+  choose(0xFF);
+  Run("cmdCompare_0");
+  Press("cmdCompare_0");
+  Press("cmdCancel");
+  RunToTheEnd();
+  EXPECT_THAT(Text("lblCompared"), EndsWith("; reading it again was cancelled"));
+}
+
 }  // namespace
 }  // namespace tendril::test

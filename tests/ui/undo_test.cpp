@@ -221,7 +221,11 @@ TEST_F(Undoing, NamesTheOriginAndTheWayBack) {
   EXPECT_THAT(Text("lblOrigin"), AllOf(StartsWith("Sent to 01 at "), EndsWith("all channels changed since")));
   Redo();
   EXPECT_THAT(Text("lblOrigin"), Not(HasSubstr("changed since")));
-  Click("Command3_1");  // what was sent is read again: the way back stays
+  Click("cmdCompare_0");  // reads what was sent: the way back stays
+  RunToTheEnd();
+  Click("Command3_0");
+  RunToTheEnd();
+  Click("Command3_1");  // so does a get
   RunToTheEnd();
   EXPECT_TRUE(Records() == preset);
   Item("Restore What Unit 01 Held at ").trigger();

@@ -1,10 +1,11 @@
 #include "ui/model/comparison.h"
 
+#include <algorithm>
 #include <array>
 #include <span>
 
 #include "platform/hex_text.h"
-#include "serial/packets.h"
+#include "ui/model/option_texts.h"
 
 namespace tendril {
 namespace {
@@ -31,12 +32,6 @@ constexpr std::array<Part, 10> kParts{{{"Output", kOutputField, kOutputField},
                                        {"Power up", kPowerUpField, kPowerUpField},
                                        {"Lost communications", kLostCommField, kLostCommField}}};
 
-constexpr std::array kKinds{"Servo", "Digital", "PWM"};
-constexpr std::array kPowerUps{"Move to Default Position", "Move to Neutral Position",
-                               "Start Pulse on First Command"};
-constexpr std::array kLostComms{"Hold at Current Position", "Move to Default Position",
-                                "Move to Neutral Position", "Stop Pulse / Start on First Command"};
-
 Microseconds PulseWidth(const ChannelConfig& record, std::size_t field) {
   const std::array widths{record.ActualRange[0],  record.ActualRange[1],  record.VirtualRange[0],
                           record.VirtualRange[1], record.VirtualStops[0], record.VirtualStops[1],
@@ -62,11 +57,11 @@ std::string Word(std::span<const char* const> words, std::uint8_t flags, FlagsOf
 std::string Here(const ChannelConfig& record, std::size_t field) {
   switch (field) {
     case kOutputField:
-      return Word(kKinds, record.PortType + 1);
+      return Word(kOutputTexts, record.PortType + 1);
     case kPowerUpField:
-      return Word(kPowerUps, record.PowerUPOpt);
+      return Word(kPowerUpTexts, record.PowerUPOpt);
     case kLostCommField:
-      return Word(kLostComms, record.LostCommOption);
+      return Word(kLostCommTexts, record.LostCommOption);
     default:
       return std::to_string(PulseWidth(record, field));
   }
@@ -76,11 +71,11 @@ std::string Held(const OptionBytes& held, std::size_t field) {
   const auto flags = [&held](std::uint8_t mask) { return static_cast<std::uint8_t>(held[0] & mask); };
   switch (field) {
     case kOutputField:
-      return Word(kKinds, flags(kKindFlags));
+      return Word(kOutputTexts, flags(kKindFlags));
     case kPowerUpField:
-      return Word(kPowerUps, flags(kPowerUpFlags), FlagsOfPowerUp);
+      return Word(kPowerUpTexts, flags(kPowerUpFlags), FlagsOfPowerUp);
     case kLostCommField:
-      return Word(kLostComms, flags(kLostCommFlags), FlagsOfLostComm);
+      return Word(kLostCommTexts, flags(kLostCommFlags), FlagsOfLostComm);
     default:
       return std::to_string(held.at(field) * kPulseResolution);
   }
@@ -99,12 +94,12 @@ void Comparison::Begin(const UnitPlace& place, const OptionTable& held, const st
   age_ = Age::kFresh;
 }
 
-void Comparison::ReadingFailed(const UnitPlace& place) {
-  if (place == place_) age_ = Age::kReadingFailed;
+void Comparison::ReadingFailed(const UnitPlace& place, bool cancelled) {
+  if (place == place_) age_ = std::max(age_, cancelled ? Age::kReadingCancelled : Age::kReadingFailed);
 }
 
 void Comparison::WritingBegins(const UnitPlace& place) {
-  if (place == place_ || (place.port == place_.port && place.unit == kAllUnits)) age_ = Age::kSentSince;
+  if (MayBeSameUnit(place, place_)) age_ = Age::kSentSince;
 }
 
 bool Comparison::Differs(std::size_t channel, std::size_t field) const {
@@ -182,6 +177,7 @@ std::string Comparison::Sentence() const {
                           : (old ? " differed: " : " differs: ") + Counted(values, "value") + " of " +
                                 Counted(channels, "channel");
   if (old) sentence += " at " + time_;
+  if (age_ == Age::kReadingCancelled) sentence += "; reading it again was cancelled";
   if (age_ == Age::kReadingFailed) sentence += "; reading it again failed";
   if (age_ == Age::kSentSince) sentence += "; sent to since";
   return sentence;

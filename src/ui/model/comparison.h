@@ -2,22 +2,14 @@
 #pragma once
 
 #include <cstddef>
-#include <cstdint>
 #include <optional>
 #include <string>
 
 #include "config/channel_config.h"
 #include "config/option_bytes.h"
+#include "ui/model/unit_place.h"
 
 namespace tendril {
-
-// A unit ID, on comm port `port`. On another port it is another unit.
-struct UnitPlace {
-  std::int16_t port = 0;
-  std::uint8_t unit = 0;
-
-  friend bool operator==(const UnitPlace&, const UnitPlace&) = default;
-};
 
 // What the window shows of a channel in one place. A range has two values, and so do both stops together.
 enum class ComparedPart {
@@ -50,9 +42,9 @@ class Comparison {
 
   // This unit is chosen now. What is said of another one names it.
   void Choose(const UnitPlace& chosen) { chosen_ = chosen; }
-  // The unit at `place` was asked again, and could not be read.
-  void ReadingFailed(const UnitPlace& place);
-  // Something is about to be written into the unit at `place`; FF is every unit on the port.
+  // The unit at `place` was asked again, and could not be read, or the user has `cancelled` that.
+  void ReadingFailed(const UnitPlace& place, bool cancelled);
+  // Something is being written into the unit at `place`; FF is every unit on the port.
   void WritingBegins(const UnitPlace& place);
 
   // The number of values of `channel`, 0 to 7, that differ: the output kind, eight pulse widths and two options.
@@ -69,7 +61,8 @@ class Comparison {
   std::string Reading() const;
 
  private:
-  enum class Age { kFresh, kReadingFailed, kSentSince };
+  // The worse, the later.
+  enum class Age { kFresh, kReadingCancelled, kReadingFailed, kSentSince };
 
   bool Differs(std::size_t channel, std::size_t field) const;
   std::string UnitName() const;

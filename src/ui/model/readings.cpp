@@ -1,12 +1,12 @@
 #include "ui/model/readings.h"
 
-#include "serial/packets.h"
+#include "ui/model/unit_place.h"
 
 namespace tendril {
 
 bool Readings::SendBegins(std::int16_t port, std::uint8_t unit) {
   for (auto& [place, kept] : units_) {
-    const bool meant = place.first == port && (place.second == unit || unit == kAllUnits);
+    const bool meant = MayBeSameUnit({place.first, place.second}, {port, unit});
     if (meant && kept.latest) kept.before_send = std::exchange(kept.latest, std::nullopt);
   }
   return !units_.try_emplace({port, unit}).second;

@@ -23,6 +23,11 @@ class Readings {
   void Keep(std::int16_t port, std::uint8_t unit, const ChannelTable& records, const std::string& time) {
     units_[{port, unit}].latest = {records, time};
   }
+  // The same, by a compare. The way back of a unit that was sent to stays: this may be what was sent.
+  void KeepCompared(std::int16_t port, std::uint8_t unit, const ChannelTable& records,
+                    const std::string& time) {
+    if (!units_[{port, unit}].before_send) Keep(port, unit, records, time);
+  }
   // A send to the unit, or with FF to every unit on the port, begins: the latest reading is the way back, until the next
   // send after another reading. False: the unit was neither read nor sent to before.
   bool SendBegins(std::int16_t port, std::uint8_t unit);

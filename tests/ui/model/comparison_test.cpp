@@ -84,16 +84,20 @@ TEST_F(Comparing, SaysAboutWhichUnitAndWhen) {
   comparison_.Choose({1, 0x02});
   expect("Unit 01, not the chosen one, differs: 4 values of 2 channels", "here PWM, unit 01: Servo");
   comparison_.Choose({2, 0x01});
-  comparison_.ReadingFailed({2, 0x01});
+  comparison_.ReadingFailed({2, 0x01}, false);
   comparison_.WritingBegins({2, 0xFF});
   expect("Unit 01 on Comm 1, not the chosen one, differs: 4 values of 2 channels",
          "here PWM, unit 01 on Comm 1: Servo");
   comparison_.Choose(kPlace);
-  comparison_.ReadingFailed(kPlace);
+  comparison_.ReadingFailed(kPlace, true);
+  expect("Unit 01 differed: 4 values of 2 channels at 14:02; reading it again was cancelled",
+         "here PWM, unit Servo at 14:02");
+  comparison_.ReadingFailed(kPlace, false);
   expect("Unit 01 differed: 4 values of 2 channels at 14:02; reading it again failed",
          "here PWM, unit Servo at 14:02");
   working_.At(7) = working_.At(2) = working_.At(0);
   comparison_.WritingBegins({1, 0xFF});
+  comparison_.ReadingFailed(kPlace, false);
   expect("Unit 01 held exactly this at 14:02; sent to since", "");
 }
 
