@@ -11,7 +11,7 @@
 
 namespace tendril {
 
-// Remarks on the records; and what is shown and not stored, with the button that stores it. The place of both is kept
+// Remarks on the records, with what differs from a unit; and what is shown and not stored, with the button that stores it. The place of both is kept
 // while they are empty. Where it is too low for both, the second covers the last lines of the first.
 class EditorNotes : public QWidget {
   Q_OBJECT
@@ -21,6 +21,8 @@ class EditorNotes : public QWidget {
 
   // Shows remarks on the records.
   void ShowRemarks(const std::vector<std::string>& sentences) { remarks_->ShowRemarks(sentences); }
+  // Shows lines about what differs from a unit.
+  void ShowDifferences(const QStringList& lines) { remarks_->ShowDifferences(lines); }
   // Shows what is not stored, and `store` on the button. An empty sentence shows neither.
   void ShowUnstored(const std::string& sentence, const std::string& store);
   // Enables the button unless there is a reason not to.

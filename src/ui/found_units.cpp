@@ -21,7 +21,6 @@ FoundUnits::FoundUnits(const UnitSearch& search, QWidget& window)
       lstUnits_(Named(new QTreeWidget, "lstUnits")),
       lblFound_(Named(new Announcement, "lblFound")) {
   setObjectName("FoundUnits");
-  setWindowTitle(QStringLiteral("Find Units"));
   lstUnits_->setHeaderLabels({QStringLiteral("ID"), QStringLiteral("What is there")});
   lstUnits_->setAccessibleName(QStringLiteral("Units found"));
   Describe(lstUnits_, "The units that answered, by ID. A click on a line, or Enter, chooses its ID.");
@@ -63,6 +62,7 @@ void FoundUnits::AddButtons() {
 }
 
 void FoundUnits::ShowSearch() {
+  setWindowTitle(QStringLiteral("Find Units on Comm %1").arg(search_.port));
   if (lstUnits_->topLevelItemCount() > static_cast<int>(search_.found.size())) lstUnits_->clear();
   const auto shown = static_cast<std::size_t>(lstUnits_->topLevelItemCount());
   for (std::size_t i = shown; i < search_.found.size(); ++i) AddUnit(search_.found[i]);

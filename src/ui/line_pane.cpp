@@ -19,6 +19,7 @@ constexpr std::int32_t kUpdateMs = 100;  // painting takes more than a milliseco
 constexpr int kRowsAtFirst = 7;
 constexpr int kLeastRows = 2;
 constexpr int kCellMargin = 12;
+constexpr int kWideWindow = 1000;  // the longest verdict has two lines, in a narrower one three
 
 // The Home and End keys go to the first and the last line, also when that is the current one out of view. Without a
 // current line the keys start at the last one in view.
@@ -130,6 +131,7 @@ QLayout* LinePane::MakeHeader() {
   lblVerdict_->setTextFormat(Qt::PlainText);
   lblVerdict_->setWordWrap(true);
   lblVerdict_->setTextInteractionFlags(Qt::TextSelectableByMouse | Qt::TextSelectableByKeyboard);
+  KeepRoomForVerdict();
   chkFollow_->setChecked(true);
   connect(chkFollow_, &QAbstractButton::clicked, this, &LinePane::Follow);
   connect(chkPause_, &QAbstractButton::toggled, this, &LinePane::Pause);
@@ -186,8 +188,21 @@ void LinePane::SetUpTable() {
 
 void LinePane::Open() {
   focus_before_ = window()->focusWidget();
+  KeepRoomForVerdict();
   show();
   lines_->setFocus();
+}
+
+void LinePane::resizeEvent(QResizeEvent* event) {
+  QDockWidget::resizeEvent(event);
+  KeepRoomForVerdict();
+}
+
+// No verdict changes the height of the pane.
+void LinePane::KeepRoomForVerdict() {
+  const bool narrow = parentWidget() != nullptr && window()->width() < kWideWindow;
+  const int lines = narrow ? 3 : 2;
+  lblVerdict_->setFixedHeight(lines * lblVerdict_->fontMetrics().lineSpacing());
 }
 
 void LinePane::showEvent(QShowEvent* event) {
@@ -236,6 +251,7 @@ void LinePane::ShowVerdict() {
   verdict_ = verdict;
   const QString sentence = QString::fromStdString(verdict.sentence);
   lblVerdict_->setText(sentence);
+  lblVerdict_->setToolTip(sentence);
   const auto sign = SignOf(verdict.kind);
   if (sign) sign_->SetKind(*sign);
   sign_->setVisible(sign.has_value());

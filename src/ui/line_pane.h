@@ -44,6 +44,7 @@ class LinePane : public QDockWidget {
   void Said(const QString& sentence);
 
  protected:
+  void resizeEvent(QResizeEvent* event) override;
   void showEvent(QShowEvent* event) override;
   void hideEvent(QHideEvent* event) override;
 
@@ -52,6 +53,7 @@ class LinePane : public QDockWidget {
   QLayout* MakeHeader();
   void OnChanged();
   void Update();
+  void KeepRoomForVerdict();
   void ShowVerdict();
   void ShowWaiting();
   void Pause(bool paused);

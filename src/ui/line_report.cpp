@@ -10,6 +10,14 @@
 namespace tendril {
 namespace {
 
+// The local time, as the lines have it, with its offset from UTC. Qt writes "Z" for an offset of zero.
+QString LocalTime() {
+  const QDateTime now = QDateTime::currentDateTime();
+  return now.toOffsetFromUtc(now.offsetFromUtc())
+      .toString(Qt::ISODate)
+      .replace(QLatin1Char('Z'), QStringLiteral("+00:00"));
+}
+
 QString DescribePort(const HwSerial& link) {
   const std::int16_t number = link.CommPort();
   if (number == 0) return QStringLiteral("none chosen");
@@ -32,14 +40,13 @@ QString TableLine(Text text) {
 QString LineReport(const ProgramInfo& info, const HwSerial& link, std::uint8_t unit,
                    const std::string& verdict, const std::deque<TraceEntry>& entries) {
   const std::size_t lines = std::min(entries.size(), kReportedLines);
-  const QDateTime now = QDateTime::currentDateTime();
   QString report = QStringLiteral("Tendril Configuration Utility %1\n").arg(info.version.Text());
   const auto add = [&report](const char* what, const QString& value) {
     report += QString::fromLatin1(what) + QStringLiteral(": ") + value + QLatin1Char('\n');
   };
   add("System", DescribeSystem());
   add("Qt", DescribeQt());
-  add("Copied", now.toOffsetFromUtc(now.offsetFromUtc()).toString(Qt::ISODate));
+  add("Copied", LocalTime());
   add("Port", DescribePort(link));
   add("Unit", QString::fromStdString(HexByte(unit)));
   add("Verdict", QString::fromStdString(verdict));

@@ -316,13 +316,17 @@ void MotionParameters::ShowValues() {
     spins_[i]->Show(value);
     captions_[i]->setText(CaptionOf(parameter, value.Value()));
     ShowPhysicalValue(parameter, values, *pulse_widths_[i]);
-    DescribeValue(i, unstored);
   }
+  DescribeValues(unstored);
 }
 
-void MotionParameters::ShowDifferences() {
-  const Unstored unstored(editor_, working_);
+void MotionParameters::ShowDifferences() { DescribeValues(Unstored(editor_, working_)); }
+
+void MotionParameters::DescribeValues(const Unstored& unstored) {
   for (std::size_t i = 0; i < kRows.size(); ++i) DescribeValue(i, unstored);
+  const auto channel = editor_.Channel();
+  const std::string differs = channel ? comparison_.InWords(*channel) : std::string();
+  notes_->ShowDifferences(QString::fromStdString(differs).split(QLatin1Char('\n'), Qt::SkipEmptyParts));
 }
 
 void MotionParameters::DescribeValue(std::size_t index, const Unstored& unstored) {

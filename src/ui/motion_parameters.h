@@ -32,7 +32,7 @@ class MotionParameters : public QGroupBox {
 
   // Shows values, limits and captions, and whether there is a channel to edit. Emits no signal.
   void ShowValues();
-  // Signs what differs from the unit that is compared. ShowValues() does it, too.
+  // Signs what differs from the unit that is compared, and says it in words. ShowValues() does it, too.
   void ShowDifferences();
   // Shows remarks on the records.
   void ShowRemarks(const std::vector<std::string>& sentences) { notes_->ShowRemarks(sentences); }
@@ -69,6 +69,7 @@ class MotionParameters : public QGroupBox {
   void AddSpacing(QGridLayout& grid);
   void MakePressable(QLabel* label);
   void ShowHasChannel();
+  void DescribeValues(const Unstored& unstored);
   void DescribeValue(std::size_t index, const Unstored& unstored);
   void OnStore();
 

@@ -68,6 +68,7 @@ StatusLine::StatusLine()
 
 void StatusLine::resizeEvent(QResizeEvent* event) {
   QStatusBar::resizeEvent(event);
+  compared_->setMaximumWidth(width() * 2 / 5);  // the sentence matters more
   ArrangeFacts();
 }
 

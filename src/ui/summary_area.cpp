@@ -249,6 +249,7 @@ void SummaryArea::NormaliseAndShowRecords() {
 void SummaryArea::ShowRecords() {
   entry_->Close();
   for (std::size_t channel = 0; channel < kPortCount; ++channel) ShowRow(channel);
+  ShowDifferencesInWords();
 }
 
 void SummaryArea::ShowRow(std::size_t channel) {
@@ -281,6 +282,17 @@ void SummaryArea::ShowTexts(std::size_t channel) {
 
 void SummaryArea::ShowDifferences() {
   for (std::size_t channel = 0; channel < kPortCount; ++channel) ShowDifferences(channel);
+  ShowDifferencesInWords();
+}
+
+void SummaryArea::ShowDifferencesInWords() {
+  QStringList lines;
+  for (std::size_t channel = 0; channel < kPortCount; ++channel) {
+    const QString differs = QString::fromStdString(comparison_.InWords(channel));
+    for (const QString& line : differs.split(QLatin1Char('\n'), Qt::SkipEmptyParts))
+      lines += QStringLiteral("Channel %1: %2").arg(channel + 1).arg(line);
+  }
+  remarks_->ShowDifferences(lines);
 }
 
 // A row without values and options is signed as a whole, whatever differs.

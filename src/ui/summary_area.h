@@ -36,7 +36,7 @@ class SummaryArea : public QWidget {
   void ShowRecords();
   // Brings all records into their bounds, and shows them.
   void NormaliseAndShowRecords();
-  // Signs what differs from the unit that is compared. What shows records does it, too.
+  // Signs what differs from the unit that is compared, and says it in words. What shows records does it, too.
   void ShowDifferences();
   // Shows remarks on the records.
   void ShowRemarks(const std::vector<std::string>& sentences) { remarks_->ShowRemarks(sentences); }
@@ -83,6 +83,7 @@ class SummaryArea : public QWidget {
   void ShowRow(std::size_t channel);
   void ShowTexts(std::size_t channel);
   void ShowDifferences(std::size_t channel);
+  void ShowDifferencesInWords();
 
   ChannelTable& working_;
   const Comparison& comparison_;

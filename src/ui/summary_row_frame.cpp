@@ -10,6 +10,7 @@ namespace {
 
 constexpr QSizeF kBadge(13, 9);
 constexpr double kBadgeSign = 7;  // in whole pixels its lines are crisp
+constexpr double kEdge = 2;       // around a value
 constexpr double kOptionSign = 10;
 constexpr double kOptionGap = 3;
 
@@ -43,6 +44,8 @@ void SummaryRowFrame::paintEvent(QPaintEvent* /*event*/) {
           QRectF(place.right() + kOptionGap, place.center().y() - kOptionSign / 2, kOptionSign, kOptionSign),
           palette().color(QPalette::WindowText));
     } else {
+      painter.setPen(QPen(palette().color(QPalette::WindowText), kEdge));
+      painter.drawRect(place.adjusted(-kEdge / 2, -kEdge / 2, kEdge / 2, kEdge / 2));
       PaintBadge(painter, {place.left() + 1, place.top() - kBadge.height() + 1}, palette());
     }
   }

@@ -27,6 +27,7 @@ FindOperation::FindOperation(CommandContext& context, const LineTrace& trace,
 
 std::string FindOperation::Prepare() {
   search_ = {};
+  search_.port = Link().CommPort();
   again_ = false;
   return "Finding units";
 }
@@ -80,7 +81,7 @@ void FindOperation::OnLastReply(bool replied, const Bytes& data) {
 }
 
 void FindOperation::ShowSearch() {
-  ShowStep(search_.Step());
+  ShowStep(search_.Step(), search_.Part());
   if (on_searched_) on_searched_();
 }
 

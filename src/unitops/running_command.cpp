@@ -1,5 +1,7 @@
 #include "unitops/running_command.h"
 
+#include <cmath>
+
 namespace tendril {
 namespace {
 
@@ -17,6 +19,7 @@ void RunningCommand::StartCommandProgress(UnitOperation& operation, std::string 
   what_ = std::move(what);
   cancelled_ = false;
   value_ = kStep;
+  part_.reset();
   if (observer_) observer_();
   view_.SetText("");
   view_.SetTitle(what_);
@@ -26,6 +29,16 @@ void RunningCommand::StartCommandProgress(UnitOperation& operation, std::string 
   tmrProgress_->SetInterval(kGrowPeriodMs);
   tmrProgress_->SetEnabled(true);
   Report({what_, {}, {}});
+}
+
+void RunningCommand::ShowStep(const std::string& step, std::optional<double> part) {
+  view_.SetTitle(what_ + ": " + step);
+  part_ = part;
+  if (part_) ShowPart();
+}
+
+void RunningCommand::ShowPart() {
+  view_.SetBarWidth(static_cast<int>(std::lround(*part_ * view_.FrameWidth())));
 }
 
 void RunningCommand::SetCancelled() {
@@ -70,6 +83,7 @@ void RunningCommand::OnTick() {
     view_.SetBarWidth(kStep);
     return;
   }
+  if (part_) return ShowPart();  // the frame may have another width
   // A full bar waits for the command's end, or for a wider frame.
   if (value_ < view_.FrameWidth()) {
     value_ += kStep;

@@ -4,6 +4,7 @@
 #include <cstdint>
 #include <functional>
 #include <memory>
+#include <optional>
 #include <string>
 #include <utility>
 
@@ -37,8 +38,8 @@ class CommandProgressView {
   virtual void SetText(const std::string& text) = 0;
 };
 
-// At most one command runs. The display shows it, then for three seconds how it ended. The bar is an animation only:
-// it counts nothing and sets no time limit.
+// At most one command runs. The display shows it, then for three seconds how it ended. The bar is an animation
+// that counts nothing and sets no time limit, unless the command says what part of it is done.
 class RunningCommand {
  public:
   // `view` must outlive it.
@@ -60,8 +61,9 @@ class RunningCommand {
 
   // `operation` runs from now on: shows the empty bar and lets it grow. `what` as above.
   void StartCommandProgress(UnitOperation& operation, std::string what);
-  // Shows how far the command is ("port 3 of 8").
-  void ShowStep(const std::string& step) { view_.SetTitle(what_ + ": " + step); }
+  // Shows how far the command is ("port 3 of 8"). With `part`, 0 to 1, the bar shows that from now on and grows no more
+  // by itself.
+  void ShowStep(const std::string& step, std::optional<double> part = {});
   // The user has cancelled the command, which runs until its outstanding poll has ended.
   void SetCancelled();
   // Ends the command and shows `text` in green or red for three seconds. `aftermath`: see CommandReport.
@@ -74,6 +76,7 @@ class RunningCommand {
 
  private:
   void OnTick();
+  void ShowPart();
   void Report(const CommandReport& report);
 
   CommandProgressView& view_;
@@ -84,6 +87,8 @@ class RunningCommand {
   std::string what_;
   bool cancelled_ = false;
   std::int32_t value_ = kEnded;  // the bar's width; kEnded while an outcome is shown, or nothing
+
+  std::optional<double> part_;  // what the bar shows; empty: it grows
 
   static constexpr std::int32_t kEnded = -1;
 };

@@ -81,7 +81,9 @@ class UnitOperation {
   // The operation cannot begin: shows `box`.
   void Refuse(const BoxMessage& box);
   // See RunningCommand::ShowStep().
-  void ShowStep(const std::string& step) { context_.running.ShowStep(step); }
+  void ShowStep(const std::string& step, std::optional<double> part = {}) {
+    context_.running.ShowStep(step, part);
+  }
   // Ends the operation and shows `text` in the progress display.
   void Succeed(const std::string& text);
   // Ends the operation as failed and shows `box`.

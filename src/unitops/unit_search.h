@@ -30,6 +30,7 @@ struct FoundUnit {
 struct UnitSearch {
   static constexpr int kIds = kLastUnitId - kFirstUnitId + 1;
 
+  std::int16_t port = 0;         // the comm port; 0 for none
   int polled = 0;                // IDs that have been polled
   std::vector<FoundUnit> found;  // in order of ID
   std::string fault = {};        // what the last poll says about the adapter: a sentence; empty for nothing
@@ -38,6 +39,8 @@ struct UnitSearch {
   void Add(std::uint8_t id, FoundUnit::What what);
   // "57 of 253, 3 found".
   std::string Step() const;
+  // What part of the IDs has been polled, 0 to 1.
+  double Part() const { return static_cast<double>(polled) / kIds; }
   // The result, and what to do next: "3 units found: 01, 0A and 7F; perhaps several at 20."
   std::string Sentence() const;
 

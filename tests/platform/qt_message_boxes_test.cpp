@@ -45,6 +45,17 @@ TEST(QtMessageBoxes, Message_IsShownAsPlainTextOverItsWindow) {
   });
   boxes.Show({"<b>low</b> > high\r\n\r\n1500 \u00b5s", "Comm Error!", BoxIcon::kCritical});
   EXPECT_TRUE(seen);
+
+  window.show();
+  QDialog list(&window);
+  list.show();
+  list.activateWindow();
+  ASSERT_TRUE(QTest::qWaitForWindowActive(&list));
+  OnNextBox([&](QMessageBox& box) {
+    EXPECT_EQ(box.parentWidget(), &list);
+    box.accept();
+  });
+  boxes.Show({"text", ""});
 }
 
 TEST(QtMessageBoxes, Question_IsYesOnlyForYes) {

@@ -8,6 +8,7 @@ namespace {
 
 using testing::EndsWith;
 using testing::HasSubstr;
+using testing::MatchesRegex;
 using testing::Not;
 
 class Compared : public Window {
@@ -49,6 +50,7 @@ TEST_F(Compared, EveryPlaceSignsWhatDiffers) {
   const QImage signed_picture = Find("ServoSimulator2_2").grab().toImage();
   Click("ServoSimulator2_2");
   EXPECT_THAT(Said("spnNeutralTrim"), EndsWith("now 1500 µs.\n≠ here 1500, unit 1510"));
+  EXPECT_EQ(Text("lblRemarks_0"), "≠ Neutral position: here 1500, unit 1510");
 
   Press("cmdShowSummary");
   world_.time.Advance(20);
@@ -56,6 +58,8 @@ TEST_F(Compared, EveryPlaceSignsWhatDiffers) {
   EXPECT_THAT(Said("txtSumNeutralPosition_2"), EndsWith("\n≠ here 1500, unit 1510"));
   EXPECT_THAT(Said("optSumLCfirstcmd_4"), EndsWith(lost_comm));
   EXPECT_EQ(Said("lblSumChannel_5"), "≠ here Servo, unit Digital");
+  EXPECT_THAT(Text("lblRemarks_1"), MatchesRegex("≠ Channel 3: Neutral position: here 1500, unit 1510\n"
+                                                 "≠ Channel 5: Lost communications: .*\nand 2 more"));
   Click("txtSumNeutralPosition_2");
   QTest::keyClick(&Spin("spnSumValue_0"), Qt::Key_Up);  // takes the virtual range and the stops with it
   EXPECT_EQ(Text("lblCompared"), "Unit 01 differs: 6 values of 3 channels");
@@ -64,7 +68,10 @@ TEST_F(Compared, EveryPlaceSignsWhatDiffers) {
   EXPECT_EQ(Text("lblCompared"), "Unit 01 differs: 4 values of 3 channels");
   EXPECT_EQ(Find("frmSumTable_2").grab().toImage(), row);
 
+  window_->resize(880, 600);
+  EXPECT_LE(Find("lblCompared").parentWidget()->width(), 352) << "the sentence beside it matters more";
   Press("cmdDismiss");
+  EXPECT_EQ(Text("lblRemarks_1"), "");
   EXPECT_FALSE(Visible("cmdDismiss") || Visible("lblCompared"));
   EXPECT_NE(Find("frmSumTable_2").grab().toImage(), row);
   Press("cmdShowConfig");
@@ -118,8 +125,7 @@ TEST_F(Compared, StaysAboutItsUnitUntilThatIsReadAnew) {
   ChooseByKeys("CmbUnitID_1", 1);
   world_.bench.Detach(1, unit_);
   Run("cmdCompare_0");
-  EXPECT_THAT(Text("lblCompared"),
-              testing::MatchesRegex("Unit 01 held exactly this at .*; reading it again failed"));
+  EXPECT_THAT(Text("lblCompared"), MatchesRegex("Unit 01 held exactly this at .*; reading it again failed"));
   ConnectUnit();
   Run("Command3_1");
   EXPECT_FALSE(Visible("lblCompared"));

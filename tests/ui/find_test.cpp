@@ -16,6 +16,8 @@ TEST_F(FindUnits, Line_ChoosesItsIdWhileTheSearchRuns) {
   world_.time.Advance(1300);
   auto& list = Find<QTreeWidget>("lstUnits");
   ASSERT_EQ(list.topLevelItemCount(), 2);
+  EXPECT_EQ(Find("FoundUnits").windowTitle().toStdString(), "Find Units on Comm 1");
+  EXPECT_LT(Find("ShapeProgress").width(), Find("pctProgress").width() / 5) << "12 of 253";
   list.setCurrentItem(list.topLevelItem(1));
   QTest::keyClick(&list, Qt::Key_Return);
   EXPECT_EQ(Find<QComboBox>("CmbUnitID_1").currentIndex(), 0x0C);

@@ -80,6 +80,21 @@ TEST_F(Line, Pane_FollowsTheLineUntilItIsScrolledBack) {
   EXPECT_EQ(world_.time.RunningTimers(), timers) << "hidden, it costs nothing";
 }
 
+TEST_F(Line, Verdict_ChangesNoHeight) {
+  window_->resize(880, 700);
+  Keys("F12");
+  QTest::qWait(50);
+  const QPoint place = PlaceOf("LinePane");
+  for (const int unit : {1, 2}) {
+    ChooseByKeys("CmbUnitID_1", unit);
+    Find<QLabel>("lblProgress").clear();
+    Press("Command3_1");
+    RunToTheEnd();
+    QTest::qWait(50);
+    EXPECT_EQ(PlaceOf("LinePane"), place) << Text("lblVerdict");
+  }
+}
+
 TEST_F(Line, Pause_KeepsWhatIsShownAndClearForgetsIt) {
   Keys("F12");
   Get();
@@ -111,6 +126,7 @@ TEST_F(Line, Copy_IsWhatSupportNeeds) {
                                       "unit.\nLines: the last 200 of "),
                             HasSubstr("\n\nTime\tFrom\tBytes\tMeaning\n"),
                             ContainsRegex("\n[0-9:]+\\.[0-9]+\tprogram\t00 2C 8A 56 00\tunlock unit 2C\n$")));
+  EXPECT_THAT(copied, ContainsRegex("\nCopied: [0-9T:-]+[+-][0-9:]+\n")) << "local, with the offset";
   EXPECT_EQ(std::count(copied.begin(), copied.end(), '\n'), 210);
   EXPECT_EQ(Text("lblStatus"), "Copied for support: version, system, port, verdict and the last 200 lines");
 

@@ -24,6 +24,10 @@ TEST_F(Progress, Bar_GrowsTenEvery15msUntilTheFrameIsFull) {
   Expect(60000, true, 400, ProgressColour::kBlue);
   progress_.frame_width = 421;
   Expect(60000, true, 430, ProgressColour::kBlue);
+  commands_.running.ShowStep("1 of 4", 0.25);
+  Expect(0, true, 105, ProgressColour::kBlue);
+  progress_.frame_width = 200;
+  Expect(60000, true, 50, ProgressColour::kBlue);
 }
 
 TEST_F(Progress, Outcome_StaysForThreeSecondsUnlessAnotherCommandStarts) {

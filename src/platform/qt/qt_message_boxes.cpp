@@ -83,12 +83,19 @@ bool QtMessageBoxes::AskYesNo(const BoxMessage& message) {
   return Ask(message, QMessageBox::Yes | QMessageBox::No) == QMessageBox::Yes;
 }
 
+// The window that the user is in gets the focus back. Never a modal one: a box would end with the box that it belongs to.
+QWidget* QtMessageBoxes::Owner() const {
+  QWidget* const active = QApplication::activeWindow();
+  const bool owned = active != nullptr && parent_ != nullptr && active->parentWidget() == parent_;
+  return owned && !active->isModal() ? active : parent_.data();
+}
+
 QMessageBox::StandardButton QtMessageBoxes::Ask(const BoxMessage& message,
                                                 QMessageBox::StandardButtons buttons) {
   if (closing_) return QMessageBox::NoButton;
 
   // On the heap: the parent may destroy the box.
-  const QPointer<CopyableBox> box = new CopyableBox(parent_);
+  const QPointer<CopyableBox> box = new CopyableBox(Owner());
   box->setObjectName(QLatin1String(kBoxName));
   box->setTextFormat(Qt::PlainText);  // a text with a "<" in it could become rich text
   box->setText(QString::fromStdString(message.text).replace(QLatin1String("\r\n"), QLatin1String("\n")));

@@ -18,7 +18,7 @@ class QtMessageBoxes final : public MessageBoxes {
   QtMessageBoxes();
   ~QtMessageBoxes() override;
 
-  // The parent window of the boxes, or null. A box that is open when the window is destroyed ends unanswered.
+  // The main window, or null. A box belongs to it, or to its window without modality that is active. A box that is open when the window is destroyed ends unanswered.
   void SetParent(QWidget* parent) { parent_ = parent; }
 
   // Closes the open boxes, questions with No, and lets no further box open.
@@ -30,6 +30,8 @@ class QtMessageBoxes final : public MessageBoxes {
  private:
   // Shows a box with `buttons`; returns the button, or NoButton when the box was closed without an answer.
   QMessageBox::StandardButton Ask(const BoxMessage& message, QMessageBox::StandardButtons buttons);
+
+  QWidget* Owner() const;
 
   QPointer<QWidget> parent_;
   std::vector<QMessageBox*> open_;  // the last is in front
