@@ -87,6 +87,8 @@ QJsonDocument ParseStrictly(const QByteArray& text) {
   QJsonParseError error;
   QJsonDocument document = QJsonDocument::fromJson(text, &error);
   if (error.error != QJsonParseError::NoError) {
+    if (!text.trimmed().startsWith('{'))
+      RefuseAt(text, 0, QStringLiteral("this is no configuration, which begins with {"));
     const auto offset = std::min<qsizetype>(error.offset, text.size());
     RefuseAt(text, offset, QStringLiteral("this is not JSON (%1)").arg(WhyNotJson(error)));
   }

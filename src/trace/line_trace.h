@@ -46,7 +46,7 @@ struct TraceEntry {
 
   // Who sent it: "program", "unit", or "" for what is no packet. An echo is the program's.
   std::string Direction() const;
-  // "poll unit 01, kind 'n'"; for an echo "echo: ..."; for an event what happened: "no reply", "RTS off: the line is free for the reply".
+  // "poll unit 01, kind 'n'"; for an echo "echo: ..."; for an event what happened: "no reply in time".
   std::string Meaning() const;
 };
 

@@ -22,8 +22,8 @@ bool IsReply(std::span<const std::uint8_t> bytes);
 // Zero bytes at the beginning of `bytes`: the rest of the line's frame, or the pads of a patient unit.
 std::size_t LeadingZeros(std::span<const std::uint8_t> bytes);
 
-// At most `shown` bytes in hexadecimal; `all` is how many there were, of which `bytes` are the first. Many zero bytes at the beginning are given as a count:
-// "45 x 00 FE 30 01 0A 00".
+// At most `shown` bytes in hexadecimal; `all` is how many there were, of which `bytes` are the first. Many zero bytes at
+// the beginning are given as a count: "45 x 00 FE 30 01 0A 00".
 std::string ShownBytes(std::span<const std::uint8_t> bytes, std::size_t shown, std::size_t all);
 
 // Takes the bytes of one direction and cuts them into packets: each ends with the zero byte after its content.

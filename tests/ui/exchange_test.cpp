@@ -77,7 +77,7 @@ TEST_F(Exchange, RefusedTextChangesNothing) {
   for (const auto& [pasted, sentence] :
        {std::pair(Replaced(text, "1500", "5"),
                   "port 1, defaultPosition: 5 is not a whole number from 10 to 2550"),
-        {"Hello", "line 1: this is not JSON (illegal value)"},
+        {"Hello", "line 1: this is no configuration, which begins with {"},
         {std::string(2'000'000, ' '), "the text is larger than 1 MiB"},
         {"", "there is no text on the clipboard"}}) {
     Paste(pasted);
