@@ -114,7 +114,7 @@ TEST(ConfigurationText, RefusedWithPlaceAndReason) {
       {"+01:00", "", "read: \"2026-11-22T14:02:31\" is not a time like \"2026-11-22T14:02:31+01:00\""},
       {"  ]\n}", "  ]\n} and more", "line 100: this is not JSON (garbage at the end of the document)"},
       {"{\n", "{\"note\": " + QByteArray(1025, '[') + "\n",
-       "line 1: this is no configuration, which begins with {"},
+       "line 1: this is not JSON (too deeply nested document)"},
       {"{\n", QByteArray(1024 * 1024, ' ') + "{\n", "the text is larger than 1 MiB"},
       {"{\n", "Hello, {\n", "line 1: this is no configuration, which begins with {"}};
   for (const auto& [in_example, instead, sentence] : cases) {
