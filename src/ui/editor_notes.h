@@ -11,8 +11,8 @@
 
 namespace tendril {
 
-// Remarks on the records, with what differs from a unit; and what is shown and not stored, with the button that stores it. The place of both is kept
-// while they are empty. Where it is too low for both, the second covers the last lines of the first.
+// Remarks on the records, with what differs from a unit; and what is shown and not stored, with the button that stores
+// it. The place of both is kept while they are empty. Where it is too low for both, the second covers the last lines of the first.
 class EditorNotes : public QWidget {
   Q_OBJECT
 

@@ -18,7 +18,8 @@ class QtMessageBoxes final : public MessageBoxes {
   QtMessageBoxes();
   ~QtMessageBoxes() override;
 
-  // The main window, or null. A box belongs to it, or to its window without modality that is active. A box that is open when the window is destroyed ends unanswered.
+  // The main window, or null. A box belongs to it, or to the active one of its windows that are not modal. A box that is
+  // open when the window is destroyed ends unanswered.
   void SetParent(QWidget* parent) { parent_ = parent; }
 
   // Closes the open boxes, questions with No, and lets no further box open.

@@ -170,13 +170,12 @@ std::string Comparison::Sentence() const {
     channels += count > 0 ? 1 : 0;
   }
   const bool old = age_ != Age::kFresh;
-  std::string sentence = "Unit " + HexByte(place_.unit);
+  std::string sentence = (old ? "What unit " : "Unit ") + HexByte(place_.unit);
   if (place_.port != chosen_.port) sentence += " on Comm " + std::to_string(place_.port);
   if (place_ != chosen_) sentence += ", not the chosen one,";
-  sentence += values == 0 ? (old ? " held exactly this" : " holds exactly this")
-                          : (old ? " differed: " : " differs: ") + Counted(values, "value") + " of " +
-                                Counted(channels, "channel");
-  if (old) sentence += " at " + time_;
+  if (old) sentence += " held at " + time_;
+  sentence += values > 0 ? " differs: " + Counted(values, "value") + " of " + Counted(channels, "channel")
+                         : (old ? " is exactly this" : " holds exactly this");
   if (age_ == Age::kReadingCancelled) sentence += "; reading it again was cancelled";
   if (age_ == Age::kReadingFailed) sentence += "; reading it again failed";
   if (age_ == Age::kSentSince) sentence += "; sent to since";

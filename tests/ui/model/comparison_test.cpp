@@ -90,15 +90,15 @@ TEST_F(Comparing, SaysAboutWhichUnitAndWhen) {
          "here PWM, unit 01 on Comm 1: Servo");
   comparison_.Choose(kPlace);
   comparison_.ReadingFailed(kPlace, true);
-  expect("Unit 01 differed: 4 values of 2 channels at 14:02; reading it again was cancelled",
+  expect("What unit 01 held at 14:02 differs: 4 values of 2 channels; reading it again was cancelled",
          "here PWM, unit Servo at 14:02");
   comparison_.ReadingFailed(kPlace, false);
-  expect("Unit 01 differed: 4 values of 2 channels at 14:02; reading it again failed",
+  expect("What unit 01 held at 14:02 differs: 4 values of 2 channels; reading it again failed",
          "here PWM, unit Servo at 14:02");
   working_.At(7) = working_.At(2) = working_.At(0);
   comparison_.WritingBegins({1, 0xFF});
   comparison_.ReadingFailed(kPlace, false);
-  expect("Unit 01 held exactly this at 14:02; sent to since", "");
+  expect("What unit 01 held at 14:02 is exactly this; sent to since", "");
 }
 
 }  // namespace
