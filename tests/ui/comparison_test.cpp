@@ -125,7 +125,8 @@ TEST_F(Compared, StaysAboutItsUnitUntilThatIsReadAnew) {
   ChooseByKeys("CmbUnitID_1", 1);
   world_.bench.Detach(1, unit_);
   Run("cmdCompare_0");
-  EXPECT_THAT(Text("lblCompared"), MatchesRegex("What unit 01 held at .* is exactly this; reading it again failed"));
+  EXPECT_THAT(Text("lblCompared"),
+              MatchesRegex("What unit 01 held at .* is exactly this; reading it again failed"));
   ConnectUnit();
   Run("Command3_1");
   EXPECT_FALSE(Visible("lblCompared"));
