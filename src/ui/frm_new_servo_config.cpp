@@ -268,7 +268,8 @@ bool frmNewServoConfig::eventFilter(QObject* object, QEvent* event) {
 
 LinePane& frmNewServoConfig::Line() {
   if (line_ == nullptr) {
-    line_ = new LinePane(trace_, timers_, link_, *connection_, info_);
+    line_ = new LinePane(trace_, timers_, link_, *connection_, info_, *this);
+    setAnimated(false);  // what is above the pane moves at once
     addDockWidget(Qt::BottomDockWidgetArea, line_);
     connect(line_, &LinePane::Said, &connections_,
             [this](const QString& sentence) { status_->Say(sentence); });

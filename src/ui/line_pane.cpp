@@ -91,8 +91,8 @@ Button* MakeButton(const char* name, const char* text, const char* accessible_na
 }  // namespace
 
 LinePane::LinePane(LineTrace& trace, TimerFactory& timers, const HwSerial& link, const UnitTarget& target,
-                   const ProgramInfo& info)
-    : QDockWidget(QStringLiteral("Line")),
+                   const ProgramInfo& info, QWidget& window)
+    : QDockWidget(QStringLiteral("Line"), &window),
       trace_(trace),
       link_(link),
       target_(target),
@@ -200,8 +200,7 @@ void LinePane::resizeEvent(QResizeEvent* event) {
 
 // No verdict changes the height of the pane.
 void LinePane::KeepRoomForVerdict() {
-  const bool narrow = parentWidget() != nullptr && window()->width() < kWideWindow;
-  const int lines = narrow ? 3 : 2;
+  const int lines = parentWidget()->width() < kWideWindow ? 3 : 2;
   lblVerdict_->setFixedHeight(lines * lblVerdict_->fontMetrics().lineSpacing());
 }
 

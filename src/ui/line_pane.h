@@ -30,9 +30,9 @@ class LinePane : public QDockWidget {
   Q_OBJECT
 
  public:
-  // All must outlive its use. The pane is the only one that `trace` reports its changes to.
+  // All must outlive its use. The pane is the only one that `trace` reports its changes to. `window` owns it.
   LinePane(LineTrace& trace, TimerFactory& timers, const HwSerial& link, const UnitTarget& target,
-           const ProgramInfo& info);
+           const ProgramInfo& info, QWidget& window);
 
   // Shows the pane, with the focus in its table. When it closes, the focus goes back.
   void Open();

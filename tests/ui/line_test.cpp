@@ -83,14 +83,14 @@ TEST_F(Line, Pane_FollowsTheLineUntilItIsScrolledBack) {
 TEST_F(Line, Verdict_ChangesNoHeight) {
   window_->resize(880, 700);
   Keys("F12");
-  QTest::qWait(50);
+  QCoreApplication::processEvents();
   const QPoint place = PlaceOf("LinePane");
   for (const int unit : {1, 2}) {
     ChooseByKeys("CmbUnitID_1", unit);
     Find<QLabel>("lblProgress").clear();
     Press("Command3_1");
     RunToTheEnd();
-    QTest::qWait(50);
+    QCoreApplication::processEvents();
     EXPECT_EQ(PlaceOf("LinePane"), place) << Text("lblVerdict");
   }
 }
