@@ -91,9 +91,10 @@ LineVerdict JudgeLastPoll(const PollSeen& poll, const std::string& unit) {
   return {};
 }
 
-// An ID without a unit is no fault while units are searched for.
+// An ID without a unit is no fault while units are searched for. An adapter that fails in the middle is one.
 std::optional<LineVerdict> JudgeSearch(const SearchSeen& search, PollOutcome last) {
-  if (search.polled < 2) return std::nullopt;
+  const bool adapter_fails = last == PollOutcome::kSilence || last == PollOutcome::kEchoDamaged;
+  if (search.polled < 2 || adapter_fails) return std::nullopt;
   const std::string asked = std::to_string(search.polled) + " IDs were asked, and ";
   if (search.answered == 1) return LineVerdict{Verdict::kAnswers, asked + "one unit answers."};
   if (search.answered > 1)

@@ -168,6 +168,18 @@ TEST(LineVerdict, UnitThatRefuses_IsNotCalledWell) {
   EXPECT_EQ(line.Verdict(), Kind::kNotAccepted);
 }
 
+TEST(LineVerdict, AdapterThatFailsInASearch_IsNoUnitThatAnswers) {
+  TracedLine line;
+  line.Poll('*');
+  const Bytes next = PollPacket(0x06, '*', 45);
+  for (const auto& [echo, verdict] : {std::pair(next, Kind::kAnswers), std::pair(Bytes{}, Kind::kSilence)}) {
+    line.trace.Note({.kind = LineEvent::Kind::kPollSent, .bytes = next}, 0);
+    line.trace.Note({.kind = LineEvent::Kind::kReceived, .bytes = echo}, 0);
+    line.trace.Note({.kind = LineEvent::Kind::kTimeOut}, 0);
+    EXPECT_EQ(line.Verdict(), verdict);
+  }
+}
+
 TEST(LineVerdict, AdapterWithoutEcho_IsKnownByAReply) {
   TracedLine line("", {.echo = false});
   line.Poll('*');
