@@ -3,8 +3,8 @@
 #include <QGroupBox>
 #include <QRadioButton>
 
+#include "config/option_texts.h"
 #include "ui/list_combo_box.h"
-#include "ui/model/option_texts.h"
 
 namespace tendril {
 

@@ -7,23 +7,10 @@
 
 #include "config/channel_config.h"
 #include "config/option_bytes.h"
+#include "config/option_differences.h"
 #include "ui/model/unit_place.h"
 
 namespace tendril {
-
-// What the window shows of a channel in one place. A range has two values, and so do both stops together.
-enum class ComparedPart {
-  kOutput,
-  kActualRange,
-  kVirtualRange,
-  kStops,
-  kLeftStop,
-  kRightStop,
-  kDefaultPosition,
-  kNeutralPosition,
-  kPowerUp,
-  kLostComm
-};
 
 // Keeps nothing of the records: each answer is about what they are now. A value is equal when a send would give the unit
 // the bits that it held: 1505 and 1500 are one value in a unit. A record that cannot be sent is compared, too.
@@ -64,7 +51,6 @@ class Comparison {
   // The worse, the later.
   enum class Age { kFresh, kReadingCancelled, kReadingFailed, kSentSince };
 
-  bool Differs(std::size_t channel, std::size_t field) const;
   std::string UnitName() const;
 
   const ChannelTable& working_;
