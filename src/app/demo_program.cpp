@@ -1,6 +1,5 @@
 #include "app/demo_program.h"
 
-#include <cstdint>
 #include <filesystem>
 
 #include "app/version.h"
@@ -8,46 +7,13 @@
 namespace tendril {
 namespace {
 
-// Enough pads for the program to release the line in time even when its window has just been painted.
-constexpr ReplyTiming kPatient{.turn_round_us = 2000, .pads = 45};
-
-// The default of the network preferences.
-constexpr std::uint16_t kListenerPort = 8837;
-
-VirtualUnit& AttachUnit(VirtualPorts& ports, std::int32_t port, std::uint8_t id) {
-  return ports.Attach<VirtualUnit>(port, id, kPatient);
-}
-
-VirtualPorts& AddPorts(VirtualPorts& ports) {
-  for (const std::int32_t port : {1, 2, 3, 4}) ports.AddPort(port);
-  return ports;
-}
-
 QString DemoLog(const QTemporaryDir& scratch) { return scratch.filePath(QStringLiteral("HUtest.txt")); }
 
 }  // namespace
 
-DemoBench::DemoBench(QtPlatform& platform)
-    : ports(platform.clock, platform.timers),
-      panel(platform.timers),
-      unit_01(AttachUnit(AddPorts(ports), 1, 0x01)),
-      unit_0a(AttachUnit(ports, 1, 0x0A)) {
-  AttachUnit(ports, 2, 0xFF);
-  AttachUnit(ports, kDemoPanelPort, 0x01);
-  panel.AddPort(kDemoPanelPort);
-  ports.SetHeldByAnother(kDemoPanelPort, true);
-  panel.SetPortHandler([this](std::uint8_t port, bool held) { ports.SetHeldByAnother(port, held); });
-  // The units on Comm 1 are set up differently from what the window starts with.
-  for (int port = 1; port <= kUnitPorts; ++port) {
-    unit_01.SetPortOptions(port, {1, 80, 220, 125, 175, 125, 175, 150, 150});
-    const auto by = [port](int width) { return static_cast<std::uint8_t>(width + 2 * port); };
-    unit_0a.SetPortOptions(port, {1, 60, 240, by(80), by(170), by(90), by(160), by(120), by(130)});
-  }
-}
-
 DemoProgram::DemoProgram()
     : log(std::filesystem::path(DemoLog(scratch).toStdString())),
-      wsCLI(bench.panel, kListenerPort, platform.timers),
+      wsCLI(bench.panel, kDemoListenerPort, platform.timers),
       window(Serial1, platform.timers, platform.boxes, control_panel,
              {kVersion, DemoLog(scratch), QStringLiteral("in memory")}) {
   platform.boxes.SetParent(&window);

@@ -6,6 +6,7 @@
 #include <cerrno>
 #include <csignal>
 #include <system_error>
+#include <utility>
 
 namespace tendril {
 namespace {
@@ -22,16 +23,16 @@ int OpenPipe() {
 
 }  // namespace
 
-QuitOnSignal::QuitOnSignal() : notifier_(OpenPipe(), QSocketNotifier::Read) {
-  QObject::connect(&notifier_, &QSocketNotifier::activated, &notifier_, [] {
-    char wake = 0;
-    (void)!::read(wake_pipe[0], &wake, 1);  // the application may go on for a while
-    QCoreApplication::quit();
+QuitOnSignal::QuitOnSignal(std::function<void(int)> handler) : notifier_(OpenPipe(), QSocketNotifier::Read) {
+  QObject::connect(&notifier_, &QSocketNotifier::activated, &notifier_, [handler = std::move(handler)] {
+    char signal = 0;
+    (void)!::read(wake_pipe[0], &signal, 1);  // the application may go on for a while
+    handler(signal);
   });
   struct sigaction action = {};
-  action.sa_handler = [](int) {
-    const char wake = 0;
-    (void)!::write(wake_pipe[1], &wake, 1);
+  action.sa_handler = [](int signal) {
+    const char number = static_cast<char>(signal);
+    (void)!::write(wake_pipe[1], &number, 1);
   };
   for (const int signal : kSignals) {
     struct sigaction before = {};
