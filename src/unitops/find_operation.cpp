@@ -2,6 +2,7 @@
 
 #include <utility>
 
+#include "serial/packets.h"
 #include "trace/line_verdict.h"
 
 namespace tendril {
@@ -25,9 +26,13 @@ FindOperation::FindOperation(CommandContext& context, const LineTrace& trace,
         Poll();
       })) {}
 
+void FindOperation::SetRange(std::uint8_t first, std::uint8_t last) {
+  first_ = first;
+  last_ = last;
+}
+
 std::string FindOperation::Prepare() {
-  search_ = {};
-  search_.port = Link().CommPort();
+  search_ = {.first = first_, .last = last_, .port = Link().CommPort()};
   again_ = false;
   return "Finding units";
 }
@@ -48,7 +53,7 @@ void FindOperation::OnReply(bool replied, std::uint8_t /*unit*/, const Bytes& da
   }
   OnLastReply(replied, data);
   ShowSearch();
-  if (search_.polled == UnitSearch::kIds) return Succeed("SUCCESS: Search Complete");
+  if (search_.Complete()) return Succeed("SUCCESS: Search Complete");
   Poll();
 }
 
@@ -64,7 +69,8 @@ void FindOperation::Poll() {
 void FindOperation::OnLastReply(bool replied, const Bytes& data) {
   if (!Link().PortOpen()) return;
   const bool polled_again = std::exchange(again_, false);
-  const std::uint8_t id = Id();
+  // A unit that was asked as all units names its own ID.
+  const std::uint8_t id = Id() == kAllUnits && replied && !data.empty() ? data[0] : Id();
   const PollOutcome outcome = trace_.Polls().empty() ? PollOutcome::kSilence : trace_.Polls().back().outcome;
   if (outcome == PollOutcome::kOtherUnit) {
     search_.Add(data[0], FoundUnit::What::kAnswersLate);
@@ -77,7 +83,7 @@ void FindOperation::OnLastReply(bool replied, const Bytes& data) {
   }
   ++search_.polled;
   const bool adapter = outcome == PollOutcome::kSilence || outcome == PollOutcome::kEchoDamaged;
-  if (search_.polled == UnitSearch::kIds && adapter) search_.fault = JudgeLine(trace_).sentence;
+  if (search_.Complete() && adapter) search_.fault = JudgeLine(trace_).sentence;
 }
 
 void FindOperation::ShowSearch() {

@@ -11,7 +11,7 @@
 
 namespace tendril {
 
-// Polls the IDs in order. The next poll follows the reply or the time-out at once. The chosen unit ID plays no part.
+// Polls the IDs of a range in order, 01 to FD unless another is set. The next poll follows the reply or the time-out at once. The chosen unit ID plays no part.
 //
 //   Idle --Start: the window disables its controls meanwhile--> Waiting
 //   Waiting --tick: poll of the first ID out--> Polling
@@ -25,6 +25,9 @@ class FindOperation final : public UnitOperation {
   // called when a search begins and after each poll. Context and trace must outlive the operation.
   FindOperation(CommandContext& context, const LineTrace& trace, std::function<void()> on_searched);
 
+  // The next searches poll the IDs from `first` to `last`, at least one. FF alone finds the unit on the line whatever its
+  // ID is, if there is one only.
+  void SetRange(std::uint8_t first, std::uint8_t last);
   // The search that runs, or the last one.
   const UnitSearch& Search() const { return search_; }
 
@@ -37,7 +40,7 @@ class FindOperation final : public UnitOperation {
 
  private:
   // The ID that is polled next, or whose poll is outstanding.
-  std::uint8_t Id() const { return static_cast<std::uint8_t>(kFirstUnitId + search_.polled); }
+  std::uint8_t Id() const { return static_cast<std::uint8_t>(search_.first + search_.polled); }
   void Poll();
   void ShowSearch();
 
@@ -45,6 +48,8 @@ class FindOperation final : public UnitOperation {
   std::function<void()> on_searched_;
   Timer& tmrFirstPoll_;
   UnitSearch search_;
+  std::uint8_t first_ = kFirstUnitId;  // of the next search
+  std::uint8_t last_ = kLastUnitId;
   bool again_ = false;  // the outstanding poll is the second one of its ID
 };
 

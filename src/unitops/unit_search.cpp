@@ -4,6 +4,7 @@
 #include <cstddef>
 
 #include "platform/hex_text.h"
+#include "serial/packets.h"
 
 namespace tendril {
 namespace {
@@ -53,7 +54,7 @@ std::vector<std::string> UnitSearch::Ids(FoundUnit::What what) const {
 }
 
 std::string UnitSearch::Step() const {
-  return std::to_string(polled) + " of " + std::to_string(kIds) + ", " +
+  return std::to_string(polled) + " of " + std::to_string(Count()) + ", " +
          std::to_string(Ids(FoundUnit::What::kAnswers).size()) + " found";
 }
 
@@ -64,9 +65,8 @@ std::string UnitSearch::Sentence() const {
   const auto others = Ids(FoundUnit::What::kOtherAnswer);
   const auto shared = Ids(FoundUnit::What::kPerhapsSeveral);
   std::string text;
-  if (polled < kIds) {
-    text +=
-        "Only IDs up to " + HexByte(static_cast<std::uint8_t>(kFirstUnitId + polled - 1)) + " were polled. ";
+  if (!Complete()) {
+    text += "Only IDs up to " + HexByte(static_cast<std::uint8_t>(first + polled - 1)) + " were polled. ";
   }
   if (units.empty()) {
     text += "No unit answered";
@@ -77,7 +77,7 @@ std::string UnitSearch::Sentence() const {
   if (!late.empty()) text += "; too late: " + Listed(late);
   if (!shared.empty()) text += "; perhaps several at " + Listed(shared);
   if (!others.empty()) text += "; an answer to something else at " + Listed(others);
-  return text + "." + (polled == kIds ? WhatNext(shared.size()) : "");
+  return text + "." + (Complete() ? WhatNext(shared.size()) : "");
 }
 
 std::string UnitSearch::WhatNext(std::size_t shared) const {
@@ -85,7 +85,10 @@ std::string UnitSearch::WhatNext(std::size_t shared) const {
   if (shared > 0) return " Connect units that share an ID one at a time, and give each its own.";
   if (!found.empty()) return {};
   if (!fault.empty()) return " " + fault;
-  return " Check power, wiring and port. A unit fresh from the factory has FF, which is not searched.";
+  const std::string check = " Check power, wiring and port.";
+  if (last == kAllUnits) return check;
+  if (first > kFirstUnitId || last < kLastUnitId) return check + " Other IDs are not searched.";
+  return check + " A unit fresh from the factory has FF, which is not searched.";
 }
 
 }  // namespace tendril
