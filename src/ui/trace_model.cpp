@@ -4,34 +4,9 @@
 #include <QFontDatabase>
 #include <algorithm>
 
+#include "trace/trace_text.h"
+
 namespace tendril {
-namespace {
-
-// A longer packet ends in "...", and its size.
-constexpr std::size_t kShownBytes = 64;
-
-bool ShouldNotHappen(const TraceEntry& entry) {
-  switch (entry.kind) {
-    case TraceEntry::Kind::kOpenFailed:
-    case TraceEntry::Kind::kLost:
-    case TraceEntry::Kind::kFault:
-    case TraceEntry::Kind::kTimeOut:
-      return true;
-    case TraceEntry::Kind::kNoise:
-      return LeadingZeros(entry.bytes) < entry.bytes.size();
-    case TraceEntry::Kind::kOpened:
-    case TraceEntry::Kind::kClosed:
-    case TraceEntry::Kind::kRtsOn:
-    case TraceEntry::Kind::kRtsOff:
-    case TraceEntry::Kind::kSent:
-    case TraceEntry::Kind::kEcho:
-    case TraceEntry::Kind::kReply:
-      return false;
-  }
-  return false;
-}
-
-}  // namespace
 
 QString TraceText(const TraceEntry& entry, TraceColumn column) {
   switch (column) {
@@ -40,10 +15,9 @@ QString TraceText(const TraceEntry& entry, TraceColumn column) {
     case TraceColumn::kFrom:
       return QString::fromStdString(entry.Direction());
     case TraceColumn::kBytes:
-      return QString::fromStdString(ShownBytes(entry.bytes, kShownBytes, entry.size));
+      return QString::fromStdString(TraceBytes(entry));
     case TraceColumn::kMeaning:
-      return (ShouldNotHappen(entry) ? QStringLiteral("⚠ ") : QString()) +
-             QString::fromStdString(entry.Meaning()).simplified();  // a system's reason may have lines
+      return QString::fromStdString(TraceMeaning(entry));
   }
   return {};
 }
