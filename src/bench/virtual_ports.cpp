@@ -88,7 +88,7 @@ class VirtualPorts::Device final : public SerialDevice {
 
   void SetEventHandler(std::function<void(SerialEvent)> handler) override { handler_ = std::move(handler); }
   bool Exists(std::int32_t number) const override;
-  std::string Describe(std::int32_t number) const override;
+  DeviceDescription Describe(std::int32_t number) const override;
   PortHolder Holder(std::int32_t number) const override { return ports_.At(number).holder; }
   void WatchPorts(const std::function<void()>& handler) override { watch_ = handler; }
 
@@ -130,8 +130,9 @@ class VirtualPorts::Device final : public SerialDevice {
   bool lost_ = false;        // kDeviceLost is due; port_ is null then
 };
 
-std::string VirtualPorts::Device::Describe(std::int32_t number) const {
-  return Exists(number) ? "Virtual serial line " + std::to_string(number) : std::string();
+DeviceDescription VirtualPorts::Device::Describe(std::int32_t number) const {
+  if (!Exists(number)) return {};
+  return {.adapter = "Virtual serial line " + std::to_string(number)};
 }
 
 bool VirtualPorts::Device::Exists(std::int32_t number) const {

@@ -12,6 +12,8 @@
 #include <string>
 #include <vector>
 
+#include "platform/serial_device.h"
+
 namespace tendril {
 
 // The device of port `number` (1 = the first), links resolved; nothing when there is none. A link whose device is gone
@@ -30,10 +32,9 @@ std::filesystem::path DefaultSerialDevice(std::int32_t number);
 bool DriverFoundHardware(const std::filesystem::path& device,
                          const std::filesystem::path& tty_class = "/sys/class/tty");
 
-// The adapter's product name, its maker and the device's path, as far as they are known: "FT232R USB UART (FTDI),
-// /dev/ttyUSB0". `tty_class` as above.
-std::string DescribeSerialDevice(const std::filesystem::path& device,
-                                 const std::filesystem::path& tty_class = "/sys/class/tty");
+// As SerialDevice::Describe(). `tty_class` as above.
+DeviceDescription DescribeSerialDevice(const std::filesystem::path& device,
+                                       const std::filesystem::path& tty_class = "/sys/class/tty");
 #endif
 
 }  // namespace tendril

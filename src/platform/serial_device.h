@@ -26,6 +26,16 @@ struct PortHolder {
   friend bool operator==(const PortHolder&, const PortHolder&) = default;
 };
 
+// The device of a port, as far as the system knows it.
+struct DeviceDescription {
+  std::string adapter = {};  // the product's name
+  std::string maker = {};
+  std::string path = {};  // "/dev/ttyUSB0"
+
+  // For the user: "FT232R USB UART (FTDI), /dev/ttyUSB0". Empty when nothing is known.
+  std::string Text() const;
+};
+
 // What users call port `number`.
 inline std::string CommName(std::int32_t number) { return "Comm " + std::to_string(number); }
 
@@ -49,9 +59,8 @@ class SerialDevice {
   // Whether port `number` (1 = the first) has a device.
   virtual bool Exists(std::int32_t number) const = 0;
 
-  // The device of port `number`, for the user: its product name and maker, as far as they are known, and its path, as
-  // in "FT232R USB UART (FTDI), /dev/ttyUSB0". Empty when there is none.
-  virtual std::string Describe(std::int32_t number) const = 0;
+  // The device of port `number`; all is empty when there is none.
+  virtual DeviceDescription Describe(std::int32_t number) const = 0;
 
   // Which other program has port `number` open, where the system reports it.
   virtual PortHolder Holder(std::int32_t /*number*/) const { return {}; }

@@ -75,7 +75,7 @@ class HwSerial {
   // Whether a device stands behind port `number`. Does not open it.
   bool ComPortExists(std::int16_t number) const { return device_.Exists(number); }
   // Which device that is, for the user; empty when it does not exist.
-  std::string DescribeComPort(std::int16_t number) const { return device_.Describe(number); }
+  std::string DescribeComPort(std::int16_t number) const { return device_.Describe(number).Text(); }
   // Which other program has it open, where the system reports that.
   PortHolder ComPortHolder(std::int16_t number) const { return device_.Holder(number); }
   // As SerialDevice::WatchPorts().

@@ -290,7 +290,7 @@ TEST_F(SerialDeviceTest, NothingBehindThePort_IsNoSuchDevice) {
   LinkPort(1, "/dev/pts/none");
   LinkPort(33, "/dev/null");
   EXPECT_TRUE(device_->Exists(kComm));
-  EXPECT_EQ(device_->Describe(kComm), line_.path());
+  EXPECT_EQ(device_->Describe(kComm).Text(), line_.path());
   EXPECT_FALSE(device_->Exists(1)) << "a link whose device is gone hides the built-in port";
   EXPECT_FALSE(device_->Exists(30));
   for (const int number : {1, 30, 33}) EXPECT_EQ(FailureOfOpening(number), kErrInvalidPort) << number;

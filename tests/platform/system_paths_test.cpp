@@ -53,11 +53,11 @@ TEST(PortNames, Description_IsTheAdaptersOwnAndNotItsHubs) {
   std::ofstream(hub / "idVendor") << "1d6b\n";
   std::ofstream(hub / "product") << "Hub\n";
   std::ofstream(adapter / "idVendor") << "1a86\n";
-  EXPECT_EQ(DescribeSerialDevice("/dev/ttyUSB0", usb), "/dev/ttyUSB0");
+  EXPECT_EQ(DescribeSerialDevice("/dev/ttyUSB0", usb).Text(), "/dev/ttyUSB0");
   std::ofstream(adapter / "product") << "USB Serial\n";
   std::ofstream(adapter / "manufacturer") << "Maker\n";
-  EXPECT_EQ(DescribeSerialDevice("/dev/ttyUSB0", usb), "USB Serial (Maker), /dev/ttyUSB0");
-  EXPECT_EQ(DescribeSerialDevice("/dev/ttyS0", usb), "/dev/ttyS0");
+  EXPECT_EQ(DescribeSerialDevice("/dev/ttyUSB0", usb).Text(), "USB Serial (Maker), /dev/ttyUSB0");
+  EXPECT_EQ(DescribeSerialDevice("/dev/ttyS0", usb).Text(), "/dev/ttyS0");
 }
 #endif
 

@@ -23,7 +23,7 @@ class CountingDevice final : public SerialDevice {
     device_.SetEventHandler(std::move(handler));
   }
   bool Exists(std::int32_t number) const override { return device_.Exists(number); }
-  std::string Describe(std::int32_t number) const override { return device_.Describe(number); }
+  DeviceDescription Describe(std::int32_t number) const override { return device_.Describe(number); }
   void Open(std::int32_t number, std::int32_t baud) override { device_.Open(number, baud); }
   void Close() noexcept override { device_.Close(); }
   void SetReceiveThreshold(std::int32_t bytes) override { device_.SetReceiveThreshold(bytes); }

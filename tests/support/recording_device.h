@@ -17,7 +17,7 @@ class RecordingDevice final : public SerialDevice {
  public:
   void SetEventHandler(std::function<void(SerialEvent)> handler) override { handler_ = std::move(handler); }
   bool Exists(std::int32_t number) const override { return number == 1 || number == 3; }
-  std::string Describe(std::int32_t /*number*/) const override { return {}; }
+  DeviceDescription Describe(std::int32_t /*number*/) const override { return {}; }
   void Open(std::int32_t number, std::int32_t baud) override {
     if (open_failure) throw RuntimeError(*open_failure);
     actions.push_back("open " + std::to_string(number) + " at " + std::to_string(baud));

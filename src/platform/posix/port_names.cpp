@@ -76,20 +76,16 @@ bool DriverFoundHardware(const fs::path& device, const fs::path& tty_class) {
   return !(file >> type) || type != kNoUart;  // only UART drivers give a type
 }
 
-std::string DescribeSerialDevice(const fs::path& device, const fs::path& tty_class) {
+DeviceDescription DescribeSerialDevice(const fs::path& device, const fs::path& tty_class) {
   // A USB adapter is described in the first folder above its terminal device that has a vendor's number. Further up are
   // the hubs.
   std::error_code error;
   for (fs::path folder = fs::canonical(tty_class / device.filename(), error);
        !error && folder.has_relative_path(); folder = folder.parent_path()) {
     if (!fs::exists(folder / "idVendor", error)) continue;
-    const std::string product = FirstLine(folder / "product");
-    const std::string maker = FirstLine(folder / "manufacturer");
-    std::string adapter = product.empty() ? maker : product;
-    if (!product.empty() && !maker.empty()) adapter += " (" + maker + ")";
-    return adapter.empty() ? device.string() : adapter + ", " + device.string();
+    return {FirstLine(folder / "product"), FirstLine(folder / "manufacturer"), device.string()};
   }
-  return device.string();
+  return {.path = device.string()};
 }
 
 std::vector<fs::path> SerialDeviceFolders() { return {"/dev", PortsFolder()}; }

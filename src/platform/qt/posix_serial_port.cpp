@@ -36,7 +36,9 @@ std::unique_ptr<SerialPort> OpenSerialPort(std::int32_t /*number*/, const std::f
   return std::make_unique<PosixSerialPort>(device, baud, std::move(on_readable), std::move(on_writable));
 }
 
-std::string DescribeSerialPort(const std::filesystem::path& device) { return DescribeSerialDevice(device); }
+DeviceDescription DescribeSerialPort(const std::filesystem::path& device) {
+  return DescribeSerialDevice(device);
+}
 
 PortHolder FindSerialPortHolder(const std::filesystem::path& device) { return FindPortHolder(device); }
 

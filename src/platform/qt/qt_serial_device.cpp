@@ -36,9 +36,9 @@ void QtSerialDevice::SetEventHandler(std::function<void(SerialEvent)> handler) {
 
 bool QtSerialDevice::Exists(std::int32_t number) const { return FindSerialDevice(number).has_value(); }
 
-std::string QtSerialDevice::Describe(std::int32_t number) const {
+DeviceDescription QtSerialDevice::Describe(std::int32_t number) const {
   const auto device = FindSerialDevice(number);
-  return device ? DescribeSerialPort(*device) : std::string();
+  return device ? DescribeSerialPort(*device) : DeviceDescription();
 }
 
 PortHolder QtSerialDevice::Holder(std::int32_t number) const {

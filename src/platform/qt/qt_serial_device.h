@@ -26,7 +26,7 @@ class QtSerialDevice final : public SerialDevice {
 
   void SetEventHandler(std::function<void(SerialEvent)> handler) override;
   bool Exists(std::int32_t number) const override;
-  std::string Describe(std::int32_t number) const override;
+  DeviceDescription Describe(std::int32_t number) const override;
   PortHolder Holder(std::int32_t number) const override;
   void WatchPorts(const std::function<void()>& handler) override;
   void Open(std::int32_t number, std::int32_t baud) override;

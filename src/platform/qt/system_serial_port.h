@@ -20,7 +20,7 @@ std::unique_ptr<SerialPort> OpenSerialPort(std::int32_t number, const std::files
                                            std::function<void()> on_writable);
 
 // As SerialDevice::Describe() and SerialDevice::Holder().
-std::string DescribeSerialPort(const std::filesystem::path& device);
+DeviceDescription DescribeSerialPort(const std::filesystem::path& device);
 PortHolder FindSerialPortHolder(const std::filesystem::path& device);
 
 }  // namespace tendril

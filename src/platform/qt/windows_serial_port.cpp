@@ -2,7 +2,6 @@
 #include <QSerialPortInfo>
 #include <QSignalBlocker>
 #include <QString>
-#include <QStringList>
 #include <utility>
 
 #include "platform/port_names.h"
@@ -104,14 +103,9 @@ std::unique_ptr<SerialPort> OpenSerialPort(std::int32_t number, const std::files
                                              std::move(on_writable));
 }
 
-std::string DescribeSerialPort(const std::filesystem::path& device) {
+DeviceDescription DescribeSerialPort(const std::filesystem::path& device) {
   const QSerialPortInfo info(QString::fromStdString(device.filename().string()));
-  QString adapter = info.description().isEmpty() ? info.manufacturer() : info.description();
-  if (adapter != info.manufacturer() && !info.manufacturer().isEmpty())
-    adapter += QStringLiteral(" (%1)").arg(info.manufacturer());
-  QStringList parts{adapter, QString::fromStdString(device.string())};
-  parts.removeAll(QString());
-  return parts.join(QStringLiteral(", ")).toStdString();
+  return {info.description().toStdString(), info.manufacturer().toStdString(), device.string()};
 }
 
 // An ordinary user's program cannot find out.
