@@ -1,0 +1,24 @@
+// Unit IDs as they are typed: "0A", "0A-1F", "01,05,20-28".
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <string_view>
+#include <variant>
+#include <vector>
+
+namespace tendril::ctl {
+
+// The IDs that a unit can have for good. 00, FE and FF are left out: ParseUnitIds() says why.
+inline constexpr std::uint8_t kFirstUnitId = 0x01;
+inline constexpr std::uint8_t kLastUnitId = 0xFD;
+
+// Whether `text` has the form of an ID list, whatever the values are: hexadecimal numbers of one or two digits with
+// commas and hyphens. "01" and "FF-00" do, "1A2" and "./01" do not.
+bool LooksLikeUnitIds(std::string_view text);
+
+// The IDs of the list `text`, each once, in the order as given; or the sentence that says what is wrong with it. Ranges
+// are ascending.
+std::variant<std::vector<std::uint8_t>, std::string> ParseUnitIds(std::string_view text);
+
+}  // namespace tendril::ctl
