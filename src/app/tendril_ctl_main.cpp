@@ -1,0 +1,115 @@
+// tendril-ctl: sets up Tendril units from a terminal and from scripts.
+#include <QCoreApplication>
+#include <QDateTime>
+#include <QEventLoop>
+#include <QTemporaryDir>
+#include <csignal>
+#include <cstdio>
+#include <filesystem>
+#include <memory>
+#include <variant>
+
+#include "app/demo_bench.h"
+#include "app/quit_on_signal.h"
+#include "app/system_terminal.h"
+#include "bench/virtual_tcp_socket.h"
+#include "ctl/command_line.h"
+#include "ctl/environment.h"
+#include "ctl/program.h"
+#include "platform/memory_registry.h"
+#include "platform/paths.h"
+#include "platform/qt/qt_serial_device.h"
+#include "platform/qt/qt_tcp_socket.h"
+#include "platform/qt/qt_timer.h"
+#include "platform/registry_store.h"
+#include "platform/steady_clock.h"
+#include "platform/system_processes.h"
+#include "platform/system_registry.h"
+#include "prefs/registry.h"
+#include "serial/command_log.h"
+
+namespace tendril {
+namespace {
+
+void Warn(const std::string& line) { std::fprintf(stderr, "tendril-ctl: %s\n", line.c_str()); }
+
+struct EventLoopWaiting final : ctl::Waiting {
+  void Until(const std::function<bool()>& done) override {
+    while (!done()) QCoreApplication::processEvents(QEventLoop::WaitForMoreEvents);
+  }
+};
+
+// What both worlds share.
+struct Process {
+  EventLoopWaiting waiting;
+  ctl::StopRequest stop;
+  SystemTerminal terminal{waiting, stop};
+  SteadyClock clock;
+  QtTimerFactory timers{Warn};
+};
+
+int Run(const ctl::CommandLine& line, Process& process, SerialDevice& device, CommandLog& log,
+        TcpSocket& socket, RegistryStore& store, const ProcessList& processes) {
+  Registry registry(store, Warn);
+  ctl::Environment environment{device,
+                               process.timers,
+                               process.clock,
+                               log,
+                               socket,
+                               registry,
+                               processes,
+                               process.waiting,
+                               process.stop,
+                               process.terminal,
+                               [] { return QDateTime::currentMSecsSinceEpoch(); }};
+  return ctl::RunCommand(line, environment);
+}
+
+int RunOnThisComputer(const ctl::CommandLine& line, Process& process) {
+  QtSerialDevice device(Warn);
+  FileCommandLog log(CommandLogPath());
+  QtTcpSocket socket(Warn);
+  const auto store = OpenSystemRegistry(Warn);
+  const auto processes = OpenProcessList();
+  return Run(line, process, device, log, socket, *store, *processes);
+}
+
+// Without a number, Comm 1 is meant.
+int RunDemo(ctl::CommandLine line, Process& process) {
+  if (line.port == 0) line.port = 1;
+  const QTemporaryDir scratch;
+  DemoBench bench(process.clock, process.timers);
+  const auto device = bench.ports.CreateDevice();
+  FileCommandLog log(std::filesystem::path(scratch.filePath(QStringLiteral("HUtest.txt")).toStdString()));
+  VirtualTcpSocket socket(bench.panel, kDemoListenerPort, process.timers);
+  MemoryRegistry store;
+  const DemoProcesses processes;
+  return Run(line, process, *device, log, socket, store, processes);
+}
+
+int Main() {
+  const auto parsed = ctl::ParseCommandLine(QCoreApplication::arguments());
+  Process process;
+  if (const auto* end = std::get_if<ctl::EarlyEnd>(&parsed)) {
+    if (end->exit_code != 0) {
+      process.terminal.PrintError(end->text.toUtf8());
+    } else if (!process.terminal.Print(end->text.toUtf8()).isEmpty()) {
+      return ctl::kExitNotAsWished;
+    }
+    return end->exit_code;
+  }
+#ifndef _WIN32
+  std::signal(SIGPIPE, SIG_IGN);  // a port is given back even when nothing reads the output any more
+  const QuitOnSignal on_signal([&process](int signal) { process.stop.Make(signal); });
+#endif
+  const auto& line = std::get<ctl::CommandLine>(parsed);
+  return line.demo ? RunDemo(line, process) : RunOnThisComputer(line, process);
+}
+
+}  // namespace
+}  // namespace tendril
+
+int main(int argc, char** argv) {
+  const QCoreApplication application(argc, argv);
+  return tendril::Main();
+}

@@ -1,0 +1,122 @@
+#include "ctl/unit_session.h"
+
+#include <algorithm>
+#include <string_view>
+
+#include "trace/line_verdict.h"
+
+namespace tendril::ctl {
+namespace {
+
+constexpr char kPortGone[] = "The port went away.";
+constexpr char kNotStarted[] = "Nothing was sent.";
+
+// The text of a box as one line, without the trace of the failure.
+std::string InOneLine(std::string_view text) {
+  std::string line;
+  while (!text.empty()) {
+    const std::size_t end = text.find("\r\n");
+    const std::string_view part = text.substr(0, end);
+    text = end == text.npos ? std::string_view() : text.substr(end + 2);
+    if (part.empty() || part.starts_with("Trace:")) continue;
+    if (!line.empty()) line += line.ends_with('.') || line.ends_with(':') ? " " : ": ";
+    line += part;
+  }
+  return line;
+}
+
+}  // namespace
+
+UnitSession::UnitSession(Environment& environment)
+    : environment_(environment),
+      link_(environment.device, environment.timers, environment.clock, environment.log),
+      commands_(link_, trace_, environment.timers, *this, *this, *this, records_,
+                {.polled =
+                     [this](std::uint8_t /*unit*/, bool replied) {
+                       replies_ += replied ? 1 : 0;
+                       ReportStep();
+                     },
+                 .compared = [this](std::uint8_t /*unit*/, const OptionTable& held) { held_ = held; }}) {
+  link_.SetLineObserver([this](const LineEvent& event) { trace_.Note(event, environment_.now_ms()); });
+  commands_.running.SetReporter([this](const CommandReport& report) { report_ = report; });
+  environment_.stop.SetHandler([this] { OnStop(); });
+}
+
+UnitSession::~UnitSession() {
+  environment_.stop.SetHandler(nullptr);
+  commands_.Stop();
+}
+
+CommandResult UnitSession::Send(std::uint8_t unit, const ChannelTable& records) {
+  records_ = records;
+  return Run(unit, commands_.send);
+}
+
+CommandResult UnitSession::Read(std::uint8_t unit, OptionTable& held) {
+  held_.reset();
+  CommandResult result = Run(unit, commands_.compare);
+  if (result.Done()) held = *held_;
+  result.aftermath.clear();  // a read leaves no trace in the unit
+  return result;
+}
+
+CommandResult UnitSession::Find(std::uint8_t first, std::uint8_t last) {
+  commands_.find.SetRange(first, last);
+  CommandResult result = Run(first, commands_.find);
+  result.aftermath.clear();  // Search() has it
+  return result;
+}
+
+CommandResult UnitSession::SetId(std::uint8_t new_id) { return Run(new_id, commands_.change_id); }
+
+CommandResult UnitSession::Run(std::uint8_t unit, UnitOperation& operation) {
+  if (environment_.stop.Made()) return {CommandResult::Kind::kCancelled, {}, kNotStarted};
+  // The link would open the port again, and another adapter may stand behind it now.
+  if (!link_.PortOpen()) return {CommandResult::Kind::kFailed, kPortGone, kNotStarted};
+  trace_.Clear();
+  unit_ = unit;
+  step_.clear();
+  box_.clear();
+  replies_ = 0;
+  succeeded_ = false;
+  report_ = {};
+  operation.Start();
+  environment_.waiting.Until([this] { return !commands_.running.Active(); });
+  if (succeeded_) return {CommandResult::Kind::kDone, {}, report_.aftermath};
+  if (report_.cancelled) return {CommandResult::Kind::kCancelled, {}, report_.aftermath};
+  return {CommandResult::Kind::kFailed, Reason(), report_.aftermath};
+}
+
+// What the line shows says more than a box, unless the last poll was answered.
+std::string UnitSession::Reason() const {
+  if (!link_.PortOpen()) return kPortGone;
+  const LineVerdict verdict = JudgeLine(trace_);
+  const bool box_only =
+      verdict.kind == LineVerdict::Kind::kAnswers || verdict.kind == LineVerdict::Kind::kNothingAsked;
+  return box_only ? InOneLine(box_) : verdict.sentence;
+}
+
+void UnitSession::OnStop() { commands_.Cancel(); }
+
+int UnitSession::FrameWidth() const { return 1; }
+
+void UnitSession::SetTitle(const std::string& title) {
+  const std::string before = commands_.running.What() + ": ";
+  if (!title.starts_with(before)) return;
+  step_ = title.substr(before.size());
+  ReportStep();
+}
+
+void UnitSession::SetColour(ProgressColour colour) { succeeded_ = colour == ProgressColour::kGreen; }
+
+void UnitSession::Show(const BoxMessage& message) {
+  if (box_.empty()) box_ = message.text;
+}
+
+void UnitSession::ReportStep() const {
+  if (!on_step_ || !commands_.running.Active()) return;
+  const bool finding = commands_.running.Operation() == &commands_.find;
+  on_step_(step_, finding ? Search().Part() : std::min(1.0, replies_ / static_cast<double>(kPortCount)));
+}
+
+}  // namespace tendril::ctl

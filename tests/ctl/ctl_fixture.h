@@ -1,0 +1,99 @@
+// CtlTest: the commands of tendril-ctl on a bench, in simulated time.
+#pragma once
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <QStringList>
+#include <QTemporaryDir>
+#include <memory>
+#include <optional>
+#include <string>
+#include <utility>
+#include <variant>
+
+#include "bench/faulty_units.h"
+#include "ctl/command_line.h"
+#include "ctl/environment.h"
+#include "ctl/program.h"
+#include "support/simulated_control_panel.h"
+#include "support/simulated_world.h"
+
+namespace tendril::test {
+
+// Keeps what is printed. No terminal, unless a test makes it one.
+struct RecordedTerminal final : ctl::Terminal {
+  QString Print(const QByteArray& text) override {
+    out += text.toStdString();
+    return print_fault;
+  }
+  void PrintError(const QByteArray& text) override { error += text.toStdString(); }
+  int ErrorColumns() const override { return columns; }
+  bool Colours() const override { return false; }
+  std::optional<QString> Ask(const QByteArray& question) override {
+    PrintError(question);
+    return answer;
+  }
+  bool CanAsk() const override { return answer.has_value(); }
+
+  std::string out;
+  std::string error;
+  QString print_fault;
+  int columns = 0;
+  std::optional<QString> answer;
+};
+
+// Comm 1 to 4 exist; no unit is on a line. The Control Panel holds no port of them until it is given one.
+class CtlTest : public testing::Test, protected ctl::Waiting {
+ protected:
+  // Puts the unit called `fault` on the line of Comm 1; an empty name is a well-behaved one.
+  VirtualUnit& Attach(const std::string& fault, std::uint8_t id) {
+    auto unit = fault.empty() ? std::make_unique<VirtualUnit>(id) : FindFaultKind(fault)->make(id);
+    VirtualUnit& attached = *unit;
+    world_.bench.Attach(1, std::move(unit));
+    return attached;
+  }
+  // Runs "tendril-ctl" with these arguments, on Comm 1 unless they name a port, and returns the exit code. What it
+  // prints is in `terminal_`.
+  int Run(QStringList arguments) {
+    terminal_.out.clear();
+    terminal_.error.clear();
+    arguments.prepend(QStringLiteral("tendril-ctl"));
+    const auto parsed = ctl::ParseCommandLine(arguments);
+    if (const auto* end = std::get_if<ctl::EarlyEnd>(&parsed)) {
+      (end->exit_code == 0 ? terminal_.out : terminal_.error) += end->text.toStdString();
+      return end->exit_code;
+    }
+    auto line = std::get<ctl::CommandLine>(parsed);
+    if (line.port == 0) line.port = 1;
+    return ctl::RunCommand(line, environment_);
+  }
+  // The path of a file in the test's own folder.
+  QString Path(const char* name) const { return folder_.filePath(QString::fromUtf8(name)); }
+
+  void Until(const std::function<bool()>& done) override {
+    constexpr std::uint64_t kLongestMs = 600'000;
+    ASSERT_TRUE(world_.time.AdvanceUntil(done, kLongestMs));
+  }
+
+  QTemporaryDir folder_;
+  SimulatedWorld world_;
+  SimulatedControlPanel panel_{world_};
+  ctl::StopRequest stop_;
+  RecordedTerminal terminal_;
+  std::int64_t start_ms_ = 1'796'000'000'000;  // 2026-11-29T21:20:00Z
+  ctl::Environment environment_{
+      *world_.device,
+      world_.time,
+      world_.time,
+      world_.log,
+      panel_.wsCLI,
+      panel_.registry,
+      panel_.processes,
+      *this,
+      stop_,
+      terminal_,
+      [this] { return start_ms_ + static_cast<std::int64_t>(world_.time.ElapsedMs()); }};
+};
+
+}  // namespace tendril::test

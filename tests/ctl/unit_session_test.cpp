@@ -1,0 +1,94 @@
+// The session's own part: when a command ends, and why it did.
+#include "ctl/unit_session.h"
+
+#include <csignal>
+#include <string>
+
+#include "config/option_bytes.h"
+#include "ctl/ctl_fixture.h"
+
+namespace tendril::test {
+namespace {
+
+using ctl::CommandResult;
+
+class UnitSessionTest : public CtlTest {
+ protected:
+  UnitSessionTest() {
+    units_.Link().SetCommPort(1);
+    units_.Link().SetBaudRate(19200);
+    units_.Link().SetPortOpen(true);
+    for (std::size_t slot = 0; slot < kPortCount; ++slot) SetFromPreset(kPresets[1], records_.At(slot));
+  }
+
+  ctl::UnitSession units_{environment_};
+  ChannelTable records_;
+  OptionTable held_{};
+};
+
+TEST_F(UnitSessionTest, Failures_HaveTheReasonThatTheLineShows) {
+  struct Case {
+    const char* unit;  // at 05; null: none
+    const char* reason;
+    const char* aftermath;
+  };
+  const Case cases[] = {
+      {nullptr,
+       "Only what the program sends comes back. Unit 05 does not answer: check its power, its ID and the "
+       "wiring.",
+       "Port 1 is perhaps written, 2 to 8 are not."},
+      {"locked",
+       "Unit 05 answers, but has not accepted what was sent. Send again; if that fails, too, the unit or the "
+       "line is "
+       "faulty.",
+       "Port 1 is perhaps written, 2 to 8 are not."},
+  };
+  for (const Case& each : cases) {
+    VirtualUnit* const unit = each.unit == nullptr ? nullptr : &Attach(each.unit, 0x05);
+    const CommandResult result = units_.Send(0x05, records_);
+    EXPECT_EQ(result.kind, CommandResult::Kind::kFailed);
+    EXPECT_EQ(result.reason, each.reason);
+    EXPECT_EQ(result.aftermath, each.aftermath);
+    if (unit != nullptr) world_.bench.Detach(1, *unit);
+  }
+  records_.At(2).VirtualRange[1] = 2560;
+  Attach("", 0x05);
+  const CommandResult result = units_.Send(0x05, records_);
+  EXPECT_EQ(result.kind, CommandResult::Kind::kFailed);
+  EXPECT_EQ(result.aftermath, "Ports 1 to 2 are written, 3 to 8 are not.");
+  EXPECT_NE(result.reason.find("Virtual"), std::string::npos) << result.reason;
+}
+
+TEST_F(UnitSessionTest, StopRequest_EndsTheCommandAndLetsNoneBegin) {
+  Attach("", 0x05);
+  const auto timer = world_.time.CreateTimer([this] { stop_.Make(SIGINT); });
+  timer->SetInterval(10);
+  units_.SetStepHandler([&](const std::string& step, double part) {
+    if (step != "port 4 of 8" || stop_.Made()) return;
+    EXPECT_EQ(part, 3 / 8.0);
+    timer->SetEnabled(true);
+  });
+  CommandResult result = units_.Send(0x05, records_);
+  EXPECT_EQ(result.kind, CommandResult::Kind::kCancelled);
+  EXPECT_EQ(result.aftermath, "Ports 1 to 4 are written, 5 to 8 are not.");
+  const std::uint32_t sent = static_cast<std::uint32_t>(units_.Link().SentByteCount());
+  EXPECT_EQ(units_.Read(0x05, held_).kind, CommandResult::Kind::kCancelled);
+  EXPECT_EQ(static_cast<std::uint32_t>(units_.Link().SentByteCount()), sent);
+}
+
+TEST_F(UnitSessionTest, LostPort_IsNotOpenedAgain) {
+  Attach("", 0x05);
+  units_.SetStepHandler([&](const std::string& step, double /*part*/) {
+    if (step == "3 of 8 ports") world_.bench.Unplug(1);
+  });
+  CommandResult result = units_.Read(0x05, held_);
+  EXPECT_EQ(result.kind, CommandResult::Kind::kFailed);
+  EXPECT_EQ(result.reason, "The port went away.");
+  EXPECT_EQ(held_, OptionTable{});
+  world_.bench.Replug(1);
+  EXPECT_FALSE(units_.Read(0x05, held_).Done());
+  EXPECT_FALSE(units_.Link().PortOpen());
+}
+
+}  // namespace
+}  // namespace tendril::test
