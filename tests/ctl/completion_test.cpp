@@ -92,7 +92,7 @@ TEST(Completion, ShellsOfferWhatACommandTakes) {
     EXPECT_EQ(Matches("^(--.*)", declared), OptionsOf(command, ":"));
     const bool file = command.arguments.startsWith("FILE"_L1),
                folder = command.arguments.startsWith("FOLDER"_L1);
-    EXPECT_EQ(Offered({name, u"READ"_s}), file ? Words{u"README.md"_s} : Words{});
+    EXPECT_EQ(Offered({name, u"CMakeL"_s}), file ? Words{u"CMakeLists.txt"_s} : Words{});
     EXPECT_EQ(Offered({name, u"packag"_s}), file || folder ? Words{u"packaging"_s} : Words{});
     EXPECT_EQ(declared.count(u"1:FILE:_files"_s), file);
     EXPECT_EQ(declared.count(u"1:FOLDER:_files -/"_s), folder);
