@@ -45,6 +45,8 @@ struct OptionDifference {
   ComparedPart part;
   std::string wanted;
   std::string held;
+
+  friend bool operator==(const OptionDifference&, const OptionDifference&) = default;
 };
 // All parts in which `held` differs from `wanted`; none exactly when the bytes are the same.
 std::vector<OptionDifference> DifferencesBetween(const OptionBytes& wanted, const OptionBytes& held);

@@ -12,14 +12,7 @@ Report NotYet() {
 
 Report Ports(Job& /*job*/) { return NotYet(); }
 Report Find(Job& /*job*/) { return NotYet(); }
-Report Get(Job& /*job*/) { return NotYet(); }
-Report Send(Job& /*job*/) { return NotYet(); }
-Report Compare(Job& /*job*/) { return NotYet(); }
-Report Backup(Job& /*job*/) { return NotYet(); }
-Report Restore(Job& /*job*/) { return NotYet(); }
 Report SetId(Job& /*job*/) { return NotYet(); }
-Report Show(Job& /*job*/) { return NotYet(); }
-Report WritePreset(Job& /*job*/) { return NotYet(); }
 Report Monitor(Job& /*job*/) { return NotYet(); }
 
 }  // namespace tendril::ctl

@@ -19,4 +19,7 @@ struct Report {
   QString problem = {};      // one sentence for standard error; empty for none
 };
 
+// The command cannot begin: `problem` says why.
+inline Report Refused(const QString& problem) { return {.exit_code = kExitUsage, .problem = problem}; }
+
 }  // namespace tendril::ctl

@@ -1,8 +1,10 @@
 #include "ctl/unit_session.h"
 
 #include <algorithm>
+#include <iterator>
 #include <string_view>
 
+#include "platform/hex_text.h"
 #include "trace/line_verdict.h"
 
 namespace tendril::ctl {
@@ -10,6 +12,19 @@ namespace {
 
 constexpr char kPortGone[] = "The port went away.";
 constexpr char kNotStarted[] = "Nothing was sent.";
+
+// What boxes say of a unit that answers each poll, by how they begin, in words that need no window.
+struct BoxWords {
+  std::string_view box;
+  const char* words;  // after the unit
+};
+constexpr BoxWords kBoxWords[] = {
+    {"Error:1 ",
+     " answers, but does not report all of its eight ports. Read it again; if that fails, too, it is "
+     "faulty."},
+    {"Upload error:", " reports a port that does not exist: check that it is a Tendril unit."},
+    {"Unit did not respond",
+     " answers, but does not acknowledge what was sent. Send again; if that fails, too, it is faulty."}};
 
 // The text of a box as one line, without the trace of the failure.
 std::string InOneLine(std::string_view text) {
@@ -49,7 +64,10 @@ UnitSession::~UnitSession() {
 
 CommandResult UnitSession::Send(std::uint8_t unit, const ChannelTable& records) {
   records_ = records;
-  return Run(unit, commands_.send);
+  CommandResult result = Run(unit, commands_.send);
+  const bool begun = !report_.what.empty();
+  if (begun) result.written = commands_.send.WhatIsWritten();
+  return result;
 }
 
 CommandResult UnitSession::Read(std::uint8_t unit, OptionTable& held) {
@@ -70,6 +88,7 @@ CommandResult UnitSession::Find(std::uint8_t first, std::uint8_t last) {
 CommandResult UnitSession::SetId(std::uint8_t new_id) { return Run(new_id, commands_.change_id); }
 
 CommandResult UnitSession::Run(std::uint8_t unit, UnitOperation& operation) {
+  report_ = {};
   if (environment_.stop.Made()) return {CommandResult::Kind::kCancelled, {}, kNotStarted};
   // The link would open the port again, and another adapter may stand behind it now.
   if (!link_.PortOpen()) return {CommandResult::Kind::kFailed, kPortGone, kNotStarted};
@@ -79,7 +98,6 @@ CommandResult UnitSession::Run(std::uint8_t unit, UnitOperation& operation) {
   box_.clear();
   replies_ = 0;
   succeeded_ = false;
-  report_ = {};
   operation.Start();
   environment_.waiting.Until([this] { return !commands_.running.Active(); });
   if (succeeded_) return {CommandResult::Kind::kDone, {}, report_.aftermath};
@@ -93,7 +111,10 @@ std::string UnitSession::Reason() const {
   const LineVerdict verdict = JudgeLine(trace_);
   const bool box_only =
       verdict.kind == LineVerdict::Kind::kAnswers || verdict.kind == LineVerdict::Kind::kNothingAsked;
-  return box_only ? InOneLine(box_) : verdict.sentence;
+  if (!box_only) return verdict.sentence;
+  const auto* words =
+      std::ranges::find_if(kBoxWords, [this](const BoxWords& each) { return box_.starts_with(each.box); });
+  return words == std::end(kBoxWords) ? InOneLine(box_) : "Unit " + HexByte(unit_) + words->words;
 }
 
 void UnitSession::OnStop() { commands_.Cancel(); }

@@ -30,6 +30,7 @@ struct CommandResult {
   Kind kind = Kind::kFailed;
   std::string reason = {};     // kFailed: why, with what to do where that is known
   std::string aftermath = {};  // how the unit is left: "Ports 1 to 3 are written, 4 perhaps, 5 to 8 are not."
+  SendOperation::Written written = SendOperation::Written::kNothing;  // by Send()
 };
 
 // The operations of the window, one at a time. Each call runs the event loop until its operation has ended. A stop

@@ -91,6 +91,12 @@ bool SendOperation::EncodeAndSendPort(std::uint8_t port_index) {
   return true;
 }
 
+SendOperation::Written SendOperation::WhatIsWritten() const {
+  if (written_ == static_cast<std::int32_t>(kPortCount)) return Written::kAll;
+  if (written_ > 0) return Written::kPart;
+  return perhaps_written_ ? Written::kPerhaps : Written::kNothing;
+}
+
 std::string SendOperation::Aftermath() const {
   const auto ports = [](std::int32_t first, std::int32_t last) {
     return first == last ? std::to_string(first) : std::to_string(first) + " to " + std::to_string(last);

@@ -23,6 +23,9 @@ namespace tendril {
 //   any --a fault--> Idle
 class SendOperation final : public UnitOperation {
  public:
+  // How much of the configuration is in the unit. kPerhaps: port 1 is perhaps written, and no other.
+  enum class Written { kNothing, kPerhaps, kPart, kAll };
+
   // `working` are the records that are sent; `on_sent` (may be empty) is called with the unit when it has accepted the
   // last of them, while the command still runs. Context and records must outlive the operation.
   SendOperation(CommandContext& context, const ChannelTable& working,
@@ -31,6 +34,9 @@ class SendOperation final : public UnitOperation {
   // Whether a send has begun to write into its unit, or perhaps has, since the last call. A send can do so and then not
   // be able to run.
   bool TakeWriting() { return (written_ > 0 || perhaps_written_) && !std::exchange(writing_taken_, true); }
+
+  // What the send that runs, or the last one, has written.
+  Written WhatIsWritten() const;
 
   // Encodes the record of slot `port_index` and sends it as options to the chosen unit. False: a field is invalid,
   // which has been shown, and nothing was sent. Raises what the link raises, and kErrOutOfRange for an index above 8.

@@ -1,0 +1,100 @@
+#include "ctl/configuration_files.h"
+
+#include <QDir>
+#include <QFile>
+#include <QFileInfo>
+#include <QJsonDocument>
+#include <QSaveFile>
+#include <cstdio>
+#include <filesystem>
+#include <system_error>
+
+#include "platform/hex_text.h"
+
+namespace tendril::ctl {
+namespace {
+
+using namespace Qt::StringLiterals;
+
+// "show.json cannot be read: No such file or directory."
+QString Cannot(const QString& path, QLatin1StringView what, const QString& reason) {
+  return u"%1 cannot be %2: %3."_s.arg(path, what, reason);
+}
+
+// The nearest folder above `path` that exists.
+QFileInfo FolderOf(const QString& path) {
+  QFileInfo folder(QFileInfo(path).absolutePath());
+  while (!folder.exists() && !folder.isRoot()) folder = QFileInfo(folder.absolutePath());
+  return folder;
+}
+
+// Why what stands at `path` may not be replaced.
+QString WhyNotReplaced(const QString& path, bool force) {
+  const QFileInfo file(path);
+  if (!file.exists()) return {};
+  if (file.isDir()) return u"%1 is a folder, not a file."_s.arg(path);
+  // A file that is written whole takes the place of what stands there, also of a device.
+  if (!file.isFile()) return u"%1 is not a regular file."_s.arg(path);
+  return force ? QString() : u"%1 exists already; --force overwrites it."_s.arg(path);
+}
+
+QString CreateFolderOf(const QString& path) {
+  const QString folder = QFileInfo(path).absolutePath();
+  std::error_code fault;
+  std::filesystem::create_directories(folder.toStdU16String(), fault);
+  return fault
+             ? u"The folder %1 cannot be created: %2."_s.arg(folder, QString::fromStdString(fault.message()))
+             : QString();
+}
+
+}  // namespace
+
+std::variant<ConfigurationText, QString> ReadConfigurationFile(const QString& path) {
+  const bool standard_input = path == u"-";
+  const QString name = standard_input ? u"Standard input"_s : path;
+  if (QFileInfo(name).isDir()) return u"%1 is a folder, not a file."_s.arg(path);
+  QFile file(path);
+  const bool open = standard_input ? file.open(stdin, QIODevice::ReadOnly) : file.open(QIODevice::ReadOnly);
+  // What is too long is refused, however much of it is read.
+  const QByteArray text = open ? file.read(kMaxConfigurationText + 1) : QByteArray();
+  if (file.error() != QFileDevice::NoError) return Cannot(name, "read"_L1, file.errorString());
+  auto configuration = ReadConfiguration(text);
+  if (const auto* refusal = std::get_if<Refusal>(&configuration))
+    return u"%1: %2."_s.arg(name, refusal->Sentence());
+  return std::get<ConfigurationText>(std::move(configuration));
+}
+
+QJsonObject AsJson(const QByteArray& configuration) {
+  return QJsonDocument::fromJson(configuration).object();
+}
+
+QString UnitFileName(std::uint8_t unit) {
+  return u"unit-%1.json"_s.arg(QString::fromStdString(HexByte(unit)));
+}
+
+QString UnitFilePath(const QString& folder, std::uint8_t unit) {
+  return folder.isEmpty() ? UnitFileName(unit) : QDir(folder).filePath(UnitFileName(unit));
+}
+
+QString WhyNotWritable(const QString& path, bool force) {
+  const QString reason = WhyNotReplaced(path, force);
+  if (!reason.isEmpty()) return reason;
+  const QFileInfo folder = FolderOf(path);
+  if (!folder.isDir()) return Cannot(path, "written"_L1, u"%1 is not a folder"_s.arg(folder.filePath()));
+  if (!folder.isWritable())
+    return Cannot(path, "written"_L1, u"the folder %1 is write-protected"_s.arg(folder.filePath()));
+  return {};
+}
+
+QString WriteNewFile(const QString& path, const QByteArray& text, bool force) {
+  const QString no_folder = CreateFolderOf(path);
+  if (!no_folder.isEmpty()) return no_folder;
+  QSaveFile file(path);
+  const bool written = file.open(QIODevice::WriteOnly) && file.write(text) == text.size() && file.flush();
+  // As late as can be: another program may have written it since the command began.
+  const QString reason = WhyNotReplaced(path, force);
+  if (!reason.isEmpty()) return reason;
+  return written && file.commit() ? QString() : Cannot(path, "written"_L1, file.errorString());
+}
+
+}  // namespace tendril::ctl

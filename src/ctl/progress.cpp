@@ -1,0 +1,56 @@
+#include "ctl/progress.h"
+
+#include <algorithm>
+#include <cmath>
+#include <utility>
+
+namespace tendril::ctl {
+namespace {
+
+using namespace Qt::StringLiterals;
+
+// Before that, what has passed says little about what is to come.
+constexpr std::uint64_t kFirstEstimateMs = 2000;
+
+}  // namespace
+
+Progress::Progress(const CommandLine& line, Environment& environment)
+    : environment_(environment),
+      mode_(line.quiet                                               ? Mode::kSilent
+            : environment.terminal.ErrorColumns() == 0 || line.trace ? Mode::kLines
+                                                                     : Mode::kRedrawn),
+      last_ms_(environment.clock.NowMs()) {}
+
+Progress::~Progress() {
+  if (drawn_ == 0) return;
+  Draw({});
+  environment_.terminal.PrintError("\r");
+}
+
+void Progress::Show(const QString& text, double part) {
+  if (mode_ == Mode::kRedrawn) Draw(text + TimeLeft(part));
+}
+
+void Progress::Note(const QString& text) {
+  if (mode_ == Mode::kLines) environment_.terminal.PrintError(text.toUtf8() + '\n');
+}
+
+// ", 00:31 left"; empty while it is not known.
+QString Progress::TimeLeft(double part) {
+  const std::uint32_t now_ms = environment_.clock.NowMs();
+  elapsed_ms_ += now_ms - std::exchange(last_ms_, now_ms);
+  if (elapsed_ms_ < kFirstEstimateMs || part <= 0) return {};
+  const auto seconds =
+      static_cast<qint64>(std::ceil(static_cast<double>(elapsed_ms_) * (1 - part) / part / 1000));
+  return u", %1:%2 left"_s.arg(seconds / 60, 2, 10, QChar(u'0')).arg(seconds % 60, 2, 10, QChar(u'0'));
+}
+
+// The terminal would begin a new line in its last column. What was longer is overwritten with spaces, which every
+// terminal understands.
+void Progress::Draw(QString text) {
+  text.truncate(std::max(environment_.terminal.ErrorColumns() - 1, 0));
+  const qsizetype columns = text.size();
+  environment_.terminal.PrintError('\r' + text.leftJustified(std::exchange(drawn_, columns)).toUtf8());
+}
+
+}  // namespace tendril::ctl

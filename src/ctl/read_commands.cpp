@@ -1,0 +1,127 @@
+// Commands that read units into files: get and backup.
+#include <QFileInfo>
+#include <algorithm>
+#include <cstdint>
+#include <functional>
+#include <iterator>
+#include <span>
+#include <vector>
+
+#include "ctl/commands.h"
+#include "ctl/configuration_files.h"
+#include "ctl/progress.h"
+#include "ctl/unit_work.h"
+#include "unitops/unit_target.h"
+
+namespace tendril::ctl {
+namespace {
+
+using namespace Qt::StringLiterals;
+using Outcome = UnitResult::Outcome;
+
+// Where a unit's configuration is kept; empty: on standard output.
+using PathOf = std::function<QString(std::uint8_t unit)>;
+
+// Why one of the files cannot be written: a sentence; empty: each can.
+QString WhyNoneWritable(const CommandLine& line, std::span<const std::uint8_t> units, const PathOf& path_of) {
+  for (const std::uint8_t unit : units) {
+    const QString fault = WhyNotWritable(path_of(unit), line.force);
+    if (!fault.isEmpty()) return fault;
+  }
+  return {};
+}
+
+std::vector<UnitResult> KeepUnits(Job& job, std::span<const std::uint8_t> units, const PathOf& path_of) {
+  return ForEachUnit(job, units, [&](UnitWork& work) {
+    OptionTable held;
+    if (work.Read(held, {}, 1)) work.Keep(held, path_of(work.Unit()));
+  });
+}
+
+Report ReportOfFiles(const Job& job, const std::vector<UnitResult>& results) {
+  return ReportOf(results, {.file = u"file"_s}, job.environment.terminal.Colours());
+}
+
+// The only unit's configuration is all that goes to standard output.
+Report GetToOutput(Job& job) {
+  if (auto fault = job.port.Open()) return *fault;
+  const auto results = KeepUnits(job, job.line.units, [](std::uint8_t /*unit*/) { return QString(); });
+  const UnitResult& result = results.front();
+  Report report = ReportOf(results, {}, false);
+  report.text = result.configuration;
+  if (!report.problem.isEmpty()) report.problem = Remarks(result).join(u"; "_s);
+  return report;
+}
+
+// Searches the whole line. Returns the report when that fails.
+std::optional<Report> FindUnits(Job& job) {
+  Progress progress(job.line, job.environment);
+  job.units.SetStepHandler([&](const std::string& step, double part) {
+    progress.Show(u"finding units: "_s + QString::fromStdString(step), part);
+  });
+  const CommandResult end = job.units.Find(kFirstUnitId, kLastUnitId);
+  job.units.SetStepHandler(nullptr);
+  const QString sentence = QString::fromStdString(job.units.Search().Sentence());
+  if (end.kind == CommandResult::Kind::kCancelled)
+    return Report{kExitNotAsWished, {}, {}, u"Stopped while units were searched for. "_s + sentence};
+  if (end.kind == CommandResult::Kind::kFailed)
+    return Report{kExitNotAsWished, {}, {}, QString::fromStdString(end.reason)};
+  if (job.units.Search().found.empty()) return Report{kExitNotAsWished, {}, {}, sentence};
+  progress.Note(sentence);
+  return std::nullopt;
+}
+
+// What is at an ID that does not simply answer.
+UnitResult NotRead(const FoundUnit& found) {
+  return {.unit = found.id,
+          .outcome = Outcome::kFailed,
+          .reason = u"Not read: %1."_s.arg(QString::fromStdString(found.Words()))};
+}
+
+Report BackUpFoundUnits(Job& job, const PathOf& path_of) {
+  if (auto fault = FindUnits(job)) return *fault;
+  std::vector<std::uint8_t> units;
+  std::vector<UnitResult> others;
+  for (const FoundUnit& found : job.units.Search().found) {
+    if (found.what == FoundUnit::What::kAnswers) {
+      units.push_back(found.id);
+    } else {
+      others.push_back(NotRead(found));
+    }
+  }
+  std::vector<UnitResult> results = KeepUnits(job, units, path_of);
+  std::ranges::move(others, std::back_inserter(results));
+  std::ranges::sort(results, {}, &UnitResult::unit);
+  return ReportOfFiles(job, results);
+}
+
+}  // namespace
+
+Report Get(Job& job) {
+  const CommandLine& line = job.line;
+  const bool one = line.units.size() == 1;
+  if (one && line.output.isEmpty()) return GetToOutput(job);
+  const bool folder = !one || line.output.endsWith(u'/') || QFileInfo(line.output).isDir();
+  const PathOf path_of = [&](std::uint8_t unit) {
+    return folder ? UnitFilePath(line.output, unit) : line.output;
+  };
+  const QString fault = WhyNoneWritable(line, line.units, path_of);
+  if (!fault.isEmpty()) return Refused(fault);
+  if (auto report = job.port.Open()) return *report;
+  return ReportOfFiles(job, KeepUnits(job, line.units, path_of));
+}
+
+Report Backup(Job& job) {
+  const CommandLine& line = job.line;
+  const PathOf path_of = [&](std::uint8_t unit) { return UnitFilePath(line.folder, unit); };
+  std::vector<std::uint8_t> perhaps = line.units;
+  for (int id = kFirstUnitId; line.units.empty() && id <= kLastUnitId; ++id)
+    perhaps.push_back(static_cast<std::uint8_t>(id));
+  const QString fault = WhyNoneWritable(line, perhaps, path_of);
+  if (!fault.isEmpty()) return Refused(fault);
+  if (auto report = job.port.Open()) return *report;
+  if (line.units.empty()) return BackUpFoundUnits(job, path_of);
+  return ReportOfFiles(job, KeepUnits(job, line.units, path_of));
+}
+
+}  // namespace tendril::ctl

@@ -1,0 +1,128 @@
+// Commands that write configurations into units: send and restore.
+#include <QDir>
+#include <QFileInfo>
+#include <QRegularExpression>
+#include <algorithm>
+#include <cstdint>
+#include <variant>
+#include <vector>
+
+#include "ctl/commands.h"
+#include "ctl/configuration_files.h"
+#include "ctl/unit_work.h"
+#include "platform/hex_text.h"
+#include "unitops/unit_target.h"
+
+namespace tendril::ctl {
+namespace {
+
+using namespace Qt::StringLiterals;
+
+// What goes into a unit.
+struct Writing {
+  std::uint8_t unit;
+  OptionTable options;
+};
+
+// What parts of the work take, in times of a read.
+constexpr double kReadTime = 1;
+constexpr double kWriteTime = 8;
+
+Report WriteUnits(Job& job, const std::vector<Writing>& writings) {
+  const CommandLine& line = job.line;
+  const bool back_up = !line.backup.isEmpty();
+  std::vector<std::uint8_t> units;
+  for (const Writing& writing : writings) {
+    units.push_back(writing.unit);
+    if (!back_up) continue;
+    const QString fault = WhyNotWritable(UnitFilePath(line.backup, writing.unit), line.force);
+    if (!fault.isEmpty()) return Refused(fault);
+  }
+  if (auto fault = job.port.Open()) return *fault;
+
+  const double whole = kWriteTime + (back_up ? kReadTime : 0) + (line.compare ? kReadTime : 0);
+  const auto results = ForEachUnit(job, units, [&](UnitWork& work) {
+    if (back_up && !work.BackUp(UnitFilePath(line.backup, work.Unit()), kReadTime / whole)) return;
+    const auto& wanted = std::ranges::find(writings, work.Unit(), &Writing::unit)->options;
+    if (work.Write(wanted, kWriteTime / whole) && line.compare)
+      work.Compare(wanted, u"compare"_s, kReadTime / whole);
+  });
+  return ReportOf(results, {.written = true, .compared = true, .file = back_up ? u"backup"_s : QString()},
+                  job.environment.terminal.Colours());
+}
+
+// The unit that a file of a backup is named after; 0: it is none. The case of the name does not matter.
+std::uint8_t UnitOfName(const QString& name) {
+  static const QRegularExpression kPattern(u"^unit-([0-9A-F]{2})\\.json$"_s,
+                                           QRegularExpression::CaseInsensitiveOption);
+  const auto match = kPattern.match(name);
+  const uint id = match.captured(1).toUInt(nullptr, 16);
+  return id <= kLastUnitId ? static_cast<std::uint8_t>(id) : std::uint8_t{0};
+}
+
+// A file of a backup, and what it is named after.
+struct BackupFile {
+  std::uint8_t unit;
+  QString path;
+};
+
+// Those of the command line, or all that the folder has, in order of ID.
+std::vector<BackupFile> BackupFiles(const CommandLine& line) {
+  std::vector<BackupFile> files;
+  for (const std::uint8_t unit : line.units) files.push_back({unit, UnitFilePath(line.folder, unit)});
+  if (!files.empty()) return files;
+  const QDir folder(line.folder);
+  for (const QString& name : folder.entryList(QDir::Files | QDir::Hidden)) {
+    if (const std::uint8_t unit = UnitOfName(name)) files.push_back({unit, folder.filePath(name)});
+  }
+  std::ranges::sort(files, {}, &BackupFile::unit);
+  return files;
+}
+
+// Why the configuration is not for the unit that its file is named after; empty: it is.
+QString WhyNotOfUnit(const BackupFile& file, const ConfigurationText& configuration) {
+  if (configuration.unit == file.unit) return {};
+  const auto id = [](std::uint8_t unit) { return QString::fromStdString(HexByte(unit)); };
+  const QString why = configuration.unit ? u"it was read from unit %1"_s.arg(id(*configuration.unit))
+                                         : u"it does not say which unit it was read from"_s;
+  return u"%1: %2; --yes writes it into unit %3 all the same."_s.arg(file.path, why, id(file.unit));
+}
+
+std::variant<Writing, QString> ReadBackupFile(const BackupFile& file, bool any_unit) {
+  auto read = ReadConfigurationFile(file.path);
+  if (auto* fault = std::get_if<QString>(&read)) return *fault;
+  const auto& configuration = std::get<ConfigurationText>(read);
+  const QString fault = any_unit ? QString() : WhyNotOfUnit(file, configuration);
+  if (!fault.isEmpty()) return fault;
+  return Writing{file.unit, OptionsOf(configuration.records)};
+}
+
+}  // namespace
+
+Report Send(Job& job) {
+  const auto read = ReadConfigurationFile(job.line.file);
+  if (const auto* fault = std::get_if<QString>(&read)) return Refused(*fault);
+  const OptionTable options = OptionsOf(std::get<ConfigurationText>(read).records);
+  std::vector<Writing> writings;
+  for (const std::uint8_t unit : job.line.units) writings.push_back({unit, options});
+  return WriteUnits(job, writings);
+}
+
+Report Restore(Job& job) {
+  const CommandLine& line = job.line;
+  if (!QFileInfo(line.folder).isDir()) return Refused(u"There is no folder %1."_s.arg(line.folder));
+  const std::vector<BackupFile> files = BackupFiles(line);
+  if (files.empty())
+    return Refused(u"The folder %1 has no backup: no file like unit-0A.json."_s.arg(line.folder));
+  std::vector<Writing> writings;
+  for (const BackupFile& file : files) {
+    auto read = ReadBackupFile(file, line.yes);
+    if (const auto* fault = std::get_if<QString>(&read)) return Refused(*fault);
+    if (!writings.empty() && writings.back().unit == file.unit)
+      return Refused(u"%1 is the second file of its unit in this folder."_s.arg(file.path));
+    writings.push_back(std::get<Writing>(read));
+  }
+  return WriteUnits(job, writings);
+}
+
+}  // namespace tendril::ctl
