@@ -81,7 +81,7 @@ QString ProgramHelp() {
          u'\n' +
          Wrapped(
              u"A FILE is a configuration as text, as tendril-utility copies it; configuration-format.md "
-             "describes it."_s) +
+             "describes it. The FILE - is standard input."_s) +
          u"\nExit codes:\n"_s + exit_codes.Lines();
 }
 

@@ -17,7 +17,10 @@ constexpr auto kOptions = std::to_array<OptionInfo>({
      "take-port"_L1,
      {},
      "Ask the Control Panel for the port if it holds it, and give it back at the end."_L1},
-    {kDemoOption, "demo"_L1, {}, "Use virtual units inside the program, without hardware."_L1},
+    {kDemoOption,
+     "demo"_L1,
+     {},
+     "Use virtual units inside the program instead of hardware: Comm 1 to 4, by default 1."_L1},
     {kNoCompareOption, "no-compare"_L1, {}, "Do not read back what was written."_L1},
     {kBackupFolderOption, "backup"_L1, "FOLDER"_L1,
      "Read each unit first, and keep what it held in FOLDER, as unit-0A.json and so on."_L1},
@@ -40,8 +43,8 @@ constexpr auto kCommands = std::to_array<CommandInfo>({
      .other_arguments = {},
      .summary = "List the comm ports."_L1,
      .description =
-         "List the comm ports: number, device, the maker of the adapter and, where the system reports it, "
-         "the program that holds the port."_L1,
+         "List the comm ports: number, device, the adapter with its maker and, where the system reports "
+         "it, the program that holds the port."_L1,
      .options = kDemoOption | kJsonOption,
      .example = "ports"_L1},
     {.command = Command::kFind,
@@ -51,7 +54,8 @@ constexpr auto kCommands = std::to_array<CommandInfo>({
      .summary = "List the units that answer."_L1,
      .description =
          "Poll every ID from FIRST to LAST, by default from 01 to FD, and list the units that answer. All "
-         "IDs take 25 seconds, on a noisy line twice that."_L1,
+         "IDs take 25 seconds, on a noisy line twice that. The exit code is 1 when none answers, or one "
+         "not as it should."_L1,
      .options = kLineOptions,
      .example = "find 01-20"_L1},
     {.command = Command::kGet,
