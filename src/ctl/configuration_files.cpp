@@ -47,6 +47,16 @@ QString CreateFolderOf(const QString& path) {
              : QString();
 }
 
+// A disk that gets full takes a part, without a reason. The next write has it.
+bool WriteAll(QIODevice& file, QByteArrayView text) {
+  while (!text.isEmpty()) {
+    const qint64 taken = file.write(text.data(), text.size());
+    if (taken <= 0) return false;
+    text = text.sliced(taken);
+  }
+  return true;
+}
+
 }  // namespace
 
 std::variant<ConfigurationText, QString> ReadConfigurationFile(const QString& path) {
@@ -90,7 +100,7 @@ QString WriteNewFile(const QString& path, const QByteArray& text, bool force) {
   const QString no_folder = CreateFolderOf(path);
   if (!no_folder.isEmpty()) return no_folder;
   QSaveFile file(path);
-  const bool written = file.open(QIODevice::WriteOnly) && file.write(text) == text.size() && file.flush();
+  const bool written = file.open(QIODevice::WriteOnly | QIODevice::Unbuffered) && WriteAll(file, text);
   // As late as can be: another program may have written it since the command began.
   const QString reason = WhyNotReplaced(path, force);
   if (!reason.isEmpty()) return reason;

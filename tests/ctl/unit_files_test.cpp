@@ -1,0 +1,335 @@
+// The commands that take configurations from units to files and back.
+#include <QDir>
+#include <QFile>
+#include <csignal>
+#include <string>
+
+#include "config/option_bytes.h"
+#include "ctl/configuration_files.h"
+#include "ctl/ctl_fixture.h"
+
+#ifdef __linux__
+#include <sys/resource.h>
+#endif
+
+namespace tendril::test {
+namespace {
+
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::IsEmpty;
+using testing::StartsWith;
+
+// Accepts what is sent, and holds another default position in port 3.
+class ForgetfulUnit final : public VirtualUnit {
+ public:
+  using VirtualUnit::VirtualUnit;
+
+ protected:
+  std::optional<Bytes> ReplyData(std::uint8_t kind) override {
+    auto data = VirtualUnit::ReplyData(kind);
+    if (kind == 'n' && data->front() == 3) (*data)[8] = 151;
+    return data;
+  }
+};
+
+// In a folder with wide.json and, after "Wide Range", no unit has its values.
+class UnitFiles : public CtlTest {
+ protected:
+  UnitFiles() {
+    QDir::setCurrent(folder_.path());
+    EXPECT_EQ(Type("preset wide --output wide.json"), 0);
+  }
+  // As in a terminal.
+  int Type(const char* words) { return Run(QString::fromUtf8(words).split(u' ')); }
+  void AttachUnits(std::uint8_t first, std::uint8_t last) {
+    for (std::uint8_t id = first; id <= last; ++id) Attach("", id);
+  }
+  static std::vector<std::string> FilesIn(const char* folder) {
+    std::vector<std::string> names;
+    for (const QString& name : QDir(QString::fromUtf8(folder)).entryList(QDir::Files | QDir::Hidden))
+      names.push_back(name.toStdString());
+    return names;
+  }
+  static QByteArray TextOf(const char* path) {
+    QFile file(QString::fromUtf8(path));
+    EXPECT_TRUE(file.open(QIODevice::ReadOnly)) << path;
+    return file.readAll();
+  }
+  static void Write(const char* path, const QByteArray& text) {
+    QFile file(QString::fromUtf8(path));
+    EXPECT_TRUE(file.open(QIODevice::WriteOnly) && file.write(text) == text.size()) << path;
+  }
+  // Does `action` in `ms`, while a command runs.
+  void In(std::int32_t ms, std::function<void()> action) {
+    timer_ = world_.time.CreateTimer([this, action = std::move(action)] {
+      timer_->SetEnabled(false);
+      action();
+    });
+    timer_->SetInterval(ms);
+    timer_->SetEnabled(true);
+  }
+  void StopIn(std::int32_t ms) {
+    In(ms, [this] { stop_.Make(SIGINT); });
+  }
+  bool Untouched(const VirtualUnit& unit) { return unit.polls_heard() + unit.accepted_commands() == 0; }
+
+  std::unique_ptr<Timer> timer_;
+};
+
+TEST_F(UnitFiles, Send_GoesOnAfterAUnitThatFails) {
+  struct Case {
+    const char* fault;
+    std::string row;
+  };
+  const Case cases[] = {
+      {"mute",
+       "05    perhaps  -         Only what the program sends comes back.\n"
+       "                         Unit 05 does not answer: check its power, its ID and the wiring.\n"
+       "                         Port 1 is perhaps written, 2 to 8 are not.\n"},
+      {"short-reply",
+       "05    partly   -         Unit 05 answers, but does not acknowledge what was sent.\n"
+       "                         Send again; if that fails, too, it is faulty.\n"
+       "                         It holds half a configuration: ports 1 to 2 are written, 3 perhaps, 4 to 8 "
+       "are not.\n"},
+      {"missing-port",
+       "05    yes      -         Unit 05 answers, but does not report all of its eight ports.\n"
+       "                         Read it again; if that fails, too, it is faulty.\n"}};
+  Attach("", 0x06);
+  const std::string headings = "unit  written  compared\n";
+  for (const auto& [fault, row] : cases) {
+    VirtualUnit& unit = Attach(fault, 0x05);
+    EXPECT_EQ(Type("send wide.json 05,06"), 1);
+    EXPECT_EQ(terminal_.out, headings + row + "06    yes      equal\n");
+    EXPECT_THAT(terminal_.error, testing::EndsWith("unit 06 (2 of 2): written, holds it\n"
+                                                   "tendril-ctl: 1 of 2 units failed.\n"));
+    world_.bench.Detach(1, unit);
+  }
+  for (const int port : {0, 1}) {
+    VirtualUnit& unit = Attach("deaf", 0x05);
+    EXPECT_EQ(Type(port == 0 ? "send wide.json 05 --quiet" : "send wide.json 05 --no-compare --quiet"), 0);
+    EXPECT_EQ(terminal_.out, headings + (port == 0 ? "05    yes      equal\n" : "05    yes      -\n"));
+    EXPECT_EQ(terminal_.error, "");
+    EXPECT_EQ(unit.PortOptions(8), (PortOptionBytes{1, 50, 250, 70, 230, 70, 230, 150, 150}));
+    world_.bench.Detach(1, unit);
+  }
+}
+
+TEST_F(UnitFiles, Compare_SaysWhatDiffers) {
+  world_.bench.Attach<ForgetfulUnit>(1, 0x05);
+  EXPECT_EQ(Type("send wide.json 05 --json"), 1);
+  const auto json = QString::fromStdString(terminal_.out).simplified().toStdString();
+  EXPECT_THAT(json, HasSubstr(R"("units": [ { "compared": "differs", "differences": [ { "held": "1510", )"
+                              R"("part": "defaultPosition", "ports": [ 3 ], "wanted": "1500" } ], )"
+                              R"("outcome": "differs", "unit": "05", "written": "all" } ])"));
+  VirtualUnit& other = Attach("", 0x06);
+  for (const int port : {1, 2, 3, 5, 7, 8})
+    other.SetPortOptions(port, {1, 50, 250, 70, 230, 70, 230, 150, 150});
+  EXPECT_EQ(Type("compare wide.json 05,06,07"), 1);
+  EXPECT_THAT(
+      terminal_.out,
+      StartsWith(
+          "unit  compared\n"
+          "05    differs   port 3, default position: 1500 in the file, 1510 in the unit\n"
+          "06    differs   ports 4, 6, actual range: 500 to 2500 in the file, 600 to 2400 in the unit\n"));
+  EXPECT_THAT(terminal_.error, HasSubstr("tendril-ctl: 2 of 3 units differ, 1 failed.\n"));
+
+  QByteArray text = TextOf("wide.json");
+  Write("same.json", text.replace("[500, 2500]", "[509, 2501]"));
+  EXPECT_EQ(Type("compare wide.json same.json"), 0);
+  Write("other.json", text.replace("stop pulse", "hold"));
+  EXPECT_EQ(Type("compare wide.json other.json"), 1);
+  EXPECT_EQ(terminal_.out,
+            "ports  part                 wide.json                            other.json\n"
+            "1-8    lost communications  Stop Pulse / Start on First Command  Hold at Current Position\n");
+}
+
+TEST_F(UnitFiles, Stop_NamesTheUnitThatHoldsHalfAConfiguration) {
+  Attach("", 0x05);
+  VirtualUnit& unit = Attach("", 0x06);
+  VirtualUnit& last = Attach("", 0x07);
+  StopIn(4000);
+  EXPECT_EQ(Type("send wide.json 05-07 --quiet"), 130);
+  EXPECT_EQ(terminal_.out,
+            "unit  written  compared\n"
+            "05    yes      equal\n"
+            "06    partly   -         Stopped. It holds half a configuration: ports 1 to 5 are written, 6 to "
+            "8 are not.\n"
+            "07    no       -         Not tried.\n");
+  EXPECT_EQ(
+      terminal_.error,
+      "tendril-ctl: Stopped at unit 06. It holds half a configuration: ports 1 to 5 are written, 6 to 8 are "
+      "not. 1 of 3 units was not tried.\n");
+  EXPECT_EQ(unit.accepted_commands(), 5U);
+  EXPECT_TRUE(Untouched(last));
+}
+
+TEST_F(UnitFiles, Backup_WritesWholeFilesAndReplacesNone) {
+  AttachUnits(0x05, 0x07);
+  In(100, [] {
+    QDir().mkdir(QStringLiteral("other"));
+    Write("other/unit-05.json", "by another program");
+  });
+  EXPECT_EQ(Type("backup other 05 --quiet"), 1);
+  EXPECT_EQ(terminal_.out,
+            "unit  file\n05    -     other/unit-05.json exists already; --force overwrites it.\n");
+  EXPECT_EQ(TextOf("other/unit-05.json"), "by another program");
+  StopIn(200);
+  EXPECT_EQ(Type("backup kept 05-07 --quiet"), 130);
+  EXPECT_THAT(FilesIn("kept"), ElementsAre("unit-05.json"));
+  EXPECT_THAT(terminal_.out, HasSubstr("06    -                  Stopped.\n"));
+}
+
+TEST_F(UnitFiles, UnpluggedPort_EndsTheCommand) {
+  Attach("", 0x05);
+  Attach("", 0x06);
+  In(1000, [this] { world_.bench.Unplug(1); });
+  EXPECT_EQ(Type("send wide.json 05,06 --quiet"), 1);
+  EXPECT_THAT(terminal_.out, HasSubstr("\n06    no       -         Not tried.\n"));
+  EXPECT_THAT(terminal_.out, HasSubstr("05    partly   -         The port went away.\n"));
+}
+
+TEST_F(UnitFiles, BackupAndRestore_GiveEachUnitBackWhatItHeld) {
+  std::vector<VirtualUnit*> units;
+  for (std::uint8_t id = 0x05; id <= 0x06; ++id) {
+    units.push_back(&Attach("", id));
+    for (int port = 1; port <= kUnitPorts; ++port)
+      units.back()->SetPortOptions(port, {0x9E, 255, 1, id, 7, 8, 9, 10, static_cast<std::uint8_t>(port)});
+  }
+  Attach("garbling", 0x09);
+  EXPECT_EQ(Type("backup kept"), 1);
+  EXPECT_EQ(terminal_.out,
+            "unit  file\n05    kept/unit-05.json\n06    kept/unit-06.json\n"
+            "09    -                  Not read: perhaps several units.\n");
+  EXPECT_THAT(TextOf("kept/unit-05.json").toStdString(),
+              HasSubstr("\"unit\": \"05\",\n  \"read\": \"2026-11-"));
+  EXPECT_EQ(Type("send wide.json 05,06 --quiet"), 0);
+  EXPECT_EQ(Type("backup kept --quiet"), 2);  // without --force
+  EXPECT_EQ(Type("restore kept --backup changed --quiet"), 0);
+  for (std::uint8_t i = 0; i < 2; ++i)
+    EXPECT_EQ(units[i]->PortOptions(4), (PortOptionBytes{0x9E, 255, 1, std::uint8_t(5 + i), 7, 8, 9, 10, 4}));
+  EXPECT_EQ(Type("compare wide.json changed/unit-06.json"), 0);
+}
+
+TEST_F(UnitFiles, AUnitWithoutABackup_IsNotWritten) {
+  VirtualUnit& exact = Attach("", 0x05);
+  VirtualUnit& inexact = Attach("", 0x06);
+  inexact.SetPortOptions(3, {0x41, 60, 240, 100, 200, 100, 200, 150, 150});
+  VirtualUnit& empty = Attach("", 0x07);
+  empty.SetPortOptions(1, {4, 60, 240, 100, 200, 100, 200, 150, 150});
+  EXPECT_EQ(Type("send wide.json 05-07 --backup kept --quiet"), 1);
+  EXPECT_EQ(exact.accepted_commands(), 8U);
+  EXPECT_EQ(inexact.accepted_commands() + empty.accepted_commands(), 0U);
+  EXPECT_THAT(terminal_.out,
+              HasSubstr("06    no       -         kept/unit-06.json  port 3, power up: Start Pulse on "
+                        "First Command in the file, unknown (flags 40) in the unit\n"));
+  EXPECT_THAT(terminal_.out,
+              HasSubstr("A file cannot have what the unit holds: port 1: output kind -1 cannot be sent."));
+  EXPECT_THAT(FilesIn("kept"), ElementsAre("unit-05.json", "unit-06.json"));
+}
+
+TEST_F(UnitFiles, ABadFile_IsRefusedBeforeAnythingIsSent) {
+  VirtualUnit& unit = Attach("", 0x05);
+  const QByteArray good = TextOf("wide.json");
+  Write("list.json", "hello");
+  Write("later.json", QByteArray(good).replace("\"version\": 1", "\"version\": 2"));
+  Write("beyond.json", QByteArray(good).replace("\"neutralPosition\": 1500", "\"neutralPosition\": 2551"));
+  Write("5.json", good);
+  QDir().mkdir(QStringLiteral("set"));
+  Write("set/unit-05.json", QByteArray(good).replace("\"ports\"", "\"unit\": \"06\", \"ports\""));
+  QDir().mkdir(QStringLiteral("half"));
+  Write("half/unit-05.json", QByteArray(good).replace("\"ports\"", "\"unit\": \"05\", \"ports\""));
+  Write("half/unit-06.json", good.first(300));
+  struct Case {
+    const char* words;
+    const char* error;
+  };
+  for (const auto& [words, error] : {
+           Case{"send none.json 05", "none.json cannot be read: No such file or directory."},
+           Case{"send . 05", ". is a folder, not a file."},
+           Case{"send list.json 05", "list.json: line 1: this is no configuration, which begins with {."},
+           Case{"compare later.json 05", "later.json: version: 2 is not 1, the one known here."},
+           Case{"compare wide.json beyond.json",
+                "beyond.json: port 1, neutralPosition: 2551 is not a whole number from 10 to 2550."},
+           Case{"restore none", "There is no folder none."},
+           Case{"restore .", "The folder . has no backup: no file like unit-0A.json."},
+           Case{"restore half", "half/unit-06.json: line 13: this is not JSON (unterminated string)."},
+           Case{"restore half 05,07", "half/unit-07.json cannot be read: No such file or directory."},
+           Case{"restore set",
+                "set/unit-05.json: it was read from unit 06; --yes writes it into unit 05 all the same."},
+           Case{"send wide.json 05 --backup half",
+                "half/unit-05.json exists already; --force overwrites it."},
+           Case{"get 05 --output wide.json", "wide.json exists already; --force overwrites it."},
+           Case{"get 05 --output /dev/null --force", "/dev/null is not a regular file."},
+           Case{"backup wide.json 05", "wide.json/unit-05.json cannot be written: "},
+       }) {
+    EXPECT_EQ(Type(words), 2) << words;
+    EXPECT_THAT(terminal_.error, StartsWith(std::string("tendril-ctl: ") + error)) << words;
+    EXPECT_EQ(terminal_.out, "");
+  }
+  EXPECT_TRUE(Untouched(unit));
+  EXPECT_EQ(Type("restore set --yes --quiet"), 0);
+  EXPECT_EQ(Type("get 05 --quiet --output wide.json --force"), 0);
+  EXPECT_NE(TextOf("wide.json"), good);
+}
+
+#ifdef __linux__
+TEST_F(UnitFiles, AFullDisk_LeavesTheOldFileAndNoOther) {
+  const QByteArray good = TextOf("wide.json");
+  rlimit limit{};
+  getrlimit(RLIMIT_FSIZE, &limit);
+  const rlimit small{512, limit.rlim_max};
+  const auto old_handler = std::signal(SIGXFSZ, SIG_IGN);
+  setrlimit(RLIMIT_FSIZE, &small);
+  const QString fault = ctl::WriteNewFile(QStringLiteral("wide.json"), good + good, true);
+  setrlimit(RLIMIT_FSIZE, &limit);
+  std::signal(SIGXFSZ, old_handler);
+  EXPECT_EQ(fault, QStringLiteral("wide.json cannot be written: File too large."));
+  EXPECT_EQ(TextOf("wide.json"), good);
+  EXPECT_THAT(FilesIn("."), ElementsAre("wide.json"));
+}
+#endif
+
+TEST_F(UnitFiles, FortyUnits_TakeWhatTheProtocolTakes) {
+  constexpr int kUnits = 40;
+  AttachUnits(1, kUnits);
+  double wire_bytes = 0;
+  world_.bench.Line(1).SetTap([&](const LineByte& /*byte*/) { ++wire_bytes; });
+  const std::uint64_t begin_ms = world_.time.ElapsedMs();
+  EXPECT_EQ(Type("send wide.json 01-28 --quiet"), 0);
+  const auto taken_ms = static_cast<double>(world_.time.ElapsedMs() - begin_ms);
+  // What is on the wire, the pause after each port that is written, and the unit's turn-round when one is read.
+  const double floor_ms =
+      wire_bytes * 10 * 1000 / 19200 + kUnits * 8 * (300 + ReplyTiming().turn_round_us / 1000.0);
+
+  EXPECT_LE(taken_ms, 1.02 * floor_ms) << "floor " << floor_ms;
+  EXPECT_GE(taken_ms, floor_ms);
+}
+
+TEST_F(UnitFiles, ProgressOnATerminal_IsOneLineWithTheTimeLeft) {
+  AttachUnits(0x05, 0x07);
+  terminal_.columns = 40;
+  EXPECT_EQ(Type("send wide.json 05-07"), 0);
+  EXPECT_THAT(terminal_.error, HasSubstr("\runit 05 (1 of 3): port 2 of 8\r"));
+  EXPECT_THAT(terminal_.error, HasSubstr("\runit 06 (2 of 3): port 5 of 8, 00:04 le\r"));
+  EXPECT_THAT(terminal_.error, testing::EndsWith("\r" + std::string(39, ' ') + "\r"));
+  EXPECT_EQ(terminal_.error.find('\n'), std::string::npos);
+}
+
+TEST_F(UnitFiles, Show_DoesNothingToTheTerminal) {
+  Write("named.json", TextOf("wide.json")
+                          .replace("\"ports\"", "\"note\": \"a\\u001b[2J\\nb\", \"ports\"")
+                          .replace("\"port\": 2,", "\"port\": 2, \"name\": \"jaw, left\","));
+  EXPECT_EQ(Type("show named.json"), 0);
+  EXPECT_THAT(
+      terminal_.out,
+      StartsWith("Note: a\uFFFD[2J b\n\n"
+                 "port  name       kind   actual range  virtual range  stops        default  neutral  power "
+                 "up       lost comm.\n"
+                 "1                servo  500 to 2500   700 to 2300    700 to 2300  1500     1500     first "
+                 "command  stop pulse\n"
+                 "2     jaw, left  servo  "));
+}
+
+}  // namespace
+}  // namespace tendril::test
