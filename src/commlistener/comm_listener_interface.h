@@ -100,6 +100,8 @@ class CommListenerInterface {
   void RelinquishCommPortControl(std::uint8_t port);
   // What became of the last of these for this port.
   PortControl CommPortControl(std::uint8_t port) const;
+  // Whether one of these waits to be sent, or for its acknowledgement.
+  bool CommPortControlPending() const { return !port_control_queue_.empty() || port_control_outstanding_; }
   // Whether physical lights are controlled. Setting it notifies the listener.
   bool PhysicalLightsControl() const { return physical_lights_control_; }
   void SetPhysicalLightsControl(bool control);

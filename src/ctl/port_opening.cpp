@@ -1,28 +1,145 @@
 #include "ctl/port_opening.h"
 
-#include <cstdint>
+#include <vector>
 
-#include "platform/runtime_error.h"
+#include "ctl/bounded_wait.h"
+#include "ctl/port_list.h"
 
 namespace tendril::ctl {
 namespace {
 
 constexpr std::int32_t kNetworkBaudRate = 19200;
+// The Control Panel may answer before it has closed the port.
+constexpr int kOpeningTries = 30;
+constexpr std::int32_t kTryAgainMs = 100;
+
+Report Failure(const std::string& sentence, int exit_code = kExitPort) {
+  return {.exit_code = exit_code, .problem = QString::fromStdString(sentence)};
+}
+
+std::string NoSuchPort(std::int16_t number, const std::vector<std::int16_t>& others) {
+  if (others.empty()) return "There is no " + CommName(number) + ", nor any other port: plug in the adapter.";
+  return "There is no " + CommName(number) + "; there " + (others.size() == 1 ? "is " : "are ") +
+         PortNames(others, "and") + ".";
+}
+
+// The device's own description, without where it was passed on.
+std::string FirstLine(const std::string& description) {
+  return description.substr(0, description.find("\r\n"));
+}
 
 }  // namespace
 
+PortOpening::PortOpening(const CommandLine& line, Environment& environment, UnitSession& units)
+    : line_(line), environment_(environment), units_(units), borrowed_(environment) {}
+
 std::optional<Report> PortOpening::Open() {
+  return OpenBy([this] {
+    HwSerial& link = units_.Link();
+    try {
+      link.SetCommPort(number_);
+      link.SetBaudRate(kNetworkBaudRate);
+      link.SetPortOpen(true);
+      link.SetRTS(true);
+    } catch (...) {
+      throw RuntimeError(CurrentFault().number(), units_.Trace().PortFault());
+    }
+  });
+}
+
+std::optional<Report> PortOpening::OpenToListen() {
+  return OpenBy([this] {
+    environment_.device.Open(number_, kNetworkBaudRate);
+    environment_.device.SetRts(false);
+  });
+}
+
+void PortOpening::GiveBack() {
+  units_.Link().SetPortOpen(false);
+  if (borrowed_.GiveBack()) return;
+  environment_.terminal.PrintError("tendril-ctl: " + QByteArray::fromStdString(CommName(number_)) +
+                                   " is not given back: the Control Panel does not answer.\n");
+}
+
+std::optional<Report> PortOpening::OpenBy(const Opener& open) {
+  if (auto problem = Choose()) return problem;
+  const auto fault = Try(open);
+  if (!fault) return std::nullopt;
+  const bool in_use = fault->number() == kErrPortAlreadyOpen;
+  if (in_use && line_.take_port && borrowed_.ControlPanelRunning()) return Borrow(open);
+  return Failure(Sentence(*fault));
+}
+
+std::optional<Report> PortOpening::Choose() {
+  number_ = line_.port;
+  if (number_ != 0) return std::nullopt;
+  const std::vector<std::int16_t> ports = ListedPorts(environment_.device);
+  if (ports.empty()) return Failure("There is no serial port: plug in the adapter.");
+  if (ports.size() > 1)
+    return Failure(
+        "Choose " + PortNames(ports, "or") + " with --port; tendril-ctl ports shows which is which.",
+        kExitUsage);
+  number_ = ports.front();
+  return std::nullopt;
+}
+
+std::optional<Report> PortOpening::Borrow(const Opener& open) {
+  const std::string port = CommName(number_);
+  if (!line_.quiet)
+    environment_.terminal.PrintError("Asking the Control Panel for " + QByteArray::fromStdString(port) +
+                                     ".\n");
+  const std::string refusal = borrowed_.Borrow(static_cast<std::uint8_t>(number_));
+  std::string sentence = port + " is in use, and " + refusal + ".";
+  if (refusal.empty()) {
+    std::optional<RuntimeError> fault = Try(open);
+    for (int tries = 1; fault && tries < kOpeningTries && !environment_.stop.Made(); ++tries) {
+      WaitUntil(environment_, kTryAgainMs, [this] { return environment_.stop.Made(); });
+      fault = Try(open);
+    }
+    if (!fault) return std::nullopt;
+    sentence = "The Control Panel has given " + port + " up, and yet: " + Sentence(*fault);
+  }
+  GiveBack();
+  return Failure(sentence);
+}
+
+std::optional<RuntimeError> PortOpening::Try(const Opener& open) {
   try {
-    link_.SetCommPort(line_.port);
-    link_.SetBaudRate(kNetworkBaudRate);
-    link_.SetPortOpen(true);
-    link_.SetRTS(true);
+    open();
   } catch (...) {
-    return Report{.exit_code = kExitPort, .problem = QString::fromStdString(DescribeCurrentFault())};
+    const RuntimeError fault = CurrentFault();
+    units_.Link().SetPortOpen(false);
+    return fault;
   }
   return std::nullopt;
 }
 
-void PortOpening::GiveBack() { link_.SetCommPort(0); }
+std::string PortOpening::Sentence(const RuntimeError& fault) {
+  switch (fault.number()) {
+    case kErrPortAlreadyOpen:
+      return InUse();
+    case kErrNotAllowed:
+      return FirstLine(fault.description());
+    default:
+      if (!environment_.device.Exists(number_)) return NoSuchPort(number_, ListedPorts(environment_.device));
+      return CommName(number_) + " cannot be opened: " + FirstLine(fault.description());
+  }
+}
+
+std::string PortOpening::InUse() {
+  const PortHolder holder = environment_.device.Holder(number_);
+  const std::string name = HolderName(holder);
+  const std::string in_use = CommName(number_) + " is in use";
+  if (!borrowed_.ControlPanelRunning()) {
+    return in_use +
+           (name.empty()          ? " by another program"
+            : holder.process == 0 ? ", " + name
+                                  : " by " + name) +
+           (line_.take_port ? "; the Control Panel, which --take-port asks, does not run." : ": close it.");
+  }
+  const std::string ask = line_.take_port ? "." : ": --take-port asks it for the port.";
+  if (holder.process == 0) return in_use + " by the Control Panel" + ask;
+  return in_use + " by " + name + ", and the Control Panel runs" + ask;
+}
 
 }  // namespace tendril::ctl

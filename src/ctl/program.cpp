@@ -54,7 +54,7 @@ int RunCommand(const CommandLine& line, Environment& environment) {
   Report report;
   {
     UnitSession units(environment);
-    PortOpening port(line, environment, units.Link());
+    PortOpening port(line, environment, units);
     Job job{line, environment, units, port};
     report = RunJob(job);
     port.GiveBack();

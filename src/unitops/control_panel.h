@@ -44,6 +44,10 @@ class ControlPanel {
   PortControl RequestState() const;
   // `handler` is called when that has changed: at once for what the user does, and within a second of the answer.
   void SetChangedHandler(std::function<void()> handler) { changed_ = std::move(handler); }
+  // Whether there is a connection to the comm listener. A request without an answer was sent only if there is one.
+  bool Connected() const { return client_.IsConnected(); }
+  // Whether a request for a port, or one that gives it back, is still to be sent or to be acknowledged.
+  bool RequestPending() const { return client_.CommPortControlPending(); }
   // Gives that port back. It counts as requested no longer.
   void RelinquishPort();
 
