@@ -2,8 +2,10 @@
 
 #include <QJsonDocument>
 #include <QJsonObject>
+#include <optional>
 
 #include "ctl/commands.h"
+#include "ctl/trace_output.h"
 
 namespace tendril::ctl {
 namespace {
@@ -54,6 +56,8 @@ int RunCommand(const CommandLine& line, Environment& environment) {
   Report report;
   {
     UnitSession units(environment);
+    std::optional<TraceOutput> trace;
+    if (line.trace) trace.emplace(units.Trace(), environment.terminal);
     PortOpening port(line, environment, units);
     Job job{line, environment, units, port};
     report = RunJob(job);

@@ -55,6 +55,8 @@ class UnitSession final : private UnitTarget, private CommandProgressView, priva
   const UnitSearch& Search() const { return commands_.find.Search(); }
   // Gives the unit at FF the ID `new_id`.
   CommandResult SetId(std::uint8_t new_id);
+  // Whether the last SetId() has sent the ID: the unit may have it.
+  bool IdPerhapsChanged() const { return commands_.change_id.PerhapsChanged(); }
 
   void SetStepHandler(StepHandler handler) { on_step_ = std::move(handler); }
   // The line. Its port is opened elsewhere; while it is closed, no command begins.

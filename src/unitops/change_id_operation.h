@@ -24,6 +24,8 @@ class ChangeIdOperation final : public UnitOperation {
   // Begins to give `new_id` to the unit at `old_id`: opens the port if needed and enables the timer. Raises what the
   // opening raises.
   void StartChangeAddress(std::uint8_t old_id, std::uint8_t new_id);
+  // Whether the unit may have got the new ID of the last change.
+  bool PerhapsChanged() const { return perhaps_changed_; }
 
  protected:
   std::string Prepare() override;

@@ -1,0 +1,116 @@
+#include <optional>
+#include <string>
+
+#include "ctl/commands.h"
+#include "ctl/find_command.h"
+#include "serial/packets.h"
+
+namespace tendril::ctl {
+namespace {
+
+using namespace Qt::StringLiterals;
+
+constexpr int kCleanReplies = 3;
+
+Report Refusal(const QString& sentences) {
+  return {.exit_code = kExitNotAsWished,
+          .members = {{u"changed"_s, u"no"_s}},
+          .problem = sentences + u" No ID has changed."_s};
+}
+
+// Any answer counts, also one that is late or garbled.
+std::optional<Report> RefuseOtherUnits(Job& job) {
+  const CommandResult result = FindWithProgress(job, kFirstUnitId, kLastUnitId);
+  const UnitSearch& search = job.units.Search();
+  const QString sentence = SearchSentence(result, search);
+  if (!result.Done()) return Refusal(sentence);
+  if (search.found.empty()) return std::nullopt;
+  return Refusal(sentence +
+                 u" Every unit that is connected would take the ID: connect the one that is to "
+                 "have it alone; --alone leaves out this search."_s);
+}
+
+// Whether the last poll brought one reply, and nothing else.
+bool CleanReply(const LineTrace& trace) {
+  int replies = 0;
+  bool others = false;
+  for (const TraceEntry& entry : trace.Entries()) {
+    replies += entry.kind == TraceEntry::Kind::kReply ? 1 : 0;
+    others |= entry.kind == TraceEntry::Kind::kNoise && LeadingZeros(entry.bytes) < entry.bytes.size();
+  }
+  return replies == 1 && !others;
+}
+
+// Polls FF several times: one of two replies may hide the other once, or come so late that only the next poll shows it.
+// `id` becomes the unit's own ID.
+std::optional<Report> RefuseUncleanReplies(Job& job, std::uint8_t& id) {
+  for (int replies = 0; replies < kCleanReplies; ++replies) {
+    const CommandResult result = job.units.Find(kAllUnits, kAllUnits);
+    const UnitSearch& search = job.units.Search();
+    if (!result.Done() || (replies == 0 && search.found.empty()))
+      return Refusal(SearchSentence(result, search));
+    const bool same = search.found.size() == 1 && (replies == 0 || search.found.front().id == id);
+    if (!same || !CleanReply(job.units.Trace()))
+      return Refusal(
+          u"Each poll of FF must bring one clean reply and nothing else, and this one did not: connect one unit alone, and check the wiring."_s);
+    id = search.found.front().id;
+  }
+  return std::nullopt;
+}
+
+// Returns the report when the user does not want it.
+std::optional<Report> Confirm(Job& job, std::uint8_t id) {
+  const QString port = QString::fromStdString(CommName(job.port.Number()));
+  const QString now = id == kAllUnits ? QString() : u", now %1,"_s.arg(IdText(id));
+  const QString question =
+      u"Give the unit on %1%2 the ID %3? [y/N] "_s.arg(port, now, IdText(job.line.new_id));
+  const std::optional<QString> answer = job.environment.terminal.Ask(question.toUtf8());
+  if (answer && (answer->toLower() == u"y" || answer->toLower() == u"yes")) return std::nullopt;
+  return Refusal(u"Not confirmed."_s);
+}
+
+Report Write(Job& job) {
+  const CommandResult result = job.units.SetId(job.line.new_id);
+  if (result.Done()) {
+    return {.text = u"The unit has the ID %1.\n"_s.arg(IdText(job.line.new_id)).toUtf8(),
+            .members = {{u"changed"_s, u"yes"_s}}};
+  }
+  const bool stopped = result.kind == CommandResult::Kind::kCancelled;
+  const std::string sentences = (stopped ? "Stopped." : result.reason) + " " + result.aftermath;
+  return {.exit_code = kExitNotAsWished,
+          .members = {{u"changed"_s, job.units.IdPerhapsChanged() ? u"perhaps"_s : u"no"_s}},
+          .problem = QString::fromStdString(sentences)};
+}
+
+// `id` becomes the unit's own ID.
+Report CheckAndWrite(Job& job, std::uint8_t& id) {
+  if (!job.line.alone) {
+    if (auto refusal = RefuseOtherUnits(job)) return *refusal;
+  }
+  if (auto refusal = RefuseUncleanReplies(job, id)) return *refusal;
+  if (id == job.line.new_id)
+    return {.text = u"The unit has the ID %1 already.\n"_s.arg(IdText(id)).toUtf8(),
+            .members = {{u"changed"_s, u"no"_s}}};
+  if (!job.line.yes) {
+    if (auto refusal = Confirm(job, id)) return *refusal;
+    // The user may have connected something meanwhile.
+    if (auto refusal = RefuseUncleanReplies(job, id)) return *refusal;
+  }
+  return Write(job);
+}
+
+}  // namespace
+
+Report SetId(Job& job) {
+  if (!job.line.yes && !job.environment.terminal.CanAsk()) {
+    return {.exit_code = kExitUsage,
+            .problem = u"set-id asks before it writes the ID: without a terminal, --yes is needed."_s};
+  }
+  if (auto problem = job.port.Open()) return *problem;
+  std::uint8_t id = kAllUnits;
+  Report report = CheckAndWrite(job, id);
+  report.members[u"unit"_s] = IdText(job.line.new_id);
+  return report;
+}
+
+}  // namespace tendril::ctl
