@@ -30,13 +30,18 @@ std::optional<Report> RefuseOtherUnits(Job& job) {
                  "have it alone; --alone leaves out this search."_s);
 }
 
-// Whether the last poll brought one reply, and nothing else.
-bool CleanReply(const LineTrace& trace) {
+// Whether the last poll brought one reply, and nothing else has arrived: since the poll, if it is the first one, since
+// opening a port may bring a stray byte; otherwise since the poll before.
+bool CleanReply(const LineTrace& trace, bool first) {
   int replies = 0;
+  bool counts = !first;
   bool others = false;
   for (const TraceEntry& entry : trace.Entries()) {
+    counts |= entry.kind == TraceEntry::Kind::kSent;
     replies += entry.kind == TraceEntry::Kind::kReply ? 1 : 0;
-    others |= entry.kind == TraceEntry::Kind::kNoise && LeadingZeros(entry.bytes) < entry.bytes.size();
+    const bool noise =
+        entry.kind == TraceEntry::Kind::kNoise && LeadingZeros(entry.bytes) < entry.bytes.size();
+    others |= counts && noise;
   }
   return replies == 1 && !others;
 }
@@ -50,7 +55,7 @@ std::optional<Report> RefuseUncleanReplies(Job& job, std::uint8_t& id) {
     if (!result.Done() || (replies == 0 && search.found.empty()))
       return Refusal(SearchSentence(result, search));
     const bool same = search.found.size() == 1 && (replies == 0 || search.found.front().id == id);
-    if (!same || !CleanReply(job.units.Trace()))
+    if (!same || !CleanReply(job.units.Trace(), replies == 0))
       return Refusal(
           u"Each poll of FF must bring one clean reply and nothing else, and this one did not: connect one unit alone, and check the wiring."_s);
     id = search.found.front().id;

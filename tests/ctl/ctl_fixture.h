@@ -68,6 +68,8 @@ class CtlTest : public testing::Test, protected ctl::Waiting {
     if (line.port == 0) line.port = 1;
     return ctl::RunCommand(line, environment_);
   }
+  // The same, with spaces between the arguments.
+  int Run(const std::string& arguments) { return Run(QString::fromStdString(arguments).split(u' ')); }
   // The path of a file in the test's own folder.
   QString Path(const char* name) const { return folder_.filePath(QString::fromUtf8(name)); }
 
