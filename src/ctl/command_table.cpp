@@ -150,7 +150,7 @@ constexpr auto kCommands = std::to_array<CommandInfo>({
      .description =
          "Print what crosses the line, with the time and the meaning of each packet, until Ctrl+C. Nothing "
          "is sent."_L1,
-     .options = kPortOption | kTakePortOption | kDemoOption,
+     .options = kPortOption | kTakePortOption | kDemoOption | kQuietOption,
      .example = "monitor --port 3"_L1},
 });
 

@@ -12,8 +12,9 @@ using namespace Qt::StringLiterals;
 Report Monitor(Job& job) {
   if (auto problem = job.port.OpenToListen()) return *problem;
   Environment& environment = job.environment;
-  environment.terminal.PrintError("Listening on " + QByteArray::fromStdString(CommName(job.port.Number())) +
-                                  "; Ctrl+C ends it.\n");
+  if (!job.line.quiet)
+    environment.terminal.PrintError("Listening on " + QByteArray::fromStdString(CommName(job.port.Number())) +
+                                    "; Ctrl+C ends it.\n");
   QString fault;
   const LineMonitor monitor(environment, [&](const TraceEntry& entry) {
     const bool packet = entry.kind != TraceEntry::Kind::kNoise;
