@@ -4,12 +4,13 @@
 #include <cstdint>
 #include <functional>
 #include <iterator>
+#include <optional>
 #include <span>
 #include <vector>
 
 #include "ctl/commands.h"
 #include "ctl/configuration_files.h"
-#include "ctl/progress.h"
+#include "ctl/find_command.h"
 #include "ctl/unit_work.h"
 #include "unitops/unit_target.h"
 
@@ -53,22 +54,12 @@ Report GetToOutput(Job& job) {
   return report;
 }
 
-// Searches the whole line. Returns the report when that fails.
+// Searches the whole line. Returns the report when there is nothing to read.
 std::optional<Report> FindUnits(Job& job) {
-  Progress progress(job.line, job.environment);
-  job.units.SetStepHandler([&](const std::string& step, double part) {
-    progress.Show(u"finding units: "_s + QString::fromStdString(step), part);
-  });
-  const CommandResult end = job.units.Find(kFirstUnitId, kLastUnitId);
-  job.units.SetStepHandler(nullptr);
-  const QString sentence = QString::fromStdString(job.units.Search().Sentence());
-  if (end.kind == CommandResult::Kind::kCancelled)
-    return Report{kExitNotAsWished, {}, {}, u"Stopped while units were searched for. "_s + sentence};
-  if (end.kind == CommandResult::Kind::kFailed)
-    return Report{kExitNotAsWished, {}, {}, QString::fromStdString(end.reason)};
-  if (job.units.Search().found.empty()) return Report{kExitNotAsWished, {}, {}, sentence};
-  progress.Note(sentence);
-  return std::nullopt;
+  const CommandResult end = FindWithProgress(job, kFirstUnitId, kLastUnitId);
+  const UnitSearch& search = job.units.Search();
+  if (end.Done() && !search.found.empty()) return std::nullopt;
+  return Report{.exit_code = kExitNotAsWished, .problem = SearchSentence(end, search)};
 }
 
 // What is at an ID that does not simply answer.

@@ -79,7 +79,7 @@ class CtlTest : public testing::Test, protected ctl::Waiting {
   }
 
   QTemporaryDir folder_;
-  SimulatedWorld world_{0xFFFFF000};  // its clock wraps soon
+  SimulatedWorld world_{0xFFFFFC00};  // its clock wraps soon
   SimulatedControlPanel panel_{world_};
   ctl::StopRequest stop_;
   RecordedTerminal terminal_;
