@@ -41,8 +41,7 @@ std::string BorrowedPort::Borrow(std::uint8_t number) {
     case PortControl::kUnanswered:
       break;
   }
-  return environment_.stop.Made() ? "the program was stopped"
-                                  : "the Control Panel gives no answer: try again, or restart it";
+  return "the Control Panel gives no answer: try again, or restart it";
 }
 
 bool BorrowedPort::GiveBack() {

@@ -27,7 +27,7 @@ std::string PortNames(const std::vector<std::int16_t>& numbers, const std::strin
 }
 
 std::string HolderName(const PortHolder& holder) {
-  if (holder.process == 0) return holder.program.empty() ? "" : "perhaps by " + holder.program;
+  if (holder.process == 0) return "another program";
   const std::string process = "process " + std::to_string(holder.process);
   return holder.program.empty() ? process : holder.program + " (" + process + ")";
 }

@@ -15,7 +15,7 @@ std::vector<std::int16_t> ListedPorts(const SerialDevice& device);
 // "Comm 1", "Comm 1 and Comm 5", "Comm 1, Comm 5 and Comm 6". There is at least one. `joined`: "and", "or".
 std::string PortNames(const std::vector<std::int16_t>& numbers, const std::string& joined);
 
-// "minicom (process 4321)", "perhaps by ModemManager"; empty when it is not known.
+// "minicom (process 4321)", "another program".
 std::string HolderName(const PortHolder& holder);
 
 }  // namespace tendril::ctl

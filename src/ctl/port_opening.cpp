@@ -90,9 +90,11 @@ std::optional<Report> PortOpening::Borrow(const Opener& open) {
                                      ".\n");
   const std::string refusal = borrowed_.Borrow(static_cast<std::uint8_t>(number_));
   std::string sentence = port + " is in use, and " + refusal + ".";
+  if (environment_.stop.Made()) sentence = "Stopped while the Control Panel was asked for " + port + ".";
   if (refusal.empty()) {
     std::optional<RuntimeError> fault = Try(open);
-    for (int tries = 1; fault && tries < kOpeningTries && !environment_.stop.Made(); ++tries) {
+    const auto in_use = [&fault] { return fault && fault->number() == kErrPortAlreadyOpen; };
+    for (int tries = 1; in_use() && tries < kOpeningTries && !environment_.stop.Made(); ++tries) {
       WaitUntil(environment_, kTryAgainMs, [this] { return environment_.stop.Made(); });
       fault = Try(open);
     }
@@ -128,18 +130,17 @@ std::string PortOpening::Sentence(const RuntimeError& fault) {
 
 std::string PortOpening::InUse() {
   const PortHolder holder = environment_.device.Holder(number_);
-  const std::string name = HolderName(holder);
   const std::string in_use = CommName(number_) + " is in use";
-  if (!borrowed_.ControlPanelRunning()) {
-    return in_use +
-           (name.empty()          ? " by another program"
-            : holder.process == 0 ? ", " + name
-                                  : " by " + name) +
-           (line_.take_port ? "; the Control Panel, which --take-port asks, does not run." : ": close it.");
+  if (borrowed_.ControlPanelRunning()) {
+    const std::string by =
+        holder.process == 0 ? "the Control Panel" : HolderName(holder) + ", and the Control Panel runs";
+    return in_use + " by " + by + (line_.take_port ? "." : ": --take-port asks it for the port.");
   }
-  const std::string ask = line_.take_port ? "." : ": --take-port asks it for the port.";
-  if (holder.process == 0) return in_use + " by the Control Panel" + ask;
-  return in_use + " by " + name + ", and the Control Panel runs" + ask;
+  const bool guess = holder.process == 0 && !holder.program.empty();
+  const std::string by = guess ? ", perhaps by " + holder.program : " by " + HolderName(holder);
+  if (line_.take_port) return in_use + by + "; the Control Panel, which --take-port asks, does not run.";
+  // A modem manager has each new port open for some seconds.
+  return in_use + by + (guess ? ": try again in a moment." : ": close it.");
 }
 
 }  // namespace tendril::ctl

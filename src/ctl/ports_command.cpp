@@ -1,4 +1,7 @@
 #include <QJsonArray>
+#include <string>
+#include <utility>
+#include <vector>
 
 #include "ctl/commands.h"
 #include "ctl/port_list.h"
@@ -32,15 +35,15 @@ Report Ports(Job& job) {
   QJsonArray ports;
   for (const std::int16_t number : ListedPorts(device)) {
     const DeviceDescription description = device.Describe(number);
-    PortHolder holder = device.Holder(number);
-    // A guess, which helps only when a port cannot be opened.
-    if (holder.process == 0) holder = {};
+    const PortHolder holder = device.Holder(number);
     ports += ToJson(number, description, holder);
-    const auto cell = [](const std::string& text) {
-      return TableCell{text.empty() ? u"-"_s : QString::fromStdString(text)};
-    };
-    table.AddRow({cell(CommName(number)), cell(description.path), cell(description.adapter),
-                  cell(description.maker), cell(HolderName(holder))});
+    // A guess would help only where a port cannot be opened.
+    const std::string held_by = holder.process == 0 ? "" : HolderName(holder);
+    std::vector<TableCell> cells;
+    for (const std::string& text :
+         {CommName(number), description.path, description.adapter, description.maker, held_by})
+      cells.push_back({text.empty() ? u"-"_s : QString::fromStdString(text)});
+    table.AddRow(std::move(cells));
   }
   return {.text = ports.isEmpty() ? "There is no serial port: plug in the adapter.\n"
                                   : table.Text(job.environment.terminal.Colours()),

@@ -31,7 +31,8 @@ TEST_F(PortTest, PortThatCannotBeOpened_IsExplained) {
   const Case cases[] = {
       {panel(""), "find --port 9", "There is no Comm 9; there are Comm 1, Comm 2, Comm 3 and Comm 4."},
       {held({"minicom", 4321}), "find --port 3", "Comm 3 is in use by minicom (process 4321): close it."},
-      {held({"ModemManager", 0}), "find --port 3", "Comm 3 is in use, perhaps by ModemManager: close it."},
+      {held({"ModemManager", 0}), "find --port 3",
+       "Comm 3 is in use, perhaps by ModemManager: try again in a moment."},
       {held(kNotKnown), "find --port 3", "Comm 3 is in use by another program: close it."},
       {[] {}, "find --port 3 --take-port",
        "Comm 3 is in use by another program; the Control Panel, which --take-port asks, does not run."},
