@@ -70,6 +70,13 @@ class CtlTest : public testing::Test, protected ctl::Waiting {
   }
   // The same, with spaces between the arguments.
   int Run(const std::string& arguments) { return Run(QString::fromStdString(arguments).split(u' ')); }
+  // Requests a stop when this much time has passed.
+  void StopAfter(std::int32_t ms, int signal) {
+    stop_ = {};
+    stop_timer_ = world_.time.CreateTimer([this, signal] { stop_.Make(signal); });
+    stop_timer_->SetInterval(ms);
+    stop_timer_->SetEnabled(true);
+  }
   // The path of a file in the test's own folder.
   QString Path(const char* name) const { return folder_.filePath(QString::fromUtf8(name)); }
 
@@ -82,6 +89,7 @@ class CtlTest : public testing::Test, protected ctl::Waiting {
   SimulatedWorld world_{0xFFFFFC00};  // its clock wraps soon
   SimulatedControlPanel panel_{world_};
   ctl::StopRequest stop_;
+  std::unique_ptr<Timer> stop_timer_;
   RecordedTerminal terminal_;
   std::int64_t start_ms_ = 1'796'000'000'000;  // 2026-11-29T21:20:00Z
   ctl::Environment environment_{

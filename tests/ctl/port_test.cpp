@@ -12,11 +12,9 @@ using testing::HasSubstr;
 class PortTest : public CtlTest {
  protected:
   PortTest() { world_.bench.Attach<VirtualUnit>(3, 0x01); }
-
-  static constexpr PortHolder kNotKnown = {};
 };
 
-TEST_F(PortTest, PortThatCannotBeOpened_IsExplained) {
+TEST_F(PortTest, PortThatCannotBeOpened_IsExplainedAndListed) {
   struct Case {
     std::function<void()> set_up;
     std::string arguments;
@@ -33,7 +31,7 @@ TEST_F(PortTest, PortThatCannotBeOpened_IsExplained) {
       {held({"minicom", 4321}), "find --port 3", "Comm 3 is in use by minicom (process 4321): close it."},
       {held({"ModemManager", 0}), "find --port 3",
        "Comm 3 is in use, perhaps by ModemManager: try again in a moment."},
-      {held(kNotKnown), "find --port 3", "Comm 3 is in use by another program: close it."},
+      {held({}), "find --port 3", "Comm 3 is in use by another program: close it."},
       {[] {}, "find --port 3 --take-port",
        "Comm 3 is in use by another program; the Control Panel, which --take-port asks, does not run."},
       {panel("NyxTray.exe"), "find --port 3",
@@ -42,15 +40,18 @@ TEST_F(PortTest, PortThatCannotBeOpened_IsExplained) {
        "Comm 3 is in use by NyxTray.exe (process 7), and the Control Panel runs: --take-port asks it for the "
        "port."},
       {[this] { world_.bench.SetAllowed(3, false); }, "find --port 3 --take-port",
-       "You are not allowed to use Comm 3. Its device belongs to the group \"dialout\": ask for your user to "
-       "be "
-       "added to that group, then log in again."}};
+       "You are not allowed to use Comm 3. Its device belongs to the group \"dialout\": ask for your user "
+       "to be added to that group, then log in again."}};
   for (const Case& each : cases) {
     each.set_up();
     EXPECT_EQ(Run(each.arguments), 3);
     EXPECT_EQ(terminal_.error, std::string("tendril-ctl: ") + each.said + "\n");
   }
   EXPECT_TRUE(panel_.panel.requests().empty());
+  EXPECT_EQ(Run("ports"), 0);
+  EXPECT_THAT(terminal_.out,
+              HasSubstr("\nComm 3  -       Virtual serial line 3  -      NyxTray.exe (process 7)\n"
+                        "Comm 4  -       Virtual serial line 4  -      -\n"));
 }
 
 // Whatever it replies, and when, it has the port again at the end.
@@ -87,28 +88,16 @@ TEST_F(PortTest, ControlPanel_GetsBackWhatWasAskedFor) {
 
 TEST_F(PortTest, Stop_GivesThePortBack) {
   panel_.Take(3);
-  const auto timer = world_.time.CreateTimer([this] { stop_.Make(SIGTERM); });
   // While the Control Panel is asked, and while units are searched for.
   for (const auto& [behaviour, after_ms] :
        {std::pair(PanelBehaviour::kSlow, 900), {PanelBehaviour::kProper, 500}}) {
-    stop_ = {};
+    StopAfter(after_ms, SIGTERM);
     panel_.panel.SetBehaviour(behaviour);
-    timer->SetInterval(after_ms);
-    timer->SetEnabled(true);
     EXPECT_EQ(Run("find --port 3 --take-port --json"), 143);
     EXPECT_TRUE(panel_.panel.Holds(3));
     EXPECT_EQ(panel_.PortRequests().back(), "3:1");
   }
   EXPECT_THAT(terminal_.out, HasSubstr("Stopped. Only IDs up to 06 were polled. 1 unit found: 01."));
-}
-
-TEST_F(PortTest, Ports_AreListedWithoutOpeningThem) {
-  world_.bench.SetHeldByAnother(3, true, {"minicom", 4321});
-  world_.bench.SetHeldByAnother(4, true, {"ModemManager", 0});
-  EXPECT_EQ(Run("ports"), 0);
-  EXPECT_THAT(terminal_.out,
-              HasSubstr("\nComm 3  -       Virtual serial line 3  -      minicom (process 4321)\n"
-                        "Comm 4  -       Virtual serial line 4  -      -\n"));
 }
 
 }  // namespace

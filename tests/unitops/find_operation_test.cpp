@@ -42,26 +42,6 @@ TEST_F(Find, TakesNoLongerThanBytesAndTimeOuts) {
   ExpectSuccess("SUCCESS: Search Complete");
 }
 
-TEST_F(Find, SearchesARange) {
-  struct Case {
-    std::uint8_t first, last;
-    std::string polls, said;
-  };
-  const Case cases[] = {
-      {0x04, 0x06, "04- 05+ 06- ", "1 unit found: 05."},
-      {0xFD, 0xFD, "FD- ", "No unit answered. Check power, wiring and port. Other IDs are not searched."},
-      {0xFF, 0xFF, "FF+ ", "1 unit found: 05."}};
-  Attach("", 0x05);
-  for (const Case& searched : cases) {
-    noted_.clear();
-    commands_.find.SetRange(searched.first, searched.last);
-    Run(commands_.find);
-    EXPECT_EQ(noted_, searched.polls);
-    EXPECT_EQ(said_, "Finding units at 14:05: SUCCESS: Search Complete. " + searched.said);
-    EXPECT_EQ(commands_.find.Search().Part(), 1);
-  }
-}
-
 // Nothing follows the poll that is out.
 TEST_F(Find, CancelledOrUnplugged_EndsWithThePollAndKeepsWhatItHasFound) {
   Attach("", 0x01);
