@@ -44,15 +44,19 @@ without_display() {
   export QT_LOGGING_RULES="default.warning=false"
 }
 
+# configure PRESET: when needed.
+configure() {
+  require_packages "${build_packages[@]}"
+  [ ! -f "build/$1/build.ninja" ] || return 0
+  say "Configuring ($1)"
+  cmake --preset "$1" >/dev/null
+}
+
 # build PRESET [TARGET ...]: configures when needed and brings the build up to date.
 build() {
   local preset=$1
   shift
-  require_packages "${build_packages[@]}"
-  if [ ! -f "build/$preset/build.ninja" ]; then
-    say "Configuring ($preset)"
-    cmake --preset "$preset" >/dev/null
-  fi
+  configure "$preset"
   local targets=()
   [ $# -eq 0 ] || targets=(--target "$@")
   if ! cmake --build --preset "$preset" "${targets[@]}" -- -n | grep -q 'no work to do'; then
