@@ -1,0 +1,166 @@
+// tendril-ctl as scripts use it: on a kernel terminal device, with the units in another process.
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <QDir>
+#include <QFile>
+#include <csignal>
+#include <memory>
+#include <string>
+
+#include "exchange/configuration_text.h"
+#include "platform/posix/serial_hold.h"
+#include "support/bench_process.h"
+#include "support/ctl_process.h"
+
+namespace tendril::test {
+namespace {
+
+using testing::HasSubstr;
+
+constexpr char kThirdPortOfUnit01[] = "set options of port 3 of unit 01";
+
+QStringList Words(const char* line) { return QString::fromUtf8(line).split(QLatin1Char(' ')); }
+
+class CtlProgram : public testing::Test {
+ protected:
+  CtlProgram() {
+    ConfigurationText configuration;
+    for (std::size_t slot = 0; slot < kPortCount; ++slot)
+      SetFromPreset(kPresets[kStartPreset], configuration.records.At(slot));
+    const QByteArray text = std::get<QByteArray>(WriteConfiguration(configuration));
+    Save("show.json", text);
+    Save("other-version.json", QByteArray(text).replace("\"version\": 1", "\"version\": 2"));
+    Save("too-wide.json", QByteArray(text).replace("2400", "2551"));
+    Save("no-json.json", "port 1: 1500\n");
+    QDir(folder_.path()).mkdir(QStringLiteral("folder"));
+    home_ = QDir::currentPath();
+    QDir::setCurrent(folder_.path());
+  }
+  ~CtlProgram() override { QDir::setCurrent(home_); }
+
+  void Save(const char* name, const QByteArray& text) const {
+    QFile file(folder_.filePath(QString::fromUtf8(name)));
+    if (!file.open(QIODevice::WriteOnly) || file.write(text) != text.size()) throw std::runtime_error(name);
+  }
+  // What is in the folder besides the files of the start.
+  std::string NewFiles() const {
+    QStringList files =
+        QDir(folder_.path()).entryList(QDir::AllEntries | QDir::Hidden | QDir::NoDotAndDotDot);
+    for (const char* known : {"folder", "no-json.json", "other-version.json", "show.json", "too-wide.json"})
+      files.removeOne(QString::fromUtf8(known));
+    return files.join(QLatin1Char(' ')).toStdString();
+  }
+  static void Expect(const char* arguments, int exit_code, const char* error,
+                     const char* redirection = "true") {
+    CtlProcess ctl(Words(arguments), redirection);
+    EXPECT_EQ(ctl.ExitCode(), exit_code) << arguments << "\n" << ctl.Error();
+    EXPECT_THAT(ctl.Error(), HasSubstr(error)) << arguments;
+  }
+
+  QTemporaryDir folder_;
+  QString home_;
+  BenchProcess bench_;
+};
+
+TEST_F(CtlProgram, WrongUseAndBadFiles_EndWith2WithoutAPort) {
+  const std::pair<const char*, const char*> cases[] = {
+      {"send show.json 01-FF", "FF"},
+      {"send missing.json 01", "missing.json"},
+      {"send folder 01", "folder"},
+      {"send no-json.json 01", "no-json.json: line 1"},
+      {"send other-version.json 01", "other-version.json"},
+      {"send too-wide.json 01", "2551"},
+      {"preset wide --output show.json", "show.json"},
+      {"set-id 05", "--yes"},
+      {"set-id FE --yes", "FE"},
+      {"find --nonsense", "nonsense"},
+  };
+  for (const auto& [arguments, error] : cases) Expect(arguments, 2, error);
+  EXPECT_EQ(NewFiles(), "");
+}
+
+TEST_F(CtlProgram, PortThatCannotBeOpened_EndsWith3) {
+  Expect("get 01 --port 1", 3, "Comm 1");  // its link leads nowhere
+  bench_.Start();
+  const auto hold = std::make_unique<SerialHold>(QFileInfo(bench_.Link()).canonicalFilePath().toStdString());
+  Expect("get 01 --port 1", 3, ("process " + std::to_string(::getpid())).c_str());
+  EXPECT_EQ(NewFiles(), "");
+}
+
+TEST_F(CtlProgram, Configuration_GoesThereAndBackWithAndWithoutEcho) {
+  for (const QStringList& options : {QStringList{}, QStringList{QStringLiteral("--no-echo")}}) {
+    bench_.Start(options);
+    Expect("send show.json 01 0A --port 1", 0, "");
+    Expect("get 01 0A --port 1 --output read", 0, "");
+    Expect("compare show.json read/unit-0A.json", 0, "");
+    Expect("compare show.json 01 03 --port 1", 1, "");
+    QDir(folder_.filePath(QStringLiteral("read"))).removeRecursively();
+    bench_.Kill();
+  }
+}
+
+TEST_F(CtlProgram, Signal_EndsTheCommandAndNamesTheUnit) {
+  bench_.Start();
+  struct Case {
+    const char* arguments;
+    const char* when;
+    int signal;
+    const char* left;  // in what is printed
+  };
+  const Case cases[] = {
+      {"send show.json 01 0A --port 1 --trace", kThirdPortOfUnit01, SIGINT, "Ports 1 to "},
+      {"send show.json 01 0A --port 1 --trace", kThirdPortOfUnit01, SIGTERM, "Ports 1 to "},
+      {"find --port 1 --trace", "poll unit 03", SIGHUP, "Only IDs up to "},
+      {"backup saved 01 0A --port 1 --trace", "poll unit 0A", SIGINT, "0A"},
+  };
+  for (const Case& each : cases) {
+    CtlProcess ctl(Words(each.arguments));
+    ASSERT_TRUE(ctl.WaitFor(each.when)) << ctl.Error();
+    ctl.Signal(each.signal);
+    EXPECT_EQ(ctl.ExitCode(), 128 + each.signal) << ctl.Error();
+    EXPECT_THAT(ctl.Out(), HasSubstr(each.left));
+  }
+  EXPECT_EQ(QDir(folder_.filePath(QStringLiteral("saved"))).entryList(QDir::Files | QDir::Hidden),
+            QStringList{QStringLiteral("unit-01.json")});
+}
+
+TEST_F(CtlProgram, UnpluggedAdapter_LeavesTheOtherUnitsAlone) {
+  bench_.Start();
+  CtlProcess ctl(Words("send show.json 01 0A --port 1 --trace"));
+  ASSERT_TRUE(ctl.WaitFor(kThirdPortOfUnit01)) << ctl.Error();
+  bench_.Kill();
+  EXPECT_EQ(ctl.ExitCode(), 1);
+  EXPECT_THAT(ctl.Out(), HasSubstr("The port went away."));
+  EXPECT_THAT(ctl.Out(), HasSubstr("not tried"));
+}
+
+TEST_F(CtlProgram, FullDisk_LeavesNoFile) {
+  bench_.Start();
+  Expect("get 01 --port 1 --output read.json", 2, "read.json", "ulimit -f 0");
+  Expect("preset wide", 1, "The result cannot be written: No space left on device", "exec >/dev/full");
+  EXPECT_EQ(NewFiles(), "");
+}
+
+TEST_F(CtlProgram, PortOfTheControlPanel_IsTakenAndGivenBack) {
+  bench_.Start({QStringLiteral("--control-panel"), bench_.WriteRegistry()}, true);
+  Expect("get 01 --port 1", 3, "--take-port");
+  EXPECT_EQ(bench_.Printed().find("panel    "), std::string::npos) << bench_.Printed();
+  Expect("get 01 --port 1 --take-port --output read.json", 0, "");
+  const auto given_back = [this](const char* reply) {
+    return WaitFor([&] { return bench_.Printed().find(reply) != std::string::npos; });
+  };
+  EXPECT_TRUE(given_back("The Control Panel holds Comm 1 again.")) << bench_.Printed();
+  for (const int signal : {SIGINT, SIGTERM, SIGHUP}) {
+    bench_.Kill();
+    bench_.Start({QStringLiteral("--control-panel"), bench_.WriteRegistry()}, true);
+    CtlProcess ctl(Words("send show.json 01 --port 1 --take-port --trace"));
+    ASSERT_TRUE(ctl.WaitFor(kThirdPortOfUnit01)) << ctl.Error();
+    ctl.Signal(signal);
+    EXPECT_EQ(ctl.ExitCode(), 128 + signal);
+    EXPECT_TRUE(given_back("The Control Panel holds Comm 1 again.")) << bench_.Printed();
+  }
+}
+
+}  // namespace
+}  // namespace tendril::test
