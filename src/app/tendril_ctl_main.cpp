@@ -99,7 +99,9 @@ int Main() {
     return end->exit_code;
   }
 #ifndef _WIN32
-  std::signal(SIGPIPE, SIG_IGN);  // a port is given back even when nothing reads the output any more
+  // A port is given back even when nothing reads the output any more, or a file becomes too large.
+  std::signal(SIGPIPE, SIG_IGN);
+  std::signal(SIGXFSZ, SIG_IGN);
   const QuitOnSignal on_signal([&process](int signal) { process.stop.Make(signal); });
 #endif
   const auto& line = std::get<ctl::CommandLine>(parsed);
