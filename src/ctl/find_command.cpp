@@ -43,13 +43,13 @@ CommandResult FindWithProgress(Job& job, std::uint8_t first, std::uint8_t last) 
     for (noted = std::min(noted, search.found.size()); noted < search.found.size(); ++noted)
       progress.Note(u"finding units: "_s + Line(search.found[noted]));
   });
-  const CommandResult result = job.units.Find(first, last);
+  CommandResult result = job.units.Find(first, last);
   job.units.SetStepHandler(nullptr);
   return result;
 }
 
 QString SearchSentence(const CommandResult& result, const UnitSearch& search) {
-  const QString found = QString::fromStdString(search.Sentence());
+  QString found = QString::fromStdString(search.Sentence());
   switch (result.kind) {
     case CommandResult::Kind::kDone:
       return found;

@@ -12,9 +12,10 @@ using namespace Qt::StringLiterals;
 Report Monitor(Job& job) {
   if (auto problem = job.port.OpenToListen()) return *problem;
   Environment& environment = job.environment;
-  if (!job.line.quiet)
+  if (!job.line.quiet) {
     environment.terminal.PrintError("Listening on " + QByteArray::fromStdString(CommName(job.port.Number())) +
                                     "; Ctrl+C ends it.\n");
+  }
   QString fault;
   const LineMonitor monitor(environment, [&](const TraceEntry& entry) {
     const bool packet = entry.kind != TraceEntry::Kind::kNoise;

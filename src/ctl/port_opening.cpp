@@ -75,19 +75,21 @@ std::optional<Report> PortOpening::Choose() {
   if (number_ != 0) return std::nullopt;
   const std::vector<std::int16_t> ports = ListedPorts(environment_.device);
   if (ports.empty()) return Failure("There is no serial port: plug in the adapter.");
-  if (ports.size() > 1)
+  if (ports.size() > 1) {
     return Failure(
         "Choose " + PortNames(ports, "or") + " with --port; tendril-ctl ports shows which is which.",
         kExitUsage);
+  }
   number_ = ports.front();
   return std::nullopt;
 }
 
 std::optional<Report> PortOpening::Borrow(const Opener& open) {
   const std::string port = CommName(number_);
-  if (!line_.quiet)
+  if (!line_.quiet) {
     environment_.terminal.PrintError("Asking the Control Panel for " + QByteArray::fromStdString(port) +
                                      ".\n");
+  }
   const std::string refusal = borrowed_.Borrow(static_cast<std::uint8_t>(number_));
   std::string sentence = port + " is in use, and " + refusal + ".";
   if (environment_.stop.Made()) sentence = "Stopped while the Control Panel was asked for " + port + ".";

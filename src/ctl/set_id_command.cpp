@@ -55,9 +55,11 @@ std::optional<Report> RefuseUncleanReplies(Job& job, std::uint8_t& id) {
     if (!result.Done() || (replies == 0 && search.found.empty()))
       return Refusal(SearchSentence(result, search));
     const bool same = search.found.size() == 1 && (replies == 0 || search.found.front().id == id);
-    if (!same || !CleanReply(job.units.Trace(), replies == 0))
+    if (!same || !CleanReply(job.units.Trace(), replies == 0)) {
       return Refusal(
-          u"Each poll of FF must bring one clean reply and nothing else, and this one did not: connect one unit alone, and check the wiring."_s);
+          u"Each poll of FF must bring one clean reply and nothing else, and this one did not: connect one "
+          "unit alone, and check the wiring."_s);
+    }
     id = search.found.front().id;
   }
   return std::nullopt;
@@ -93,9 +95,10 @@ Report CheckAndWrite(Job& job, std::uint8_t& id) {
     if (auto refusal = RefuseOtherUnits(job)) return *refusal;
   }
   if (auto refusal = RefuseUncleanReplies(job, id)) return *refusal;
-  if (id == job.line.new_id)
+  if (id == job.line.new_id) {
     return {.text = u"The unit has the ID %1 already.\n"_s.arg(IdText(id)).toUtf8(),
             .members = {{u"changed"_s, u"no"_s}}};
+  }
   if (!job.line.yes) {
     if (auto refusal = Confirm(job, id)) return *refusal;
     // The user may have connected something meanwhile.

@@ -85,7 +85,7 @@ std::string UnitSearch::WhatNext(std::size_t shared) const {
   if (shared > 0) return " Connect units that share an ID one at a time, and give each its own.";
   if (!found.empty()) return {};
   if (!fault.empty()) return " " + fault;
-  const std::string check = " Check power, wiring and port.";
+  std::string check = " Check power, wiring and port.";
   if (last == kAllUnits) return check;
   if (first > kFirstUnitId || last < kLastUnitId) return check + " Other IDs are not searched.";
   return check + " A unit fresh from the factory has FF, which is not searched.";
