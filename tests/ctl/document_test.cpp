@@ -15,7 +15,7 @@ class Documents : public CtlTest {
  protected:
   Documents() {
     QDir::setCurrent(folder_.path());
-    QFile file(QStringLiteral(TENDRIL_DOCS "/tendril-ctl.schema.json"));
+    QFile file(QStringLiteral(TENDRIL_SOURCES "/docs/tendril-ctl.schema.json"));
     if (file.open(QIODevice::ReadOnly)) schema_ = QJsonDocument::fromJson(file.readAll()).object();
     Note(schema_, described_);
     for (const QJsonValue& definition : schema_[u"$defs"].toObject()) Note(definition.toObject(), described_);
