@@ -73,7 +73,8 @@ std::optional<Report> Confirm(Job& job, std::uint8_t id) {
       u"Give the unit on %1%2 the ID %3? [y/N] "_s.arg(port, now, IdText(job.line.new_id));
   const std::optional<QString> answer = job.environment.terminal.Ask(question.toUtf8());
   if (answer && (answer->toLower() == u"y" || answer->toLower() == u"yes")) return std::nullopt;
-  return Refusal(u"Not confirmed."_s);
+  if (!answer) job.environment.terminal.PrintError("\n");  // ends the question's line
+  return Refusal(job.environment.stop.Made() ? u"Stopped."_s : u"Not confirmed."_s);
 }
 
 Report Write(Job& job) {
