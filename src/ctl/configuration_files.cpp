@@ -87,7 +87,7 @@ QString UnitFilePath(const QString& folder, std::uint8_t unit) {
 }
 
 QString WhyNotWritable(const QString& path, bool force) {
-  const QString reason = WhyNotReplaced(path, force);
+  QString reason = WhyNotReplaced(path, force);
   if (!reason.isEmpty()) return reason;
   const QFileInfo folder = FolderOf(path);
   if (!folder.isDir()) return Cannot(path, "written"_L1, u"%1 is not a folder"_s.arg(folder.filePath()));
@@ -97,12 +97,12 @@ QString WhyNotWritable(const QString& path, bool force) {
 }
 
 QString WriteNewFile(const QString& path, const QByteArray& text, bool force) {
-  const QString no_folder = CreateFolderOf(path);
+  QString no_folder = CreateFolderOf(path);
   if (!no_folder.isEmpty()) return no_folder;
   QSaveFile file(path);
   const bool written = file.open(QIODevice::WriteOnly | QIODevice::Unbuffered) && WriteAll(file, text);
   // As late as can be: another program may have written it since the command began.
-  const QString reason = WhyNotReplaced(path, force);
+  QString reason = WhyNotReplaced(path, force);
   if (!reason.isEmpty()) return reason;
   return written && file.commit() ? QString() : Cannot(path, "written"_L1, file.errorString());
 }

@@ -26,7 +26,7 @@ using PathOf = std::function<QString(std::uint8_t unit)>;
 // Why one of the files cannot be written: a sentence; empty: each can.
 QString WhyNoneWritable(const CommandLine& line, std::span<const std::uint8_t> units, const PathOf& path_of) {
   for (const std::uint8_t unit : units) {
-    const QString fault = WhyNotWritable(path_of(unit), line.force);
+    QString fault = WhyNotWritable(path_of(unit), line.force);
     if (!fault.isEmpty()) return fault;
   }
   return {};

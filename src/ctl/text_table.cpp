@@ -9,7 +9,7 @@ namespace {
 constexpr qsizetype kGap = 2;
 
 QByteArray Coloured(const TableCell& cell) {
-  const QByteArray text = cell.text.toUtf8();
+  QByteArray text = cell.text.toUtf8();
   switch (cell.tone) {
     case Tone::kGood:
       return "\x1b[32m" + text + "\x1b[m";
