@@ -27,7 +27,7 @@ void UnitProgress::BeginPhase(const QString& what, double share) {
 }
 
 void UnitProgress::EndUnit(const QString& outcome) {
-  progress_.Note(Place() + outcome);
+  if (units_ > 1) progress_.Note(Place() + outcome);  // the report about one unit follows at once
   ++done_;
 }
 

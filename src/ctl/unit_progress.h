@@ -25,7 +25,7 @@ class UnitProgress {
   // The session's next command is called `what` ("compare"; empty for the main one), and is `share` of what is done
   // with each unit, 0 to 1.
   void BeginPhase(const QString& what, double share);
-  // The unit is done: `outcome` says how it is.
+  // The unit is done: `outcome` says how it is. Of several units, each has a line where no terminal shows progress.
   void EndUnit(const QString& outcome);
 
  private:

@@ -197,6 +197,12 @@ TEST_F(UnitFiles, AUnitWithoutABackup_IsNotWritten) {
   inexact.SetPortOptions(3, {0x41, 60, 240, 100, 200, 100, 200, 150, 150});
   VirtualUnit& empty = Attach("", 0x07);
   empty.SetPortOptions(1, {4, 60, 240, 100, 200, 100, 200, 150, 150});
+  EXPECT_EQ(Type("get 06"), 1);
+  EXPECT_THAT(terminal_.out, HasSubstr("\"unit\": \"06\","));
+  EXPECT_EQ(
+      terminal_.error,
+      "tendril-ctl: The configuration cannot have all: port 3, power up: Start Pulse on First Command in the "
+      "file, unknown (flags 40) in the unit.\n");
   EXPECT_EQ(Type("send wide.json 05-07 --backup kept --quiet"), 1);
   EXPECT_EQ(exact.accepted_commands(), 8U);
   EXPECT_EQ(inexact.accepted_commands() + empty.accepted_commands(), 0U);
