@@ -50,7 +50,6 @@ Report GetToOutput(Job& job) {
   const UnitResult& result = results.front();
   Report report = ReportOf(results, {}, false);
   report.text = result.configuration;
-  if (result.outcome == Outcome::kFailed) report.problem = Remarks(result).join(u' ');
   if (result.outcome == Outcome::kDiffers)
     report.problem = u"The configuration cannot have all: %1."_s.arg(Remarks(result).join(u"; "_s));
   return report;

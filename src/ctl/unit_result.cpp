@@ -126,7 +126,7 @@ QJsonObject ToJson(const UnitResult& result, const ResultColumns& columns) {
   return row;
 }
 
-// "2 of 40 units differ, 1 failed, 3 were not tried."
+// "2 of 40 units differ, 1 failed, 3 were not tried."; of a single unit that failed, why.
 QString Summary(const std::vector<UnitResult>& results) {
   struct Clause {
     Outcome outcome;
@@ -139,6 +139,7 @@ QString Summary(const std::vector<UnitResult>& results) {
   for (const auto& [outcome, one, several] : kClauses) {
     const auto units = std::ranges::count(results, outcome, &UnitResult::outcome);
     if (units == 0) continue;
+    if (results.size() == 1 && outcome == Outcome::kFailed) return Remarks(results.front()).join(u' ');
     if (results.size() == 1) return u"Unit %1 %2."_s.arg(UnitName(results.front()), one);
     const QString of = clauses.isEmpty() ? u" of %1 units"_s.arg(results.size()) : QString();
     clauses += u"%1%2 %3"_s.arg(QString::number(units), of, units == 1 ? one : several);
