@@ -9,6 +9,7 @@
 #include <io.h>
 #else
 #include <sys/ioctl.h>
+#include <termios.h>
 #include <unistd.h>
 
 #include <QSocketNotifier>
@@ -24,6 +25,8 @@ bool IsTerminal(std::FILE* stream) { return ::_isatty(::_fileno(stream)) != 0; }
 
 int Columns() { return kUsualColumns; }
 
+void DropTypedInput() {}
+
 // Stops are not noticed meanwhile.
 std::optional<QString> ReadLine(ctl::Waiting& /*waiting*/, const ctl::StopRequest& /*stop*/) {
   char line[256];
@@ -38,6 +41,9 @@ int Columns() {
   if (::ioctl(STDERR_FILENO, TIOCGWINSZ, &size) != 0 || size.ws_col == 0) return kUsualColumns;
   return size.ws_col;
 }
+
+// What was typed before a question does not answer it.
+void DropTypedInput() { ::tcflush(STDIN_FILENO, TCIFLUSH); }
 
 // A terminal hands a line over when it is complete.
 std::optional<QString> ReadLine(ctl::Waiting& waiting, const ctl::StopRequest& stop) {
@@ -77,6 +83,7 @@ bool SystemTerminal::CanAsk() const { return IsTerminal(stdin) && IsTerminal(std
 
 std::optional<QString> SystemTerminal::Ask(const QByteArray& question) {
   if (!CanAsk()) return std::nullopt;
+  DropTypedInput();
   PrintError(question);
   return ReadLine(waiting_, stop_);
 }

@@ -7,6 +7,7 @@
 #include <cstdio>
 #include <filesystem>
 #include <memory>
+#include <optional>
 #include <variant>
 
 #include "app/demo_bench.h"
@@ -102,7 +103,8 @@ int Main() {
   // A port is given back even when nothing reads the output any more, or a file becomes too large.
   std::signal(SIGPIPE, SIG_IGN);
   std::signal(SIGXFSZ, SIG_IGN);
-  const QuitOnSignal on_signal([&process](int signal) { process.stop.Make(signal); });
+  std::optional<QuitOnSignal> on_signal;
+  process.stop.SetWatch([&] { on_signal.emplace([&process](int signal) { process.stop.Make(signal); }); });
 #endif
   const auto& line = std::get<ctl::CommandLine>(parsed);
   return line.demo ? RunDemo(line, process) : RunOnThisComputer(line, process);

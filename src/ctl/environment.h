@@ -29,6 +29,12 @@ class Waiting {
 // The request to end the program early: Ctrl+C and its like.
 class StopRequest {
  public:
+  // `watch` makes requests reach this object.
+  void SetWatch(std::function<void()> watch) { watch_ = std::move(watch); }
+  // From now on a command ends in order. Before that the system ends the program, even while it waits for a file.
+  void Watch() const {
+    if (watch_) watch_();
+  }
   // Of a signal with this number. The first one counts. Calls the handler.
   void Make(int signal) {
     if (Made()) return;
@@ -43,6 +49,7 @@ class StopRequest {
 
  private:
   int signal_ = 0;
+  std::function<void()> watch_;
   std::function<void()> handler_;
 };
 

@@ -23,8 +23,7 @@ Report Monitor(Job& job) {
       fault = environment.terminal.Print(TraceLine(entry, packet ? entry.Direction() : std::string()));
   });
   environment.waiting.Until([&] { return environment.stop.Made() || monitor.Lost() || !fault.isEmpty(); });
-  if (!fault.isEmpty())
-    return {.exit_code = kExitNotAsWished, .problem = u"The result cannot be written: "_s + fault};
+  if (!fault.isEmpty()) return ResultNotWritten(environment, fault);
   if (monitor.Lost()) return {.exit_code = kExitNotAsWished, .problem = u"The port went away."_s};
   return {};
 }

@@ -54,15 +54,16 @@ std::optional<Report> PortOpening::OpenToListen() {
   });
 }
 
-void PortOpening::GiveBack() {
+QString PortOpening::GiveBack() {
   units_.Link().SetPortOpen(false);
-  if (borrowed_.GiveBack()) return;
-  environment_.terminal.PrintError("tendril-ctl: " + QByteArray::fromStdString(CommName(number_)) +
-                                   " is not given back: the Control Panel does not answer.\n");
+  if (borrowed_.GiveBack()) return {};
+  return QStringLiteral("%1 is not given back: the Control Panel does not answer. Restart it.")
+      .arg(QString::fromStdString(CommName(number_)));
 }
 
 std::optional<Report> PortOpening::OpenBy(const Opener& open) {
   if (auto problem = Choose()) return problem;
+  environment_.stop.Watch();
   const auto fault = Try(open);
   if (!fault) return std::nullopt;
   const bool in_use = fault->number() == kErrPortAlreadyOpen;
@@ -103,8 +104,10 @@ std::optional<Report> PortOpening::Borrow(const Opener& open) {
     if (!fault) return std::nullopt;
     sentence = "The Control Panel has given " + port + " up, and yet: " + Sentence(*fault);
   }
-  GiveBack();
-  return Failure(sentence);
+  const QString not_given_back = GiveBack();
+  Report report = Failure(sentence);
+  if (!not_given_back.isEmpty()) report.problem += u' ' + not_given_back;
+  return report;
 }
 
 std::optional<RuntimeError> PortOpening::Try(const Opener& open) {

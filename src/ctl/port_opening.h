@@ -28,8 +28,9 @@ class PortOpening {
   std::optional<Report> OpenToListen();
   // The port's number; 0 before it is opened.
   std::int16_t Number() const { return number_; }
-  // Closes the port, if it is open, and gives it back, if it is borrowed.
-  void GiveBack();
+  // Closes the port, if it is open, and gives it back, if it is borrowed. Returns why that is not done: a sentence; empty
+  // otherwise.
+  QString GiveBack();
 
  private:
   // Opens port `number_`. Raises what the device raises.

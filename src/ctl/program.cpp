@@ -2,15 +2,20 @@
 
 #include <QJsonDocument>
 #include <QJsonObject>
+#include <cstdint>
 #include <optional>
 
+#include "ctl/bounded_wait.h"
 #include "ctl/commands.h"
 #include "ctl/trace_output.h"
+#include "platform/runtime_error.h"
 
 namespace tendril::ctl {
 namespace {
 
 constexpr int kDocumentVersion = 1;
+// In which the event loop delivers a signal that has interrupted a write.
+constexpr std::int32_t kSignalMs = 50;
 
 Report RunJob(Job& job) {
   switch (job.line.command) {
@@ -50,28 +55,50 @@ QByteArray Document(const CommandLine& line, const Report& report) {
   return QJsonDocument(document).toJson();
 }
 
+// Whatever happens, a port that was borrowed goes back.
+Report RunAndGiveBack(const CommandLine& line, Environment& environment) {
+  UnitSession units(environment);
+  std::optional<TraceOutput> trace;
+  if (line.trace) trace.emplace(units.Trace(), environment.terminal);
+  PortOpening port(line, environment, units);
+  Job job{line, environment, units, port};
+  Report report;
+  try {
+    report = RunJob(job);
+  } catch (...) {
+    report = {.exit_code = kExitNotAsWished, .problem = QString::fromStdString(DescribeCurrentFault())};
+  }
+  const QString not_given_back = port.GiveBack();
+  if (not_given_back.isEmpty()) return report;
+  if (report.exit_code == kExitSuccess) report.exit_code = kExitNotAsWished;
+  report.problem += (report.problem.isEmpty() ? QString() : QStringLiteral(" ")) + not_given_back;
+  return report;
+}
+
 }  // namespace
 
+Report ResultNotWritten(Environment& environment, const QString& fault) {
+  WaitUntil(environment, kSignalMs, [&environment] { return environment.stop.Made(); });
+  if (environment.stop.Made()) return {};
+  return {.exit_code = kExitNotAsWished,
+          .problem = QStringLiteral("The result cannot be written: %1.").arg(fault)};
+}
+
 int RunCommand(const CommandLine& line, Environment& environment) {
-  Report report;
-  {
-    UnitSession units(environment);
-    std::optional<TraceOutput> trace;
-    if (line.trace) trace.emplace(units.Trace(), environment.terminal);
-    PortOpening port(line, environment, units);
-    Job job{line, environment, units, port};
-    report = RunJob(job);
-    port.GiveBack();
-  }
+  Report report = RunAndGiveBack(line, environment);
   if (environment.stop.Made()) report.exit_code = environment.stop.ExitCode();
   const QString fault = environment.terminal.Print(line.json ? Document(line, report) : report.text);
-  const auto complain = [&environment](const QString& sentence) {
-    if (!sentence.isEmpty()) environment.terminal.PrintError("tendril-ctl: " + sentence.toUtf8() + "\n");
+  const auto complain = [&environment](const Report& ended) {
+    if (!ended.problem.isEmpty())
+      environment.terminal.PrintError("tendril-ctl: " + ended.problem.toUtf8() + "\n");
   };
-  complain(report.problem);
-  if (fault.isEmpty()) return report.exit_code;
-  complain(QStringLiteral("The result cannot be written: ") + fault);
-  return report.exit_code == kExitSuccess ? kExitNotAsWished : report.exit_code;
+  complain(report);
+  if (!fault.isEmpty()) {
+    const Report not_written = ResultNotWritten(environment, fault);
+    complain(not_written);
+    if (report.exit_code == kExitSuccess) report.exit_code = not_written.exit_code;
+  }
+  return environment.stop.Made() ? environment.stop.ExitCode() : report.exit_code;
 }
 
 }  // namespace tendril::ctl

@@ -17,6 +17,10 @@ struct Job {
   PortOpening& port;
 };
 
+// The report when standard output takes no more, for the reason `fault`. When a stop has interrupted the writing, that is
+// no problem.
+Report ResultNotWritten(Environment& environment, const QString& fault);
+
 // Runs the command and prints its report. Returns the exit code. The port that the command has opened is closed by then,
 // and given back to the Control Panel if it was asked for it.
 int RunCommand(const CommandLine& line, Environment& environment);

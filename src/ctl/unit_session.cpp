@@ -4,12 +4,15 @@
 #include <iterator>
 #include <string_view>
 
+#include "ctl/bounded_wait.h"
 #include "platform/hex_text.h"
 #include "trace/line_verdict.h"
 
 namespace tendril::ctl {
 namespace {
 
+// A reply that comes later than its poll waits must not be taken for one of the next unit.
+constexpr std::int32_t kLateReplyMs = 500;
 constexpr char kPortGone[] = "The port went away.";
 constexpr char kNotStarted[] = "Nothing was sent.";
 
@@ -49,10 +52,15 @@ UnitSession::UnitSession(Environment& environment)
                 {.polled =
                      [this](std::uint8_t /*unit*/, bool replied) {
                        replies_ += replied ? 1 : 0;
+                       unanswered_ = unanswered_ || !replied;
                        ReportStep();
                      },
                  .compared = [this](std::uint8_t /*unit*/, const OptionTable& held) { held_ = held; }}) {
   link_.SetLineObserver([this](const LineEvent& event) { trace_.Note(event, environment_.now_ms()); });
+  // A command that runs would open the port again, and another adapter may stand behind it then.
+  link_.SetPortHandler([this](bool open) {
+    if (!open) link_.SetCommPort(0);
+  });
   commands_.running.SetReporter([this](const CommandReport& report) { report_ = report; });
   environment_.stop.SetHandler([this] { OnStop(); });
 }
@@ -89,8 +97,8 @@ CommandResult UnitSession::SetId(std::uint8_t new_id) { return Run(new_id, comma
 
 CommandResult UnitSession::Run(std::uint8_t unit, UnitOperation& operation) {
   report_ = {};
+  if (unit != unit_) AwaitLateReplies();
   if (environment_.stop.Made()) return {CommandResult::Kind::kCancelled, {}, kNotStarted};
-  // The link would open the port again, and another adapter may stand behind it now.
   if (!link_.PortOpen()) return {CommandResult::Kind::kFailed, kPortGone, kNotStarted};
   trace_.Clear();
   unit_ = unit;
@@ -103,6 +111,11 @@ CommandResult UnitSession::Run(std::uint8_t unit, UnitOperation& operation) {
   if (succeeded_) return {CommandResult::Kind::kDone, {}, report_.aftermath};
   if (report_.cancelled) return {CommandResult::Kind::kCancelled, {}, report_.aftermath};
   return {CommandResult::Kind::kFailed, Reason(), report_.aftermath};
+}
+
+void UnitSession::AwaitLateReplies() {
+  if (std::exchange(unanswered_, false))
+    WaitUntil(environment_, kLateReplyMs, [this] { return environment_.stop.Made(); });
 }
 
 // What the line shows says more than a box, unless the last poll was answered.

@@ -66,6 +66,7 @@ class UnitSession final : private UnitTarget, private CommandProgressView, priva
 
  private:
   CommandResult Run(std::uint8_t unit, UnitOperation& operation);
+  void AwaitLateReplies();
   std::string Reason() const;
   void OnStop();
   void ReportStep() const;
@@ -85,8 +86,8 @@ class UnitSession final : private UnitTarget, private CommandProgressView, priva
   bool AskYesNo(const BoxMessage& /*message*/) override { return false; }
 
   Environment& environment_;
-  HwSerial link_;
   LineTrace trace_;
+  HwSerial link_;
   StepHandler on_step_;
 
   // Of the running command, or the last one.
@@ -96,6 +97,7 @@ class UnitSession final : private UnitTarget, private CommandProgressView, priva
   std::string step_;
   std::string box_;  // the first one's text
   int replies_ = 0;
+  bool unanswered_ = false;  // a poll had no reply, since the line was last left alone
   bool succeeded_ = false;
   CommandReport report_;
 

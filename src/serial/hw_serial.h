@@ -55,8 +55,8 @@ class HwSerial {
   PollReplyHandler SetPollReplyHandler(PollReplyHandler handler) {
     return std::exchange(poll_reply_, std::move(handler));
   }
-  // `handler` is called whenever the port has been opened (true) or the open port closed (false). It raises nothing,
-  // and only asks the link.
+  // `handler` is called whenever the port has been opened (true) or the open port closed (false). It raises nothing.
+  // It only asks the link; or it sets CommPort to 0, so that no command opens the port again.
   void SetPortHandler(std::function<void(bool open)> handler) { port_handler_ = std::move(handler); }
   // `observer` gets all that happens on the line; nullptr ends that.
   void SetLineObserver(LineObserver observer) { line_.SetObserver(std::move(observer)); }

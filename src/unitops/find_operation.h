@@ -11,7 +11,8 @@
 
 namespace tendril {
 
-// Polls the IDs of a range in order, 01 to FD unless another is set. The next poll follows the reply or the time-out at once. The chosen unit ID plays no part.
+// Polls the IDs of a range in order, 01 to FD unless another is set. The next poll follows the reply or the time-out at
+// once. The chosen unit ID plays no part.
 //
 //   Idle --Start: the window disables its controls meanwhile--> Waiting
 //   Waiting --tick: poll of the first ID out--> Polling
@@ -25,8 +26,8 @@ class FindOperation final : public UnitOperation {
   // called when a search begins and after each poll. Context and trace must outlive the operation.
   FindOperation(CommandContext& context, const LineTrace& trace, std::function<void()> on_searched);
 
-  // The next searches poll the IDs from `first` to `last`, at least one. FF alone finds the unit on the line whatever its
-  // ID is, if there is one only.
+  // The next searches poll the IDs from `first` to `last`, at least one. FF alone finds the only unit on the line,
+  // whatever its ID is.
   void SetRange(std::uint8_t first, std::uint8_t last);
   // The search that runs, or the last one.
   const UnitSearch& Search() const { return search_; }

@@ -76,18 +76,42 @@ TEST_F(UnitSessionTest, StopRequest_EndsTheCommandAndLetsNoneBegin) {
   EXPECT_EQ(static_cast<std::uint32_t>(units_.Link().SentByteCount()), sent);
 }
 
-TEST_F(UnitSessionTest, LostPort_IsNotOpenedAgain) {
+TEST_F(UnitSessionTest, PortThatIsBackAtOnce_IsNotOpenedAgain) {
   Attach("", 0x05);
+  const auto timer = world_.time.CreateTimer([this] { world_.bench.Replug(1); });
+  timer->SetInterval(1);
   units_.SetStepHandler([&](const std::string& step, double /*part*/) {
-    if (step == "3 of 8 ports") world_.bench.Unplug(1);
+    if (step != "3 of 8 ports" && step != "port 3 of 8") return;
+    world_.bench.Unplug(1);
+    timer->SetEnabled(true);
   });
-  CommandResult result = units_.Read(0x05, held_);
-  EXPECT_EQ(result.kind, CommandResult::Kind::kFailed);
-  EXPECT_EQ(result.reason, "The port went away.");
-  EXPECT_EQ(held_, OptionTable{});
-  world_.bench.Replug(1);
-  EXPECT_FALSE(units_.Read(0x05, held_).Done());
-  EXPECT_FALSE(units_.Link().PortOpen());
+  for (const bool send : {false, true}) {
+    world_.time.Advance(10);
+    units_.Link().SetCommPort(1);
+    units_.Link().SetPortOpen(true);
+    const CommandResult result = send ? units_.Send(0x05, records_) : units_.Read(0x05, held_);
+    EXPECT_EQ(result.kind, CommandResult::Kind::kFailed);
+    EXPECT_EQ(result.reason, "The port went away.");
+    EXPECT_EQ(result.aftermath, send ? "Ports 1 to 2 are written, 3 perhaps, 4 to 8 are not." : "");
+    EXPECT_EQ(held_, OptionTable{});
+    EXPECT_FALSE(units_.Read(0x05, held_).Done());
+    EXPECT_FALSE(units_.Link().PortOpen());
+  }
+}
+
+TEST_F(UnitSessionTest, LateReplies_AreNoneOfTheNextUnit) {
+  VirtualUnit& next = Attach("", 0x06);
+  for (int port = 1; port <= kUnitPorts; ++port)
+    next.SetPortOptions(port, {1, 50, 250, 70, 230, 70, 230, 150, 150});
+  for (std::uint64_t late_us = 100'000; late_us <= 160'000; late_us += 15'000) {
+    auto& late =
+        world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x05}, ReplyTiming{.turn_round_us = late_us});
+    units_.Read(0x05, held_);
+    held_ = {};
+    ASSERT_TRUE(units_.Read(0x06, held_).Done());
+    for (const OptionBytes& held : held_) EXPECT_EQ(held, next.PortOptions(1)) << late_us;
+    world_.bench.Detach(1, late);
+  }
 }
 
 }  // namespace
