@@ -54,7 +54,8 @@ std::optional<Report> RefuseUncleanReplies(Job& job, std::uint8_t& id) {
     const UnitSearch& search = job.units.Search();
     if (!result.Done() || (replies == 0 && search.found.empty()))
       return Refusal(SearchSentence(result, search));
-    const bool same = search.found.size() == 1 && (replies == 0 || search.found.front().id == id);
+    const bool answer = search.found.size() == 1 && search.found.front().what == FoundUnit::What::kAnswers;
+    const bool same = answer && (replies == 0 || search.found.front().id == id);
     if (!same || !CleanReply(job.units.Trace(), replies == 0)) {
       return Refusal(
           u"Each poll of FF must bring one clean reply and nothing else, and this one did not: connect one "
@@ -90,11 +91,11 @@ Report Write(Job& job) {
           .problem = QString::fromStdString(sentences)};
 }
 
-// `id` becomes the unit's own ID.
-Report CheckAndWrite(Job& job, std::uint8_t& id) {
+Report CheckAndWrite(Job& job) {
   if (!job.line.alone) {
     if (auto refusal = RefuseOtherUnits(job)) return *refusal;
   }
+  std::uint8_t id = kAllUnits;
   if (auto refusal = RefuseUncleanReplies(job, id)) return *refusal;
   if (id == job.line.new_id) {
     return {.text = u"The unit has the ID %1 already.\n"_s.arg(IdText(id)).toUtf8(),
@@ -103,7 +104,12 @@ Report CheckAndWrite(Job& job, std::uint8_t& id) {
   if (!job.line.yes) {
     if (auto refusal = Confirm(job, id)) return *refusal;
     // The user may have connected something meanwhile.
-    if (auto refusal = RefuseUncleanReplies(job, id)) return *refusal;
+    std::uint8_t id_now = kAllUnits;
+    if (auto refusal = RefuseUncleanReplies(job, id_now)) return *refusal;
+    if (id_now != id) {
+      return Refusal(u"Unit %1 answers now, and the question was about unit %2: start again."_s.arg(
+          IdText(id_now), IdText(id)));
+    }
   }
   return Write(job);
 }
@@ -116,8 +122,7 @@ Report SetId(Job& job) {
             .problem = u"set-id asks before it writes the ID: without a terminal, --yes is needed."_s};
   }
   if (auto problem = job.port.Open()) return *problem;
-  std::uint8_t id = kAllUnits;
-  Report report = CheckAndWrite(job, id);
+  Report report = CheckAndWrite(job);
   report.members[u"unit"_s] = IdText(job.line.new_id);
   return report;
 }

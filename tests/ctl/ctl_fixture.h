@@ -32,6 +32,7 @@ struct RecordedTerminal final : ctl::Terminal {
   bool Colours() const override { return false; }
   std::optional<QString> Ask(const QByteArray& question) override {
     PrintError(question);
+    if (asked) asked();
     return answer;
   }
   bool CanAsk() const override { return answer.has_value(); }
@@ -41,6 +42,7 @@ struct RecordedTerminal final : ctl::Terminal {
   QString print_fault;
   int columns = 0;
   std::optional<QString> answer;
+  std::function<void()> asked;  // what the user does before the answer
 };
 
 // Comm 1 to 4 exist; no unit is on a line. The Control Panel holds no port of them until it is given one.

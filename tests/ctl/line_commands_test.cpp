@@ -81,6 +81,32 @@ TEST_F(LineCommands, SetId_WritesOnlyToOneUnitAlone) {
   }
 }
 
+// Answers each poll as if it asked for the options of a port.
+class OtherAnswerUnit final : public VirtualUnit {
+ public:
+  using VirtualUnit::VirtualUnit;
+
+ protected:
+  Transmission Reply(std::uint8_t /*kind*/, const Bytes& data, std::uint64_t poll_end_us) override {
+    return VirtualUnit::Reply('n', data, poll_end_us);
+  }
+};
+
+TEST_F(LineCommands, SetId_WritesOnlyToTheUnitThatAnswersAndWasAskedAbout) {
+  VirtualUnit& other = world_.bench.Attach<OtherAnswerUnit>(1, std::uint8_t{0xFF});
+  EXPECT_EQ(Run("set-id 0B --alone --yes --quiet"), 1);
+  EXPECT_THAT(terminal_.error, HasSubstr("Each poll of FF must bring one clean reply"));
+  EXPECT_EQ(other.id(), 0xFF);
+  world_.bench.Detach(1, other);
+  AttachAll({{"", 0x01}});
+  terminal_.answer = QStringLiteral("y");
+  terminal_.asked = [this] { AttachAll({{"", 0x07}}); };
+  EXPECT_EQ(Run("set-id 0B --alone --quiet"), 1);
+  EXPECT_THAT(terminal_.error, HasSubstr("Unit 07 answers now, and the question was about unit 01: start "
+                                         "again. No ID has changed."));
+  EXPECT_EQ(units_[0]->id(), 0x07);
+}
+
 // In the search, and after the ID was sent.
 TEST_F(LineCommands, SetIdThatIsStopped_SaysHowTheUnitIsLeft) {
   for (const auto& [option, after_ms, said] :
