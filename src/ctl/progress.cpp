@@ -22,7 +22,7 @@ Progress::Progress(const CommandLine& line, Environment& environment)
       last_ms_(environment.clock.NowMs()) {}
 
 Progress::~Progress() {
-  if (drawn_ == 0) return;
+  if (drawn_.isEmpty()) return;
   Draw({});
   environment_.terminal.PrintError("\r");
 }
@@ -47,10 +47,11 @@ QString Progress::TimeLeft(double part) {
 
 // The terminal would begin a new line in its last column. What was longer is overwritten with spaces, which every
 // terminal understands.
-void Progress::Draw(QString text) {
-  text.truncate(std::max(environment_.terminal.ErrorColumns() - 1, 0));
-  const qsizetype columns = text.size();
-  environment_.terminal.PrintError('\r' + text.leftJustified(std::exchange(drawn_, columns)).toUtf8());
+void Progress::Draw(const QString& text) {
+  const QString line = text.left(std::max(environment_.terminal.ErrorColumns() - 1, 0));
+  if (line == drawn_) return;
+  environment_.terminal.PrintError('\r' + line.leftJustified(drawn_.size()).toUtf8());
+  drawn_ = line;
 }
 
 }  // namespace tendril::ctl

@@ -30,13 +30,13 @@ class Progress {
   enum class Mode { kSilent, kLines, kRedrawn };
 
   QString TimeLeft(double part);
-  void Draw(QString text);
+  void Draw(const QString& text);
 
   Environment& environment_;
   Mode mode_;
   std::uint32_t last_ms_;  // reading of the clock, which wraps
   std::uint64_t elapsed_ms_ = 0;
-  qsizetype drawn_ = 0;  // columns of the line
+  QString drawn_;  // the line that is shown
 };
 
 }  // namespace tendril::ctl
