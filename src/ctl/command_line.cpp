@@ -5,13 +5,13 @@
 #include <utility>
 
 #include "ctl/command_help.h"
+#include "ctl/report.h"
 
 namespace tendril::ctl {
 namespace {
 
 using namespace Qt::StringLiterals;
 
-constexpr int kWrongUse = 2;
 constexpr unsigned kOfTheLine = kPortOption | kTakePortOption | kDemoOption | kTraceOption;
 
 struct WrongUse {
@@ -263,7 +263,7 @@ std::variant<CommandLine, EarlyEnd> ParseCommandLine(const QStringList& argument
     TakeOptions(given, line);
     return line;
   } catch (const WrongUse& fault) {
-    return EarlyEnd{kWrongUse, u"tendril-ctl: "_s + fault.sentence + u'\n'};
+    return EarlyEnd{kExitUsage, u"tendril-ctl: "_s + fault.sentence + u'\n'};
   }
 }
 
