@@ -4,6 +4,8 @@
 #include <QJsonArray>
 #include <QJsonDocument>
 #include <QJsonObject>
+#include <QRegularExpression>
+#include <map>
 #include <set>
 
 #include "ctl/ctl_fixture.h"
@@ -45,6 +47,15 @@ class Documents : public CtlTest {
     const QString reference = schema[u"$ref"].toString();
     if (reference.endsWith(u".json")) return;  // a configuration, which has its own
     if (!reference.isEmpty()) schema = schema_[u"$defs"][reference.section(u'/', -1)].toObject();
+    static const std::map<QString, QJsonValue::Type> kTypes{{QStringLiteral("object"), QJsonValue::Object},
+                                                            {QStringLiteral("array"), QJsonValue::Array},
+                                                            {QStringLiteral("string"), QJsonValue::String},
+                                                            {QStringLiteral("integer"), QJsonValue::Double}};
+    const QString type = schema[u"type"].toString();
+    EXPECT_TRUE(type.isEmpty() || kTypes.at(type) == value.type()) << terminal_.out;
+    EXPECT_TRUE(!schema.contains(u"const") || schema[u"const"] == value) << terminal_.out;
+    EXPECT_TRUE(value.toString().contains(QRegularExpression(schema[u"pattern"].toString())));
+    EXPECT_GE(value.toDouble(), schema[u"minimum"].toDouble());
     EXPECT_TRUE(!schema.contains(u"enum") || schema[u"enum"].toArray().contains(value)) << terminal_.out;
     for (const QJsonValue& item : value.toArray()) Check(item, schema[u"items"].toObject());
     const QJsonObject object = value.toObject(), properties = schema[u"properties"].toObject();
