@@ -59,10 +59,12 @@ bool WriteAll(QIODevice& file, QByteArrayView text) {
 
 }  // namespace
 
+QString NameOfFile(const QString& path) { return path == u"-" ? u"Standard input"_s : path; }
+
 std::variant<ConfigurationText, QString> ReadConfigurationFile(const QString& path) {
   const bool standard_input = path == u"-";
-  const QString name = standard_input ? u"Standard input"_s : path;
-  if (QFileInfo(name).isDir()) return u"%1 is a folder, not a file."_s.arg(path);
+  const QString name = NameOfFile(path);
+  if (!standard_input && QFileInfo(path).isDir()) return u"%1 is a folder, not a file."_s.arg(path);
   QFile file(path);
   const bool open = standard_input ? file.open(stdin, QIODevice::ReadOnly) : file.open(QIODevice::ReadOnly);
   // What is too long is refused, however much of it is read.
@@ -93,6 +95,14 @@ QString WhyNotWritable(const QString& path, bool force) {
   if (!folder.isDir()) return Cannot(path, "written"_L1, u"%1 is not a folder"_s.arg(folder.filePath()));
   if (!folder.isWritable())
     return Cannot(path, "written"_L1, u"the folder %1 is write-protected"_s.arg(folder.filePath()));
+  return {};
+}
+
+QString WhyNoneWritable(std::span<const std::uint8_t> units, const PathOfUnit& path_of, bool force) {
+  for (const std::uint8_t unit : units) {
+    QString reason = WhyNotWritable(path_of(unit), force);
+    if (!reason.isEmpty()) return reason;
+  }
   return {};
 }
 

@@ -2,7 +2,6 @@
 #include <QFileInfo>
 #include <algorithm>
 #include <cstdint>
-#include <functional>
 #include <iterator>
 #include <optional>
 #include <span>
@@ -20,19 +19,7 @@ namespace {
 using namespace Qt::StringLiterals;
 using Outcome = UnitResult::Outcome;
 
-// Where a unit's configuration is kept; empty: on standard output.
-using PathOf = std::function<QString(std::uint8_t unit)>;
-
-// Why one of the files cannot be written: a sentence; empty: each can.
-QString WhyNoneWritable(const CommandLine& line, std::span<const std::uint8_t> units, const PathOf& path_of) {
-  for (const std::uint8_t unit : units) {
-    QString fault = WhyNotWritable(path_of(unit), line.force);
-    if (!fault.isEmpty()) return fault;
-  }
-  return {};
-}
-
-std::vector<UnitResult> KeepUnits(Job& job, std::span<const std::uint8_t> units, const PathOf& path_of) {
+std::vector<UnitResult> KeepUnits(Job& job, std::span<const std::uint8_t> units, const PathOfUnit& path_of) {
   return ForEachUnit(job, units, [&](UnitWork& work) {
     OptionTable held;
     if (work.Read(held, {}, 1)) work.Keep(held, path_of(work.Unit()));
@@ -70,7 +57,7 @@ UnitResult NotRead(const FoundUnit& found) {
           .reason = u"Not read: %1."_s.arg(QString::fromStdString(found.Words()))};
 }
 
-Report BackUpFoundUnits(Job& job, const PathOf& path_of) {
+Report BackUpFoundUnits(Job& job, const PathOfUnit& path_of) {
   if (auto fault = FindUnits(job)) return *fault;
   std::vector<std::uint8_t> units;
   std::vector<UnitResult> others;
@@ -94,10 +81,10 @@ Report Get(Job& job) {
   const bool one = line.units.size() == 1;
   if (one && line.output.isEmpty()) return GetToOutput(job);
   const bool folder = !one || line.output.endsWith(u'/') || QFileInfo(line.output).isDir();
-  const PathOf path_of = [&](std::uint8_t unit) {
+  const PathOfUnit path_of = [&](std::uint8_t unit) {
     return folder ? UnitFilePath(line.output, unit) : line.output;
   };
-  const QString fault = WhyNoneWritable(line, line.units, path_of);
+  const QString fault = WhyNoneWritable(line.units, path_of, line.force);
   if (!fault.isEmpty()) return Refused(fault);
   if (auto report = job.port.Open()) return *report;
   return ReportOfFiles(job, KeepUnits(job, line.units, path_of));
@@ -105,11 +92,11 @@ Report Get(Job& job) {
 
 Report Backup(Job& job) {
   const CommandLine& line = job.line;
-  const PathOf path_of = [&](std::uint8_t unit) { return UnitFilePath(line.folder, unit); };
+  const PathOfUnit path_of = [&](std::uint8_t unit) { return UnitFilePath(line.folder, unit); };
   std::vector<std::uint8_t> perhaps = line.units;
   for (int id = kFirstUnitId; line.units.empty() && id <= kLastUnitId; ++id)
     perhaps.push_back(static_cast<std::uint8_t>(id));
-  const QString fault = WhyNoneWritable(line, perhaps, path_of);
+  const QString fault = WhyNoneWritable(perhaps, path_of, line.force);
   if (!fault.isEmpty()) return Refused(fault);
   if (auto report = job.port.Open()) return *report;
   if (line.units.empty()) return BackUpFoundUnits(job, path_of);

@@ -59,26 +59,24 @@ QByteArray HeadOf(const ConfigurationText& configuration) {
   return lines.isEmpty() ? QByteArray() : (lines.join(u'\n') + u"\n\n"_s).toUtf8();
 }
 
-// What was read from a file, or made of a preset, can be written.
-QByteArray TextOf(const ConfigurationText& configuration) {
-  return std::get<QByteArray>(WriteConfiguration(configuration));
-}
-
 }  // namespace
 
 Report Show(Job& job) {
   const auto read = ReadConfigurationFile(job.line.file);
   if (const auto* fault = std::get_if<QString>(&read)) return Refused(*fault);
   const auto& configuration = std::get<ConfigurationText>(read);
+  const auto text = WriteConfiguration(configuration);
+  if (const auto* refusal = std::get_if<Refusal>(&text))  // a field a line, a text can be too long
+    return Refused(u"%1: %2."_s.arg(NameOfFile(job.line.file), refusal->Sentence()));
   return {.text = HeadOf(configuration) + TableOf(configuration, job.environment.terminal.Colours()),
-          .members = {{u"configuration"_s, AsJson(TextOf(configuration))}}};
+          .members = {{u"configuration"_s, AsJson(std::get<QByteArray>(text))}}};
 }
 
 Report WritePreset(Job& job) {
   ConfigurationText configuration;
   for (std::size_t slot = 0; slot < kPortCount; ++slot)
     SetFromPreset(*job.line.preset, configuration.records.At(slot));
-  const QByteArray text = TextOf(configuration);
+  const auto text = std::get<QByteArray>(WriteConfiguration(configuration));
   const QString& path = job.line.output;
   if (path.isEmpty()) return {.text = text, .members = {{u"configuration"_s, AsJson(text)}}};
   const QString refusal = WhyNotWritable(path, job.line.force);

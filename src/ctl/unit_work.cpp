@@ -76,7 +76,11 @@ bool UnitWork::BackUp(const QString& path, double share) {
   if (Read(held, u"backup"_s, share) && Keep(held, path)) return true;
   if (result_.outcome == Outcome::kFailed)
     result_.reason = u"Not written, since there is no backup. "_s + result_.reason;
-  return false;
+  if (result_.outcome != Outcome::kDiffers) return false;
+  QString reason = u"Not written: a file cannot have all that the unit holds."_s;
+  for (const QString& difference : Remarks(result_))
+    reason += u" %1%2."_s.arg(difference.left(1).toUpper(), difference.sliced(1));
+  return Fail(reason);
 }
 
 bool UnitWork::Take(const CommandResult& end) {

@@ -2,6 +2,7 @@
 #include <QDir>
 #include <QFile>
 #include <QFileInfo>
+#include <algorithm>
 #include <csignal>
 #include <map>
 #include <string>
@@ -206,9 +207,14 @@ TEST_F(UnitFiles, AUnitWithoutABackup_IsNotWritten) {
   EXPECT_EQ(Type("send wide.json 05-07 --backup kept --quiet"), 1);
   EXPECT_EQ(exact.accepted_commands(), 8U);
   EXPECT_EQ(inexact.accepted_commands() + empty.accepted_commands(), 0U);
-  EXPECT_THAT(terminal_.out,
-              HasSubstr("06    no       -         kept/unit-06.json  port 3, power up: Start Pulse on "
-                        "First Command in the file, unknown (flags 40) in the unit\n"));
+  const std::string gap(42, ' ');
+  EXPECT_THAT(
+      terminal_.out,
+      HasSubstr(
+          "06    no       -         kept/unit-06.json  Not written: a file cannot have all that the "
+          "unit holds.\n" +
+          gap +
+          "  Port 3, power up: Start Pulse on First Command in the file, unknown (flags 40) in the unit.\n"));
   EXPECT_THAT(terminal_.out,
               HasSubstr("A file cannot have what the unit holds: port 1: output kind -1 cannot be sent."));
   EXPECT_EQ(FilesIn("kept"), "unit-05.json unit-06.json");
@@ -222,6 +228,13 @@ TEST_F(UnitFiles, ABadFile_IsRefusedBeforeAnythingIsSent) {
   Edit("set/unit-05.json", "\"ports\"", "\"unit\": \"06\", \"ports\"");
   Edit("half/unit-05.json", "\"ports\"", "\"unit\": \"05\", \"ports\"");
   Write("half/unit-06.json", TextOf("wide.json").first(300));
+  Edit("strange/unit-fe.json", "", "");
+  QDir().mkdir(QStringLiteral("linked"));
+  QFile::link(QStringLiteral("none.json"), QStringLiteral("linked/unit-05.json"));
+  Write("large.json",
+        TextOf("wide.json")
+            .simplified()
+            .replace("\"ports\"", "\"note\": \"" + QByteArray(1'047'000, 'x') + "\", \"ports\""));
   using Case = std::pair<const char*, std::string>;
   for (const auto& [words, error] : {
            Case{"send none.json 05", "none.json cannot be read: No such file or directory."},
@@ -236,6 +249,14 @@ TEST_F(UnitFiles, ABadFile_IsRefusedBeforeAnythingIsSent) {
            Case{"restore half 05,07", "half/unit-07.json cannot be read: No such file or directory."},
            Case{"restore set",
                 "set/unit-05.json: it was read from unit 06; --yes writes it into unit 05 all the same."},
+           Case{"restore strange",
+                "strange/unit-fe.json: a unit at FE cannot be reached through an adapter with an echo: IDs "
+                "are 01 to FD."},
+           Case{"restore linked", "linked/unit-05.json cannot be read: No such file or directory."},
+           Case{"show large.json", "large.json: the text is larger than 1 MiB."},
+           Case{"send ./half/unit-05.json 06,05 --backup half --force",
+                "The backup half/unit-05.json would overwrite a file that this command reads: choose another "
+                "folder."},
            Case{"send wide.json 05 --backup half",
                 "half/unit-05.json exists already; --force overwrites it."},
            Case{"get 05 --output wide.json", "wide.json exists already; --force overwrites it."},
@@ -270,14 +291,14 @@ TEST_F(UnitFiles, AFullDisk_LeavesTheOldFileAndNoOther) {
 TEST_F(UnitFiles, FortyUnits_TakeWhatTheProtocolTakes) {
   constexpr int kUnits = 40;
   AttachUnits(1, kUnits);
-  double wire_bytes = 0;
-  world_.bench.Line(1).SetTap([&](const LineByte& /*byte*/) { ++wire_bytes; });
   const std::uint64_t begin_ms = world_.time.ElapsedMs();
   EXPECT_EQ(Type("send wide.json 01-28 --quiet"), 0);
   const auto taken_ms = static_cast<double>(world_.time.ElapsedMs() - begin_ms);
-  // What is on the wire, the pause after each port that is written, and the unit's turn-round when one is read.
-  const double floor_ms =
-      wire_bytes * 10 * 1000 / 19200 + kUnits * 8 * (300 + ReplyTiming().turn_round_us / 1000.0);
+  // For each port that is written: two packets, a poll, its reply and a pause. For each that is read: a poll and its
+  // reply, which are 8 and 16 bytes long. A unit begins each reply after its turn-round.
+  constexpr int kBytes = 5 + 16 + 6 + 8 + 6 + 16;
+  const double turn_round_ms = static_cast<double>(ReplyTiming().turn_round_us) / 1000;
+  const double floor_ms = kUnits * 8 * (kBytes * 10 * 1000 / 19200.0 + 300 + 2 * turn_round_ms);
 
   EXPECT_LE(taken_ms, 1.02 * floor_ms) << "floor " << floor_ms;
   EXPECT_GE(taken_ms, floor_ms);
@@ -291,6 +312,8 @@ TEST_F(UnitFiles, ProgressOnATerminal_IsOneLineWithTheTimeLeft) {
   EXPECT_THAT(terminal_.error, HasSubstr("\runit 06 (2 of 3): port 5 of 8, 00:04 le\r"));
   EXPECT_THAT(terminal_.error, EndsWith("\r" + std::string(39, ' ') + "\r"));
   EXPECT_EQ(terminal_.error.find('\n'), std::string::npos);
+  const QStringList drawn = QString::fromStdString(terminal_.error).split(u'\r');
+  EXPECT_EQ(std::ranges::adjacent_find(drawn), drawn.end());
 }
 
 TEST_F(UnitFiles, Show_DoesNothingToTheTerminal) {
