@@ -111,6 +111,8 @@ std::variant<Writing, QString> ReadBackupFile(const BackupFile& file, bool any_u
   const auto id = ParseUnitIds(HexByte(file.unit));
   if (const auto* fault = std::get_if<std::string>(&id))
     return u"%1: %2"_s.arg(file.path, QString::fromStdString(*fault));
+  const QFileInfo info(file.path);
+  if (info.exists() && !info.isFile()) return u"%1 is not a regular file."_s.arg(file.path);
   auto read = ReadConfigurationFile(file.path);
   if (auto* fault = std::get_if<QString>(&read)) return *fault;
   const auto& configuration = std::get<ConfigurationText>(read);
