@@ -66,8 +66,8 @@ Report Show(Job& job) {
   if (const auto* fault = std::get_if<QString>(&read)) return Refused(*fault);
   const auto& configuration = std::get<ConfigurationText>(read);
   const auto text = WriteConfiguration(configuration);
-  if (const auto* refusal = std::get_if<Refusal>(&text))  // a field a line, a text can be too long
-    return Refused(u"%1: %2."_s.arg(NameOfFile(job.line.file), refusal->Sentence()));
+  if (const auto* refusal = std::get_if<Refusal>(&text))
+    return Refused(u"%1: with a field a line, %2."_s.arg(NameOfFile(job.line.file), refusal->Sentence()));
   return {.text = HeadOf(configuration) + TableOf(configuration, job.environment.terminal.Colours()),
           .members = {{u"configuration"_s, AsJson(std::get<QByteArray>(text))}}};
 }

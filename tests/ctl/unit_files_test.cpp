@@ -253,7 +253,7 @@ TEST_F(UnitFiles, ABadFile_IsRefusedBeforeAnythingIsSent) {
                 "strange/unit-fe.json: a unit at FE cannot be reached through an adapter with an echo: IDs "
                 "are 01 to FD."},
            Case{"restore linked", "linked/unit-05.json cannot be read: No such file or directory."},
-           Case{"show large.json", "large.json: the text is larger than 1 MiB."},
+           Case{"show large.json", "large.json: with a field a line, the text is larger than 1 MiB."},
            Case{"send ./half/unit-05.json 06,05 --backup half --force",
                 "The backup half/unit-05.json would overwrite a file that this command reads: choose another "
                 "folder."},
