@@ -231,10 +231,9 @@ TEST_F(UnitFiles, ABadFile_IsRefusedBeforeAnythingIsSent) {
   Edit("strange/unit-fe.json", "", "");
   QDir().mkdir(QStringLiteral("linked"));
   QFile::link(QStringLiteral("none.json"), QStringLiteral("linked/unit-05.json"));
+  const QByteArray compact = TextOf("wide.json").simplified();
   Write("large.json",
-        TextOf("wide.json")
-            .simplified()
-            .replace("\"ports\"", "\"note\": \"" + QByteArray(1'047'000, 'x') + "\", \"ports\""));
+        QByteArray(compact).insert(1, "\"note\": \"" + QByteArray(1'048'500 - compact.size(), 'x') + "\","));
   using Case = std::pair<const char*, std::string>;
   for (const auto& [words, error] : {
            Case{"send none.json 05", "none.json cannot be read: No such file or directory."},
