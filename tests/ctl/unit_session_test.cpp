@@ -80,13 +80,15 @@ TEST_F(UnitSessionTest, PortThatIsBackAtOnce_IsNotOpenedAgain) {
   Attach("", 0x05);
   const auto timer = world_.time.CreateTimer([this] { world_.bench.Replug(1); });
   timer->SetInterval(1);
+  bool unplugged = false;
   units_.SetStepHandler([&](const std::string& step, double /*part*/) {
-    if (step != "3 of 8 ports" && step != "port 3 of 8") return;
+    if ((step != "3 of 8 ports" && step != "port 3 of 8") || std::exchange(unplugged, true)) return;
     world_.bench.Unplug(1);
     timer->SetEnabled(true);
   });
   for (const bool send : {false, true}) {
     world_.time.Advance(10);
+    unplugged = false;
     units_.Link().SetCommPort(1);
     units_.Link().SetPortOpen(true);
     const CommandResult result = send ? units_.Send(0x05, records_) : units_.Read(0x05, held_);
