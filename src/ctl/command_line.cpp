@@ -6,6 +6,7 @@
 
 #include "ctl/command_help.h"
 #include "ctl/report.h"
+#include "ctl/unit_ids.h"
 
 namespace tendril::ctl {
 namespace {

@@ -9,7 +9,7 @@
 
 #include "config/channel_config.h"
 #include "ctl/command_table.h"
-#include "ctl/unit_ids.h"
+#include "unitops/unit_target.h"
 
 namespace tendril::ctl {
 

@@ -9,7 +9,7 @@
 #include <filesystem>
 #include <system_error>
 
-#include "platform/hex_text.h"
+#include "ctl/unit_ids.h"
 
 namespace tendril::ctl {
 namespace {
@@ -80,9 +80,7 @@ QJsonObject AsJson(const QByteArray& configuration) {
   return QJsonDocument::fromJson(configuration).object();
 }
 
-QString UnitFileName(std::uint8_t unit) {
-  return u"unit-%1.json"_s.arg(QString::fromStdString(HexByte(unit)));
-}
+QString UnitFileName(std::uint8_t unit) { return u"unit-%1.json"_s.arg(IdText(unit)); }
 
 QString UnitFilePath(const QString& folder, std::uint8_t unit) {
   return folder.isEmpty() ? UnitFileName(unit) : QDir(folder).filePath(UnitFileName(unit));

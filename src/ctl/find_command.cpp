@@ -7,7 +7,7 @@
 
 #include "ctl/commands.h"
 #include "ctl/progress.h"
-#include "platform/hex_text.h"
+#include "ctl/unit_ids.h"
 
 namespace tendril::ctl {
 namespace {
@@ -31,8 +31,6 @@ QString AnswerName(FoundUnit::What what) {
 }
 
 }  // namespace
-
-QString IdText(std::uint8_t id) { return QString::fromStdString(HexByte(id)); }
 
 CommandResult FindWithProgress(Job& job, std::uint8_t first, std::uint8_t last) {
   Progress progress(job.line, job.environment);

@@ -9,9 +9,6 @@
 
 namespace tendril::ctl {
 
-// "0A".
-QString IdText(std::uint8_t id);
-
 // Polls the IDs from `first` to `last` and shows the progress; without a terminal, each unit as it is found. The
 // session's Search() has what was found.
 CommandResult FindWithProgress(Job& job, std::uint8_t first, std::uint8_t last);

@@ -3,6 +3,7 @@
 
 #include "ctl/commands.h"
 #include "ctl/find_command.h"
+#include "ctl/unit_ids.h"
 #include "serial/packets.h"
 
 namespace tendril::ctl {

@@ -6,8 +6,8 @@
 #include "ctl/commands.h"
 #include "ctl/configuration_files.h"
 #include "ctl/text_table.h"
+#include "ctl/unit_ids.h"
 #include "exchange/format_names.h"
-#include "platform/hex_text.h"
 
 namespace tendril::ctl {
 namespace {
@@ -53,7 +53,7 @@ QByteArray TableOf(const ConfigurationText& configuration, bool colours) {
 // What the file says of itself, a line each.
 QByteArray HeadOf(const ConfigurationText& configuration) {
   QStringList lines;
-  if (configuration.unit) lines += u"Unit %1"_s.arg(QString::fromStdString(HexByte(*configuration.unit)));
+  if (configuration.unit) lines += u"Unit %1"_s.arg(IdText(*configuration.unit));
   if (configuration.read) lines += u"Read %1"_s.arg(*configuration.read);
   if (configuration.note) lines += u"Note: %1"_s.arg(Printable(*configuration.note));
   return lines.isEmpty() ? QByteArray() : (lines.join(u'\n') + u"\n\n"_s).toUtf8();

@@ -4,7 +4,7 @@
 #include <charconv>
 #include <optional>
 
-#include "platform/hex_text.h"
+#include "unitops/unit_target.h"
 
 namespace tendril::ctl {
 namespace {

@@ -2,7 +2,7 @@
 
 #include <utility>
 
-#include "platform/hex_text.h"
+#include "ctl/unit_ids.h"
 
 namespace tendril::ctl {
 
@@ -38,7 +38,7 @@ void UnitProgress::ShowStep(const std::string& step, double part) {
 }
 
 QString UnitProgress::Place() const {
-  return u"unit %1 (%2 of %3): "_s.arg(QString::fromStdString(HexByte(unit_))).arg(done_ + 1).arg(units_);
+  return u"unit %1 (%2 of %3): "_s.arg(IdText(unit_)).arg(done_ + 1).arg(units_);
 }
 
 }  // namespace tendril::ctl

@@ -9,7 +9,7 @@
 
 #include "ctl/configuration_files.h"
 #include "ctl/text_table.h"
-#include "platform/hex_text.h"
+#include "ctl/unit_ids.h"
 
 namespace tendril::ctl {
 namespace {
@@ -60,8 +60,6 @@ WrittenWords Words(Written written) {
   return {};
 }
 
-QString UnitName(const UnitResult& result) { return QString::fromStdString(HexByte(result.unit)); }
-
 // "It holds half a configuration: ports 1 to 3 are written, 4 perhaps, 5 to 8 are not."
 QString HowItIsLeft(const UnitResult& result) {
   if (result.written != Written::kPart) return result.aftermath;
@@ -100,7 +98,7 @@ QByteArray TableOf(const std::vector<UnitResult>& results, const ResultColumns& 
   const auto remark_column = static_cast<std::size_t>(headings.size());
   TextTable table(headings);
   for (const UnitResult& result : results) {
-    std::vector<TableCell> row{{UnitName(result)}};
+    std::vector<TableCell> row{{IdText(result.unit)}};
     if (columns.written) row.push_back(WrittenCell(result));
     if (columns.compared) row.push_back(ComparedCell(result));
     if (!columns.file.isEmpty()) row.push_back({result.file.isEmpty() ? u"-"_s : result.file});
@@ -115,7 +113,7 @@ QByteArray TableOf(const std::vector<UnitResult>& results, const ResultColumns& 
 }
 
 QJsonObject ToJson(const UnitResult& result, const ResultColumns& columns) {
-  QJsonObject row{{u"unit"_s, UnitName(result)}, {u"outcome"_s, Word(result.outcome)}};
+  QJsonObject row{{u"unit"_s, IdText(result.unit)}, {u"outcome"_s, Word(result.outcome)}};
   if (columns.written) row[u"written"_s] = Words(result.written).name;
   if (result.compared) row[u"compared"_s] = result.differences.empty() ? u"equal"_s : u"differs"_s;
   if (!result.file.isEmpty()) row[u"file"_s] = result.file;
@@ -140,7 +138,7 @@ QString Summary(const std::vector<UnitResult>& results) {
     const auto units = std::ranges::count(results, outcome, &UnitResult::outcome);
     if (units == 0) continue;
     if (results.size() == 1 && outcome == Outcome::kFailed) return Remarks(results.front()).join(u' ');
-    if (results.size() == 1) return u"Unit %1 %2."_s.arg(UnitName(results.front()), one);
+    if (results.size() == 1) return u"Unit %1 %2."_s.arg(IdText(results.front().unit), one);
     const QString of = clauses.isEmpty() ? u" of %1 units"_s.arg(results.size()) : QString();
     clauses += u"%1%2 %3"_s.arg(QString::number(units), of, units == 1 ? one : several);
   }
@@ -152,8 +150,8 @@ QString WhereStopped(const std::vector<UnitResult>& results) {
   const auto stopped = std::ranges::find(results, Outcome::kCancelled, &UnitResult::outcome);
   if (stopped == results.end()) return {};
   if (stopped->written == Written::kAll)
-    return u"Stopped: unit %1 is written, and not compared."_s.arg(UnitName(*stopped));
-  return Spaced({u"Stopped at unit %1."_s.arg(UnitName(*stopped)), HowItIsLeft(*stopped)});
+    return u"Stopped: unit %1 is written, and not compared."_s.arg(IdText(stopped->unit));
+  return Spaced({u"Stopped at unit %1."_s.arg(IdText(stopped->unit)), HowItIsLeft(*stopped)});
 }
 
 }  // namespace

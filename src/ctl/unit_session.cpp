@@ -13,6 +13,9 @@ namespace {
 
 // A reply that comes later than its poll waits must not be taken for one of the next unit.
 constexpr std::int32_t kLateReplyMs = 500;
+// No window is painted first.
+constexpr std::int32_t kFirstPollMs = 1;
+constexpr int kMaxLooks = 3;
 constexpr char kPortGone[] = "The port went away.";
 constexpr char kNotStarted[] = "Nothing was sent.";
 
@@ -52,10 +55,12 @@ UnitSession::UnitSession(Environment& environment)
                 {.polled =
                      [this](std::uint8_t /*unit*/, bool replied) {
                        replies_ += replied ? 1 : 0;
+                       misses_ += replied ? 0 : 1;
                        unanswered_ = unanswered_ || !replied;
                        ReportStep();
                      },
                  .compared = [this](std::uint8_t /*unit*/, const OptionTable& held) { held_ = held; }}) {
+  commands_.find.SetFirstPollDelay(kFirstPollMs);
   link_.SetLineObserver([this](const LineEvent& event) { trace_.Note(event, environment_.now_ms()); });
   // A command that runs would open the port again, and another adapter may stand behind it then.
   link_.SetPortHandler([this](bool open) {
@@ -78,7 +83,42 @@ CommandResult UnitSession::Send(std::uint8_t unit, const ChannelTable& records) 
   return result;
 }
 
+CommandResult UnitSession::LookFor(std::uint8_t unit) {
+  CommandResult result;
+  for (int looks = 0; looks < kMaxLooks; ++looks) {
+    result = Find(unit, unit);
+    const auto& found = Search().found;
+    if (!result.Done() || !found.empty()) break;
+  }
+  if (!result.Done()) return result;
+  const auto& found = Search().found;
+  const bool clean =
+      found.size() == 1 && found.front().id == unit && found.front().what == FoundUnit::What::kAnswers;
+  return clean ? result : CommandResult{CommandResult::Kind::kFailed, Reason(), {}};
+}
+
 CommandResult UnitSession::Read(std::uint8_t unit, OptionTable& held) {
+  OptionTable read{};
+  CommandResult result = ReadOnce(unit, read);
+  if (result.Done() && InDoubt()) {
+    const OptionTable first = read;
+    result = ReadOnce(unit, read);
+    if (result.Done() && read != first) {
+      return {CommandResult::Kind::kFailed,
+              "Two readings of unit " + HexByte(unit) + " differ: check the wiring and the adapter."};
+    }
+  }
+  if (result.Done()) held = read;
+  return result;
+}
+
+bool UnitSession::InDoubt() const {
+  return misses_ > 0 || std::ranges::any_of(trace_.Entries(), [](const TraceEntry& entry) {
+           return entry.kind == TraceEntry::Kind::kNoise && LeadingZeros(entry.bytes) < entry.bytes.size();
+         });
+}
+
+CommandResult UnitSession::ReadOnce(std::uint8_t unit, OptionTable& held) {
   held_.reset();
   CommandResult result = Run(unit, commands_.compare);
   if (result.Done()) held = *held_;
@@ -105,6 +145,7 @@ CommandResult UnitSession::Run(std::uint8_t unit, UnitOperation& operation) {
   step_.clear();
   box_.clear();
   replies_ = 0;
+  misses_ = 0;
   succeeded_ = false;
   operation.Start();
   environment_.waiting.Until([this] { return !commands_.running.Active(); });
@@ -122,6 +163,9 @@ void UnitSession::AwaitLateReplies() {
 std::string UnitSession::Reason() const {
   if (!link_.PortOpen()) return kPortGone;
   const LineVerdict verdict = JudgeLine(trace_);
+  if (verdict.kind == LineVerdict::Kind::kEchoOnly)
+    return "Unit " + HexByte(trace_.Polls().back().unit) +
+           " does not answer: check its power, its ID and the wiring.";
   const bool box_only =
       verdict.kind == LineVerdict::Kind::kAnswers || verdict.kind == LineVerdict::Kind::kNothingAsked;
   if (!box_only) return verdict.sentence;

@@ -46,9 +46,12 @@ class UnitSession final : private UnitTarget, private CommandProgressView, priva
   UnitSession(const UnitSession&) = delete;
   UnitSession& operator=(const UnitSession&) = delete;
 
+  // Polls `unit` until it answers, some times. Done: it does, and nothing else.
+  CommandResult LookFor(std::uint8_t unit);
   // Writes `records` into `unit`, all ports.
   CommandResult Send(std::uint8_t unit, const ChannelTable& records);
-  // Reads what `unit` holds into `held`, which stays as it was unless all ports were read.
+  // Reads what `unit` holds into `held`, which stays as it was unless all ports were read. A reading in which a reply was
+  // missing, or noise came, is done twice, and fails unless both are equal: replies have no checksum.
   CommandResult Read(std::uint8_t unit, OptionTable& held);
   // Polls the IDs from `first` to `last`. Search() has what was found, also after a failure.
   CommandResult Find(std::uint8_t first, std::uint8_t last);
@@ -67,6 +70,8 @@ class UnitSession final : private UnitTarget, private CommandProgressView, priva
  private:
   CommandResult Run(std::uint8_t unit, UnitOperation& operation);
   void AwaitLateReplies();
+  CommandResult ReadOnce(std::uint8_t unit, OptionTable& held);
+  bool InDoubt() const;
   std::string Reason() const;
   void OnStop();
   void ReportStep() const;
@@ -97,6 +102,7 @@ class UnitSession final : private UnitTarget, private CommandProgressView, priva
   std::string step_;
   std::string box_;  // the first one's text
   int replies_ = 0;
+  int misses_ = 0;  // polls without a reply
   bool unanswered_ = false;  // a poll had no reply, since the line was last left alone
   bool succeeded_ = false;
   CommandReport report_;

@@ -43,6 +43,8 @@ bool UnitWork::Read(OptionTable& held, const QString& what, double share) {
 
 bool UnitWork::Write(const OptionTable& wanted, double share) {
   progress_.BeginPhase({}, share);
+  // Nothing is written at an ID where nothing answers, or several units do.
+  if (!Take(job_.units.LookFor(Unit()))) return false;
   const CommandResult end = job_.units.Send(Unit(), RecordsOf(wanted));
   result_.written = end.written;
   if (!end.Done()) result_.aftermath = QString::fromStdString(end.aftermath);

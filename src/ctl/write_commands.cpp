@@ -16,6 +16,7 @@
 #include "ctl/unit_ids.h"
 #include "ctl/unit_work.h"
 #include "platform/hex_text.h"
+#include "unitops/unit_target.h"
 
 namespace tendril::ctl {
 namespace {
@@ -101,10 +102,9 @@ std::vector<BackupFile> BackupFiles(const CommandLine& line) {
 // Why the configuration is not for the unit that its file is named after; empty: it is.
 QString WhyNotOfUnit(const BackupFile& file, const ConfigurationText& configuration) {
   if (configuration.unit == file.unit) return {};
-  const auto id = [](std::uint8_t unit) { return QString::fromStdString(HexByte(unit)); };
-  const QString why = configuration.unit ? u"it was read from unit %1"_s.arg(id(*configuration.unit))
+  const QString why = configuration.unit ? u"it was read from unit %1"_s.arg(IdText(*configuration.unit))
                                          : u"it does not say which unit it was read from"_s;
-  return u"%1: %2; --yes writes it into unit %3 all the same."_s.arg(file.path, why, id(file.unit));
+  return u"%1: %2; --yes writes it into unit %3 all the same."_s.arg(file.path, why, IdText(file.unit));
 }
 
 std::variant<Writing, QString> ReadBackupFile(const BackupFile& file, bool any_unit) {

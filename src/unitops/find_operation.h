@@ -29,6 +29,8 @@ class FindOperation final : public UnitOperation {
   // The next searches poll the IDs from `first` to `last`, at least one. FF alone finds the only unit on the line,
   // whatever its ID is.
   void SetRange(std::uint8_t first, std::uint8_t last);
+  // How long after its start a search polls first, at least 1 ms.
+  void SetFirstPollDelay(std::int32_t ms) { tmrFirstPoll_.SetInterval(ms); }
   // The search that runs, or the last one.
   const UnitSearch& Search() const { return search_; }
 
