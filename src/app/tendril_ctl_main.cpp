@@ -6,6 +6,7 @@
 #include <csignal>
 #include <cstdio>
 #include <filesystem>
+#include <functional>
 #include <memory>
 #include <optional>
 #include <variant>
@@ -34,6 +35,13 @@ namespace {
 
 void Warn(const std::string& line) { std::fprintf(stderr, "tendril-ctl: %s\n", line.c_str()); }
 
+// Preferences that are missing have their defaults: only who looks for a fault reads of that.
+std::function<void(const std::string&)> WarningsOf(const ctl::CommandLine& line) {
+  return [shown = line.trace](const std::string& warning) {
+    if (shown) Warn(warning);
+  };
+}
+
 struct EventLoopWaiting final : ctl::Waiting {
   void Until(const std::function<bool()>& done) override {
     while (!done()) QCoreApplication::processEvents(QEventLoop::WaitForMoreEvents);
@@ -51,7 +59,7 @@ struct Process {
 
 int Run(const ctl::CommandLine& line, Process& process, SerialDevice& device, CommandLog& log,
         TcpSocket& socket, RegistryStore& store, const ProcessList& processes) {
-  Registry registry(store, Warn);
+  Registry registry(store, WarningsOf(line));
   ctl::Environment environment{device,
                                process.timers,
                                process.clock,
@@ -70,7 +78,7 @@ int RunOnThisComputer(const ctl::CommandLine& line, Process& process) {
   QtSerialDevice device(Warn);
   FileCommandLog log(CommandLogPath());
   QtTcpSocket socket(Warn);
-  const auto store = OpenSystemRegistry(Warn);
+  const auto store = OpenSystemRegistry(WarningsOf(line));
   const auto processes = OpenProcessList();
   return Run(line, process, device, log, socket, *store, *processes);
 }
@@ -92,12 +100,8 @@ int Main() {
   const auto parsed = ctl::ParseCommandLine(QCoreApplication::arguments());
   Process process;
   if (const auto* end = std::get_if<ctl::EarlyEnd>(&parsed)) {
-    if (end->exit_code != 0) {
-      process.terminal.PrintError(end->text.toUtf8());
-    } else if (!process.terminal.Print(end->text.toUtf8()).isEmpty()) {
-      return ctl::kExitNotAsWished;
-    }
-    return end->exit_code;
+    const bool json = QCoreApplication::arguments().contains(QStringLiteral("--json"));
+    return ctl::PrintEarlyEnd(*end, json, process.terminal);
   }
 #ifndef _WIN32
   // A port is given back even when nothing reads the output any more, or a file becomes too large.

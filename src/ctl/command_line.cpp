@@ -264,7 +264,7 @@ std::variant<CommandLine, EarlyEnd> ParseCommandLine(const QStringList& argument
     TakeOptions(given, line);
     return line;
   } catch (const WrongUse& fault) {
-    return EarlyEnd{kExitUsage, u"tendril-ctl: "_s + fault.sentence + u'\n'};
+    return EarlyEnd{kExitUsage, fault.sentence};
   }
 }
 

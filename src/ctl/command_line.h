@@ -39,7 +39,7 @@ struct CommandLine {
 };
 
 // The program ends at once: for --help and --version with exit code 0 and a text for standard output, after wrong use
-// with 2 and one sentence for standard error. The text ends with a line break.
+// with 2 and a sentence for standard error.
 struct EarlyEnd {
   int exit_code = 0;
   QString text;

@@ -45,14 +45,18 @@ Report RunJob(Job& job) {
   return {};
 }
 
-QByteArray Document(const CommandLine& line, const Report& report) {
+QByteArray Document(const QString& command, const Report& report) {
   QJsonObject document = report.members;
   document[QStringLiteral("format")] = QStringLiteral("tendril-ctl");
   document[QStringLiteral("version")] = kDocumentVersion;
-  document[QStringLiteral("command")] = CommandName(line.command);
+  if (!command.isEmpty()) document[QStringLiteral("command")] = command;
   document[QStringLiteral("exitCode")] = report.exit_code;
   if (!report.problem.isEmpty()) document[QStringLiteral("problem")] = report.problem;
   return QJsonDocument(document).toJson();
+}
+
+void Complain(const QString& problem, Terminal& terminal) {
+  if (!problem.isEmpty()) terminal.PrintError("tendril-ctl: " + problem.toUtf8() + "\n");
 }
 
 // Whatever happens, a port that was borrowed goes back.
@@ -77,6 +81,15 @@ Report RunAndGiveBack(const CommandLine& line, Environment& environment) {
 
 }  // namespace
 
+int PrintEarlyEnd(const EarlyEnd& end, bool json, Terminal& terminal) {
+  const bool wrong_use = end.exit_code != kExitSuccess;
+  if (wrong_use) Complain(end.text, terminal);
+  if (wrong_use && !json) return end.exit_code;
+  const QString fault = terminal.Print(
+      wrong_use ? Document({}, {.exit_code = end.exit_code, .problem = end.text}) : end.text.toUtf8());
+  return fault.isEmpty() || wrong_use ? end.exit_code : kExitNotAsWished;
+}
+
 Report ResultNotWritten(Environment& environment, const QString& fault) {
   WaitUntil(environment, kSignalMs, [&environment] { return environment.stop.Made(); });
   if (environment.stop.Made()) return {};
@@ -87,15 +100,12 @@ Report ResultNotWritten(Environment& environment, const QString& fault) {
 int RunCommand(const CommandLine& line, Environment& environment) {
   Report report = RunAndGiveBack(line, environment);
   if (environment.stop.Made()) report.exit_code = environment.stop.ExitCode();
-  const QString fault = environment.terminal.Print(line.json ? Document(line, report) : report.text);
-  const auto complain = [&environment](const Report& ended) {
-    if (!ended.problem.isEmpty())
-      environment.terminal.PrintError("tendril-ctl: " + ended.problem.toUtf8() + "\n");
-  };
-  complain(report);
+  const QString fault =
+      environment.terminal.Print(line.json ? Document(CommandName(line.command), report) : report.text);
+  Complain(report.problem, environment.terminal);
   if (!fault.isEmpty()) {
     const Report not_written = ResultNotWritten(environment, fault);
-    complain(not_written);
+    Complain(not_written.problem, environment.terminal);
     if (report.exit_code == kExitSuccess) report.exit_code = not_written.exit_code;
   }
   return environment.stop.Made() ? environment.stop.ExitCode() : report.exit_code;

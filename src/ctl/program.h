@@ -17,6 +17,9 @@ struct Job {
   PortOpening& port;
 };
 
+// Prints what ends the program before a command, as a document where `json` asks for one. Returns the exit code.
+int PrintEarlyEnd(const EarlyEnd& end, bool json, Terminal& terminal);
+
 // The report when standard output takes no more, for the reason `fault`. When a stop has interrupted the writing, that is
 // no problem.
 Report ResultNotWritten(Environment& environment, const QString& fault);

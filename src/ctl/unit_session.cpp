@@ -14,7 +14,7 @@ namespace {
 // A reply that comes later than its poll waits must not be taken for one of the next unit.
 constexpr std::int32_t kLateReplyMs = 500;
 // No window is painted first.
-constexpr std::int32_t kFirstPollMs = 1;
+constexpr std::int32_t kAtOnceMs = 1;
 constexpr int kMaxLooks = 3;
 constexpr char kPortGone[] = "The port went away.";
 constexpr char kNotStarted[] = "Nothing was sent.";
@@ -60,7 +60,6 @@ UnitSession::UnitSession(Environment& environment)
                        ReportStep();
                      },
                  .compared = [this](std::uint8_t /*unit*/, const OptionTable& held) { held_ = held; }}) {
-  commands_.find.SetFirstPollDelay(kFirstPollMs);
   link_.SetLineObserver([this](const LineEvent& event) { trace_.Note(event, environment_.now_ms()); });
   // A command that runs would open the port again, and another adapter may stand behind it then.
   link_.SetPortHandler([this](bool open) {
@@ -86,7 +85,7 @@ CommandResult UnitSession::Send(std::uint8_t unit, const ChannelTable& records) 
 CommandResult UnitSession::LookFor(std::uint8_t unit) {
   CommandResult result;
   for (int looks = 0; looks < kMaxLooks; ++looks) {
-    result = Find(unit, unit);
+    result = Find(unit, unit, kAtOnceMs);
     const auto& found = Search().found;
     if (!result.Done() || !found.empty()) break;
   }
@@ -112,10 +111,16 @@ CommandResult UnitSession::Read(std::uint8_t unit, OptionTable& held) {
   return result;
 }
 
+// A port that is opened may bring stray bytes before the first echo.
 bool UnitSession::InDoubt() const {
-  return misses_ > 0 || std::ranges::any_of(trace_.Entries(), [](const TraceEntry& entry) {
-           return entry.kind == TraceEntry::Kind::kNoise && LeadingZeros(entry.bytes) < entry.bytes.size();
-         });
+  bool exchanging = false;
+  bool noise = false;
+  for (const TraceEntry& entry : trace_.Entries()) {
+    exchanging |= entry.kind == TraceEntry::Kind::kEcho || entry.kind == TraceEntry::Kind::kReply;
+    noise |= exchanging && entry.kind == TraceEntry::Kind::kNoise &&
+             LeadingZeros(entry.bytes) < entry.bytes.size();
+  }
+  return misses_ > 0 || noise;
 }
 
 CommandResult UnitSession::ReadOnce(std::uint8_t unit, OptionTable& held) {
@@ -126,8 +131,8 @@ CommandResult UnitSession::ReadOnce(std::uint8_t unit, OptionTable& held) {
   return result;
 }
 
-CommandResult UnitSession::Find(std::uint8_t first, std::uint8_t last) {
-  commands_.find.SetRange(first, last);
+CommandResult UnitSession::Find(std::uint8_t first, std::uint8_t last, std::int32_t first_poll_ms) {
+  commands_.find.SetRange(first, last, first_poll_ms);
   CommandResult result = Run(first, commands_.find);
   result.aftermath.clear();  // Search() has it
   return result;

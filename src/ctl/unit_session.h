@@ -54,7 +54,8 @@ class UnitSession final : private UnitTarget, private CommandProgressView, priva
   // missing, or noise came, is done twice, and fails unless both are equal: replies have no checksum.
   CommandResult Read(std::uint8_t unit, OptionTable& held);
   // Polls the IDs from `first` to `last`. Search() has what was found, also after a failure.
-  CommandResult Find(std::uint8_t first, std::uint8_t last);
+  CommandResult Find(std::uint8_t first, std::uint8_t last,
+                     std::int32_t first_poll_ms = FindOperation::kFirstPollMs);
   const UnitSearch& Search() const { return commands_.find.Search(); }
   // Gives the unit at FF the ID `new_id`.
   CommandResult SetId(std::uint8_t new_id);
@@ -102,7 +103,7 @@ class UnitSession final : private UnitTarget, private CommandProgressView, priva
   std::string step_;
   std::string box_;  // the first one's text
   int replies_ = 0;
-  int misses_ = 0;  // polls without a reply
+  int misses_ = 0;           // polls without a reply
   bool unanswered_ = false;  // a poll had no reply, since the line was last left alone
   bool succeeded_ = false;
   CommandReport report_;

@@ -9,9 +9,6 @@ namespace tendril {
 namespace {
 
 constexpr std::uint8_t kSearchPoll = '*';
-// A unit's reply is lost while the program is too busy to release the line for it. This is time enough to paint the
-// window with its controls disabled, and the list.
-constexpr std::int32_t kFirstPollMs = 100;
 constexpr char kCannotSearch[] = "Error finding units, Please retry";
 
 }  // namespace
@@ -26,7 +23,8 @@ FindOperation::FindOperation(CommandContext& context, const LineTrace& trace,
         Poll();
       })) {}
 
-void FindOperation::SetRange(std::uint8_t first, std::uint8_t last) {
+void FindOperation::SetRange(std::uint8_t first, std::uint8_t last, std::int32_t first_poll_ms) {
+  tmrFirstPoll_.SetInterval(first_poll_ms);
   first_ = first;
   last_ = last;
 }

@@ -22,15 +22,18 @@ namespace tendril {
 //   Waiting, Polling --the port is closed, or a fault--> Idle (failed; what was found stays)
 class FindOperation final : public UnitOperation {
  public:
+  // A unit's reply is lost while the program is too busy to release the line for it. This is time enough to paint the
+  // window with its controls disabled, and the list.
+  static constexpr std::int32_t kFirstPollMs = 100;
+
   // `trace` follows the link, and judges the polls that have no reply. `on_searched` (may be empty; raises nothing) is
   // called when a search begins and after each poll. Context and trace must outlive the operation.
   FindOperation(CommandContext& context, const LineTrace& trace, std::function<void()> on_searched);
 
   // The next searches poll the IDs from `first` to `last`, at least one. FF alone finds the only unit on the line,
   // whatever its ID is.
-  void SetRange(std::uint8_t first, std::uint8_t last);
-  // How long after its start a search polls first, at least 1 ms.
-  void SetFirstPollDelay(std::int32_t ms) { tmrFirstPoll_.SetInterval(ms); }
+  // The first poll goes out `first_poll_ms` after the start, 1 or more.
+  void SetRange(std::uint8_t first, std::uint8_t last, std::int32_t first_poll_ms = kFirstPollMs);
   // The search that runs, or the last one.
   const UnitSearch& Search() const { return search_; }
 

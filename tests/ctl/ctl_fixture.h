@@ -62,10 +62,8 @@ class CtlTest : public testing::Test, protected ctl::Waiting {
     terminal_.error.clear();
     arguments.prepend(QStringLiteral("tendril-ctl"));
     const auto parsed = ctl::ParseCommandLine(arguments);
-    if (const auto* end = std::get_if<ctl::EarlyEnd>(&parsed)) {
-      (end->exit_code == 0 ? terminal_.out : terminal_.error) += end->text.toStdString();
-      return end->exit_code;
-    }
+    if (const auto* end = std::get_if<ctl::EarlyEnd>(&parsed))
+      return ctl::PrintEarlyEnd(*end, arguments.contains(QStringLiteral("--json")), terminal_);
     auto line = std::get<ctl::CommandLine>(parsed);
     if (line.port == 0) line.port = 1;
     return ctl::RunCommand(line, environment_);

@@ -73,14 +73,15 @@ class UnitFiles : public CtlTest {
 
 TEST_F(UnitFiles, Send_GoesOnAfterAUnitThatFails) {
   const std::map<std::string, std::string> rows{
-      {"mute",
-       "05    perhaps  -         Only what the program sends comes back.\n"
-       "                         Unit 05 does not answer: check its power, its ID and the wiring.\n"
+      {"mute", "05    no       -         Unit 05 does not answer: check its power, its ID and the wiring.\n"},
+      {"locked",
+       "05    perhaps  -         Unit 05 answers, but has not accepted what was sent.\n"
+       "                         Send again; if that fails, too, the unit or the line is faulty.\n"
        "                         Port 1 is perhaps written, 2 to 8 are not.\n"},
       {"short-reply",
        "05    partly   -         Unit 05 answers, but does not acknowledge what was sent.\n"
        "                         Send again; if that fails, too, it is faulty.\n"
-       "                         It holds half a configuration: ports 1 to 2 are written, 3 perhaps, 4 to 8 "
+       "                         It holds half a configuration: port 1 is written, 2 perhaps, 3 to 8 "
        "are not.\n"},
       {"missing-port",
        "05    yes      -         Unit 05 answers, but does not report all of its eight ports.\n"

@@ -34,7 +34,7 @@ TEST_F(UnitSessionTest, Failures_HaveTheReasonThatTheLineShows) {
   };
   const Case cases[] = {
       {nullptr,
-       "Only what the program sends comes back. Unit 05 does not answer: check its power, its ID and the "
+       "Unit 05 does not answer: check its power, its ID and the "
        "wiring.",
        "Port 1 is perhaps written, 2 to 8 are not."},
       {"locked",
@@ -99,6 +99,32 @@ TEST_F(UnitSessionTest, PortThatIsBackAtOnce_IsNotOpenedAgain) {
     EXPECT_FALSE(units_.Read(0x05, held_).Done());
     EXPECT_FALSE(units_.Link().PortOpen());
   }
+}
+
+// Does not answer its first poll.
+class DrowsyUnit final : public VirtualUnit {
+ public:
+  using VirtualUnit::VirtualUnit;
+
+ protected:
+  std::optional<Bytes> ReplyData(std::uint8_t kind) override {
+    return polls_heard() == 1 ? std::nullopt : VirtualUnit::ReplyData(kind);
+  }
+};
+
+TEST_F(UnitSessionTest, ReadingWithAMissedReply_IsDoneTwice) {
+  auto* unit = &world_.bench.Attach<DrowsyUnit>(1, std::uint8_t{0x05});
+  ASSERT_TRUE(units_.Read(0x05, held_).Done());
+  EXPECT_EQ(unit->polls_heard(), 17u);
+  world_.bench.Detach(1, *unit);
+  unit = &world_.bench.Attach<DrowsyUnit>(1, std::uint8_t{0x05});
+  units_.SetStepHandler([&](const std::string& step, double /*part*/) {
+    if (step == "7 of 8 ports") unit->SetPortOptions(1, {1, 50, 250, 70, 230, 70, 230, 150, 150});
+  });
+  held_ = {};
+  const CommandResult result = units_.Read(0x05, held_);
+  EXPECT_EQ(result.reason, "Two readings of unit 05 differ: check the wiring and the adapter.");
+  EXPECT_EQ(held_, OptionTable{});
 }
 
 TEST_F(UnitSessionTest, LateReplies_AreNoneOfTheNextUnit) {
