@@ -24,7 +24,9 @@ Report Monitor(Job& job) {
   });
   environment.waiting.Until([&] { return environment.stop.Made() || monitor.Lost() || !fault.isEmpty(); });
   if (!fault.isEmpty()) return ResultNotWritten(environment, fault);
-  if (monitor.Lost()) return {.exit_code = kExitNotAsWished, .problem = u"The port went away."_s};
+  if (monitor.Lost()) {
+    return {.exit_code = kExitNotAsWished, .problem = u"The port went away: plug the adapter in again."_s};
+  }
   return {};
 }
 

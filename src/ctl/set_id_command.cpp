@@ -13,7 +13,7 @@ using namespace Qt::StringLiterals;
 
 constexpr int kCleanReplies = 3;
 
-Report Refusal(const QString& sentences) {
+Report NotGiven(const QString& sentences) {
   return {.exit_code = kExitNotAsWished,
           .members = {{u"changed"_s, u"no"_s}},
           .problem = sentences + u" No ID has changed."_s};
@@ -24,11 +24,11 @@ std::optional<Report> RefuseOtherUnits(Job& job) {
   const CommandResult result = FindWithProgress(job, kFirstUnitId, kLastUnitId);
   const UnitSearch& search = job.units.Search();
   const QString sentence = SearchSentence(result, search);
-  if (!result.Done()) return Refusal(sentence);
+  if (!result.Done()) return NotGiven(sentence);
   if (search.found.empty()) return std::nullopt;
-  return Refusal(sentence +
-                 u" Every unit that is connected would take the ID: connect the one that is to "
-                 "have it alone; --alone leaves out this search."_s);
+  return NotGiven(sentence +
+                  u" Every unit that is connected would take the ID: disconnect all but the one that "
+                  "is to have it; then --alone leaves out this search."_s);
 }
 
 // Whether the last poll brought one reply, and nothing else has arrived: since the poll, if it is the first one, since
@@ -54,11 +54,11 @@ std::optional<Report> RefuseUncleanReplies(Job& job, std::uint8_t& id) {
     const CommandResult result = job.units.Find(kAllUnits, kAllUnits);
     const UnitSearch& search = job.units.Search();
     if (!result.Done() || (replies == 0 && search.found.empty()))
-      return Refusal(SearchSentence(result, search));
+      return NotGiven(SearchSentence(result, search));
     const bool answer = search.found.size() == 1 && search.found.front().what == FoundUnit::What::kAnswers;
     const bool same = answer && (replies == 0 || search.found.front().id == id);
     if (!same || !CleanReply(job.units.Trace(), replies == 0)) {
-      return Refusal(
+      return NotGiven(
           u"Each poll of FF must bring one clean reply and nothing else, and this one did not: connect one "
           "unit alone, and check the wiring."_s);
     }
@@ -76,20 +76,39 @@ std::optional<Report> Confirm(Job& job, std::uint8_t id) {
   const std::optional<QString> answer = job.environment.terminal.Ask(question.toUtf8());
   if (answer && (answer->toLower() == u"y" || answer->toLower() == u"yes")) return std::nullopt;
   if (!answer) job.environment.terminal.PrintError("\n");  // ends the question's line
-  return Refusal(job.environment.stop.Made() ? u"Stopped."_s : u"Not confirmed."_s);
+  return NotGiven(job.environment.stop.Made() ? u"Stopped."_s : u"Not confirmed."_s);
+}
+
+Report Given(const Job& job) {
+  return {.text = u"The unit has the ID %1.\n"_s.arg(IdText(job.line.new_id)).toUtf8(),
+          .members = {{u"changed"_s, u"yes"_s}}};
+}
+
+// The ID of the unit that answers at FF; nothing when none does, or not clearly.
+std::optional<std::uint8_t> IdNow(Job& job) {
+  const CommandResult result = job.units.Find(kAllUnits, kAllUnits);
+  const auto& found = job.units.Search().found;
+  const bool answer = result.Done() && found.size() == 1 && found.front().what == FoundUnit::What::kAnswers;
+  return answer ? std::optional(found.front().id) : std::nullopt;
 }
 
 Report Write(Job& job) {
   const CommandResult result = job.units.SetId(job.line.new_id);
-  if (result.Done()) {
-    return {.text = u"The unit has the ID %1.\n"_s.arg(IdText(job.line.new_id)).toUtf8(),
-            .members = {{u"changed"_s, u"yes"_s}}};
-  }
+  if (result.Done()) return Given(job);
+  const bool perhaps = job.units.IdPerhapsChanged();
   const bool stopped = result.kind == CommandResult::Kind::kCancelled;
-  const std::string sentences = (stopped ? "Stopped." : result.reason) + " " + result.aftermath;
+  const std::optional<std::uint8_t> id = perhaps && !stopped ? IdNow(job) : std::nullopt;
+  if (id == job.line.new_id) return Given(job);
+  if (id) {
+    return NotGiven(
+        u"The unit is still at %1: it does not take the ID. Run set-id again; if that fails, too, the "
+        "unit is faulty."_s.arg(IdText(*id)));
+  }
+  QString problem = QString::fromStdString((stopped ? "Stopped." : result.reason) + " " + result.aftermath);
+  if (perhaps && !stopped) problem += u" Run set-id again, or find."_s;
   return {.exit_code = kExitNotAsWished,
-          .members = {{u"changed"_s, job.units.IdPerhapsChanged() ? u"perhaps"_s : u"no"_s}},
-          .problem = QString::fromStdString(sentences)};
+          .members = {{u"changed"_s, perhaps ? u"perhaps"_s : u"no"_s}},
+          .problem = problem};
 }
 
 Report CheckAndWrite(Job& job) {
@@ -108,7 +127,7 @@ Report CheckAndWrite(Job& job) {
     std::uint8_t id_now = kAllUnits;
     if (auto refusal = RefuseUncleanReplies(job, id_now)) return *refusal;
     if (id_now != id) {
-      return Refusal(u"Unit %1 answers now, and the question was about unit %2: start again."_s.arg(
+      return NotGiven(u"Unit %1 answers now, and the question was about unit %2: start again."_s.arg(
           IdText(id_now), IdText(id)));
     }
   }

@@ -16,7 +16,7 @@ constexpr std::int32_t kLateReplyMs = 500;
 // No window is painted first.
 constexpr std::int32_t kAtOnceMs = 1;
 constexpr int kMaxLooks = 3;
-constexpr char kPortGone[] = "The port went away.";
+constexpr char kPortGone[] = "The port went away: plug the adapter in again.";
 constexpr char kNotStarted[] = "Nothing was sent.";
 
 // What boxes say of a unit that answers each poll, by how they begin, in words that need no window.

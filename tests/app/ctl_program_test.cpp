@@ -133,7 +133,7 @@ TEST_F(CtlProgram, UnpluggedAdapter_LeavesTheOtherUnitsAlone) {
   ASSERT_TRUE(ctl.WaitFor(kThirdPortOfUnit01)) << ctl.Error();
   bench_.Kill();
   EXPECT_EQ(ctl.ExitCode(), 1);
-  EXPECT_THAT(ctl.Out(), HasSubstr("The port went away."));
+  EXPECT_THAT(ctl.Out(), HasSubstr("The port went away: plug the adapter in again."));
   EXPECT_THAT(ctl.Out(), HasSubstr("0A    no       -         Not tried."));
 }
 

@@ -93,7 +93,7 @@ TEST_F(UnitSessionTest, PortThatIsBackAtOnce_IsNotOpenedAgain) {
     units_.Link().SetPortOpen(true);
     const CommandResult result = send ? units_.Send(0x05, records_) : units_.Read(0x05, held_);
     EXPECT_EQ(result.kind, CommandResult::Kind::kFailed);
-    EXPECT_EQ(result.reason, "The port went away.");
+    EXPECT_EQ(result.reason, "The port went away: plug the adapter in again.");
     EXPECT_EQ(result.aftermath, send ? "Ports 1 to 2 are written, 3 perhaps, 4 to 8 are not." : "");
     EXPECT_EQ(held_, OptionTable{});
     EXPECT_FALSE(units_.Read(0x05, held_).Done());
