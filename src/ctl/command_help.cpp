@@ -5,6 +5,8 @@
 #include <algorithm>
 #include <utility>
 
+#include "ctl/folded_text.h"
+
 namespace tendril::ctl {
 namespace {
 
@@ -12,18 +14,9 @@ using namespace Qt::StringLiterals;
 
 constexpr qsizetype kColumns = 80;
 
-// Breaks `text` into lines; those after the first one begin with `indent` spaces, where the first one already is.
+// Folds `text`; the lines after the first one begin with `indent` spaces, where the first one already is.
 QString Wrapped(const QString& text, qsizetype indent = 0) {
-  QString lines;
-  qsizetype column = indent;
-  for (const QString& word : text.split(u' ')) {
-    const bool breaks = column > indent && column + 1 + word.size() > kColumns;
-    if (breaks) lines += u'\n' + QString(indent, u' ');
-    if (!breaks && column > indent) lines += u' ';
-    column = (breaks ? indent : column + (column > indent ? 1 : 0)) + word.size();
-    lines += word;
-  }
-  return lines + u'\n';
+  return Folded(text, kColumns - indent).join(u'\n' + QString(indent, u' ')) + u'\n';
 }
 
 // "  --port N   The comm port." with the descriptions in one column.
@@ -56,7 +49,7 @@ QString OptionLines(unsigned options) {
     if ((options & info.option) != 0)
       rows.Add((u"--"_s + info.name + u' ' + info.value).trimmed(), info.description);
   }
-  rows.Add(u"--help"_s, "Print this help."_L1);
+  rows.Add(u"-h, --help"_s, "Print this help."_L1);
   return rows.Lines();
 }
 
@@ -73,7 +66,9 @@ QString ProgramHelp() {
          Wrapped(u"Set up Tendril units from a terminal and from scripts."_s) + u"\nCommands:\n"_s +
          commands.Lines() + u'\n' +
          Wrapped(
-             u"tendril-ctl COMMAND --help describes a command and its options; --version prints the version."_s) +
+             u"tendril-ctl COMMAND --help, or help COMMAND, describes a command and its options; --version "
+             u"prints "
+             "the version."_s) +
          u'\n' +
          Wrapped(
              u"An ID is two hexadecimal digits, 01 to FD. Several: 0A-1F, or 01,05,20-28, or one after the "

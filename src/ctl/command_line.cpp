@@ -58,10 +58,9 @@ class Arguments {
     return words_.takeFirst();
   }
   QString TakePath(QLatin1StringView what) {
-    if (NextIsUnits()) {
+    if (NextIsUnits())
       throw WrongUse{
           u"%1 needs %2; one named %3 is given as ./%3."_s.arg(info_.name, what, words_.constFirst())};
-    }
     return Take(what);
   }
   // All that follow.
@@ -195,10 +194,9 @@ class GivenOptions {
 std::int16_t PortNumber(const QString& text) {
   bool valid = false;
   const int number = text.toInt(&valid);
-  if (!valid || number < 1 || number > 255) {
+  if (!valid || number < 1 || number > 255)
     throw WrongUse{
         u"%1 is no port: --port takes a number, 1 to 255; tendril-ctl ports lists them."_s.arg(Quoted(text))};
-  }
   return static_cast<std::int16_t>(number);
 }
 
@@ -215,6 +213,11 @@ void TakeOptions(const GivenOptions& given, CommandLine& line) {
   line.alone = given.Has(kAloneOption);
   line.output = given.Value(kOutputFileOption) + given.Value(kOutputFileOrFolderOption);
   line.backup = given.Value(kBackupFolderOption);
+  if (line.output == u"-") {
+    if (line.units.size() > 1)
+      throw WrongUse{u"--output - takes one unit: the files of several go into a folder."_s};
+    line.output.clear();
+  }
 
   if (!line.other_file.isEmpty())
     given.RefuseAny(kOfTheLine, "is of no use: two files are compared without a unit"_L1);
@@ -238,10 +241,18 @@ void AddOptions(QCommandLineParser& parser) {
     if (!known.contains(option.name)) parser.addOption(added);
     known += option.name;
   }
-  parser.addOptions({QCommandLineOption(u"help"_s), QCommandLineOption(u"version"_s)});
+  parser.addOption(QCommandLineOption(QStringList{u"h"_s, u"help"_s}));
+  parser.addOption(QCommandLineOption(QStringList{u"v"_s, u"version"_s}));
 }
 
 EarlyEnd HelpOf(const CommandInfo* info) { return {0, info == nullptr ? ProgramHelp() : CommandHelp(*info)}; }
+
+// Takes the word "help" in place of the option: "help send".
+bool TakeHelp(QStringList& words) {
+  if (words.isEmpty() || words.constFirst() != u"help") return false;
+  words.removeFirst();
+  return true;
+}
 
 }  // namespace
 
@@ -252,13 +263,14 @@ std::variant<CommandLine, EarlyEnd> ParseCommandLine(const QStringList& argument
   AddOptions(parser);
   parser.parse(arguments);
   QStringList words = parser.positionalArguments();
+  const bool help = TakeHelp(words) || parser.isSet(u"help"_s);
   const QString name = words.isEmpty() ? QString() : words.takeFirst();
   const CommandInfo* info = FindCommand(name);
-  if (parser.isSet(u"help"_s)) return HelpOf(info);
   if (parser.isSet(u"version"_s)) return EarlyEnd{0, u"tendril-ctl " TENDRIL_VERSION "\n"_s};
   try {
+    if (!name.isEmpty() && info == nullptr) Refuse(u"%1 is no command"_s.arg(Quoted(name)), nullptr);
+    if (help) return HelpOf(info);
     if (name.isEmpty()) Refuse(u"a command is missing"_s, nullptr);
-    if (info == nullptr) Refuse(u"%1 is no command"_s.arg(Quoted(name)), nullptr);
     CommandLine line;
     line.command = info->command;
     const GivenOptions given(*info, parser);

@@ -34,7 +34,7 @@ struct CommandLine {
   bool force = false;
   bool yes = false;
   bool alone = false;
-  QString output;  // empty: not given
+  QString output;  // empty: standard output, or the current folder
   QString backup;
 };
 

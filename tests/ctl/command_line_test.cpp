@@ -69,6 +69,10 @@ TEST(CommandLine, WrongUseIsOneSentence) {
             "\"256\" is no port: --port takes a number, 1 to 255; tendril-ctl ports lists them."},
            {"find --port 1 --port 2", "--port is given twice; see tendril-ctl find --help."},
            {"get 1 --output --force", "missing value after --output; see tendril-ctl get --help."},
+           {"bogus --help", "\"bogus\" is no command; see tendril-ctl --help."},
+           {"get 1,2 --output -", "--output - takes one unit: the files of several go into a folder."},
+           {"get 1 --output - --force",
+            "--force is of no use: no file is written; see tendril-ctl get --help."},
            {"send x 1 --force", "--force is of no use: no file is written; see tendril-ctl send --help."}}) {
     const auto result = Parse(QString::fromLatin1(line));
     const auto* end = std::get_if<EarlyEnd>(&result);
@@ -85,6 +89,8 @@ TEST(CommandLine, HelpFitsATerminal) {
   for (const QString& command : helps) {
     const auto end = std::get<EarlyEnd>(Parse(command + u"--help"_s));
     EXPECT_EQ(end.exit_code, 0);
+    EXPECT_EQ(end.text, std::get<EarlyEnd>(Parse(u"help "_s + command.trimmed())).text);
+    EXPECT_EQ(end.text, std::get<EarlyEnd>(Parse(command + u"-h"_s)).text);
     EXPECT_TRUE(end.text.startsWith(u"Usage: tendril-ctl "_s + command)) << end.text.toStdString();
     for (const QString& line : end.text.split(u'\n')) EXPECT_LE(line.size(), 80) << line.toStdString();
   }

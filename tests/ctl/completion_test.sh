@@ -47,7 +47,7 @@ for command in $commands; do
   help=$("$program" "$command" --help)
   # "send FILE ID..."; "--json" and "--port:", which takes a value.
   usages=$(sed -nE 's/^(Usage:|      ) tendril-ctl (.*) \[OPTION\.\.\.\]$/\2/p' <<<"$help")
-  options=$(sed -nE 's/^  (--[a-z-]+) [A-Z|]+  .*/\1:/p; s/^  (--[a-z-]+)  .*/\1/p' <<<"$help")
+  options=$(sed -nE 's/^  (--[a-z-]+) [A-Z|]+  .*/\1:/p; s/^  (-h, )?(--[a-z-]+)  .*/\2/p' <<<"$help")
   all_options+=" ${options//:/}"
   all_usages+=" $usages"
   declared=$(declared "$command")
@@ -64,7 +64,7 @@ done
 
 page=$(tr -d '\134' <man/tendril-ctl.1)
 same 'commands in the page' "$all_usages" "$(sed -n 's/^\.SS //p' <<<"$page")"
-same 'options in the page' "$all_options" "$(sed -nE 's/^\.BI? (--[a-z-]+).*/\1/p' <<<"$page")"
+same 'options in the page' "$all_options" "$(sed -nE 's/^\.BI? (-[hv], )?(--[a-z-]+).*/\2/p' <<<"$page")"
 same 'options in the text of the page' "$all_options" "$(grep -oe '--[a-z][a-z-]*' <<<"$page")"
 same 'exit codes in the page' "$exit_codes" "$(sed -nE 's/^\.B ([0-9]+)$/\1/p' <<<"$page")"
 exit $failed
