@@ -28,7 +28,11 @@ Progress::~Progress() {
 }
 
 void Progress::Show(const QString& text, double part) {
-  if (mode_ == Mode::kRedrawn) Draw(text + TimeLeft(part));
+  if (mode_ != Mode::kRedrawn) return;
+  const QString left = TimeLeft(part);
+  // Where not all has room, the step counts less than the time.
+  const bool fits = text.size() + left.size() < environment_.terminal.ErrorColumns();
+  Draw(fits || left.isEmpty() ? text + left : text.section(u": "_s, 0, 0) + left);
 }
 
 void Progress::Note(const QString& text) {
