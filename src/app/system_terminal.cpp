@@ -23,7 +23,7 @@ constexpr int kUsualColumns = 80;
 #ifdef _WIN32
 bool IsTerminal(std::FILE* stream) { return ::_isatty(::_fileno(stream)) != 0; }
 
-int Columns() { return kUsualColumns; }
+int Columns(std::FILE* /*stream*/) { return kUsualColumns; }
 
 void DropTypedInput() {}
 
@@ -36,9 +36,9 @@ std::optional<QString> ReadLine(ctl::Waiting& /*waiting*/, const ctl::StopReques
 #else
 bool IsTerminal(std::FILE* stream) { return ::isatty(::fileno(stream)) != 0; }
 
-int Columns() {
+int Columns(std::FILE* stream) {
   winsize size = {};
-  if (::ioctl(STDERR_FILENO, TIOCGWINSZ, &size) != 0 || size.ws_col == 0) return kUsualColumns;
+  if (::ioctl(::fileno(stream), TIOCGWINSZ, &size) != 0 || size.ws_col == 0) return kUsualColumns;
   return size.ws_col;
 }
 
@@ -75,7 +75,9 @@ void SystemTerminal::PrintError(const QByteArray& text) {
   std::fflush(stderr);
 }
 
-int SystemTerminal::ErrorColumns() const { return IsTerminal(stderr) ? Columns() : 0; }
+int SystemTerminal::ErrorColumns() const { return IsTerminal(stderr) ? Columns(stderr) : 0; }
+
+int SystemTerminal::OutputColumns() const { return IsTerminal(stdout) ? Columns(stdout) : 0; }
 
 bool SystemTerminal::Colours() const { return IsTerminal(stdout) && qEnvironmentVariableIsEmpty("NO_COLOR"); }
 

@@ -17,6 +17,7 @@ class SystemTerminal final : public ctl::Terminal {
   QString Print(const QByteArray& text) override;
   void PrintError(const QByteArray& text) override;
   int ErrorColumns() const override;
+  int OutputColumns() const override;
   bool Colours() const override;
   std::optional<QString> Ask(const QByteArray& question) override;
   bool CanAsk() const override;

@@ -13,7 +13,7 @@ using namespace Qt::StringLiterals;
 
 // What the differences of two files are, as a unit would hold them.
 Report CompareFiles(const CommandLine& line, const OptionTable& first, const OptionTable& second,
-                    bool colours) {
+                    const Terminal& terminal) {
   const auto differences = DifferencesBetween(first, second);
   Report report{.members = {{u"differences"_s, ToJson(differences)}}};
   if (differences.empty()) {
@@ -28,7 +28,7 @@ Report CompareFiles(const CommandLine& line, const OptionTable& first, const Opt
                   {QString::fromStdString(difference.part.held)}});
   }
   report.exit_code = kExitNotAsWished;
-  report.text = table.Text(colours);
+  report.text = table.Text(terminal);
   report.problem = u"The files differ."_s;
   return report;
 }
@@ -36,18 +36,18 @@ Report CompareFiles(const CommandLine& line, const OptionTable& first, const Opt
 }  // namespace
 
 Report Compare(Job& job) {
-  const bool colours = job.environment.terminal.Colours();
+  const Terminal& terminal = job.environment.terminal;
   const auto read = ReadConfigurationFile(job.line.file);
   if (const auto* fault = std::get_if<QString>(&read)) return Refused(*fault);
   const OptionTable wanted = OptionsOf(std::get<ConfigurationText>(read).records);
   if (!job.line.other_file.isEmpty()) {
     const auto other = ReadConfigurationFile(job.line.other_file);
     if (const auto* fault = std::get_if<QString>(&other)) return Refused(*fault);
-    return CompareFiles(job.line, wanted, OptionsOf(std::get<ConfigurationText>(other).records), colours);
+    return CompareFiles(job.line, wanted, OptionsOf(std::get<ConfigurationText>(other).records), terminal);
   }
   if (auto fault = job.port.Open()) return *fault;
   const auto results = ForEachUnit(job, job.line.units, [&](UnitWork& work) { work.Compare(wanted, {}, 1); });
-  return ReportOf(results, {.compared = true}, colours);
+  return ReportOf(results, {.compared = true}, terminal);
 }
 
 }  // namespace tendril::ctl

@@ -28,14 +28,18 @@ QFileInfo FolderOf(const QString& path) {
   return folder;
 }
 
-// Why what stands at `path` may not be replaced.
-QString WhyNotReplaced(const QString& path, bool force) {
+// Why what stands at `path` may not be replaced. A link that leads nowhere stands there, too.
+QString WhyNotReplaced(const QString& path, const CommandLine& line) {
   const QFileInfo file(path);
-  if (!file.exists()) return {};
+  if (!file.exists() && !file.isSymLink()) return {};
   if (file.isDir()) return u"%1 is a folder, not a file."_s.arg(path);
   // A file that is written whole takes the place of what stands there, also of a device.
-  if (!file.isFile()) return u"%1 is not a regular file."_s.arg(path);
-  return force ? QString() : u"%1 exists already; --force overwrites it."_s.arg(path);
+  if (file.exists() && !file.isFile()) return u"%1 is not a regular file."_s.arg(path);
+  if (line.force) return {};
+  // When a command runs again after a part of its work, the older backup is the good one.
+  const QString advice =
+      line.backup.isEmpty() ? u"; --force overwrites it."_s : u": give --backup another folder."_s;
+  return u"%1 exists already"_s.arg(path) + advice;
 }
 
 QString CreateFolderOf(const QString& path) {
@@ -86,8 +90,8 @@ QString UnitFilePath(const QString& folder, std::uint8_t unit) {
   return folder.isEmpty() ? UnitFileName(unit) : QDir(folder).filePath(UnitFileName(unit));
 }
 
-QString WhyNotWritable(const QString& path, bool force) {
-  QString reason = WhyNotReplaced(path, force);
+QString WhyNotWritable(const QString& path, const CommandLine& line) {
+  QString reason = WhyNotReplaced(path, line);
   if (!reason.isEmpty()) return reason;
   const QFileInfo folder = FolderOf(path);
   if (!folder.isDir()) return Cannot(path, "written"_L1, u"%1 is not a folder"_s.arg(folder.filePath()));
@@ -96,21 +100,22 @@ QString WhyNotWritable(const QString& path, bool force) {
   return {};
 }
 
-QString WhyNoneWritable(std::span<const std::uint8_t> units, const PathOfUnit& path_of, bool force) {
+QString WhyNoneWritable(std::span<const std::uint8_t> units, const PathOfUnit& path_of,
+                        const CommandLine& line) {
   for (const std::uint8_t unit : units) {
-    QString reason = WhyNotWritable(path_of(unit), force);
+    QString reason = WhyNotWritable(path_of(unit), line);
     if (!reason.isEmpty()) return reason;
   }
   return {};
 }
 
-QString WriteNewFile(const QString& path, const QByteArray& text, bool force) {
+QString WriteNewFile(const QString& path, const QByteArray& text, const CommandLine& line) {
   QString no_folder = CreateFolderOf(path);
   if (!no_folder.isEmpty()) return no_folder;
   QSaveFile file(path);
   const bool written = file.open(QIODevice::WriteOnly | QIODevice::Unbuffered) && WriteAll(file, text);
   // As late as can be: another program may have written it since the command began.
-  QString reason = WhyNotReplaced(path, force);
+  QString reason = WhyNotReplaced(path, line);
   if (!reason.isEmpty()) return reason;
   return written && file.commit() ? QString() : Cannot(path, "written"_L1, file.errorString());
 }

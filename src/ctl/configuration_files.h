@@ -9,6 +9,7 @@
 #include <span>
 #include <variant>
 
+#include "ctl/command_line.h"
 #include "exchange/configuration_text.h"
 
 namespace tendril::ctl {
@@ -30,15 +31,16 @@ QString UnitFilePath(const QString& folder, std::uint8_t unit);
 
 // Why WriteNewFile() would refuse `path`, as far as that shows beforehand: a sentence; empty when it does
 // not. Changes nothing.
-QString WhyNotWritable(const QString& path, bool force);
+QString WhyNotWritable(const QString& path, const CommandLine& line);
 
 // Where a unit's configuration is kept; empty: on standard output.
 using PathOfUnit = std::function<QString(std::uint8_t unit)>;
 // The same for the files of all `units`: empty when none would be refused.
-QString WhyNoneWritable(std::span<const std::uint8_t> units, const PathOfUnit& path_of, bool force);
+QString WhyNoneWritable(std::span<const std::uint8_t> units, const PathOfUnit& path_of,
+                        const CommandLine& line);
 
 // Writes `path` whole or not at all, and leaves no other file behind. Creates its folder. Replaces a file that exists
-// only with `force`. Returns why it is not written: a sentence; empty when it is.
-QString WriteNewFile(const QString& path, const QByteArray& text, bool force);
+// only with --force. Returns why it is not written: a sentence; empty when it is.
+QString WriteNewFile(const QString& path, const QByteArray& text, const CommandLine& line);
 
 }  // namespace tendril::ctl

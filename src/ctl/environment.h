@@ -63,6 +63,8 @@ class Terminal {
   virtual void PrintError(const QByteArray& text) = 0;
   // The columns of the terminal that shows standard error; 0 when none does.
   virtual int ErrorColumns() const = 0;
+  // The columns of the terminal that shows standard output; 0 when none does.
+  virtual int OutputColumns() const = 0;
   // Whether standard output may have colours: a terminal shows it, and the user does not object.
   virtual bool Colours() const = 0;
   // Asks on standard error and returns the line that the user types; nothing when there is no terminal to ask on, or

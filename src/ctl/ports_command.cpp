@@ -46,7 +46,7 @@ Report Ports(Job& job) {
     table.AddRow(std::move(cells));
   }
   return {.text = ports.isEmpty() ? "There is no serial port: plug in the adapter.\n"
-                                  : table.Text(job.environment.terminal.Colours()),
+                                  : table.Text(job.environment.terminal),
           .members = {{u"ports"_s, ports}}};
 }
 

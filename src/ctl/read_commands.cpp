@@ -27,7 +27,7 @@ std::vector<UnitResult> KeepUnits(Job& job, std::span<const std::uint8_t> units,
 }
 
 Report ReportOfFiles(const Job& job, const std::vector<UnitResult>& results) {
-  return ReportOf(results, {.file = u"file"_s}, job.environment.terminal.Colours());
+  return ReportOf(results, {.file = u"file"_s}, job.environment.terminal);
 }
 
 // The only unit's configuration is all that goes to standard output.
@@ -35,7 +35,7 @@ Report GetToOutput(Job& job) {
   if (auto fault = job.port.Open()) return *fault;
   const auto results = KeepUnits(job, job.line.units, [](std::uint8_t /*unit*/) { return QString(); });
   const UnitResult& result = results.front();
-  Report report = ReportOf(results, {}, false);
+  Report report = ReportOf(results, {}, job.environment.terminal);
   report.text = result.configuration;
   if (result.outcome == Outcome::kDiffers)
     report.problem = u"The configuration cannot have all: %1."_s.arg(Remarks(result).join(u"; "_s));
@@ -84,7 +84,7 @@ Report Get(Job& job) {
   const PathOfUnit path_of = [&](std::uint8_t unit) {
     return folder ? UnitFilePath(line.output, unit) : line.output;
   };
-  const QString fault = WhyNoneWritable(line.units, path_of, line.force);
+  const QString fault = WhyNoneWritable(line.units, path_of, line);
   if (!fault.isEmpty()) return Refused(fault);
   if (auto report = job.port.Open()) return *report;
   return ReportOfFiles(job, KeepUnits(job, line.units, path_of));
@@ -96,7 +96,7 @@ Report Backup(Job& job) {
   std::vector<std::uint8_t> perhaps = line.units;
   for (int id = kFirstUnitId; line.units.empty() && id <= kLastUnitId; ++id)
     perhaps.push_back(static_cast<std::uint8_t>(id));
-  const QString fault = WhyNoneWritable(perhaps, path_of, line.force);
+  const QString fault = WhyNoneWritable(perhaps, path_of, line);
   if (!fault.isEmpty()) return Refused(fault);
   if (auto report = job.port.Open()) return *report;
   if (line.units.empty()) return BackUpFoundUnits(job, path_of);

@@ -21,6 +21,16 @@ TableCell Word(const Words& words, int index) {
   return {QString::fromLatin1(words.at(static_cast<std::size_t>(index)))};
 }
 
+// A name can be as long as the file; the table has room for this.
+constexpr qsizetype kNameColumns = 24;
+
+QString Shortened(const QString& name) {
+  if (name.size() <= kNameColumns) return name;
+  const qsizetype end = kNameColumns - 3;
+  const bool splits = name.at(end - 1).isHighSurrogate();
+  return name.left(splits ? end - 1 : end) + u"..."_s;
+}
+
 // The words of the file: those of the window would make the table too wide for a terminal.
 std::vector<TableCell> PortRow(const ChannelConfig& record) {
   return {Word(exchange::kKinds, record.PortType - kPortServo),
@@ -33,7 +43,7 @@ std::vector<TableCell> PortRow(const ChannelConfig& record) {
           Word(exchange::kLostCommunications, record.LostCommOption - kLostCommHold)};
 }
 
-QByteArray TableOf(const ConfigurationText& configuration, bool colours) {
+QByteArray TableOf(const ConfigurationText& configuration, const Terminal& terminal) {
   const bool names =
       std::ranges::any_of(configuration.names, [](const auto& name) { return name.has_value(); });
   QStringList headings{u"port"_s};
@@ -43,11 +53,11 @@ QByteArray TableOf(const ConfigurationText& configuration, bool colours) {
   TextTable table(headings);
   for (std::size_t slot = 0; slot < kPortCount; ++slot) {
     std::vector<TableCell> row{{QString::number(slot + 1)}};
-    if (names) row.push_back({configuration.names[slot].value_or(QString())});
+    if (names) row.push_back({Shortened(configuration.names[slot].value_or(QString()))});
     std::ranges::move(PortRow(configuration.records.At(slot)), std::back_inserter(row));
     table.AddRow(std::move(row));
   }
-  return table.Text(colours);
+  return table.Text(terminal);
 }
 
 // What the file says of itself, a line each.
@@ -68,7 +78,7 @@ Report Show(Job& job) {
   const auto text = WriteConfiguration(configuration);
   if (const auto* refusal = std::get_if<Refusal>(&text))
     return Refused(u"%1: with a field a line, %2."_s.arg(NameOfFile(job.line.file), refusal->Sentence()));
-  return {.text = HeadOf(configuration) + TableOf(configuration, job.environment.terminal.Colours()),
+  return {.text = HeadOf(configuration) + TableOf(configuration, job.environment.terminal),
           .members = {{u"configuration"_s, AsJson(std::get<QByteArray>(text))}}};
 }
 
@@ -79,9 +89,9 @@ Report WritePreset(Job& job) {
   const auto text = std::get<QByteArray>(WriteConfiguration(configuration));
   const QString& path = job.line.output;
   if (path.isEmpty()) return {.text = text, .members = {{u"configuration"_s, AsJson(text)}}};
-  const QString refusal = WhyNotWritable(path, job.line.force);
+  const QString refusal = WhyNotWritable(path, job.line);
   if (!refusal.isEmpty()) return Refused(refusal);
-  const QString fault = WriteNewFile(path, text, job.line.force);
+  const QString fault = WriteNewFile(path, text, job.line);
   if (!fault.isEmpty()) return {.exit_code = kExitNotAsWished, .problem = fault};
   return {.members = {{u"file"_s, path}}};
 }

@@ -7,6 +7,8 @@
 #include <cstddef>
 #include <vector>
 
+#include "ctl/environment.h"
+
 namespace tendril::ctl {
 
 // What a cell says of the outcome.
@@ -24,15 +26,19 @@ class TextTable {
   // A row may have fewer cells than there are headings.
   void AddRow(std::vector<TableCell> cells);
 
-  // The table in UTF-8, in lines without spaces at their ends. `colours`: the tones are shown.
-  QByteArray Text(bool colours) const;
+  // The table in UTF-8, in lines without spaces at their ends, with the colours that `terminal` has. The last column is
+  // folded at words to its width, unless that leaves it too narrow.
+  QByteArray Text(const Terminal& terminal) const;
 
  private:
+  // How wide the last column may be.
+  qsizetype LastWidth(const Terminal& terminal) const;
+
   std::vector<std::vector<TableCell>> rows_;
   std::vector<qsizetype> widths_;
 };
 
-// `text` in one line, without control characters: a text from a file does nothing to the terminal.
-QString Printable(QString text);
+// `text` in one line, without control and format characters: a text from a file does nothing to the terminal.
+QString Printable(const QString& text);
 
 }  // namespace tendril::ctl

@@ -80,4 +80,14 @@ std::variant<std::vector<std::uint8_t>, std::string> ParseUnitIds(std::string_vi
   return ids;
 }
 
+std::string UnitIdList(std::span<const std::uint8_t> ids) {
+  std::string list;
+  for (std::size_t first = 0, last = 0; first < ids.size(); first = ++last) {
+    while (last + 1 < ids.size() && ids[last + 1] == ids[last] + 1) ++last;
+    list += (list.empty() ? "" : ",") + HexByte(ids[first]);
+    if (last > first) list += "-" + HexByte(ids[last]);
+  }
+  return list;
+}
+
 }  // namespace tendril::ctl

@@ -3,6 +3,7 @@
 
 #include <QString>
 #include <cstdint>
+#include <span>
 #include <string>
 #include <string_view>
 #include <variant>
@@ -22,5 +23,8 @@ bool LooksLikeUnitIds(std::string_view text);
 // The IDs of the list `text`, from kFirstUnitId to kLastUnitId, each once, in the order as given; or the sentence that says
 // what is wrong with it. Ranges are ascending.
 std::variant<std::vector<std::uint8_t>, std::string> ParseUnitIds(std::string_view text);
+
+// `ids` as such a list: "0A,1C-1F".
+std::string UnitIdList(std::span<const std::uint8_t> ids);
 
 }  // namespace tendril::ctl

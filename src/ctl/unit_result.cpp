@@ -90,7 +90,8 @@ TableCell ComparedCell(const UnitResult& result) {
                                     : TableCell{u"differs"_s, Tone::kBad};
 }
 
-QByteArray TableOf(const std::vector<UnitResult>& results, const ResultColumns& columns, bool colours) {
+QByteArray TableOf(const std::vector<UnitResult>& results, const ResultColumns& columns,
+                   const Terminal& terminal) {
   QStringList headings{u"unit"_s};
   if (columns.written) headings += u"written"_s;
   if (columns.compared) headings += u"compared"_s;
@@ -109,7 +110,7 @@ QByteArray TableOf(const std::vector<UnitResult>& results, const ResultColumns& 
     }
     if (!row.empty()) table.AddRow(row);
   }
-  return table.Text(colours);
+  return table.Text(terminal);
 }
 
 QJsonObject ToJson(const UnitResult& result, const ResultColumns& columns) {
@@ -152,6 +153,15 @@ QString WhereStopped(const std::vector<UnitResult>& results) {
   if (stopped->written == Written::kAll)
     return u"Stopped: unit %1 is written, and not compared."_s.arg(IdText(stopped->unit));
   return Spaced({u"Stopped at unit %1."_s.arg(IdText(stopped->unit)), HowItIsLeft(*stopped)});
+}
+
+// Those that are not done, as a command takes them.
+QString UnitsForAnotherRun(const std::vector<UnitResult>& results) {
+  std::vector<std::uint8_t> units;
+  for (const UnitResult& result : results) {
+    if (result.outcome != Outcome::kDone) units.push_back(result.unit);
+  }
+  return QString::fromStdString(UnitIdList(units));
 }
 
 }  // namespace
@@ -230,17 +240,18 @@ QString InWords(const UnitResult& result) {
   return words.join(u", "_s);
 }
 
-Report ReportOf(const std::vector<UnitResult>& results, const ResultColumns& columns, bool colours) {
+Report ReportOf(const std::vector<UnitResult>& results, const ResultColumns& columns,
+                const Terminal& terminal) {
   QJsonArray units;
-  bool all_done = true;
-  for (const UnitResult& result : results) {
-    units += ToJson(result, columns);
-    all_done &= result.outcome == Outcome::kDone;
-  }
-  return {.exit_code = all_done ? kExitSuccess : kExitNotAsWished,
-          .text = TableOf(results, columns, colours),
-          .members = {{u"units"_s, units}},
-          .problem = Spaced({WhereStopped(results), Summary(results)})};
+  for (const UnitResult& result : results) units += ToJson(result, columns);
+  Report report{.text = TableOf(results, columns, terminal), .members = {{u"units"_s, units}}};
+  const QString again = UnitsForAnotherRun(results);
+  if (again.isEmpty()) return report;
+  report.exit_code = kExitNotAsWished;
+  report.members[u"again"_s] = again;
+  report.problem = Spaced({WhereStopped(results), Summary(results)});
+  if (results.size() > 1) report.problem += u" For another run: %1."_s.arg(again);
+  return report;
 }
 
 }  // namespace tendril::ctl

@@ -8,6 +8,7 @@
 
 #include "config/option_bytes.h"
 #include "config/option_differences.h"
+#include "ctl/environment.h"
 #include "ctl/report.h"
 #include "unitops/send_operation.h"
 
@@ -54,7 +55,8 @@ struct ResultColumns {
   QString file = {};  // the heading of the files; empty: there are none
 };
 
-// The table, the member "units" and one sentence about all of them, unless all are done.
-Report ReportOf(const std::vector<UnitResult>& results, const ResultColumns& columns, bool colours);
+// The table, the member "units" and, unless all are done, a sentence about all of them with the IDs for another run.
+Report ReportOf(const std::vector<UnitResult>& results, const ResultColumns& columns,
+                const Terminal& terminal);
 
 }  // namespace tendril::ctl

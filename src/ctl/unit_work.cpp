@@ -66,7 +66,7 @@ bool UnitWork::Keep(const OptionTable& held, const QString& path) {
   if (path.isEmpty()) {
     result_.configuration = std::get<QByteArray>(text);
   } else {
-    const QString fault = WriteNewFile(path, std::get<QByteArray>(text), job_.line.force);
+    const QString fault = WriteNewFile(path, std::get<QByteArray>(text), job_.line);
     if (!fault.isEmpty()) return Fail(fault);
     result_.file = path;
   }

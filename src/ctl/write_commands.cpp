@@ -5,7 +5,6 @@
 #include <QSet>
 #include <algorithm>
 #include <cstdint>
-#include <iterator>
 #include <optional>
 #include <span>
 #include <string>
@@ -48,14 +47,14 @@ QString WhyNoBackup(const CommandLine& line, const std::vector<Writing>& writing
     }
   }
   return WhyNoneWritable(
-      units, [&](std::uint8_t unit) { return UnitFilePath(line.backup, unit); }, line.force);
+      units, [&](std::uint8_t unit) { return UnitFilePath(line.backup, unit); }, line);
 }
 
 Report WriteUnits(Job& job, const std::vector<Writing>& writings) {
   const CommandLine& line = job.line;
   const bool back_up = !line.backup.isEmpty();
   std::vector<std::uint8_t> units;
-  std::ranges::transform(writings, std::back_inserter(units), &Writing::unit);
+  for (const Writing& writing : writings) units.push_back(writing.unit);
   const QString no_backup = back_up ? WhyNoBackup(line, writings, units) : QString();
   if (!no_backup.isEmpty()) return Refused(no_backup);
   if (auto fault = job.port.Open()) return *fault;
@@ -68,7 +67,7 @@ Report WriteUnits(Job& job, const std::vector<Writing>& writings) {
       work.Compare(wanted, u"compare"_s, kReadTime / whole);
   });
   return ReportOf(results, {.written = true, .compared = true, .file = back_up ? u"backup"_s : QString()},
-                  job.environment.terminal.Colours());
+                  job.environment.terminal);
 }
 
 // The ID that a file of a backup is named after; nothing when it is none. The case of the name does not matter.

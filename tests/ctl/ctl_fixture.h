@@ -29,6 +29,7 @@ struct RecordedTerminal final : ctl::Terminal {
   }
   void PrintError(const QByteArray& text) override { error += text.toStdString(); }
   int ErrorColumns() const override { return columns; }
+  int OutputColumns() const override { return columns; }
   bool Colours() const override { return false; }
   std::optional<QString> Ask(const QByteArray& question) override {
     PrintError(question);

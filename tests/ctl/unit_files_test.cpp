@@ -93,7 +93,7 @@ TEST_F(UnitFiles, Send_GoesOnAfterAUnitThatFails) {
     EXPECT_EQ(Type("send wide.json 05,06"), 1);
     EXPECT_EQ(terminal_.out, headings + row + "06    yes      equal\n");
     EXPECT_THAT(terminal_.error, EndsWith("unit 06 (2 of 2): written, holds it\n"
-                                          "tendril-ctl: 1 of 2 units failed.\n"));
+                                          "tendril-ctl: 1 of 2 units failed. For another run: 05.\n"));
     world_.bench.Detach(1, unit);
   }
   const VirtualUnit& deaf = Attach("deaf", 0x05);
@@ -120,7 +120,8 @@ TEST_F(UnitFiles, Compare_SaysWhatDiffers) {
           "unit  compared\n"
           "05    differs   port 3, default position: 1500 in the file, 1510 in the unit\n"
           "06    differs   ports 4, 6, actual range: 500 to 2500 in the file, 600 to 2400 in the unit\n"));
-  EXPECT_THAT(terminal_.error, HasSubstr("tendril-ctl: 2 of 3 units differ, 1 failed.\n"));
+  EXPECT_THAT(terminal_.error,
+              HasSubstr("tendril-ctl: 2 of 3 units differ, 1 failed. For another run: 05-07.\n"));
 
   Edit("same.json", "[500, 2500]", "[509, 2501]");
   EXPECT_EQ(Type("compare wide.json same.json"), 0);
@@ -146,7 +147,7 @@ TEST_F(UnitFiles, Stop_NamesTheUnitThatHoldsHalfAConfiguration) {
   EXPECT_EQ(
       terminal_.error,
       "tendril-ctl: Stopped at unit 06. It holds half a configuration: ports 1 to 5 are written, 6 to 8 are "
-      "not. 1 of 3 units was not tried.\n");
+      "not. 1 of 3 units was not tried. For another run: 06-07.\n");
   EXPECT_EQ(unit.accepted_commands(), 5U);
   EXPECT_TRUE(Untouched(last));
 }
@@ -155,7 +156,8 @@ TEST_F(UnitFiles, UnpluggedPort_EndsTheCommand) {
   AttachUnits(0x05, 0x06);
   In(1000, [this] { world_.bench.Unplug(1); });
   EXPECT_EQ(Type("send wide.json 05,06 --quiet"), 1);
-  EXPECT_THAT(terminal_.out, HasSubstr("05    partly   -         The port went away.\n"));
+  EXPECT_THAT(terminal_.out,
+              HasSubstr("05    partly   -         The port went away: plug the adapter in again.\n"));
   EXPECT_THAT(terminal_.out, HasSubstr("\n06    no       -         Not tried.\n"));
 }
 
@@ -258,7 +260,9 @@ TEST_F(UnitFiles, ABadFile_IsRefusedBeforeAnythingIsSent) {
                 "The backup half/unit-05.json would overwrite a file that this command reads: choose another "
                 "folder."},
            Case{"send wide.json 05 --backup half",
-                "half/unit-05.json exists already; --force overwrites it."},
+                "half/unit-05.json exists already: give --backup another folder."},
+           Case{"get 05 --output linked/unit-05.json",
+                "linked/unit-05.json exists already; --force overwrites it."},
            Case{"get 05 --output wide.json", "wide.json exists already; --force overwrites it."},
            Case{"get 05 --output /dev/null --force", "/dev/null is not a regular file."},
            Case{"backup wide.json 05", "wide.json/unit-05.json cannot be written: "},
@@ -279,7 +283,9 @@ TEST_F(UnitFiles, AFullDisk_LeavesTheOldFileAndNoOther) {
   const rlimit small{512, limit.rlim_max};
   const auto old_handler = std::signal(SIGXFSZ, SIG_IGN);
   setrlimit(RLIMIT_FSIZE, &small);
-  const QString fault = ctl::WriteNewFile(QStringLiteral("wide.json"), good + good, true);
+  ctl::CommandLine force;
+  force.force = true;
+  const QString fault = ctl::WriteNewFile(QStringLiteral("wide.json"), good + good, force);
   setrlimit(RLIMIT_FSIZE, &limit);
   std::signal(SIGXFSZ, old_handler);
   EXPECT_EQ(fault, QStringLiteral("wide.json cannot be written: File too large."));
@@ -309,17 +315,22 @@ TEST_F(UnitFiles, ProgressOnATerminal_IsOneLineWithTheTimeLeft) {
   terminal_.columns = 40;
   EXPECT_EQ(Type("send wide.json 05-07"), 0);
   EXPECT_THAT(terminal_.error, HasSubstr("\runit 05 (1 of 3): port 2 of 8\r"));
-  EXPECT_THAT(terminal_.error, HasSubstr("\runit 06 (2 of 3): port 5 of 8, 00:04 le\r"));
-  EXPECT_THAT(terminal_.error, EndsWith("\r" + std::string(39, ' ') + "\r"));
+  EXPECT_THAT(terminal_.error, HasSubstr("\runit 06 (2 of 3), 00:04 left\r"));
+  EXPECT_THAT(terminal_.error, EndsWith("\r" + std::string(28, ' ') + "\r"));
   EXPECT_EQ(terminal_.error.find('\n'), std::string::npos);
   const QStringList drawn = QString::fromStdString(terminal_.error).split(u'\r');
   EXPECT_EQ(std::ranges::adjacent_find(drawn), drawn.end());
+  terminal_.columns = 46;
+  EXPECT_EQ(Type("send wide.json 08"), 1);
+  const std::string indent(25, ' ');
+  EXPECT_THAT(terminal_.out, HasSubstr("Unit 08 does not\n" + indent + "answer: check its\n" + indent));
 }
 
 TEST_F(UnitFiles, Show_DoesNothingToTheTerminal) {
-  Edit("named.json", "\"port\": 2,", "\"port\": 2, \"name\": \"a\\u001b[2J\\nb\",");
+  Edit("named.json", "\"port\": 2,",
+       "\"port\": 2, \"name\": \"a\\u001b[2J\\nb\\u202e456789012345678901234567\",");
   EXPECT_EQ(Type("show named.json"), 0);
-  EXPECT_THAT(terminal_.out, HasSubstr("\n2     a\uFFFD[2J b  servo  500 to 2500"));
+  EXPECT_THAT(terminal_.out, HasSubstr("\n2     a\uFFFD[2J b\uFFFD4567890123456...  servo  500 to 2500"));
 }
 
 }  // namespace
