@@ -7,6 +7,7 @@
 
 #include "ctl/bounded_wait.h"
 #include "ctl/commands.h"
+#include "ctl/text_table.h"
 #include "ctl/trace_output.h"
 #include "platform/runtime_error.h"
 
@@ -56,7 +57,7 @@ QByteArray Document(const QString& command, const Report& report) {
 }
 
 void Complain(const QString& problem, Terminal& terminal) {
-  if (!problem.isEmpty()) terminal.PrintError("tendril-ctl: " + problem.toUtf8() + "\n");
+  if (!problem.isEmpty()) terminal.PrintError("tendril-ctl: " + Printable(problem).toUtf8() + "\n");
 }
 
 // Whatever happens, a port that was borrowed goes back.

@@ -95,20 +95,20 @@ std::optional<std::uint8_t> IdNow(Job& job) {
 Report Write(Job& job) {
   const CommandResult result = job.units.SetId(job.line.new_id);
   if (result.Done()) return Given(job);
-  const bool perhaps = job.units.IdPerhapsChanged();
+  const auto not_confirmed = [](const QString& changed, const QString& problem) {
+    return Report{.exit_code = kExitNotAsWished, .members = {{u"changed"_s, changed}}, .problem = problem};
+  };
   const bool stopped = result.kind == CommandResult::Kind::kCancelled;
-  const std::optional<std::uint8_t> id = perhaps && !stopped ? IdNow(job) : std::nullopt;
+  const QString how_it_ended =
+      QString::fromStdString((stopped ? "Stopped." : result.reason) + " " + result.aftermath);
+  if (!job.units.IdPerhapsChanged()) return not_confirmed(u"no"_s, how_it_ended);
+  if (stopped) return not_confirmed(u"perhaps"_s, how_it_ended);
+  const std::optional<std::uint8_t> id = IdNow(job);
+  if (!id) return not_confirmed(u"perhaps"_s, how_it_ended + u" Run set-id again, or find."_s);
   if (id == job.line.new_id) return Given(job);
-  if (id) {
-    return NotGiven(
-        u"The unit is still at %1: it does not take the ID. Run set-id again; if that fails, too, the "
-        "unit is faulty."_s.arg(IdText(*id)));
-  }
-  QString problem = QString::fromStdString((stopped ? "Stopped." : result.reason) + " " + result.aftermath);
-  if (perhaps && !stopped) problem += u" Run set-id again, or find."_s;
-  return {.exit_code = kExitNotAsWished,
-          .members = {{u"changed"_s, perhaps ? u"perhaps"_s : u"no"_s}},
-          .problem = problem};
+  return not_confirmed(u"no"_s,
+                       u"The unit is still at %1: it has not taken the ID. Run set-id again; if that fails, "
+                       "too, it is faulty."_s.arg(IdText(*id)));
 }
 
 Report CheckAndWrite(Job& job) {

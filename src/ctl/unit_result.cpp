@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <array>
 #include <cstddef>
+#include <iterator>
 #include <utility>
 
 #include "ctl/configuration_files.h"
@@ -146,10 +147,14 @@ QString Summary(const std::vector<UnitResult>& results) {
   return clauses.isEmpty() ? QString() : clauses.join(u", "_s) + u'.';
 }
 
-// Where the stop has come; empty: it came between two units, or not at all.
+// Where the stop has come, or why else some units are not tried; empty: all are, or the stop came between two.
 QString WhereStopped(const std::vector<UnitResult>& results) {
+  const auto not_tried = std::ranges::find(results, Outcome::kNotTried, &UnitResult::outcome);
   const auto stopped = std::ranges::find(results, Outcome::kCancelled, &UnitResult::outcome);
-  if (stopped == results.end()) return {};
+  if (stopped == results.end()) {
+    const bool lost = not_tried != results.begin() && not_tried != results.end();
+    return lost ? std::prev(not_tried)->reason : QString();
+  }
   if (stopped->written == Written::kAll)
     return u"Stopped: unit %1 is written, and not compared."_s.arg(IdText(stopped->unit));
   return Spaced({u"Stopped at unit %1."_s.arg(IdText(stopped->unit)), HowItIsLeft(*stopped)});

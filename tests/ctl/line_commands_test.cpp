@@ -63,7 +63,7 @@ TEST_F(LineCommands, SetId_WritesOnlyToOneUnitAlone) {
       {{{"rambling", 0xFF}}, " --alone --yes", 1, kNo, kUnclean},
       {{{"deaf", 0xFF}}, " --alone --yes", 1, kNo, kUnclean},
       {{}, " --alone --yes", 1, kNo, "No unit answered. Check power, wiring and port. No ID has changed."},
-      {{{"stubborn", 0x07}}, " --alone --yes", 1, kNo, "The unit is still at 07: it does not take the ID."}};
+      {{{"stubborn", 0x07}}, " --alone --yes", 1, kNo, "The unit is still at 07: it has not taken the ID."}};
   for (const Case& each : cases) {
     AttachAll(each.units);
     if (each.answer != nullptr) terminal_.answer = QString::fromUtf8(each.answer);
@@ -117,6 +117,14 @@ TEST_F(LineCommands, SetIdThatIsStopped_SaysHowTheUnitIsLeft) {
     EXPECT_EQ(Run(std::string("set-id 0B --yes --quiet ") + option), 130);
     EXPECT_EQ(terminal_.error, std::string("tendril-ctl: ") + said + "\n");
   }
+  AttachAll({{"restarting", 0xFF}});
+  stop_ = {};
+  stop_timer_ = world_.time.CreateTimer([this] { world_.bench.Unplug(1); });
+  stop_timer_->SetInterval(1000);
+  stop_timer_->SetEnabled(true);
+  EXPECT_EQ(Run("set-id 0B --yes --alone --quiet"), 1);
+  EXPECT_THAT(terminal_.error,
+              HasSubstr(" again. The unit may be at 0B already. Run set-id again, or find.\n"));
 }
 
 TEST_F(LineCommands, Monitor_ReadsAndNeverSends) {

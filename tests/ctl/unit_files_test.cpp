@@ -159,6 +159,10 @@ TEST_F(UnitFiles, UnpluggedPort_EndsTheCommand) {
   EXPECT_THAT(terminal_.out,
               HasSubstr("05    partly   -         The port went away: plug the adapter in again.\n"));
   EXPECT_THAT(terminal_.out, HasSubstr("\n06    no       -         Not tried.\n"));
+  EXPECT_EQ(
+      terminal_.error,
+      "tendril-ctl: The port went away: plug the adapter in again. 1 of 2 units failed, 1 was not tried. "
+      "For another run: 05-06.\n");
 }
 
 TEST_F(UnitFiles, Backup_WritesWholeFilesAndReplacesNone) {
