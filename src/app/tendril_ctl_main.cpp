@@ -5,6 +5,7 @@
 #include <QTemporaryDir>
 #include <csignal>
 #include <cstdio>
+#include <exception>
 #include <filesystem>
 #include <functional>
 #include <memory>
@@ -118,6 +119,11 @@ int Main() {
 }  // namespace tendril
 
 int main(int argc, char** argv) {
-  const QCoreApplication application(argc, argv);
-  return tendril::Main();
+  try {
+    const QCoreApplication application(argc, argv);
+    return tendril::Main();
+  } catch (const std::exception& fault) {
+    std::fprintf(stderr, "tendril-ctl: %s\n", fault.what());
+    return tendril::ctl::kExitNotAsWished;
+  }
 }

@@ -58,9 +58,10 @@ class Arguments {
     return words_.takeFirst();
   }
   QString TakePath(QLatin1StringView what) {
-    if (NextIsUnits())
+    if (NextIsUnits()) {
       throw WrongUse{
           u"%1 needs %2; one named %3 is given as ./%3."_s.arg(info_.name, what, words_.constFirst())};
+    }
     return Take(what);
   }
   // All that follow.
@@ -194,9 +195,10 @@ class GivenOptions {
 std::int16_t PortNumber(const QString& text) {
   bool valid = false;
   const int number = text.toInt(&valid);
-  if (!valid || number < 1 || number > 255)
+  if (!valid || number < 1 || number > 255) {
     throw WrongUse{
         u"%1 is no port: --port takes a number, 1 to 255; tendril-ctl ports lists them."_s.arg(Quoted(text))};
+  }
   return static_cast<std::int16_t>(number);
 }
 

@@ -168,9 +168,10 @@ void UnitSession::AwaitLateReplies() {
 std::string UnitSession::Reason() const {
   if (!link_.PortOpen()) return kPortGone;
   const LineVerdict verdict = JudgeLine(trace_);
-  if (verdict.kind == LineVerdict::Kind::kEchoOnly)
+  if (verdict.kind == LineVerdict::Kind::kEchoOnly) {
     return "Unit " + HexByte(trace_.Polls().back().unit) +
            " does not answer: check its power, its ID and the wiring.";
+  }
   const bool box_only =
       verdict.kind == LineVerdict::Kind::kAnswers || verdict.kind == LineVerdict::Kind::kNothingAsked;
   if (!box_only) return verdict.sentence;

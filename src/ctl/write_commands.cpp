@@ -5,6 +5,7 @@
 #include <QSet>
 #include <algorithm>
 #include <cstdint>
+#include <iterator>
 #include <optional>
 #include <span>
 #include <string>
@@ -54,7 +55,7 @@ Report WriteUnits(Job& job, const std::vector<Writing>& writings) {
   const CommandLine& line = job.line;
   const bool back_up = !line.backup.isEmpty();
   std::vector<std::uint8_t> units;
-  for (const Writing& writing : writings) units.push_back(writing.unit);
+  std::ranges::transform(writings, std::back_inserter(units), &Writing::unit);
   const QString no_backup = back_up ? WhyNoBackup(line, writings, units) : QString();
   if (!no_backup.isEmpty()) return Refused(no_backup);
   if (auto fault = job.port.Open()) return *fault;
