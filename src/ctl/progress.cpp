@@ -23,8 +23,9 @@ Progress::Progress(const CommandLine& line, Environment& environment)
 
 Progress::~Progress() {
   if (drawn_.isEmpty()) return;
-  Draw({});
-  environment_.terminal.PrintError("\r");
+  // All columns: the terminal itself writes "^C" behind the text.
+  const int columns = std::max(environment_.terminal.ErrorColumns() - 1, 0);
+  environment_.terminal.PrintError('\r' + QByteArray(columns, ' ') + '\r');
 }
 
 void Progress::Show(const QString& text, double part) {

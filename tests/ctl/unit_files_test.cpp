@@ -320,7 +320,7 @@ TEST_F(UnitFiles, ProgressOnATerminal_IsOneLineWithTheTimeLeft) {
   EXPECT_EQ(Type("send wide.json 05-07"), 0);
   EXPECT_THAT(terminal_.error, HasSubstr("\runit 05 (1 of 3): port 2 of 8\r"));
   EXPECT_THAT(terminal_.error, HasSubstr("\runit 06 (2 of 3), 00:04 left\r"));
-  EXPECT_THAT(terminal_.error, EndsWith("\r" + std::string(28, ' ') + "\r"));
+  EXPECT_THAT(terminal_.error, EndsWith("\r" + std::string(39, ' ') + "\r"));
   EXPECT_EQ(terminal_.error.find('\n'), std::string::npos);
   const QStringList drawn = QString::fromStdString(terminal_.error).split(u'\r');
   EXPECT_EQ(std::ranges::adjacent_find(drawn), drawn.end());
