@@ -13,6 +13,7 @@
 #include <unistd.h>
 
 #include <QSocketNotifier>
+#include <QTimer>
 #endif
 
 namespace tendril {
@@ -27,6 +28,13 @@ int Columns(std::FILE* /*stream*/) { return kUsualColumns; }
 
 void DropTypedInput() {}
 
+QString WriteAll(std::FILE* stream, const QByteArray& text) {
+  const auto size = static_cast<std::size_t>(text.size());
+  errno = 0;
+  if (std::fwrite(text.constData(), 1, size, stream) == size && std::fflush(stream) == 0) return {};
+  return QString::fromStdString(std::generic_category().message(errno));
+}
+
 // Stops are not noticed meanwhile.
 std::optional<QString> ReadLine(ctl::Waiting& /*waiting*/, const ctl::StopRequest& /*stop*/) {
   char line[256];
@@ -34,6 +42,8 @@ std::optional<QString> ReadLine(ctl::Waiting& /*waiting*/, const ctl::StopReques
   return QString::fromLocal8Bit(line).trimmed();
 }
 #else
+constexpr int kSignalMs = 100;  // in which a signal is delivered
+
 bool IsTerminal(std::FILE* stream) { return ::isatty(::fileno(stream)) != 0; }
 
 int Columns(std::FILE* stream) {
@@ -44,6 +54,14 @@ int Columns(std::FILE* stream) {
 
 // What was typed before a question does not answer it.
 void DropTypedInput() { ::tcflush(STDIN_FILENO, TCIFLUSH); }
+
+// A terminal that is closed ends the input, and sends a signal.
+void AwaitStop(ctl::Waiting& waiting, const ctl::StopRequest& stop) {
+  QTimer limit;
+  limit.setSingleShot(true);
+  limit.start(kSignalMs);
+  waiting.Until([&] { return !limit.isActive() || stop.Made(); });
+}
 
 // A terminal hands a line over when it is complete.
 std::optional<QString> ReadLine(ctl::Waiting& waiting, const ctl::StopRequest& stop) {
@@ -56,23 +74,32 @@ std::optional<QString> ReadLine(ctl::Waiting& waiting, const ctl::StopRequest& s
   waiting.Until([&] { return readable || stop.Made(); });
   char line[256];
   const auto size = readable ? ::read(STDIN_FILENO, line, sizeof line) : -1;
-  if (size <= 0) return std::nullopt;
+  if (size <= 0) {
+    AwaitStop(waiting, stop);
+    return std::nullopt;
+  }
   return QString::fromLocal8Bit(line, size).trimmed();
+}
+
+// A signal ends the wait for a reader that stands still. What is left is not kept, since the program's end would wait for
+// that reader again.
+QString WriteAll(std::FILE* stream, const QByteArray& text) {
+  for (qsizetype written = 0; written < text.size();) {
+    const auto some = ::write(::fileno(stream), text.constData() + written,
+                              static_cast<std::size_t>(text.size() - written));
+    if (some < 0) return QString::fromStdString(std::generic_category().message(errno));
+    written += some;
+  }
+  return {};
 }
 #endif
 
 }  // namespace
 
-QString SystemTerminal::Print(const QByteArray& text) {
-  const auto size = static_cast<std::size_t>(text.size());
-  errno = 0;
-  if (std::fwrite(text.constData(), 1, size, stdout) == size && std::fflush(stdout) == 0) return {};
-  return QString::fromStdString(std::generic_category().message(errno));
-}
+QString SystemTerminal::Print(const QByteArray& text) { return WriteAll(stdout, text); }
 
 void SystemTerminal::PrintError(const QByteArray& text) {
-  std::fwrite(text.constData(), 1, static_cast<std::size_t>(text.size()), stderr);
-  std::fflush(stderr);
+  if (!error_stalled_ && !WriteAll(stderr, text).isEmpty()) error_stalled_ = errno == EINTR;
 }
 
 int SystemTerminal::ErrorColumns() const { return IsTerminal(stderr) ? Columns(stderr) : 0; }

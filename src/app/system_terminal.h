@@ -25,6 +25,7 @@ class SystemTerminal final : public ctl::Terminal {
  private:
   ctl::Waiting& waiting_;
   ctl::StopRequest& stop_;
+  bool error_stalled_ = false;  // a signal has come while nothing read standard error
 };
 
 }  // namespace tendril

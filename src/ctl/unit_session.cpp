@@ -13,6 +13,8 @@ namespace {
 
 // A reply that comes later than its poll waits must not be taken for one of the next unit.
 constexpr std::int32_t kLateReplyMs = 500;
+// A unit that floods the line does so for seconds.
+constexpr int kMaxWaits = 10;
 // No window is painted first.
 constexpr std::int32_t kAtOnceMs = 1;
 constexpr int kMaxLooks = 3;
@@ -83,12 +85,14 @@ CommandResult UnitSession::Send(std::uint8_t unit, const ChannelTable& records) 
 }
 
 CommandResult UnitSession::LookFor(std::uint8_t unit) {
+  const StepHandler on_step = std::exchange(on_step_, nullptr);  // its steps are those of a search
   CommandResult result;
   for (int looks = 0; looks < kMaxLooks; ++looks) {
     result = Find(unit, unit, kAtOnceMs);
     const auto& found = Search().found;
     if (!result.Done() || !found.empty()) break;
   }
+  on_step_ = on_step;
   if (!result.Done()) return result;
   const auto& found = Search().found;
   const bool clean =
@@ -160,8 +164,12 @@ CommandResult UnitSession::Run(std::uint8_t unit, UnitOperation& operation) {
 }
 
 void UnitSession::AwaitLateReplies() {
-  if (std::exchange(unanswered_, false))
-    WaitUntil(environment_, kLateReplyMs, [this] { return environment_.stop.Made(); });
+  if (!std::exchange(unanswered_, false)) return;
+  for (int waits = 0; waits < kMaxWaits; ++waits) {
+    const bool stopped = WaitUntil(environment_, kLateReplyMs,
+                                   [this] { return environment_.stop.Made() || !link_.PortOpen(); });
+    if (stopped || environment_.device.ReadAll().empty()) return;
+  }
 }
 
 // What the line shows says more than a box, unless the last poll was answered.

@@ -67,8 +67,15 @@ Report WriteUnits(Job& job, const std::vector<Writing>& writings) {
     if (work.Write(wanted, kWriteTime / whole) && line.compare)
       work.Compare(wanted, u"compare"_s, kReadTime / whole);
   });
-  return ReportOf(results, {.written = true, .compared = true, .file = back_up ? u"backup"_s : QString()},
-                  job.environment.terminal);
+  Report report =
+      ReportOf(results, {.written = true, .compared = true, .file = back_up ? u"backup"_s : QString()},
+               job.environment.terminal);
+  // Those have their backups already.
+  const bool again = std::ranges::any_of(results, [](const UnitResult& result) {
+    return result.outcome != UnitResult::Outcome::kDone && !result.file.isEmpty();
+  });
+  if (again) report.problem += u" Give --backup another folder then."_s;
+  return report;
 }
 
 // The ID that a file of a backup is named after; nothing when it is none. The case of the name does not matter.

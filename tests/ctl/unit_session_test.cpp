@@ -101,6 +101,14 @@ TEST_F(UnitSessionTest, PortThatIsBackAtOnce_IsNotOpenedAgain) {
   }
 }
 
+TEST_F(UnitSessionTest, NoiseOfAUnit_HasPassedBeforeTheNextOne) {
+  Attach("flooding", 0x05);
+  Attach("", 0x06);
+  EXPECT_FALSE(units_.Send(0x05, records_).Done());
+  EXPECT_TRUE(units_.LookFor(0x06).Done());
+  EXPECT_TRUE(units_.Send(0x06, records_).Done());
+}
+
 // Does not answer its first poll.
 class DrowsyUnit final : public VirtualUnit {
  public:
