@@ -5,6 +5,7 @@
 #include "ctl/find_command.h"
 #include "ctl/unit_ids.h"
 #include "serial/packets.h"
+#include "trace/trace_text.h"
 
 namespace tendril::ctl {
 namespace {
@@ -40,9 +41,7 @@ bool CleanReply(const LineTrace& trace, bool first) {
   for (const TraceEntry& entry : trace.Entries()) {
     counts |= entry.kind == TraceEntry::Kind::kSent;
     replies += entry.kind == TraceEntry::Kind::kReply ? 1 : 0;
-    const bool noise =
-        entry.kind == TraceEntry::Kind::kNoise && LeadingZeros(entry.bytes) < entry.bytes.size();
-    others |= counts && noise;
+    others |= counts && IsNoise(entry);
   }
   return replies == 1 && !others;
 }

@@ -7,6 +7,7 @@
 #include "ctl/bounded_wait.h"
 #include "platform/hex_text.h"
 #include "trace/line_verdict.h"
+#include "trace/trace_text.h"
 
 namespace tendril::ctl {
 namespace {
@@ -121,8 +122,7 @@ bool UnitSession::InDoubt() const {
   bool noise = false;
   for (const TraceEntry& entry : trace_.Entries()) {
     exchanging |= entry.kind == TraceEntry::Kind::kEcho || entry.kind == TraceEntry::Kind::kReply;
-    noise |= exchanging && entry.kind == TraceEntry::Kind::kNoise &&
-             LeadingZeros(entry.bytes) < entry.bytes.size();
+    noise |= exchanging && IsNoise(entry);
   }
   return misses_ > 0 || noise;
 }

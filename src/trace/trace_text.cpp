@@ -18,7 +18,7 @@ bool ShouldNotHappen(const TraceEntry& entry) {
     case TraceEntry::Kind::kTimeOut:
       return true;
     case TraceEntry::Kind::kNoise:
-      return LeadingZeros(entry.bytes) < entry.bytes.size();
+      return IsNoise(entry);
     case TraceEntry::Kind::kOpened:
     case TraceEntry::Kind::kClosed:
     case TraceEntry::Kind::kRtsOn:
@@ -32,6 +32,10 @@ bool ShouldNotHappen(const TraceEntry& entry) {
 }
 
 }  // namespace
+
+bool IsNoise(const TraceEntry& entry) {
+  return entry.kind == TraceEntry::Kind::kNoise && LeadingZeros(entry.bytes) < entry.bytes.size();
+}
 
 std::string TraceBytes(const TraceEntry& entry) { return ShownBytes(entry.bytes, kShownBytes, entry.size); }
 
