@@ -25,7 +25,7 @@ QString AnswerName(FoundUnit::What what) {
     case FoundUnit::What::kOtherAnswer:
       return u"other"_s;
     case FoundUnit::What::kPerhapsSeveral:
-      return u"perhaps several"_s;
+      return u"perhapsSeveral"_s;
   }
   return {};
 }

@@ -30,7 +30,7 @@ TEST_F(LineCommands, Find_ListsWhatAnswersAndTheTraceShowsIt) {
   EXPECT_THAT(terminal_.error,
               HasSubstr("  program  00 02 88 2A 2D 00         echo: poll unit 02, kind '*'\n"));
   EXPECT_EQ(Run("find 01-05 --json"), 1);
-  EXPECT_THAT(terminal_.out, HasSubstr("\"answer\": \"perhaps several\",\n            \"unit\": \"03\""));
+  EXPECT_THAT(terminal_.out, HasSubstr("\"answer\": \"perhapsSeveral\",\n            \"unit\": \"03\""));
   EXPECT_EQ(Run("find 04-05 --quiet"), 1);
   EXPECT_EQ(terminal_.error,
             "tendril-ctl: No unit answered. Check power, wiring and port. Other IDs are not searched.\n");
