@@ -3,7 +3,7 @@ set -euo pipefail
 cd "$(dirname "${BASH_SOURCE[0]}")/.."
 
 # What building, running and testing needs on Debian 12 and its relatives.
-build_packages=(g++ cmake ninja-build qt6-base-dev qt6-serialport-dev libgl-dev libgtest-dev libgmock-dev
+build_packages=(g++ cmake ninja-build qt6-base-dev libgl-dev libgtest-dev libgmock-dev
                 fonts-dejavu-core)
 # What one test needs besides: a display and an accessibility bus for the program.
 test_packages=(xvfb dbus at-spi2-core xdotool)
