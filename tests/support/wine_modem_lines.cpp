@@ -1,0 +1,111 @@
+// Gives pseudo-terminals the modem lines that wine asks a serial port for. A library of Linux, for LD_PRELOAD: it takes
+// ioctl() and open() of wine's processes, and all other calls pass unchanged.
+//
+//   g++ -shared -fPIC -o wine_modem_lines.so wine_modem_lines.cpp
+//   LD_PRELOAD=$PWD/wine_modem_lines.so TENDRIL_RTS_NOTES=$PWD/rts wine64 program.exe
+//
+// TENDRIL_RTS_NOTES names a file that gets a character for each turn of RTS: "1" asserted, "0" released.
+#include <asm/termbits.h>
+#include <dlfcn.h>
+#include <fcntl.h>
+#include <linux/serial.h>
+#include <sys/ioctl.h>
+#include <sys/poll.h>
+#include <sys/stat.h>
+#include <sys/sysmacros.h>
+#include <unistd.h>
+
+#include <cerrno>
+#include <cstdarg>
+#include <cstdlib>
+
+namespace {
+
+constexpr int kOutputs = TIOCM_DTR | TIOCM_RTS;
+constexpr int kInputs = TIOCM_CTS | TIOCM_DSR | TIOCM_CAR;  // the device at the other end is ready
+
+int lines = kInputs | kOutputs;  // of the only serial port that a process has open
+
+bool IsPseudoTerminal(int descriptor) {
+  constexpr unsigned kFirst = 136, kLast = 143;
+  struct stat about {};
+  return ::fstat(descriptor, &about) == 0 && S_ISCHR(about.st_mode) && major(about.st_rdev) >= kFirst &&
+         major(about.st_rdev) <= kLast;
+}
+
+bool HungUp(int descriptor) {
+  pollfd state = {descriptor, 0, 0};
+  return ::poll(&state, 1, 0) > 0 && (state.revents & POLLHUP) != 0;
+}
+
+void SetOutputs(int outputs) {
+  const char* const notes = std::getenv("TENDRIL_RTS_NOTES");
+  if (((lines ^ outputs) & TIOCM_RTS) != 0 && notes != nullptr) {
+    const int file = ::open(notes, O_WRONLY | O_CREAT | O_APPEND | O_CLOEXEC, 0644);
+    if (::write(file, (outputs & TIOCM_RTS) != 0 ? "1" : "0", 1) != 1) std::abort();
+    ::close(file);
+  }
+  lines = kInputs | (outputs & kOutputs);
+}
+
+// Returns whether the request is one that a pseudo-terminal does not know.
+bool Answer(unsigned long request, void* argument) {
+  int* const bits = static_cast<int*>(argument);
+  switch (request) {
+    case TIOCMGET:
+      *bits = lines;
+      return true;
+    case TIOCMSET:
+      SetOutputs(*bits);
+      return true;
+    case TIOCMBIS:
+      SetOutputs(lines | *bits);
+      return true;
+    case TIOCMBIC:
+      SetOutputs(lines & ~*bits);
+      return true;
+    case TIOCGICOUNT:
+      *static_cast<serial_icounter_struct*>(argument) = {};
+      return true;
+    case TIOCGSERIAL:
+      *static_cast<serial_struct*>(argument) = {};
+      return true;
+    case TIOCSERGETLSR:
+      *bits = TIOCSER_TEMT;
+      return true;
+    default:
+      return false;
+  }
+}
+
+template <typename Function>
+Function* Real(const char* name) {
+  return reinterpret_cast<Function*>(::dlsym(RTLD_NEXT, name));
+}
+
+}  // namespace
+
+extern "C" int ioctl(int descriptor, unsigned long request, ...) noexcept {
+  static auto* const real = Real<int(int, unsigned long, ...)>("ioctl");
+  va_list arguments;
+  va_start(arguments, request);
+  void* const argument = va_arg(arguments, void*);
+  va_end(arguments);
+  // Wine's requests are few: "T" is the letter of the terminals'.
+  if ((request >> 8) != 'T' || !IsPseudoTerminal(descriptor)) return real(descriptor, request, argument);
+  if (HungUp(descriptor)) {
+    errno = EIO;
+    return -1;
+  }
+  return Answer(request, argument) ? 0 : real(descriptor, request, argument);
+}
+
+// The device must not become wineserver's controlling terminal: its loss would be a signal to wineserver.
+extern "C" int open(const char* path, int flags, ...) {
+  static auto* const real = Real<int(const char*, int, ...)>("open");
+  va_list arguments;
+  va_start(arguments, flags);
+  const mode_t mode = (flags & (O_CREAT | O_TMPFILE)) != 0 ? va_arg(arguments, mode_t) : 0;
+  va_end(arguments);
+  return real(path, flags | O_NOCTTY, mode);
+}
