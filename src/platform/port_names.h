@@ -20,7 +20,13 @@ namespace tendril {
 // is no port, and hides the number's own device. Never opens a device: that would change its control lines.
 std::optional<std::filesystem::path> FindSerialDevice(std::int32_t number);
 
-#ifndef _WIN32
+#ifdef _WIN32
+// Whether there is a port of this name ("COM3").
+bool SerialDeviceExists(const std::filesystem::path& device);
+
+// As SerialDevice::Describe().
+DeviceDescription DescribeSerialDevice(const std::filesystem::path& device);
+#else
 // The folders whose entries decide which devices the ports have. They need not exist.
 std::vector<std::filesystem::path> SerialDeviceFolders();
 

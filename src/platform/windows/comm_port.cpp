@@ -1,0 +1,192 @@
+#include "platform/windows/comm_port.h"
+
+#include <windows.h>
+
+#include <algorithm>
+#include <optional>
+#include <string>
+#include <utility>
+
+#include "platform/port_names.h"
+#include "platform/runtime_error.h"
+#include "platform/windows/overlapped_call.h"
+#include "platform/windows/system_text.h"
+
+namespace tendril {
+namespace {
+
+// What a driver is asked to keep in either direction, in bytes.
+constexpr DWORD kDriverQueueBytes = 4096;
+
+RuntimeError NoSuchDevice(const std::filesystem::path& device) {
+  return {kErrInvalidPort, "There is no serial device at " + device.string() + "."};
+}
+
+RuntimeError WhyNotOpen(const std::filesystem::path& device, DWORD error) {
+  switch (error) {
+    case ERROR_FILE_NOT_FOUND:
+    case ERROR_PATH_NOT_FOUND:
+    case ERROR_DEVICE_NOT_CONNECTED:
+      return NoSuchDevice(device);
+    case ERROR_ACCESS_DENIED:
+    case ERROR_SHARING_VIOLATION:
+    case ERROR_BUSY:
+      return {kErrPortAlreadyOpen, device.string() + " is in use by another program."};
+    default:
+      return {kErrSettingsRefused, device.string() + " cannot be set up: " + SystemText(error) + "."};
+  }
+}
+
+// 8 data bits, no parity, one stop bit, no handshaking, and no error that stops the line.
+DCB LineSettings(DWORD baud) {
+  DCB settings = {};
+  settings.DCBlength = sizeof settings;
+  settings.BaudRate = baud;
+  settings.fBinary = TRUE;
+  settings.fDtrControl = DTR_CONTROL_ENABLE;
+  settings.fRtsControl = RTS_CONTROL_ENABLE;
+  settings.ByteSize = 8;
+  settings.Parity = NOPARITY;
+  settings.StopBits = ONESTOPBIT;
+  return settings;
+}
+
+}  // namespace
+
+void CommPort::Closer::operator()(Handle handle) const { CloseHandle(handle); }
+
+CommPort::OpenHandle CommPort::Open(const std::filesystem::path& device) {
+  const std::wstring name = L"\\\\.\\" + device.wstring();  // from COM10 on, the name alone is a file's
+  const HANDLE port = CreateFileW(name.c_str(), GENERIC_READ | GENERIC_WRITE, 0, nullptr, OPEN_EXISTING,
+                                  FILE_FLAG_OVERLAPPED, nullptr);
+  if (port == INVALID_HANDLE_VALUE) throw WhyNotOpen(device, GetLastError());
+  return OpenHandle(port);
+}
+
+CommPort::CommPort(const std::filesystem::path& device, std::int32_t baud)
+    : device_(device),
+      port_(Open(device)),
+      wait_(std::make_unique<OverlappedCall>()),
+      read_(std::make_unique<OverlappedCall>()),
+      write_(std::make_unique<OverlappedCall>()) {
+  Configure(baud);
+  PurgeComm(port_.get(), PURGE_RXCLEAR | PURGE_TXCLEAR);
+  SetEvent(written());
+  AwaitNext();
+}
+
+CommPort::~CommPort() {
+  // First the mask, which ends the wait: a wait that is only cancelled may never end while bytes are being sent.
+  SetCommMask(port_.get(), 0);
+  CancelIoEx(port_.get(), nullptr);
+  PurgeComm(port_.get(), PURGE_RXCLEAR | PURGE_TXCLEAR);
+  port_.reset();
+  for (auto* call : {&wait_, &read_, &write_}) OverlappedCall::Abandon(std::move(*call));
+}
+
+void CommPort::Configure(std::int32_t baud) {
+  DCB settings = LineSettings(static_cast<DWORD>(baud));
+  // A read returns at once with what is there; a write has no time limit.
+  COMMTIMEOUTS limits = {MAXDWORD, 0, 0, 0, 0};
+  SetupComm(port_.get(), kDriverQueueBytes, kDriverQueueBytes);  // a driver may have its own sizes
+  if (SetCommState(port_.get(), &settings) && SetCommTimeouts(port_.get(), &limits) &&
+      SetCommMask(port_.get(), EV_RXCHAR)) {
+    return;
+  }
+  const DWORD error = GetLastError();
+  if (HungUp()) throw NoSuchDevice(device_);  // it has gone since it was opened
+  throw RuntimeError(kErrSettingsRefused, device_.string() + " cannot be set to " + std::to_string(baud) +
+                                              " bit/s: " + SystemText(error) + ".");
+}
+
+CommPort::Handle CommPort::arrived() const { return wait_->event(); }
+CommPort::Handle CommPort::read() const { return read_->event(); }
+CommPort::Handle CommPort::written() const { return write_->event(); }
+
+// Reads before it waits again: a wait that is begun earlier reports the bytes that are read now once more.
+std::size_t CommPort::Read(std::span<std::uint8_t> buffer) {
+  if (lost_) return 0;
+  if (unread_.empty()) unread_ = Receive();
+  const std::size_t got = std::min(buffer.size(), unread_.size());
+  std::copy_n(unread_.begin(), got, buffer.begin());
+  unread_ = unread_.subspan(got);
+  if (got > 0 && got == buffer.size()) SetEvent(read());  // the wait does not report what was there before
+  if (!lost_) AwaitNext();
+  return got;
+}
+
+std::span<const std::uint8_t> CommPort::Receive() {
+  const auto begin = [this](OVERLAPPED* record) {
+    return ReadFile(port_.get(), read_->bytes.data(), static_cast<DWORD>(read_->bytes.size()), nullptr,
+                    record);
+  };
+  lost_ = !read_->begun() && read_->Begin(begin) != ERROR_SUCCESS;
+  if (lost_) return {};
+  const auto end = read_->TakeEnd(port_.get());
+  if (!end) return {};
+  ResetEvent(read());
+  lost_ = end->error != ERROR_SUCCESS;
+  return std::span(read_->bytes).first(end->bytes);
+}
+
+void CommPort::AwaitNext() {
+  if (wait_->begun()) {
+    const auto end = wait_->TakeEnd(port_.get());
+    if (!end) return;
+    lost_ = end->error != ERROR_SUCCESS;
+    if (lost_) return;
+  }
+  lost_ = wait_->Begin([this](OVERLAPPED* record) {
+    return WaitCommEvent(port_.get(), &wait_->mask, record);
+  }) != ERROR_SUCCESS;
+}
+
+std::size_t CommPort::Write(std::span<const std::uint8_t> bytes) {
+  const auto check = [this](DWORD error) {
+    if (error == ERROR_SUCCESS) return;
+    throw RuntimeError(kErrDeviceIo, device_.string() + " cannot be written to: " + SystemText(error) + ".");
+  };
+  if (write_->begun()) {
+    const auto end = write_->TakeEnd(port_.get());
+    if (!end) return 0;
+    check(end->error);
+  }
+  if (bytes.empty()) return 0;
+  in_write_ = std::min(bytes.size(), write_->bytes.size());
+  std::copy_n(bytes.begin(), in_write_, write_->bytes.begin());
+  check(write_->Begin([this](OVERLAPPED* record) {
+    return WriteFile(port_.get(), write_->bytes.data(), static_cast<DWORD>(in_write_), nullptr, record);
+  }));
+  return in_write_;
+}
+
+// A driver may count the bytes of the write that it is at, or leave them out.
+std::size_t CommPort::QueuedOutput() const {
+  COMSTAT state = {};
+  DWORD errors = 0;
+  ClearCommError(port_.get(), &errors, &state);
+  return std::max<std::size_t>(state.cbOutQue, write_->running() ? in_write_ : 0);
+}
+
+void CommPort::ClearInput() {
+  if (read_->begun()) (void)read_->TakeEnd(port_.get());
+  unread_ = {};
+  PurgeComm(port_.get(), PURGE_RXCLEAR);
+}
+
+bool CommPort::SetRts(bool asserted) {
+  if (EscapeCommFunction(port_.get(), asserted ? SETRTS : CLRRTS)) return true;
+  const DWORD error = GetLastError();
+  if (error == ERROR_NOT_SUPPORTED || error == ERROR_INVALID_FUNCTION) return false;
+  throw RuntimeError(kErrDeviceIo, "RTS of " + device_.string() + " cannot be " +
+                                       (asserted ? "asserted" : "cleared") + ": " + SystemText(error) + ".");
+}
+
+// Windows takes the name of a device away with it, also while the port is open.
+bool CommPort::HungUp() const {
+  COMSTAT state = {};
+  DWORD errors = 0;
+  return lost_ || !ClearCommError(port_.get(), &errors, &state) || !SerialDeviceExists(device_);
+}
+
+}  // namespace tendril
