@@ -9,10 +9,12 @@ build_packages=(g++ cmake ninja-build qt6-base-dev libgl-dev libgtest-dev libgmo
 test_packages=(xvfb dbus at-spi2-core xdotool)
 # What building and testing for Windows needs; GoogleTest is compiled along.
 windows_packages=(cmake ninja-build g++-mingw-w64-x86-64-posix googletest wine64)
+# What making Qt for Windows needs besides: sources, their licences, and Qt's tools on this computer.
+qt_windows_packages=(dpkg-dev python3 qt6-base-dev)
 fuzz_packages=(clang-14 libclang-rt-14-dev llvm-14 cmake ninja-build qt6-base-dev libgl-dev)
 coverage_packages=(gcovr)
 check_packages=(clang-format-14 clang-tidy-14)
-icon_packages=(librsvg2-bin optipng)
+icon_packages=(librsvg2-bin optipng icoutils)
 picture_packages=(imagemagick optipng)
 
 say() { printf '%s\n' "== $*" >&2; }
@@ -36,6 +38,22 @@ require_packages() {
   "${as_root[@]}" apt-get update -qq
   "${as_root[@]}" env DEBIAN_FRONTEND=noninteractive apt-get install -y -qq --no-install-recommends "${missing[@]}" \
     >/dev/null
+}
+
+# The version of the source of the installed Qt.
+qt_version() { dpkg-query -W -f '${source:Version}' qt6-base-dev 2>/dev/null; }
+
+# The folder of Qt for Windows. Where it exists, it is complete; else scripts/qt-windows makes it. Another version of Qt,
+# other options or another compiler have a folder of their own.
+windows_qt_folder() {
+  local version made_of
+  version=$(qt_version) || version=none
+  made_of=$({
+    printf '%s\n' "$version"
+    dpkg-query -W -f '${Package} ${Version}\n' g++-mingw-w64-x86-64-posix mingw-w64-x86-64-dev 2>/dev/null || true
+    sed 's/ *#.*//' cmake/qt-windows.cmake cmake/mingw-w64.cmake
+  } | sha256sum)
+  printf '%s\n' "${XDG_CACHE_HOME:-$HOME/.cache}/tendril/qt-${version%%[+-]*}-${made_of:0:8}"
 }
 
 # For programs with a window that run without a display. That platform warns of what it cannot do.
