@@ -11,6 +11,8 @@ test_packages=(xvfb dbus at-spi2-core xdotool)
 windows_packages=(cmake ninja-build g++-mingw-w64-x86-64-posix googletest wine64)
 # What making Qt for Windows needs besides: sources, their licences, and Qt's tools on this computer.
 qt_windows_packages=(dpkg-dev python3 qt6-base-dev)
+# What packing for Windows needs besides.
+windows_package_packages=(cmark-gfm nsis zip)
 fuzz_packages=(clang-14 libclang-rt-14-dev llvm-14 cmake ninja-build qt6-base-dev libgl-dev)
 coverage_packages=(gcovr)
 check_packages=(clang-format-14 clang-tidy-14)

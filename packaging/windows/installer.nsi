@@ -1,0 +1,127 @@
+; The installer for Windows, 64 bits, for all users. scripts/package-windows calls makensis with:
+;   VERSION, FOLDER (what to install), REMOVAL (a file that removes each of these), OUTPUT, ICON, SIGN (a command, or empty)
+Target amd64-unicode
+SetCompressor /SOLID lzma
+!include MUI2.nsh
+!include LogicLib.nsh
+!include WinVer.nsh
+
+!define PRODUCT "Tendril Configuration Utility"
+!define UNINSTALL_KEY "Software\Microsoft\Windows\CurrentVersion\Uninstall\Tendril Configuration Utility"
+!define EXIT_RUNNING 3  ; the exit code then, besides NSIS's own: 0 done, 1 cancelled, 2 failed
+
+Name "${PRODUCT}"
+OutFile "${OUTPUT}"
+InstallDir "$PROGRAMFILES64\Tendril"
+InstallDirRegKey HKLM "${UNINSTALL_KEY}" InstallLocation  ; an upgrade goes where the older version is
+RequestExecutionLevel admin
+ManifestSupportedOS all
+ManifestDPIAware true
+ShowInstDetails nevershow
+ShowUninstDetails nevershow
+BrandingText " "
+VIProductVersion "${VERSION}.0"
+VIAddVersionKey CompanyName "Kelvane"
+VIAddVersionKey FileDescription "Installs the ${PRODUCT}"
+VIAddVersionKey FileVersion "${VERSION}"
+VIAddVersionKey LegalCopyright ""
+VIAddVersionKey ProductName "${PRODUCT}"
+VIAddVersionKey ProductVersion "${VERSION}"
+!if "${SIGN}" != ""
+  !uninstfinalize '${SIGN} "%1"'
+!endif
+
+!define MUI_ICON "${ICON}"
+!define MUI_UNICON "${ICON}"
+!define MUI_ABORTWARNING
+!insertmacro MUI_PAGE_DIRECTORY
+!insertmacro MUI_PAGE_INSTFILES
+!define MUI_FINISHPAGE_TEXT "The ${PRODUCT} is in the Start menu."
+!insertmacro MUI_PAGE_FINISH
+!insertmacro MUI_UNPAGE_CONFIRM
+!insertmacro MUI_UNPAGE_INSTFILES
+!insertmacro MUI_LANGUAGE English
+
+; A program that runs cannot be opened for writing. Asks to close it; silent, ends with an exit code.
+!macro EndWhileRunning program
+  ${Do}
+    ${IfNot} ${FileExists} "$INSTDIR\${program}.exe"
+      ${ExitDo}
+    ${EndIf}
+    ClearErrors
+    FileOpen $0 "$INSTDIR\${program}.exe" a
+    ${IfNot} ${Errors}
+      FileClose $0
+      ${ExitDo}
+    ${EndIf}
+    MessageBox MB_RETRYCANCEL|MB_ICONEXCLAMATION \
+      "${program} is running. Close it, then press Retry." /SD IDCANCEL IDRETRY +3
+    SetErrorLevel ${EXIT_RUNNING}
+    Quit
+  ${Loop}
+!macroend
+
+!macro EndWhileAnyRuns
+  !insertmacro EndWhileRunning tendril-utility
+  !insertmacro EndWhileRunning tendril-demo
+  !insertmacro EndWhileRunning tendril-ctl
+!macroend
+
+Function .onInit
+  SetShellVarContext all
+  ${IfNot} ${AtLeastWin10}
+    MessageBox MB_YESNO|MB_ICONEXCLAMATION|MB_DEFBUTTON2 \
+      "The ${PRODUCT} needs Windows 10 or newer. Install it on this older Windows all the same?" /SD IDYES IDYES +2
+    Quit
+  ${EndIf}
+FunctionEnd
+
+Function un.onInit
+  SetShellVarContext all
+FunctionEnd
+
+Section
+  !insertmacro EndWhileAnyRuns
+  ; What an older version has and this one has not, goes.
+  ${If} ${FileExists} "$INSTDIR\uninstall.exe"
+    ExecWait '"$INSTDIR\uninstall.exe" /S _?=$INSTDIR' $0
+    ${If} $0 <> 0
+      MessageBox MB_OK|MB_ICONSTOP "The version that is installed cannot be removed." /SD IDOK
+      SetErrorLevel $0
+      Quit
+    ${EndIf}
+  ${EndIf}
+  SetOutPath "$INSTDIR"
+  File /r "${FOLDER}/*"
+  WriteUninstaller "$INSTDIR\uninstall.exe"
+
+  CreateDirectory "$SMPROGRAMS\${PRODUCT}"
+  CreateShortcut "$SMPROGRAMS\${PRODUCT}\${PRODUCT}.lnk" "$INSTDIR\tendril-utility.exe"
+  CreateShortcut "$SMPROGRAMS\${PRODUCT}\Demonstration without hardware.lnk" "$INSTDIR\tendril-demo.exe"
+  CreateShortcut "$SMPROGRAMS\${PRODUCT}\Manual.lnk" "$INSTDIR\docs\manual.html"
+
+  WriteRegStr HKLM "${UNINSTALL_KEY}" DisplayName "${PRODUCT}"
+  WriteRegStr HKLM "${UNINSTALL_KEY}" DisplayVersion "${VERSION}"
+  WriteRegStr HKLM "${UNINSTALL_KEY}" DisplayIcon "$INSTDIR\tendril-utility.exe"
+  WriteRegStr HKLM "${UNINSTALL_KEY}" Publisher "Kelvane"
+  WriteRegStr HKLM "${UNINSTALL_KEY}" InstallLocation "$INSTDIR"
+  WriteRegStr HKLM "${UNINSTALL_KEY}" UninstallString '"$INSTDIR\uninstall.exe"'
+  WriteRegStr HKLM "${UNINSTALL_KEY}" QuietUninstallString '"$INSTDIR\uninstall.exe" /S'
+  WriteRegDWORD HKLM "${UNINSTALL_KEY}" NoModify 1
+  WriteRegDWORD HKLM "${UNINSTALL_KEY}" NoRepair 1
+  SectionGetSize 0 $0
+  WriteRegDWORD HKLM "${UNINSTALL_KEY}" EstimatedSize $0
+SectionEnd
+
+Section Uninstall
+  !insertmacro EndWhileAnyRuns
+  ; Each file by its name: what the user has put there stays.
+  !include "${REMOVAL}"
+  Delete "$INSTDIR\uninstall.exe"
+  RMDir "$INSTDIR"
+  Delete "$SMPROGRAMS\${PRODUCT}\${PRODUCT}.lnk"
+  Delete "$SMPROGRAMS\${PRODUCT}\Demonstration without hardware.lnk"
+  Delete "$SMPROGRAMS\${PRODUCT}\Manual.lnk"
+  RMDir "$SMPROGRAMS\${PRODUCT}"
+  DeleteRegKey HKLM "${UNINSTALL_KEY}"
+SectionEnd
