@@ -1,8 +1,7 @@
 #include "app/demo_program.h"
 
-#include <filesystem>
-
 #include "app/version.h"
+#include "platform/qt/path_text.h"
 
 namespace tendril {
 namespace {
@@ -12,7 +11,7 @@ QString DemoLog(const QTemporaryDir& scratch) { return scratch.filePath(QStringL
 }  // namespace
 
 DemoProgram::DemoProgram()
-    : log(std::filesystem::path(DemoLog(scratch).toStdString())),
+    : log(ToPath(DemoLog(scratch))),
       wsCLI(bench.panel, kDemoListenerPort, platform.timers),
       window(Serial1, platform.timers, platform.boxes, control_panel,
              {kVersion, DemoLog(scratch), QStringLiteral("in memory")}) {

@@ -3,10 +3,7 @@
 #include <QDateTime>
 #include <QEventLoop>
 #include <QTemporaryDir>
-#include <csignal>
-#include <cstdio>
 #include <exception>
-#include <filesystem>
 #include <functional>
 #include <memory>
 #include <optional>
@@ -21,10 +18,12 @@
 #include "ctl/program.h"
 #include "platform/memory_registry.h"
 #include "platform/paths.h"
+#include "platform/qt/path_text.h"
 #include "platform/qt/qt_serial_device.h"
 #include "platform/qt/qt_tcp_socket.h"
 #include "platform/qt/qt_timer.h"
 #include "platform/registry_store.h"
+#include "platform/standard_streams.h"
 #include "platform/steady_clock.h"
 #include "platform/system_processes.h"
 #include "platform/system_registry.h"
@@ -34,7 +33,7 @@
 namespace tendril {
 namespace {
 
-void Warn(const std::string& line) { std::fprintf(stderr, "tendril-ctl: %s\n", line.c_str()); }
+void Warn(const std::string& line) { WriteAll(Stream::kError, "tendril-ctl: " + line + "\n"); }
 
 // Preferences that are missing have their defaults: only who looks for a fault reads of that.
 std::function<void(const std::string&)> WarningsOf(const ctl::CommandLine& line) {
@@ -90,7 +89,7 @@ int RunDemo(ctl::CommandLine line, Process& process) {
   const QTemporaryDir scratch;
   DemoBench bench(process.clock, process.timers);
   const auto device = bench.ports.CreateDevice();
-  FileCommandLog log(std::filesystem::path(scratch.filePath(QStringLiteral("HUtest.txt")).toStdString()));
+  FileCommandLog log(ToPath(scratch.filePath(QStringLiteral("HUtest.txt"))));
   VirtualTcpSocket socket(bench.panel, kDemoListenerPort, process.timers);
   MemoryRegistry store;
   const DemoProcesses processes;
@@ -104,13 +103,9 @@ int Main() {
     const bool json = QCoreApplication::arguments().contains(QStringLiteral("--json"));
     return ctl::PrintEarlyEnd(*end, json, process.terminal);
   }
-#ifndef _WIN32
-  // A port is given back even when nothing reads the output any more, or a file becomes too large.
-  std::signal(SIGPIPE, SIG_IGN);
-  std::signal(SIGXFSZ, SIG_IGN);
+  PrepareStreams();
   std::optional<QuitOnSignal> on_signal;
   process.stop.SetWatch([&] { on_signal.emplace([&process](int signal) { process.stop.Make(signal); }); });
-#endif
   const auto& line = std::get<ctl::CommandLine>(parsed);
   return line.demo ? RunDemo(line, process) : RunOnThisComputer(line, process);
 }
@@ -123,7 +118,7 @@ int main(int argc, char** argv) {
     const QCoreApplication application(argc, argv);
     return tendril::Main();
   } catch (const std::exception& fault) {
-    std::fprintf(stderr, "tendril-ctl: %s\n", fault.what());
+    tendril::Warn(fault.what());
     return tendril::ctl::kExitNotAsWished;
   }
 }

@@ -1,11 +1,11 @@
 #include "app/utility_program.h"
 
-#include <QFile>
 #include <QLoggingCategory>
 #include <string>
 
 #include "app/version.h"
 #include "platform/paths.h"
+#include "platform/qt/path_text.h"
 #include "platform/system_processes.h"
 #include "platform/system_registry.h"
 
@@ -19,8 +19,6 @@ void Trace(const std::string& line) { qCDebug(serial_trace, "%s", line.c_str());
 
 void Warn(const std::string& line) { qCWarning(preferences, "%s", line.c_str()); }
 
-QString PathText(const std::filesystem::path& path) { return QFile(path).fileName(); }
-
 }  // namespace
 
 UtilityProgram::UtilityProgram()
@@ -33,7 +31,7 @@ UtilityProgram::UtilityProgram()
       processes(OpenProcessList()),
       control_panel(platform.timers, platform.boxes, wsCLI, registry, *processes),
       window(Serial1, platform.timers, platform.boxes, control_panel,
-             {kVersion, PathText(CommandLogPath()), PathText(RegistryPath())}) {
+             {kVersion, FromPath(CommandLogPath()), FromPath(RegistryPath())}) {
   Serial1.SetTraceSink(Trace);
   Serial1.SetTraceOutput(serial_trace().isDebugEnabled());
   platform.boxes.SetParent(&window);

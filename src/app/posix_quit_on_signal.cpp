@@ -1,12 +1,13 @@
-#include "app/quit_on_signal.h"
-
 #include <unistd.h>
 
+#include <QSocketNotifier>
 #include <array>
 #include <cerrno>
 #include <csignal>
 #include <system_error>
 #include <utility>
+
+#include "app/quit_on_signal.h"
 
 namespace tendril {
 namespace {
@@ -23,12 +24,22 @@ int OpenPipe() {
 
 }  // namespace
 
-QuitOnSignal::QuitOnSignal(std::function<void(int)> handler) : notifier_(OpenPipe(), QSocketNotifier::Read) {
-  QObject::connect(&notifier_, &QSocketNotifier::activated, &notifier_, [handler = std::move(handler)] {
-    char signal = 0;
-    (void)!::read(wake_pipe[0], &signal, 1);  // the application may go on for a while
-    handler(signal);
-  });
+class QuitOnSignal::Delivery {
+ public:
+  explicit Delivery(std::function<void(int)> handler) : notifier_(OpenPipe(), QSocketNotifier::Read) {
+    QObject::connect(&notifier_, &QSocketNotifier::activated, &notifier_, [handler = std::move(handler)] {
+      char signal = 0;
+      (void)!::read(wake_pipe[0], &signal, 1);  // the application may go on for a while
+      handler(signal);
+    });
+  }
+
+ private:
+  QSocketNotifier notifier_;
+};
+
+QuitOnSignal::QuitOnSignal(std::function<void(int)> handler)
+    : delivery_(std::make_unique<Delivery>(std::move(handler))) {
   struct sigaction action = {};
   action.sa_handler = [](int signal) {
     const char number = static_cast<char>(signal);
