@@ -6,7 +6,7 @@
 
 int main(int argc, char** argv) {
   QApplication application(argc, argv);
-#ifndef _WIN32  // there the system closes the window instead
+#ifndef _WIN32                                 // there the system closes the window instead
   const tendril::QuitOnSignal quit_on_signal;  // a port is given back then too
 #endif
   tendril::UtilityProgram program;

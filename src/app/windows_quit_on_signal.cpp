@@ -77,7 +77,8 @@ class QuitOnSignal::Delivery {
   Delivery& operator=(const Delivery&) = delete;
 
   void Deliver(int signal) {
-    QMetaObject::invokeMethod(&context_, [this, signal] { handler_(signal); }, Qt::QueuedConnection);
+    QMetaObject::invokeMethod(
+        &context_, [this, signal] { handler_(signal); }, Qt::QueuedConnection);
     ::CancelSynchronousIo(main_thread_);  // it may wait for a reader that stands still
   }
 

@@ -38,9 +38,8 @@ class EscapeSequences {
  public:
   explicit EscapeSequences(HANDLE console) : console_(console) {
     is_console_ = ::GetConsoleMode(console_, &before_) != 0;
-    understood_ =
-        is_console_ && ::SetConsoleMode(console_, before_ | ENABLE_PROCESSED_OUTPUT |
-                                                      ENABLE_VIRTUAL_TERMINAL_PROCESSING) != 0;
+    understood_ = is_console_ && ::SetConsoleMode(console_, before_ | ENABLE_PROCESSED_OUTPUT |
+                                                                ENABLE_VIRTUAL_TERMINAL_PROCESSING) != 0;
   }
   ~EscapeSequences() {
     if (understood_) ::SetConsoleMode(console_, before_);
@@ -109,9 +108,9 @@ std::error_code WriteAll(Stream stream, std::string_view text) {
 std::string ReasonText(const std::error_code& fault) {
   if (fault.category() != std::system_category()) return fault.message();
   wchar_t text[512];
-  const DWORD size = ::FormatMessageW(FORMAT_MESSAGE_FROM_SYSTEM | FORMAT_MESSAGE_IGNORE_INSERTS |
-                                          FORMAT_MESSAGE_MAX_WIDTH_MASK,
-                                      nullptr, static_cast<DWORD>(fault.value()), 0, text, 512, nullptr);
+  const DWORD size = ::FormatMessageW(
+      FORMAT_MESSAGE_FROM_SYSTEM | FORMAT_MESSAGE_IGNORE_INSERTS | FORMAT_MESSAGE_MAX_WIDTH_MASK, nullptr,
+      static_cast<DWORD>(fault.value()), 0, text, 512, nullptr);
   std::wstring_view reason(text, size);
   const auto end = reason.find_last_not_of(L" .\r\n");
   reason = reason.substr(0, end + 1);
