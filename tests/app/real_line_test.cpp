@@ -38,7 +38,9 @@ class RealLine : public testing::Test, protected User {
   }
   // Whatever a test does, the program sets the adapter up like this.
   void TearDown() override {
+#ifdef __linux__
     EXPECT_GT(Adapter().empty_reads, 0u);
+#endif
     ASSERT_FALSE(Adapter().settings.empty());
     EXPECT_EQ(Adapter().settings.front(), EmulatedAdapter::LineSettings());
     ASSERT_FALSE(Adapter().rts.empty());
@@ -83,6 +85,8 @@ TEST_F(RealLine, PortOfTheControlPanel_ChangesHandsAndBack) {
   ASSERT_TRUE(program_->Serial1.PortOpen());
   Press(kSend);
   EXPECT_EQ(Outcome(), "SUCCESS: Send Complete!");
+  Press(kSend);
+  ASSERT_FALSE(Button(kSend).isEnabled());  // it runs
   EXPECT_FALSE(program_->window.close());
   EXPECT_FALSE(program_->Serial1.PortOpen());
   ASSERT_TRUE(QTest::qWaitFor([this] { return !program_->window.isVisible(); }, kMaxWaitMs));
@@ -124,6 +128,7 @@ TEST_F(RealLine, Send_SucceedsWithAndWithoutEcho) {
   EXPECT_TRUE(std::filesystem::exists(CommandLogPath()));
 }
 
+#ifdef __linux__  // wine has no such faults
 TEST_F(RealLine, RtsThatFails_FailsTheOpeningAndOtherwiseOnlyThePoll) {
   bench_.Start();
   StartProgram();
@@ -147,6 +152,7 @@ TEST_F(RealLine, RtsThatFails_FailsTheOpeningAndOtherwiseOnlyThePoll) {
   EXPECT_LT(turns_that_fail, 0);
   EXPECT_TRUE(read.empty());
 }
+#endif
 
 // A unit whose ports 3 and 8 differ from what the window starts with; the others hold just that.
 TEST_F(RealLine, Get_TakesOverAllPortsOrNone) {

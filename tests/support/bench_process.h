@@ -1,6 +1,9 @@
 // BenchProcess: a tendril-bench in a process of its own, and the folder in which the program finds its
 // device.
 #pragma once
+#ifdef _WIN32
+#include "support/wine_bench_process.h"
+#else
 
 #include <QByteArray>
 #include <QCoreApplication>
@@ -88,3 +91,4 @@ class BenchProcess {
 };
 
 }  // namespace tendril::test
+#endif

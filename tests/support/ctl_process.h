@@ -15,6 +15,12 @@ namespace tendril::test {
 // TENDRIL_CTL_PROGRAM names the program.
 class CtlProcess {
  public:
+#ifdef _WIN32
+  explicit CtlProcess(const QStringList& arguments, const char* /*redirection*/ = nullptr) {
+    process_.start(QStringLiteral(TENDRIL_CTL_PROGRAM), arguments);
+    process_.closeWriteChannel();
+  }
+#else
   // `redirection`: what a shell does before it becomes the program: "ulimit -f 0", "exec >/dev/full".
   explicit CtlProcess(const QStringList& arguments, const char* redirection = "true") {
     process_.start(QStringLiteral("/bin/sh"),
@@ -24,6 +30,8 @@ class CtlProcess {
                        arguments);
     process_.closeWriteChannel();
   }
+  void Signal(int number) const { ::kill(static_cast<pid_t>(process_.processId()), number); }
+#endif
   ~CtlProcess() {
     process_.kill();
     process_.waitForFinished();
@@ -34,7 +42,6 @@ class CtlProcess {
     return test::WaitFor([&] { return Error().find(text) != std::string::npos || HasEnded(); }) &&
            Error().find(text) != std::string::npos;
   }
-  void Signal(int number) const { ::kill(static_cast<pid_t>(process_.processId()), number); }
   // Waits for its end and returns its exit code; -1 when it crashed or does not end.
   int ExitCode() {
     constexpr int kLongestMs = 60'000;

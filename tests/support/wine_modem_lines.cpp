@@ -1,11 +1,11 @@
 // Gives pseudo-terminals the modem lines that wine asks a serial port for. A library of Linux, for LD_PRELOAD: it takes
-// ioctl() and open() of wine's processes, and all other calls pass unchanged.
+// ioctl(), tcsetattr() and open() of wine's processes, and all other calls pass unchanged.
 //
 //   g++ -shared -fPIC -o wine_modem_lines.so wine_modem_lines.cpp
-//   LD_PRELOAD=$PWD/wine_modem_lines.so TENDRIL_RTS_NOTES=$PWD/rts wine64 program.exe
+//   LD_PRELOAD=$PWD/wine_modem_lines.so TENDRIL_PORT_NOTES=$PWD/notes wine64 program.exe
 //
-// TENDRIL_RTS_NOTES names a file that gets a character for each turn of RTS: "1" asserted, "0" released.
-#include <asm/termbits.h>
+// TENDRIL_PORT_NOTES names a file that gets a line for each turn of RTS, "rts 1" or "rts 0", and for each change of the
+// settings, as in "settings 19200 8 0 1 0": baud, data bits, parity, stop bits, handshaking.
 #include <dlfcn.h>
 #include <fcntl.h>
 #include <linux/serial.h>
@@ -13,10 +13,12 @@
 #include <sys/poll.h>
 #include <sys/stat.h>
 #include <sys/sysmacros.h>
+#include <termios.h>
 #include <unistd.h>
 
 #include <cerrno>
 #include <cstdarg>
+#include <cstdio>
 #include <cstdlib>
 
 namespace {
@@ -38,14 +40,20 @@ bool HungUp(int descriptor) {
   return ::poll(&state, 1, 0) > 0 && (state.revents & POLLHUP) != 0;
 }
 
+void Note(const char* format, ...) {
+  const char* const notes = std::getenv("TENDRIL_PORT_NOTES");
+  const int file = notes == nullptr ? -1 : ::open(notes, O_WRONLY | O_CREAT | O_APPEND | O_CLOEXEC, 0644);
+  if (file < 0) return;
+  va_list arguments;
+  va_start(arguments, format);
+  ::vdprintf(file, format, arguments);
+  va_end(arguments);
+  ::close(file);
+}
+
 void SetOutputs(int outputs) {
-  const char* const notes = std::getenv("TENDRIL_RTS_NOTES");
-  if (((lines ^ outputs) & TIOCM_RTS) != 0 && notes != nullptr) {
-    const int file = ::open(notes, O_WRONLY | O_CREAT | O_APPEND | O_CLOEXEC, 0644);
-    if (::write(file, (outputs & TIOCM_RTS) != 0 ? "1" : "0", 1) != 1) std::abort();
-    ::close(file);
-  }
   lines = kInputs | (outputs & kOutputs);
+  Note("rts %d\n", (lines & TIOCM_RTS) != 0);
 }
 
 // Returns whether the request is one that a pseudo-terminal does not know.
@@ -98,6 +106,18 @@ extern "C" int ioctl(int descriptor, unsigned long request, ...) noexcept {
     return -1;
   }
   return Answer(request, argument) ? 0 : real(descriptor, request, argument);
+}
+
+extern "C" int tcsetattr(int descriptor, int actions, const termios* settings) noexcept {
+  static auto* const real = Real<int(int, int, const termios*)>("tcsetattr");
+  const tcflag_t flags = settings->c_cflag;
+  const int baud = ::cfgetospeed(settings) == B19200 ? 19200 : 0;  // or another
+  const bool handshaking = (flags & CRTSCTS) != 0 || (settings->c_iflag & (IXON | IXOFF)) != 0;
+  if (IsPseudoTerminal(descriptor)) {
+    Note("settings %d %d %d %d %d\n", baud, 5 + static_cast<int>((flags & CSIZE) / CS6),
+         (flags & PARENB) != 0, (flags & CSTOPB) != 0 ? 2 : 1, handshaking);
+  }
+  return real(descriptor, actions, settings);
 }
 
 // The device must not become wineserver's controlling terminal: its loss would be a signal to wineserver.
