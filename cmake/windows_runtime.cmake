@@ -26,6 +26,7 @@ endforeach()
 # The tests use these besides.
 list(APPEND runtime_libraries "${qt_libraries}/Qt6Test.dll")
 list(APPEND runtime_plugins platforms/qoffscreen.dll)
+file(MAKE_DIRECTORY "${CMAKE_RUNTIME_OUTPUT_DIRECTORY}")
 foreach(library ${runtime_libraries})
   get_filename_component(name "${library}" NAME)
   file(CREATE_LINK "${library}" "${CMAKE_RUNTIME_OUTPUT_DIRECTORY}/${name}" SYMBOLIC)

@@ -84,7 +84,7 @@ TEST_F(CtlProgram, WrongUseAndBadFiles_EndWith2WithoutAPort) {
 
 TEST_F(CtlProgram, PortThatCannotBeOpened_EndsWith3) {
   Expect("get 01 --port 1", 3, "Comm 1");  // its link leads nowhere
-#ifdef __linux__  // wine lets several programs open a port
+#ifdef __linux__
   bench_.Start();
   const auto hold = std::make_unique<SerialHold>(QFileInfo(bench_.Link()).canonicalFilePath().toStdString());
   Expect("get 01 --port 1", 3, ("process " + std::to_string(::getpid())).c_str());

@@ -241,9 +241,14 @@ TEST_F(UnitFiles, ABadFile_IsRefusedBeforeAnythingIsSent) {
   const QByteArray compact = TextOf("wide.json").simplified();
   Write("large.json",
         QByteArray(compact).insert(1, "\"note\": \"" + QByteArray(1'048'500 - compact.size(), 'x') + "\","));
+#ifdef _WIN32
+  const std::string no_such_file = "File not found.";
+#else
+  const std::string no_such_file = "No such file or directory.";
+#endif
   using Case = std::pair<const char*, std::string>;
   for (const auto& [words, error] : {
-           Case{"send none.json 05", "none.json cannot be read: No such file or directory."},
+           Case{"send none.json 05", "none.json cannot be read: " + no_such_file},
            Case{"send . 05", ". is a folder, not a file."},
            Case{"send list.json 05", "list.json: line 1: this is no configuration, which begins with {."},
            Case{"compare later.json 05", "later.json: version: 2 is not 1, the one known here."},
@@ -252,13 +257,16 @@ TEST_F(UnitFiles, ABadFile_IsRefusedBeforeAnythingIsSent) {
            Case{"restore none", "There is no folder none."},
            Case{"restore .", "The folder . has no backup: no file like unit-0A.json."},
            Case{"restore half", "half/unit-06.json: line 13: this is not JSON (unterminated string)."},
-           Case{"restore half 05,07", "half/unit-07.json cannot be read: No such file or directory."},
+           Case{"restore half 05,07", "half/unit-07.json cannot be read: " + no_such_file},
            Case{"restore set",
                 "set/unit-05.json: it was read from unit 06; --yes writes it into unit 05 all the same."},
            Case{"restore strange",
                 "strange/unit-fe.json: a unit at FE cannot be reached through an adapter with an echo: IDs "
                 "are 01 to FD."},
-           Case{"restore linked", "linked/unit-05.json cannot be read: No such file or directory."},
+#ifdef __linux__
+           Case{"restore linked", "linked/unit-05.json cannot be read: " + no_such_file},
+           Case{"get 05 --output /dev/null --force", "/dev/null is not a regular file."},
+#endif
            Case{"show large.json", "large.json: with a field a line, the text is larger than 1 MiB."},
            Case{"send ./half/unit-05.json 06,05 --backup half --force",
                 "The backup half/unit-05.json would overwrite a file that this command reads: choose another "
@@ -268,7 +276,6 @@ TEST_F(UnitFiles, ABadFile_IsRefusedBeforeAnythingIsSent) {
            Case{"get 05 --output linked/unit-05.json",
                 "linked/unit-05.json exists already; --force overwrites it."},
            Case{"get 05 --output wide.json", "wide.json exists already; --force overwrites it."},
-           Case{"get 05 --output /dev/null --force", "/dev/null is not a regular file."},
            Case{"backup wide.json 05", "wide.json/unit-05.json cannot be written: "},
        }) {
     EXPECT_EQ(Type(words), 2) << words;

@@ -34,7 +34,7 @@ class BenchProcess {
   void Start(const QStringList& options = {}, bool printing = false) {
     QFile::remove(folder_.filePath(QStringLiteral("bench.txt")));
     const QStringList quiet = printing ? QStringList() : QStringList{QStringLiteral("--quiet")};
-    Run("cd \"$0\" && { \"$@\" >bench.txt & } && echo $! >process && wait;"
+    Run("unset LD_PRELOAD && cd \"$0\" && { \"$@\" >bench.txt & } && echo $! >process && wait;"
         "ln -s /nowhere nowhere && mv -T nowhere \"$3\" && rm process",
         QStringList{folder_.path().mid(2), QStringLiteral(TENDRIL_BENCH_PROGRAM), QStringLiteral("--link"),
                     qEnvironmentVariable("WINEPREFIX") + QStringLiteral("/dosdevices/com1")} +

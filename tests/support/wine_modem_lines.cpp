@@ -9,6 +9,7 @@
 #include <dlfcn.h>
 #include <fcntl.h>
 #include <linux/serial.h>
+#include <sys/file.h>
 #include <sys/ioctl.h>
 #include <sys/poll.h>
 #include <sys/stat.h>
@@ -120,12 +121,18 @@ extern "C" int tcsetattr(int descriptor, int actions, const termios* settings) n
   return real(descriptor, actions, settings);
 }
 
-// The device must not become wineserver's controlling terminal: its loss would be a signal to wineserver.
+// The device is for one program alone, as on Windows; and it must not become wineserver's controlling terminal, since its
+// loss would be a signal to wineserver.
 extern "C" int open(const char* path, int flags, ...) {
   static auto* const real = Real<int(const char*, int, ...)>("open");
   va_list arguments;
   va_start(arguments, flags);
   const mode_t mode = (flags & (O_CREAT | O_TMPFILE)) != 0 ? va_arg(arguments, mode_t) : 0;
   va_end(arguments);
-  return real(path, flags | O_NOCTTY, mode);
+  const int descriptor = real(path, flags | O_NOCTTY, mode);
+  if (descriptor < 0 || !IsPseudoTerminal(descriptor) || ::flock(descriptor, LOCK_EX | LOCK_NB) == 0)
+    return descriptor;
+  ::close(descriptor);
+  errno = EACCES;
+  return -1;
 }

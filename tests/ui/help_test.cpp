@@ -1,6 +1,7 @@
 // What the help menu opens: the facts about the program, and the manual.
 #include <QClipboard>
 #include <QDesktopServices>
+#include <QDir>
 #include <QLineEdit>
 #include <QPushButton>
 #include <QTextBrowser>
@@ -45,7 +46,8 @@ TEST_F(Window, Manual_IsOpenedOrTheUserSeesWhereItIs) {
   QDesktopServices::unsetUrlHandler(QStringLiteral("file"));
   OpenManual(world_.boxes);  // this platform opens nothing
   ASSERT_EQ(world_.boxes.shown.size(), 1u);
-  EXPECT_THAT(world_.boxes.shown[0].text, HasSubstr(viewer.source().toLocalFile().toStdString()));
+  EXPECT_THAT(world_.boxes.shown[0].text,
+              HasSubstr(QDir::toNativeSeparators(viewer.source().toLocalFile()).toStdString()));
 }
 
 }  // namespace

@@ -19,11 +19,10 @@ TEST_F(Window, StatusLine_SaysTheOutcomeAndCanBeCopied) {
   window_->findChild<StatusLine*>()->Copy();
   const std::string outcome = Accessible("lblStatus").text(QAccessible::Name).toStdString();
   EXPECT_THAT(outcome,
-              testing::MatchesRegex(
-                  "Sending to unit 01 at [0-9][0-9]:[0-9][0-9]: SUCCESS: Send Complete! Ports 1 to 8 are "
-                  "written. What it held before is not known: it was not read."));
+              testing::MatchesRegex("Sending to unit 01 at ..:..: SUCCESS: Send Complete! Ports 1 to 8 are "
+                                    "written. What it held before is not known: it was not read."));
   EXPECT_THAT(Copied(), testing::StartsWith(outcome + "\nNothing moves\n"));
-  EXPECT_THAT(Copied(), testing::ContainsRegex("\nUnit 01 answered at [0-9:]+\nSent to 01 at"));
+  EXPECT_THAT(Copied(), testing::ContainsRegex("\nUnit 01 answered at .+\nSent to 01 at"));
   EXPECT_EQ(Accessible("lblStatus").role(), QAccessible::Notification);
 }
 
