@@ -1,4 +1,5 @@
 // tendril-ctl: sets up Tendril units from a terminal and from scripts.
+#include <QAbstractEventDispatcher>
 #include <QCoreApplication>
 #include <QDateTime>
 #include <QEventLoop>
@@ -42,9 +43,15 @@ std::function<void(const std::string&)> WarningsOf(const ctl::CommandLine& line)
   };
 }
 
+// On Windows a call that waits for events first sends those that are posted, and waits for others then. So it is made
+// only when none was left.
 struct EventLoopWaiting final : ctl::Waiting {
   void Until(const std::function<bool()>& done) override {
-    while (!done()) QCoreApplication::processEvents(QEventLoop::WaitForMoreEvents);
+    auto& events = *QAbstractEventDispatcher::instance();
+    while (!done()) {
+      if (!events.processEvents(QEventLoop::AllEvents) && !done())
+        events.processEvents(QEventLoop::WaitForMoreEvents);
+    }
   }
 };
 

@@ -1,7 +1,9 @@
 // tendril-demo: the utility's window on a virtual bench inside the process, for trying it without hardware.
 #include <QApplication>
 #include <QCommandLineParser>
+#include <cstdlib>
 
+#include "app/caller_terminal.h"
 #include "app/demo_program.h"
 #include "ui/appearance.h"
 
@@ -16,7 +18,17 @@ int main(int argc, char** argv) {
   parser.addHelpOption();
   const QCommandLineOption dark(QStringLiteral("dark"), QStringLiteral("Light text on a dark background."));
   parser.addOption(dark);
-  parser.process(application);
+  if (!parser.parse(QCoreApplication::arguments())) {
+    tendril::ShowInTerminal(
+        tendril::Stream::kError,
+        QStringLiteral("%1: %2\n").arg(QCoreApplication::applicationName(), parser.errorText()));
+    return EXIT_FAILURE;
+  }
+  if (parser.isSet(QStringLiteral("help"))) {
+    tendril::ShowInTerminal(tendril::Stream::kOutput, parser.helpText());
+    return EXIT_SUCCESS;
+  }
+  parser.process(application);  // the options of Qt
   if (parser.isSet(dark)) tendril::SetDarkAppearance(true);
   tendril::DemoProgram program;
   program.window.show();

@@ -16,9 +16,9 @@ namespace {
 
 using namespace Qt::StringLiterals;
 
-// "show.json cannot be read: No such file or directory."
+// "show.json cannot be read: No such file or directory." On Windows the reason ends in a full stop of its own.
 QString Cannot(const QString& path, QLatin1StringView what, const QString& reason) {
-  return u"%1 cannot be %2: %3."_s.arg(path, what, reason);
+  return u"%1 cannot be %2: %3"_s.arg(path, what, reason) + (reason.endsWith(u'.') ? u""_s : u"."_s);
 }
 
 // The nearest folder above `path` that exists.
@@ -43,7 +43,7 @@ QString WhyNotReplaced(const QString& path, const CommandLine& line) {
 }
 
 QString CreateFolderOf(const QString& path) {
-  const QString folder = QFileInfo(path).absolutePath();
+  const QString folder = QDir::toNativeSeparators(QFileInfo(path).absolutePath());
   std::error_code fault;
   std::filesystem::create_directories(folder.toStdU16String(), fault);
   return fault
@@ -87,16 +87,18 @@ QJsonObject AsJson(const QByteArray& configuration) {
 QString UnitFileName(std::uint8_t unit) { return u"unit-%1.json"_s.arg(IdText(unit)); }
 
 QString UnitFilePath(const QString& folder, std::uint8_t unit) {
-  return folder.isEmpty() ? UnitFileName(unit) : QDir(folder).filePath(UnitFileName(unit));
+  if (folder.isEmpty()) return UnitFileName(unit);
+  return QDir::toNativeSeparators(QDir(folder).filePath(UnitFileName(unit)));
 }
 
 QString WhyNotWritable(const QString& path, const CommandLine& line) {
   QString reason = WhyNotReplaced(path, line);
   if (!reason.isEmpty()) return reason;
   const QFileInfo folder = FolderOf(path);
-  if (!folder.isDir()) return Cannot(path, "written"_L1, u"%1 is not a folder"_s.arg(folder.filePath()));
+  const QString name = QDir::toNativeSeparators(folder.filePath());
+  if (!folder.isDir()) return Cannot(path, "written"_L1, u"%1 is not a folder"_s.arg(name));
   if (!folder.isWritable())
-    return Cannot(path, "written"_L1, u"the folder %1 is write-protected"_s.arg(folder.filePath()));
+    return Cannot(path, "written"_L1, u"the folder %1 is write-protected"_s.arg(name));
   return {};
 }
 

@@ -1,4 +1,5 @@
 // Commands that read units into files: get and backup.
+#include <QDir>
 #include <QFileInfo>
 #include <algorithm>
 #include <cstdint>
@@ -80,7 +81,8 @@ Report Get(Job& job) {
   const CommandLine& line = job.line;
   const bool one = line.units.size() == 1;
   if (one && line.output.isEmpty()) return GetToOutput(job);
-  const bool folder = !one || line.output.endsWith(u'/') || QFileInfo(line.output).isDir();
+  const bool names_folder = QDir::fromNativeSeparators(line.output).endsWith(u'/');
+  const bool folder = !one || names_folder || QFileInfo(line.output).isDir();
   const PathOfUnit path_of = [&](std::uint8_t unit) {
     return folder ? UnitFilePath(line.output, unit) : line.output;
   };

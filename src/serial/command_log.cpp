@@ -6,6 +6,7 @@
 #include <utility>
 
 #include "platform/runtime_error.h"
+#include "platform/unicode.h"
 
 namespace tendril {
 
@@ -18,7 +19,8 @@ void FileCommandLog::Append(std::string_view line) {
   file << line << '\n';
   file.close();
   if (!file) {
-    throw RuntimeError(kErrPathAccess, "The command log \"" + path_.string() + "\" cannot be written");
+    throw RuntimeError(kErrPathAccess,
+                       "The command log \"" + Utf8(path_.u16string()) + "\" cannot be written");
   }
 }
 
