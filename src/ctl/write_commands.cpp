@@ -101,7 +101,8 @@ std::vector<BackupFile> BackupFiles(const CommandLine& line) {
   const QDir folder(line.folder);
   // Also what cannot be read, like a link to nothing: a backup is restored as a whole or not at all.
   for (const QString& name : folder.entryList(QDir::AllEntries | QDir::Hidden | QDir::System)) {
-    if (const auto unit = UnitOfName(name)) files.push_back({*unit, QDir::toNativeSeparators(folder.filePath(name))});
+    if (const auto unit = UnitOfName(name))
+      files.push_back({*unit, QDir::toNativeSeparators(folder.filePath(name))});
   }
   std::ranges::sort(files, {}, &BackupFile::unit);
   return files;
