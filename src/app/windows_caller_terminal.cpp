@@ -14,34 +14,32 @@ DWORD NumberOf(Stream stream) { return stream == Stream::kError ? STD_ERROR_HAND
 // The console of the process that has started this one. Its prompt may stand there already.
 class CallerConsole {
  public:
-  explicit CallerConsole(Stream stream) : stream_(stream), before_(::GetStdHandle(NumberOf(stream))) {
-    attached_ = ::AttachConsole(ATTACH_PARENT_PROCESS) != 0;
-    if (!attached_) return;
+  explicit CallerConsole(Stream stream)
+      : stream_(stream),
+        before_(::GetStdHandle(NumberOf(stream))),
+        attached_(::AttachConsole(ATTACH_PARENT_PROCESS)) {
     console_ = ::CreateFileW(L"CONOUT$", GENERIC_READ | GENERIC_WRITE, FILE_SHARE_READ | FILE_SHARE_WRITE,
                              nullptr, OPEN_EXISTING, 0, nullptr);
     ::SetStdHandle(NumberOf(stream_), console_);
   }
   ~CallerConsole() {
-    if (!attached_) return;
     ::SetStdHandle(NumberOf(stream_), before_);
     ::CloseHandle(console_);
-    ::FreeConsole();  // what happens to it is nothing to this process
+    if (attached_ != 0) ::FreeConsole();  // what happens to it is nothing to this process
   }
   CallerConsole(const CallerConsole&) = delete;
   CallerConsole& operator=(const CallerConsole&) = delete;
 
   bool Print(const QString& text) const {
-    if (!attached_) return false;
     CONSOLE_SCREEN_BUFFER_INFO about = {};
-    const bool line_begun =
-        ::GetConsoleScreenBufferInfo(console_, &about) != 0 && about.dwCursorPosition.X != 0;
-    return !WriteAll(stream_, (line_begun ? "\n" : "") + text.toStdString());
+    if (::GetConsoleScreenBufferInfo(console_, &about) == 0) return false;
+    return !WriteAll(stream_, (about.dwCursorPosition.X != 0 ? "\n" : "") + text.toStdString());
   }
 
  private:
   Stream stream_;
   HANDLE before_;
-  bool attached_ = false;
+  BOOL attached_;
   HANDLE console_ = nullptr;
 };
 
