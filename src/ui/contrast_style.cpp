@@ -82,6 +82,7 @@ void ContrastStyle::polish(QPalette& palette) {
 
 void ContrastStyle::drawPrimitive(PrimitiveElement element, const QStyleOption* option, QPainter* painter,
                                   const QWidget* widget) const {
+  if (element == PE_FrameStatusBarItem) return;  // a lone line at the window's end, in the style of Windows
   if (!draws_edges_) return QProxyStyle::drawPrimitive(element, option, painter, widget);
   if (element == PE_FrameGroupBox) {
     const int title = std::max(pixelMetric(PM_ExclusiveIndicatorHeight), option->fontMetrics.height());
