@@ -1,12 +1,16 @@
 #include "app/demo_program.h"
 
+#include <QDir>
+
 #include "app/version.h"
 #include "platform/qt/path_text.h"
 
 namespace tendril {
 namespace {
 
-QString DemoLog(const QTemporaryDir& scratch) { return scratch.filePath(QStringLiteral("HUtest.txt")); }
+QString DemoLog(const QTemporaryDir& scratch) {
+  return QDir::toNativeSeparators(scratch.filePath(QStringLiteral("HUtest.txt")));
+}
 
 }  // namespace
 
