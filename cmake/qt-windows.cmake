@@ -4,7 +4,8 @@ set(QT_BUILD_EXAMPLES OFF CACHE BOOL "")
 set(QT_BUILD_TESTS OFF CACHE BOOL "")
 foreach(feature
     concurrent dbus printsupport sql xml  # modules
-    direct2d gif jpeg networklistmanager pdf pkg_config ssl system_zlib tuiotouch vulkan zstd)
+    direct2d1_1 directwrite3 gif jpeg networklistmanager pdf pkg_config schannel ssl system_zlib tuiotouch vulkan zstd
+    tabletevent)  # Debian's source has no wintab.h
   set(FEATURE_${feature} OFF CACHE BOOL "")
 endforeach()
 set(INPUT_opengl no CACHE STRING "")
