@@ -67,6 +67,10 @@ without_display() {
 # configure PRESET: when needed.
 configure() {
   require_packages "${build_packages[@]}"
+  if [ "$1" = windows-qt ] && ! grep -qsxF "CMAKE_PREFIX_PATH:UNINITIALIZED=$TENDRIL_WINDOWS_QT" build/windows-qt/CMakeCache.txt
+  then
+    rm -rf build/windows-qt  # there is none, or it is made with another Qt
+  fi
   [ ! -f "build/$1/build.ninja" ] || return 0
   say "Configuring ($1)"
   cmake --preset "$1" >/dev/null
