@@ -7,7 +7,6 @@
 #include <string>
 
 #include "platform/paths.h"
-#include "platform/port_names.h"
 #include "platform/standard_streams.h"
 #include "serial/command_log.h"
 
@@ -60,10 +59,6 @@ TEST(WindowsSystem, PipeThatNothingReads_HasAReasonWithoutAStop) {
   EXPECT_NE(ReasonText(fault).back(), '.');
   EXPECT_EQ(ReasonText({ERROR_FILE_NOT_FOUND, std::system_category()}).find_last_of(".\r\n"),
             std::string::npos);
-}
-
-TEST(WindowsSystem, NumbersWithoutADevice_AreNotFound) {
-  for (const int number : {-1, 0, 251}) EXPECT_EQ(FindSerialDevice(number), std::nullopt) << number;
 }
 
 }  // namespace

@@ -4,16 +4,16 @@
 
 #include "platform/port_names.h"
 #include "platform/qt/system_serial_port.h"
-#include "platform/windows/comm_port.h"
+#include "platform/windows/serial_handle.h"
 
 namespace tendril {
 namespace {
 
-class WindowsSerialPort final : public CommPort {
+class WindowsSerialPort final : public SerialHandle {
  public:
   WindowsSerialPort(const std::filesystem::path& device, std::int32_t baud, std::function<void()> on_readable,
                     std::function<void()> on_writable)
-      : CommPort(device, baud), arrived_(arrived()), read_(read()), written_(written()) {
+      : SerialHandle(device, baud), arrived_(arrived()), read_(read()), written_(written()) {
     written_.setEnabled(false);
     const auto notified = [this, on_readable = std::move(on_readable)] {
       on_readable();

@@ -1,4 +1,4 @@
-#include "platform/windows/comm_port.h"
+#include "platform/windows/serial_handle.h"
 
 #include <windows.h>
 
@@ -26,6 +26,7 @@ RuntimeError WhyNotOpen(const std::filesystem::path& device, DWORD error) {
   switch (error) {
     case ERROR_FILE_NOT_FOUND:
     case ERROR_PATH_NOT_FOUND:
+    case ERROR_DEV_NOT_EXIST:
     case ERROR_DEVICE_NOT_CONNECTED:
       return NoSuchDevice(device);
     case ERROR_ACCESS_DENIED:
@@ -45,6 +46,8 @@ DCB LineSettings(DWORD baud) {
   settings.fBinary = TRUE;
   settings.fDtrControl = DTR_CONTROL_ENABLE;
   settings.fRtsControl = RTS_CONTROL_ENABLE;
+  settings.XonChar = 0x11;  // drivers refuse two that are equal, also where they are not used
+  settings.XoffChar = 0x13;
   settings.ByteSize = 8;
   settings.Parity = NOPARITY;
   settings.StopBits = ONESTOPBIT;
@@ -53,9 +56,9 @@ DCB LineSettings(DWORD baud) {
 
 }  // namespace
 
-void CommPort::Closer::operator()(Handle handle) const { CloseHandle(handle); }
+void SerialHandle::Closer::operator()(Handle handle) const { CloseHandle(handle); }
 
-CommPort::OpenHandle CommPort::Open(const std::filesystem::path& device) {
+SerialHandle::OpenHandle SerialHandle::Open(const std::filesystem::path& device) {
   const std::wstring name = L"\\\\.\\" + device.wstring();  // from COM10 on, the name alone is a file's
   const HANDLE port = CreateFileW(name.c_str(), GENERIC_READ | GENERIC_WRITE, 0, nullptr, OPEN_EXISTING,
                                   FILE_FLAG_OVERLAPPED, nullptr);
@@ -63,7 +66,7 @@ CommPort::OpenHandle CommPort::Open(const std::filesystem::path& device) {
   return OpenHandle(port);
 }
 
-CommPort::CommPort(const std::filesystem::path& device, std::int32_t baud)
+SerialHandle::SerialHandle(const std::filesystem::path& device, std::int32_t baud)
     : device_(device),
       port_(Open(device)),
       wait_(std::make_unique<OverlappedCall>()),
@@ -75,7 +78,7 @@ CommPort::CommPort(const std::filesystem::path& device, std::int32_t baud)
   AwaitNext();
 }
 
-CommPort::~CommPort() {
+SerialHandle::~SerialHandle() {
   // First the mask, which ends the wait: a wait that is only cancelled may never end while bytes are being sent.
   SetCommMask(port_.get(), 0);
   CancelIoEx(port_.get(), nullptr);
@@ -84,7 +87,7 @@ CommPort::~CommPort() {
   for (auto* call : {&wait_, &read_, &write_}) OverlappedCall::Abandon(std::move(*call));
 }
 
-void CommPort::Configure(std::int32_t baud) {
+void SerialHandle::Configure(std::int32_t baud) {
   DCB settings = LineSettings(static_cast<DWORD>(baud));
   // A read returns at once with what is there; a write has no time limit.
   COMMTIMEOUTS limits = {MAXDWORD, 0, 0, 0, 0};
@@ -99,12 +102,12 @@ void CommPort::Configure(std::int32_t baud) {
                                               " bit/s: " + SystemText(error) + ".");
 }
 
-CommPort::Handle CommPort::arrived() const { return wait_->event(); }
-CommPort::Handle CommPort::read() const { return read_->event(); }
-CommPort::Handle CommPort::written() const { return write_->event(); }
+SerialHandle::Handle SerialHandle::arrived() const { return wait_->event(); }
+SerialHandle::Handle SerialHandle::read() const { return read_->event(); }
+SerialHandle::Handle SerialHandle::written() const { return write_->event(); }
 
 // Reads before it waits again: a wait that is begun earlier reports the bytes that are read now once more.
-std::size_t CommPort::Read(std::span<std::uint8_t> buffer) {
+std::size_t SerialHandle::Read(std::span<std::uint8_t> buffer) {
   if (lost_) return 0;
   if (unread_.empty()) unread_ = Receive();
   const std::size_t got = std::min(buffer.size(), unread_.size());
@@ -115,7 +118,7 @@ std::size_t CommPort::Read(std::span<std::uint8_t> buffer) {
   return got;
 }
 
-std::span<const std::uint8_t> CommPort::Receive() {
+std::span<const std::uint8_t> SerialHandle::Receive() {
   const auto begin = [this](OVERLAPPED* record) {
     return ReadFile(port_.get(), read_->bytes.data(), static_cast<DWORD>(read_->bytes.size()), nullptr,
                     record);
@@ -129,7 +132,7 @@ std::span<const std::uint8_t> CommPort::Receive() {
   return std::span(read_->bytes).first(end->bytes);
 }
 
-void CommPort::AwaitNext() {
+void SerialHandle::AwaitNext() {
   if (wait_->begun()) {
     const auto end = wait_->TakeEnd(port_.get());
     if (!end) return;
@@ -141,7 +144,7 @@ void CommPort::AwaitNext() {
   }) != ERROR_SUCCESS;
 }
 
-std::size_t CommPort::Write(std::span<const std::uint8_t> bytes) {
+std::size_t SerialHandle::Write(std::span<const std::uint8_t> bytes) {
   const auto check = [this](DWORD error) {
     if (error == ERROR_SUCCESS) return;
     throw RuntimeError(kErrDeviceIo, device_.string() + " cannot be written to: " + SystemText(error) + ".");
@@ -161,20 +164,20 @@ std::size_t CommPort::Write(std::span<const std::uint8_t> bytes) {
 }
 
 // A driver may count the bytes of the write that it is at, or leave them out.
-std::size_t CommPort::QueuedOutput() const {
+std::size_t SerialHandle::QueuedOutput() const {
   COMSTAT state = {};
   DWORD errors = 0;
   ClearCommError(port_.get(), &errors, &state);
   return std::max<std::size_t>(state.cbOutQue, write_->running() ? in_write_ : 0);
 }
 
-void CommPort::ClearInput() {
+void SerialHandle::ClearInput() {
   if (read_->begun()) (void)read_->TakeEnd(port_.get());
   unread_ = {};
   PurgeComm(port_.get(), PURGE_RXCLEAR);
 }
 
-bool CommPort::SetRts(bool asserted) {
+bool SerialHandle::SetRts(bool asserted) {
   if (EscapeCommFunction(port_.get(), asserted ? SETRTS : CLRRTS)) return true;
   const DWORD error = GetLastError();
   if (error == ERROR_NOT_SUPPORTED || error == ERROR_INVALID_FUNCTION) return false;
@@ -183,7 +186,7 @@ bool CommPort::SetRts(bool asserted) {
 }
 
 // Windows takes the name of a device away with it, also while the port is open.
-bool CommPort::HungUp() const {
+bool SerialHandle::HungUp() const {
   COMSTAT state = {};
   DWORD errors = 0;
   return lost_ || !ClearCommError(port_.get(), &errors, &state) || !SerialDeviceExists(device_);

@@ -1,4 +1,4 @@
-// CommPort: an open serial port of Windows.
+// SerialHandle: an open serial port of Windows.
 #pragma once
 
 #include <cstddef>
@@ -15,16 +15,16 @@ class OverlappedCall;
 
 // A serial port without the event loop that NotifyWritable() needs. The system reads, writes and waits on its own; each of
 // the three has an event, which stays set until the call that is due is made.
-class CommPort : public SerialPort {
+class SerialHandle : public SerialPort {
  public:
   using Handle = void*;
 
   // Opens `device` ("COM3") at `baud` bit/s, with DTR and RTS asserted; what had arrived before is dropped. Raises
   // kErrInvalidPort, kErrPortAlreadyOpen or kErrSettingsRefused.
-  CommPort(const std::filesystem::path& device, std::int32_t baud);
-  ~CommPort() override;
-  CommPort(const CommPort&) = delete;
-  CommPort& operator=(const CommPort&) = delete;
+  SerialHandle(const std::filesystem::path& device, std::int32_t baud);
+  ~SerialHandle() override;
+  SerialHandle(const SerialHandle&) = delete;
+  SerialHandle& operator=(const SerialHandle&) = delete;
 
   // Set when Read() is due: bytes have arrived, or the device has gone.
   Handle arrived() const;
