@@ -13,8 +13,8 @@ class WindowsSerialPort final : public SerialHandle {
  public:
   WindowsSerialPort(const std::filesystem::path& device, std::int32_t baud, std::function<void()> on_readable,
                     std::function<void()> on_writable)
-      : SerialHandle(device, baud), arrived_(arrived()), read_(read()), written_(written()) {
-    written_.setEnabled(false);
+      : SerialHandle(device, baud), arrived_(arrived()), read_(read()) {
+    written_.setHandle(written());  // which does not enable it: the event is set
     const auto notified = [this, on_readable = std::move(on_readable)] {
       on_readable();
       // The events of a lost device stay set.
