@@ -9,28 +9,54 @@
 namespace tendril {
 namespace {
 
+// Reports an event while it is set. The emulator may report one that has just been switched off: such a report must find
+// the notifier, so it is destroyed by the event loop.
+class Notifier {
+ public:
+  explicit Notifier(void* event) { notifier_->setHandle(event); }
+  ~Notifier() {
+    notifier_->disconnect();
+    notifier_->setEnabled(false);
+    notifier_->deleteLater();
+  }
+  Notifier(const Notifier&) = delete;
+  Notifier& operator=(const Notifier&) = delete;
+
+  void Call(std::function<void()> on_set) {
+    QObject::connect(notifier_, &QWinEventNotifier::activated, notifier_, std::move(on_set));
+  }
+  void SetEnabled(bool enabled) { notifier_->setEnabled(enabled); }
+
+ private:
+  QWinEventNotifier* notifier_ = new QWinEventNotifier;
+};
+
 class WindowsSerialPort final : public SerialHandle {
  public:
   WindowsSerialPort(const std::filesystem::path& device, std::int32_t baud, std::function<void()> on_readable,
                     std::function<void()> on_writable)
-      : SerialHandle(device, baud), arrived_(arrived()), read_(read()) {
-    written_.setHandle(written());  // which does not enable it: the event is set
+      : SerialHandle(device, baud) {
     const auto notified = [this, on_readable = std::move(on_readable)] {
       on_readable();
-      // The events of a lost device stay set.
-      for (QWinEventNotifier* notifier : {&arrived_, &read_}) notifier->setEnabled(!lost());
+      NotifyReadable(!lost());  // the events of a lost device stay set
     };
-    QObject::connect(&arrived_, &QWinEventNotifier::activated, &arrived_, notified);
-    QObject::connect(&read_, &QWinEventNotifier::activated, &read_, notified);
-    QObject::connect(&written_, &QWinEventNotifier::activated, &written_, std::move(on_writable));
+    arrived_.Call(notified);
+    read_.Call(notified);
+    written_.Call(std::move(on_writable));
+    NotifyReadable(true);
   }
 
-  void NotifyWritable(bool enabled) override { written_.setEnabled(enabled); }
+  void NotifyWritable(bool enabled) override { written_.SetEnabled(enabled); }
 
  private:
-  QWinEventNotifier arrived_;
-  QWinEventNotifier read_;
-  QWinEventNotifier written_;
+  void NotifyReadable(bool enabled) {
+    arrived_.SetEnabled(enabled);
+    read_.SetEnabled(enabled);
+  }
+
+  Notifier arrived_{arrived()};
+  Notifier read_{read()};
+  Notifier written_{written()};
 };
 
 }  // namespace
