@@ -36,26 +36,18 @@ class WindowsSerialPort final : public SerialHandle {
   WindowsSerialPort(const std::filesystem::path& device, std::int32_t baud, std::function<void()> on_readable,
                     std::function<void()> on_writable)
       : SerialHandle(device, baud) {
-    const auto notified = [this, on_readable = std::move(on_readable)] {
+    arrived_.Call([this, on_readable = std::move(on_readable)] {
       on_readable();
-      NotifyReadable(!lost());  // the events of a lost device stay set
-    };
-    arrived_.Call(notified);
-    read_.Call(notified);
+      if (lost()) arrived_.SetEnabled(false);  // the event of a lost device stays set
+    });
     written_.Call(std::move(on_writable));
-    NotifyReadable(true);
+    arrived_.SetEnabled(true);
   }
 
   void NotifyWritable(bool enabled) override { written_.SetEnabled(enabled); }
 
  private:
-  void NotifyReadable(bool enabled) {
-    arrived_.SetEnabled(enabled);
-    read_.SetEnabled(enabled);
-  }
-
   Notifier arrived_{arrived()};
-  Notifier read_{read()};
   Notifier written_{written()};
 };
 

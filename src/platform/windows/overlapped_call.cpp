@@ -14,9 +14,9 @@ OverlappedCall::OverlappedCall() {
 }
 
 std::optional<OverlappedCall::End> OverlappedCall::TakeEnd(HANDLE device) {
+  if (WaitForSingleObject(record_.hEvent, 0) != WAIT_OBJECT_0) return std::nullopt;
   End end;
   if (!GetOverlappedResult(device, &record_, &end.bytes, FALSE)) end.error = GetLastError();
-  if (end.error == ERROR_IO_INCOMPLETE) return std::nullopt;
   begun_ = false;
   return end;
 }

@@ -44,7 +44,6 @@ class OverlappedCall {
   static void Abandon(std::unique_ptr<OverlappedCall> call);
 
   std::array<std::uint8_t, 4096> bytes;  // what a read or a write moves
-  DWORD mask = 0;                        // what a wait has seen
 
  private:
   OVERLAPPED record_ = {};

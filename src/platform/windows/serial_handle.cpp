@@ -3,6 +3,7 @@
 #include <windows.h>
 
 #include <algorithm>
+#include <array>
 #include <optional>
 #include <string>
 #include <utility>
@@ -54,6 +55,14 @@ DCB LineSettings(DWORD baud) {
   return settings;
 }
 
+// What waits in the driver; nothing when the device has gone.
+std::optional<COMSTAT> Queues(HANDLE port) {
+  COMSTAT state = {};
+  DWORD errors = 0;
+  if (!ClearCommError(port, &errors, &state)) return std::nullopt;
+  return state;
+}
+
 }  // namespace
 
 void SerialHandle::Closer::operator()(Handle handle) const { CloseHandle(handle); }
@@ -69,78 +78,56 @@ SerialHandle::OpenHandle SerialHandle::Open(const std::filesystem::path& device)
 SerialHandle::SerialHandle(const std::filesystem::path& device, std::int32_t baud)
     : device_(device),
       port_(Open(device)),
-      wait_(std::make_unique<OverlappedCall>()),
       read_(std::make_unique<OverlappedCall>()),
       write_(std::make_unique<OverlappedCall>()) {
   Configure(baud);
   PurgeComm(port_.get(), PURGE_RXCLEAR | PURGE_TXCLEAR);
   SetEvent(written());
-  AwaitNext();
+  BeginRead();
 }
 
 SerialHandle::~SerialHandle() {
-  // First the mask, which ends the wait: a wait that is only cancelled may never end while bytes are being sent.
-  SetCommMask(port_.get(), 0);
   CancelIoEx(port_.get(), nullptr);
   PurgeComm(port_.get(), PURGE_RXCLEAR | PURGE_TXCLEAR);
   port_.reset();
-  for (auto* call : {&wait_, &read_, &write_}) OverlappedCall::Abandon(std::move(*call));
+  for (auto* call : {&read_, &write_}) OverlappedCall::Abandon(std::move(*call));
 }
 
 void SerialHandle::Configure(std::int32_t baud) {
   DCB settings = LineSettings(static_cast<DWORD>(baud));
-  // A read returns at once with what is there; a write has no time limit.
-  COMMTIMEOUTS limits = {MAXDWORD, 0, 0, 0, 0};
+  COMMTIMEOUTS limits = {};                                      // a call ends when all its bytes are moved
   SetupComm(port_.get(), kDriverQueueBytes, kDriverQueueBytes);  // a driver may have its own sizes
-  if (SetCommState(port_.get(), &settings) && SetCommTimeouts(port_.get(), &limits) &&
-      SetCommMask(port_.get(), EV_RXCHAR)) {
-    return;
-  }
+  if (SetCommState(port_.get(), &settings) && SetCommTimeouts(port_.get(), &limits)) return;
   const DWORD error = GetLastError();
   if (HungUp()) throw NoSuchDevice(device_);  // it has gone since it was opened
   throw RuntimeError(kErrSettingsRefused, device_.string() + " cannot be set to " + std::to_string(baud) +
                                               " bit/s: " + SystemText(error) + ".");
 }
 
-SerialHandle::Handle SerialHandle::arrived() const { return wait_->event(); }
-SerialHandle::Handle SerialHandle::read() const { return read_->event(); }
+SerialHandle::Handle SerialHandle::arrived() const { return read_->event(); }
 SerialHandle::Handle SerialHandle::written() const { return write_->event(); }
 
-// Reads before it waits again: a wait that is begun earlier reports the bytes that are read now once more.
 std::size_t SerialHandle::Read(std::span<std::uint8_t> buffer) {
   if (lost_) return 0;
-  if (unread_.empty()) unread_ = Receive();
+  if (unread_.empty()) {
+    const auto end = read_->TakeEnd(port_.get());
+    if (!end) return 0;
+    lost_ = end->error != ERROR_SUCCESS;
+    unread_ = std::span(read_->bytes).first(end->bytes);
+  }
   const std::size_t got = std::min(buffer.size(), unread_.size());
   std::copy_n(unread_.begin(), got, buffer.begin());
   unread_ = unread_.subspan(got);
-  if (got > 0 && got == buffer.size()) SetEvent(read());  // the wait does not report what was there before
-  if (!lost_) AwaitNext();
+  if (unread_.empty() && !lost_) BeginRead();
   return got;
 }
 
-std::span<const std::uint8_t> SerialHandle::Receive() {
-  const auto begin = [this](OVERLAPPED* record) {
-    return ReadFile(port_.get(), read_->bytes.data(), static_cast<DWORD>(read_->bytes.size()), nullptr,
-                    record);
-  };
-  lost_ = !read_->begun() && read_->Begin(begin) != ERROR_SUCCESS;
-  if (lost_) return {};
-  const auto end = read_->TakeEnd(port_.get());
-  if (!end) return {};
-  ResetEvent(read());
-  lost_ = end->error != ERROR_SUCCESS;
-  return std::span(read_->bytes).first(end->bytes);
-}
-
-void SerialHandle::AwaitNext() {
-  if (wait_->begun()) {
-    const auto end = wait_->TakeEnd(port_.get());
-    if (!end) return;
-    lost_ = end->error != ERROR_SUCCESS;
-    if (lost_) return;
-  }
-  lost_ = wait_->Begin([this](OVERLAPPED* record) {
-    return WaitCommEvent(port_.get(), &wait_->mask, record);
+// As much as is there; else the next byte. A driver need not know limits that would let one call do both.
+void SerialHandle::BeginRead() {
+  const DWORD size =
+      std::clamp<DWORD>(Queues(port_.get()).value_or(COMSTAT{}).cbInQue, 1, sizeof read_->bytes);
+  lost_ = read_->Begin([&](OVERLAPPED* record) {
+    return ReadFile(port_.get(), read_->bytes.data(), size, nullptr, record);
   }) != ERROR_SUCCESS;
 }
 
@@ -165,16 +152,14 @@ std::size_t SerialHandle::Write(std::span<const std::uint8_t> bytes) {
 
 // A driver may count the bytes of the write that it is at, or leave them out.
 std::size_t SerialHandle::QueuedOutput() const {
-  COMSTAT state = {};
-  DWORD errors = 0;
-  ClearCommError(port_.get(), &errors, &state);
-  return std::max<std::size_t>(state.cbOutQue, write_->running() ? in_write_ : 0);
+  return std::max<std::size_t>(Queues(port_.get()).value_or(COMSTAT{}).cbOutQue,
+                               write_->running() ? in_write_ : 0);
 }
 
 void SerialHandle::ClearInput() {
-  if (read_->begun()) (void)read_->TakeEnd(port_.get());
-  unread_ = {};
   PurgeComm(port_.get(), PURGE_RXCLEAR);
+  std::array<std::uint8_t, sizeof(OverlappedCall::bytes)> dropped;  // what was read before
+  (void)Read(dropped);
 }
 
 bool SerialHandle::SetRts(bool asserted) {
@@ -186,10 +171,6 @@ bool SerialHandle::SetRts(bool asserted) {
 }
 
 // Windows takes the name of a device away with it, also while the port is open.
-bool SerialHandle::HungUp() const {
-  COMSTAT state = {};
-  DWORD errors = 0;
-  return lost_ || !ClearCommError(port_.get(), &errors, &state) || !SerialDeviceExists(device_);
-}
+bool SerialHandle::HungUp() const { return lost_ || !Queues(port_.get()) || !SerialDeviceExists(device_); }
 
 }  // namespace tendril

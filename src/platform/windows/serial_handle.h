@@ -13,8 +13,8 @@ namespace tendril {
 
 class OverlappedCall;
 
-// A serial port without the event loop that NotifyWritable() needs. The system reads, writes and waits on its own; each of
-// the three has an event, which stays set until the call that is due is made.
+// A serial port without the event loop that NotifyWritable() needs. The system reads and writes on its own; each of the two
+// has an event, which stays set until the call that is due is made.
 class SerialHandle : public SerialPort {
  public:
   using Handle = void*;
@@ -28,8 +28,6 @@ class SerialHandle : public SerialPort {
 
   // Set when Read() is due: bytes have arrived, or the device has gone.
   Handle arrived() const;
-  // Set when Read() is due: it was begun and has ended, or there may be more than it has taken.
-  Handle read() const;
   // Set when Write() is due: what it has begun has ended.
   Handle written() const;
   // The device has gone, and the events stay as they are.
@@ -50,14 +48,12 @@ class SerialHandle : public SerialPort {
 
   static OpenHandle Open(const std::filesystem::path& device);
   void Configure(std::int32_t baud);
-  // Moves what has arrived into this program.
-  std::span<const std::uint8_t> Receive();
-  // Waits for the next byte, unless it waits already.
-  void AwaitNext();
+  // Has the system read what arrives next.
+  void BeginRead();
 
   std::filesystem::path device_;
   OpenHandle port_;
-  std::unique_ptr<OverlappedCall> wait_, read_, write_;
+  std::unique_ptr<OverlappedCall> read_, write_;
   std::span<const std::uint8_t> unread_;  // of what was read
   std::size_t in_write_ = 0;              // bytes
   bool lost_ = false;
