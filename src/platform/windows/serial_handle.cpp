@@ -95,7 +95,8 @@ SerialHandle::~SerialHandle() {
 
 void SerialHandle::Configure(std::int32_t baud) {
   DCB settings = LineSettings(static_cast<DWORD>(baud));
-  COMMTIMEOUTS limits = {};                                      // a call ends when all its bytes are moved
+  // A call ends when all its bytes are moved; a read also 20 ms after a byte, when fewer come than the driver had counted.
+  COMMTIMEOUTS limits = {20, 0, 0, 0, 0};
   SetupComm(port_.get(), kDriverQueueBytes, kDriverQueueBytes);  // a driver may have its own sizes
   if (SetCommState(port_.get(), &settings) && SetCommTimeouts(port_.get(), &limits)) return;
   const DWORD error = GetLastError();
