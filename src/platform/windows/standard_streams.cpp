@@ -9,6 +9,7 @@
 #include <limits>
 
 #include "platform/unicode.h"
+#include "platform/windows/system_text.h"
 
 namespace tendril {
 namespace {
@@ -106,16 +107,8 @@ std::error_code WriteAll(Stream stream, std::string_view text) {
 }
 
 std::string ReasonText(const std::error_code& fault) {
-  if (fault.category() != std::system_category()) return fault.message();
-  wchar_t text[512];
-  const DWORD size = ::FormatMessageW(
-      FORMAT_MESSAGE_FROM_SYSTEM | FORMAT_MESSAGE_IGNORE_INSERTS | FORMAT_MESSAGE_MAX_WIDTH_MASK, nullptr,
-      static_cast<DWORD>(fault.value()), 0, text, 512, nullptr);
-  std::wstring_view reason(text, size);
-  const auto end = reason.find_last_not_of(L" .\r\n");
-  reason = reason.substr(0, end + 1);
-  if (reason.empty()) return "error " + std::to_string(fault.value());
-  return Utf8({reinterpret_cast<const char16_t*>(reason.data()), reason.size()});
+  const bool of_the_system = fault.category() == std::system_category();
+  return of_the_system ? SystemText(static_cast<std::uint32_t>(fault.value())) : fault.message();
 }
 
 void DropTypedInput() { ::FlushConsoleInputBuffer(HandleOf(Stream::kInput)); }
