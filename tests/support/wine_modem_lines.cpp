@@ -1,5 +1,5 @@
 // Gives pseudo-terminals the modem lines that wine asks a serial port for. A library of Linux, for LD_PRELOAD: it takes
-// ioctl(), tcsetattr() and open() of wine's processes, and all other calls pass unchanged.
+// ioctl(), tcsetattr(), read() and open() of wine's processes, and all other calls pass unchanged.
 //
 //   g++ -shared -fPIC -o wine_modem_lines.so wine_modem_lines.cpp
 //   LD_PRELOAD=$PWD/wine_modem_lines.so TENDRIL_PORT_NOTES=$PWD/notes wine64 program.exe
@@ -119,6 +119,15 @@ extern "C" int tcsetattr(int descriptor, int actions, const termios* settings) n
          (flags & PARENB) != 0, (flags & CSTOPB) != 0 ? 2 : 1, handshaking);
   }
   return real(descriptor, actions, settings);
+}
+
+// Wine takes a read that finds nothing for a loss, and a purge may come between its wait and its read.
+extern "C" ssize_t read(int descriptor, void* buffer, std::size_t size) {
+  static auto* const real = Real<ssize_t(int, void*, std::size_t)>("read");
+  const ssize_t got = real(descriptor, buffer, size);
+  if (got != 0 || size == 0 || !IsPseudoTerminal(descriptor) || HungUp(descriptor)) return got;
+  errno = EAGAIN;
+  return -1;
 }
 
 // The device is for one program alone, as on Windows; and it must not become wineserver's controlling terminal, since its
