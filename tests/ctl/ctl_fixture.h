@@ -24,10 +24,10 @@ namespace tendril::test {
 // Keeps what is printed. No terminal, unless a test makes it one.
 struct RecordedTerminal final : ctl::Terminal {
   QString Print(const QByteArray& text) override {
-    out += text.toStdString();
+    out += WithSlashes(text);
     return print_fault;
   }
-  void PrintError(const QByteArray& text) override { error += text.toStdString(); }
+  void PrintError(const QByteArray& text) override { error += WithSlashes(text); }
   int ErrorColumns() const override { return columns; }
   int OutputColumns() const override { return columns; }
   bool Colours() const override { return false; }
@@ -37,6 +37,14 @@ struct RecordedTerminal final : ctl::Terminal {
     return answer;
   }
   bool CanAsk() const override { return answer.has_value(); }
+
+  // Paths have the separators of all other systems. A document of JSON stays as it is.
+  static std::string WithSlashes(QByteArray text) {
+#ifdef _WIN32
+    if (!text.startsWith('{')) text.replace('\\', '/');
+#endif
+    return text.toStdString();
+  }
 
   std::string out;
   std::string error;
