@@ -91,7 +91,7 @@ void Simulation::LetTimePass(std::uint64_t ms) {
   Check();
 }
 
-void Simulation::Require(bool holds, const std::string& rule) {
+void Simulation::Require(bool holds, std::string_view rule) {
   if (holds || !broken_.empty()) return;
   broken_ = rule;
   Note("BROKEN: " + broken_);
@@ -112,10 +112,7 @@ bool Simulation::SweepRuns() const {
                      [](const auto* button) { return button->text() == QStringLiteral("Stop"); });
 }
 
-bool Simulation::SummaryShown() const {
-  const auto* back = window_->findChild<QAbstractButton*>(QStringLiteral("cmdShowConfig"));
-  return back != nullptr && back->isVisibleTo(window_.get());
-}
+bool Simulation::SummaryShown() const { return !Find("fraChosenServo").isVisibleTo(window_.get()); }
 
 bool Simulation::AllRecordsValid() const {
   for (std::size_t slot = 0; slot < kPortCount; ++slot) {
@@ -201,12 +198,11 @@ void Simulation::Check() {
     }
   }
   const QString port_sentence = Find<QLabel>("lblPort").text();
-  for (const std::int32_t port : kPorts) {
-    const QString name = QString::fromStdString(CommName(port));
-    const bool said_open = port_sentence.startsWith(name + QStringLiteral(" open: ")) ||
-                           port_sentence.endsWith(name + QStringLiteral(" is still open"));
-    Require(said_open == (OpenPort() == port), "the window says which port is open");
-  }
+  const QString open = QString::fromStdString(CommName(OpenPort()));
+  const bool said_open = port_sentence.section(u' ', 2, 2) == QStringLiteral("open:") ||
+                         port_sentence.endsWith(QStringLiteral(" is still open"));
+  Require(said_open == link_.PortOpen() && (!said_open || port_sentence.contains(open)),
+          "the window says which port is open");
   if (boxes_open_ > 0) return;
   if (operation_.running) CheckCommand();
   if (SummaryShown()) records_ = window_->WorkingConfiguration();  // it changes records by showing them

@@ -2,14 +2,18 @@
 // anything goes wrong; and the rules that hold all the same.
 #pragma once
 
+#include <QPointer>
+#include <QWidget>
 #include <array>
 #include <cstddef>
 #include <cstdint>
+#include <map>
 #include <memory>
 #include <optional>
 #include <set>
 #include <span>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "config/channel_config.h"
@@ -92,7 +96,7 @@ class Simulation {
   std::uint64_t AnyDuration();
 
   // What must hold.
-  void Require(bool holds, const std::string& rule);
+  void Require(bool holds, std::string_view rule);
   void OnWritten(std::span<const std::uint8_t> bytes);
   void OnPacket(const Bytes& packet);
   void OnOptionsSent(const Bytes& packet);
@@ -104,9 +108,12 @@ class Simulation {
   void CheckData();
   void CheckRecovery();
 
+  // Searched for once: the rules look at some controls after each tick.
   template <typename Widget = QWidget>
   Widget& Find(const char* name) const {
-    return FindControl<Widget>(*window_, name);
+    QPointer<QWidget>& control = controls_[name];
+    if (control == nullptr) control = &FindControl<QWidget>(*window_, name);
+    return dynamic_cast<Widget&>(*control);
   }
   bool CommandRuns() const;
   bool SweepRuns() const;
@@ -134,6 +141,7 @@ class Simulation {
   CountingDevice device_{*world_.device};
   HwSerial link_{device_, world_.time, world_.time, world_.log};
   std::unique_ptr<frmNewServoConfig> window_;
+  mutable std::map<std::string_view, QPointer<QWidget>> controls_;
 
   std::vector<Place> units_;
   std::set<std::uint8_t> panel_ports_;  // that the panel has had
