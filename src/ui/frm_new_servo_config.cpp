@@ -165,8 +165,7 @@ void frmNewServoConfig::ConnectOperations() {
   commands_.running.SetObserver(
       [this] { command_focus_.Follow(commands_.running.Active(), [this] { EnableControls(); }); });
   commands_.running.SetReporter([this](const CommandReport& report) { OnReport(report); });
-  link_.SetLineObserver(
-      [this](const LineEvent& event) { trace_.Note(event, QDateTime::currentMSecsSinceEpoch()); });
+  link_.SetLineObserver([this](const LineEvent& event) { OnLine(event); });
   link_.SetPortHandler([this](bool open) {
     const bool swept = live_test_area_->Sweeps();
     if (!open) live_test_.OnPortClosed();
@@ -204,6 +203,16 @@ void frmNewServoConfig::ConnectMenu() {
   });
   connect(menu_, &MainMenu::AboutChosen, c, [this] { ShowAbout(*this, info_); });
   connect(menu_, &MainMenu::StopChosen, c, [this] { live_test_.EndSweep(); });
+}
+
+// A unit answers within milliseconds of a poll, and cannot be heard before the line is released. Painting may take longer.
+void frmNewServoConfig::OnLine(const LineEvent& event) {
+  trace_.Note(event, QDateTime::currentMSecsSinceEpoch());
+  if (event.kind == LineEvent::Kind::kPollSent) {
+    until_released_.SetForm(this);
+  } else if (event.kind != LineEvent::Kind::kReceived) {
+    until_released_.SetForm(nullptr);
+  }
 }
 
 void frmNewServoConfig::ShowPort() {

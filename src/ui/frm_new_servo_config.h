@@ -24,6 +24,7 @@
 #include "ui/comparison_signs.h"
 #include "ui/connection_area.h"
 #include "ui/found_units.h"
+#include "ui/freeze.h"
 #include "ui/line_pane.h"
 #include "ui/live_test_area.h"
 #include "ui/main_menu.h"
@@ -66,6 +67,7 @@ class frmNewServoConfig : public QMainWindow {
   void ConnectMenu();
   void ConnectOperations();
   void StartUp();
+  void OnLine(const LineEvent& event);
   void ShowPort();
   void ChooseChannel(std::size_t channel);
   void SelectChannel(std::size_t channel);
@@ -149,6 +151,7 @@ class frmNewServoConfig : public QMainWindow {
   ComparisonSigns compared_{comparison_, link_, *connection_, *channels_, *parameters_, *choices_, *status_};
   WindowFacts facts_{link_, *connection_, *servo_, commands_.running, *live_test_area_, *status_};
   QPointer<QWidget> focus_before_summary_;
+  Freeze until_released_;  // the line, after a poll
 
   std::unique_ptr<Timer> tmrSummaryScreen_;
   Shutdown shutdown_;

@@ -57,6 +57,22 @@ TEST_F(DuringCommand, NothingChangesTheRecords) {
   EXPECT_THAT(ToolTip("spnDefaultPos"), HasSubstr("now 1400"));
 }
 
+TEST_F(DuringCommand, NothingIsPaintedFromAPollUntilTheLineIsReleased) {
+  struct : QObject {
+    int count = 0;
+    bool eventFilter(QObject*, QEvent* event) override {
+      return (count += event->type() == QEvent::Paint, false);
+    }
+  } paints;
+  ConnectUnit();
+  Find("frmProgress").installEventFilter(&paints);
+  for (const int by_then : {0, 1}) {
+    by_then == 0 ? Keys("Ctrl+Return") : world_.time.Advance(20);
+    QTest::qWait(0);
+    EXPECT_EQ(paints.count, by_then);
+  }
+}
+
 TEST_F(DuringCommand, SummaryThatIsAboutToBeShown_IsShownBefore) {
   ConnectUnit();
   Press("cmdShowSummary");
