@@ -205,7 +205,7 @@ void frmNewServoConfig::ConnectMenu() {
   connect(menu_, &MainMenu::StopChosen, c, [this] { live_test_.EndSweep(); });
 }
 
-// A unit answers within milliseconds of a poll, and cannot be heard before the line is released. Painting may take longer.
+// A unit answers some 25 ms after a poll, and the line has to be released by then. Painting may take longer.
 void frmNewServoConfig::OnLine(const LineEvent& event) {
   trace_.Note(event, QDateTime::currentMSecsSinceEpoch());
   if (event.kind == LineEvent::Kind::kPollSent) {
