@@ -146,8 +146,7 @@ QColor ColourBehind(const QWidget* widget) {
 
 TEST_F(Window, EveryLabel_CanBeReadWhenTheThemeChanges) {
   ConnectUnit();
-  Click("Command3_0");
-  RunToTheEnd();
+  Run("Command3_0");
   for (const bool dark : {true, false}) {
     SetDarkAppearance(dark);
     for (const QLabel* label : window_->findChildren<QLabel*>()) {

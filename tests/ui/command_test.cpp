@@ -12,7 +12,6 @@ using testing::HasSubstr;
 class DuringCommand : public Window {
  protected:
   std::string Title() { return Find<QGroupBox>("frmProgress").title().toStdString(); }
-  void Keys(const char* keys) { QTest::keySequence(window_.get(), QKeySequence(QString::fromLatin1(keys))); }
   // By mouse, key and assistive technology.
   void Try(const char* control) {
     Click(control);
@@ -22,7 +21,6 @@ class DuringCommand : public Window {
 };
 
 TEST_F(DuringCommand, NothingChangesTheRecords) {
-  Activate();
   auto& unit = ConnectUnit();
   Click("ServoSimulator2_2");
   TypeOver("spnDefaultPos", "-100");  // typed, and not entered
@@ -93,7 +91,6 @@ TEST_F(DuringCommand, SummaryThatIsAboutToBeShown_IsShownBefore) {
 }
 
 TEST_F(DuringCommand, Cancel_EndsItAfterItsPollAndSaysHowTheUnitIsLeft) {
-  Activate();
   ConnectUnit();
   Find("Command3_0").setFocus();
   Key(Qt::Key_Space);

@@ -20,9 +20,6 @@ class Compared : public Window {
     Press(button);
     RunToTheEnd();
   }
-  std::string Said(const char* control) {
-    return Accessible(control).text(QAccessible::Description).toStdString();
-  }
 
   VirtualUnit& unit_ = ConnectUnit();
 };
@@ -45,15 +42,13 @@ TEST_F(Compared, EveryPlaceSignsWhatDiffers) {
   const char* lost_comm = "\n≠ here Stop Pulse / Start on First Command, unit Hold at Current Position";
   EXPECT_THAT(Said("optLostComm_2"), EndsWith(lost_comm));
   EXPECT_THAT(Said("spnNeutralTrim"), Not(HasSubstr("≠")));
-  EXPECT_EQ(Accessible("ServoSimulator2_5").text(QAccessible::Description).toStdString(),
-            "Differs from unit 01: 2 values");
+  EXPECT_EQ(Said("ServoSimulator2_5"), "Differs from unit 01: 2 values");
   const QImage signed_picture = Find("ServoSimulator2_2").grab().toImage();
   Click("ServoSimulator2_2");
   EXPECT_THAT(Said("spnNeutralTrim"), EndsWith("now 1500 µs.\n≠ here 1500, unit 1510"));
   EXPECT_EQ(Text("lblRemarks_0"), "≠ Neutral position: here 1500, unit 1510");
 
-  Press("cmdShowSummary");
-  world_.time.Advance(20);
+  ShowSummary();
   const QImage row = Find("frmSumTable_2").grab().toImage();
   EXPECT_THAT(Said("txtSumNeutralPosition_2"), EndsWith("\n≠ here 1500, unit 1510"));
   EXPECT_THAT(Said("optSumLCfirstcmd_4"), EndsWith(lost_comm));
@@ -64,7 +59,7 @@ TEST_F(Compared, EveryPlaceSignsWhatDiffers) {
   QTest::keyClick(&Spin("spnSumValue_0"), Qt::Key_Up);  // takes the virtual range and the stops with it
   EXPECT_EQ(Text("lblCompared"), "Unit 01 differs: 6 values of 3 channels");
   EXPECT_THAT(Said("txtSumNeutralPosition_2"), Not(HasSubstr("≠")));
-  QTest::keyClick(window_.get(), Qt::Key_Z, Qt::ControlModifier);
+  Keys("Ctrl+Z");
   EXPECT_EQ(Text("lblCompared"), "Unit 01 differs: 4 values of 3 channels");
   EXPECT_EQ(Find("frmSumTable_2").grab().toImage(), row);
 
@@ -95,11 +90,11 @@ TEST_F(Compared, AfterASendItIsOfferedAndEqual) {
     const char* what;
     std::function<void()> act;
   };
-  for (const auto& [what, act] : std::initializer_list<Case>{
-           {"an edit", [&] { QTest::keyClick(&Spin("spnDefaultPos"), Qt::Key_Up); }},
-           {"undo", [&] { QTest::keyClick(window_.get(), Qt::Key_Z, Qt::ControlModifier); }},
-           {"another unit", [&] { ChooseByKeys("CmbUnitID_1", 2); }},
-           {"a command", [&] { Run("Command3_1"); }}}) {
+  for (const auto& [what, act] :
+       std::initializer_list<Case>{{"an edit", [&] { QTest::keyClick(&Spin("spnDefaultPos"), Qt::Key_Up); }},
+                                   {"undo", [&] { Keys("Ctrl+Z"); }},
+                                   {"another unit", [&] { ChooseByKeys("CmbUnitID_1", 2); }},
+                                   {"a command", [&] { Run("Command3_1"); }}}) {
     ChooseByKeys("CmbUnitID_1", 1);
     Run("Command3_0");
     EXPECT_EQ(Text("cmdCompareSent"), "Sent to 01: compare?");

@@ -44,8 +44,7 @@ TEST_F(Editor, TypedValue_IsStoredWhenTypingEnds) {
   EXPECT_EQ(Record(0).DefaultPosition, 1755);
   // A shortcut does not move the focus: the typed value is sent nevertheless.
   TypeOver("spnActPulseRange", "880");
-  Press("Command3_0");
-  RunToTheEnd();
+  Run("Command3_0");
   EXPECT_EQ(unit.PortOptions(1), (PortOptionBytes{1, 62, 238, 100, 200, 100, 200, 175, 150}));
 
   // Closing stores it too, and opens no port for the slider.
@@ -99,7 +98,7 @@ TEST_F(Editor, WithoutAChannel_StoresNothing) {
 }
 
 TEST_F(Editor, PulseScale_ShowsTheEditedValuesAndTheArm) {
-  const auto words = [&] { return Accessible("PulseScale").text(QAccessible::Description).toStdString(); };
+  const auto words = [&] { return Said("PulseScale"); };
   const auto title = [&] { return Find("fraChosenServo").property("title").toString().toStdString(); };
   EXPECT_EQ(title(), "Channel");
   EXPECT_EQ(Text("lblNoChannel"), "Choose a channel: click a servo, or Ctrl+1");
@@ -125,7 +124,6 @@ TEST_F(Editor, PulseScale_ShowsTheEditedValuesAndTheArm) {
 }
 
 TEST_F(Editor, ShownButNotStored_IsSaidUntilItIsStored) {
-  Activate();
   window_->resize(1280, 800);
   const auto& unit = ConnectUnit();
   Click("ServoSimulator2_2");
@@ -134,19 +132,17 @@ TEST_F(Editor, ShownButNotStored_IsSaidUntilItIsStored) {
   const QPoint scale = PlaceOf("PulseScale");
   const auto stored = [&] { return Find("PulseScale").grab().toImage(); };
   const auto described = [&](const char* spin) {
-    return Accessible(spin).text(QAccessible::Description).contains(QStringLiteral("not stored yet"));
+    return Said(spin).find("not stored yet") != std::string::npos;
   };
   Type("spnNeutralTrim", "100");
   const std::string sentence =
       "Shown, not stored yet: virtual range, stops, default. SEND would write what is stored.";
   EXPECT_EQ(Text("lblUnstored", "cmdStore"), sentence + " Store to 3, 7");
   EXPECT_EQ(Accessible("lblUnstored").text(QAccessible::Name).toStdString(), sentence);
-  EXPECT_THAT(Accessible("PulseScale").text(QAccessible::Description).toStdString(),
-              testing::HasSubstr(sentence));
+  EXPECT_THAT(Said("PulseScale"), testing::HasSubstr(sentence));
   EXPECT_TRUE(described("spnVirtPulseRange") && described("spnDefaultPos"));
   EXPECT_FALSE(described("spnActPulseRange") || described("spnNeutralTrim"));
-  Press("Command3_0");
-  RunToTheEnd();
+  Run("Command3_0");
   EXPECT_EQ(unit.PortOptions(3), (PortOptionBytes{1, 60, 240, 100, 200, 100, 200, 150, 160}))
       << "what is stored";
   Press("chkUpdate_7");
@@ -155,7 +151,7 @@ TEST_F(Editor, ShownButNotStored_IsSaidUntilItIsStored) {
   // By its key, and from the keyboard; the focus then stays in the editor.
   Type("spnNeutralTrim", "50");
   const QImage hatched = stored();
-  QTest::keySequence(window_.get(), QKeySequence(QStringLiteral("Ctrl+S")));
+  Keys("Ctrl+S");
   EXPECT_FALSE(Visible("cmdStore") || described("spnDefaultPos"));
   EXPECT_NE(stored(), hatched);
   EXPECT_EQ(PlaceOf("PulseScale"), scale) << "the editor jumps";
@@ -230,7 +226,6 @@ TEST_F(Editor, PhysicalValues_PopUpForASecondInsideTheWindow) {
 }
 
 TEST_F(Editor, TabKey_GoesThroughTheParametersFromTopToBottom) {
-  Activate();
   Spin("spnActPulseRange").setFocus();
   for (const char* next :
        {"cmdTest_3", "spnVirtPulseRange", "cmdTest_0", "spnNeutralTrim", "cmdTest_4", "spnLeftVirtStop",

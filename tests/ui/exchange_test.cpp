@@ -14,19 +14,9 @@ using testing::StartsWith;
 
 class Exchange : public Window {
  protected:
-  Exchange() { Activate(); }
-
-  void Keys(const char* keys) {
-    QTest::keySequence(window_->focusWidget(), QKeySequence(QString::fromLatin1(keys)));
-  }
-  std::string Copied() { return QGuiApplication::clipboard()->text().toStdString(); }
   void Paste(const std::string& text) {
     QGuiApplication::clipboard()->setText(QString::fromStdString(text));
     Keys("Ctrl+Shift+V");
-  }
-  void ShowSummary() {
-    Press("cmdShowSummary");
-    world_.time.Advance(20);
   }
   static std::string Replaced(std::string text, const std::string& old, const std::string& with) {
     return text.replace(text.find(old), old.size(), with);
@@ -36,8 +26,7 @@ class Exchange : public Window {
 TEST_F(Exchange, CopyEditPasteUndo) {
   auto& unit = ConnectUnit();
   unit.SetPortOptions(2, {1, 70, 230, 90, 190, 95, 180, 130, 140});
-  Click("Command3_1");
-  RunToTheEnd();
+  Run("Command3_1");
   const ChannelTable read = window_->WorkingConfiguration();
   Keys("Ctrl+Shift+C");
   EXPECT_EQ(Text("lblStatus"), "Copied the configuration: 8 channels");
@@ -89,8 +78,7 @@ TEST_F(Exchange, RefusedTextChangesNothing) {
 
 TEST_F(Exchange, RecordThatCannotBeSent_IsNotCopied) {
   ConnectUnit().SetPortOptions(3, {4, 60, 240, 100, 200, 100, 200, 150, 150});
-  Click("Command3_1");
-  RunToTheEnd();
+  Run("Command3_1");
   QGuiApplication::clipboard()->setText(QStringLiteral("kept"));
   Keys("Ctrl+Shift+C");
   EXPECT_EQ(Text("lblStatus"), "Not copied: port 3: output kind -1 cannot be sent");

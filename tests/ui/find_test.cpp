@@ -9,10 +9,9 @@ namespace {
 using FindUnits = Window;
 
 TEST_F(FindUnits, Line_ChoosesItsIdWhileTheSearchRuns) {
-  Activate();
   ConnectUnit();
   world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x0C});
-  QTest::keySequence(window_.get(), QKeySequence(QStringLiteral("Ctrl+F")));
+  Keys("Ctrl+F");
   world_.time.Advance(1300);
   auto& list = Find<QTreeWidget>("lstUnits");
   ASSERT_EQ(list.topLevelItemCount(), 2);

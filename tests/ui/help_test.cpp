@@ -1,5 +1,4 @@
 // What the help menu opens: the facts about the program, and the manual.
-#include <QClipboard>
 #include <QDesktopServices>
 #include <QDir>
 #include <QLineEdit>
@@ -21,7 +20,7 @@ TEST_F(Window, About_CopiesEveryFactThatItShows) {
   auto& about = Find<QDialog>("AboutDialog");
   for (auto* button : about.findChildren<QPushButton*>())
     if (button->toolTip().startsWith(QStringLiteral("Copies"))) button->click();
-  const std::string copied = QGuiApplication::clipboard()->text().toStdString();
+  const std::string copied = Copied();
   EXPECT_THAT(copied, HasSubstr("Version: 3.2.1\nQt: " QT_VERSION_STR));
   EXPECT_THAT(copied, HasSubstr("/log/HUtest.txt\nRegistry: /config/registry.reg"));
   EXPECT_EQ(about.findChildren<QLineEdit*>().size(), 6);

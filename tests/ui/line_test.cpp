@@ -1,7 +1,5 @@
 // The pane of the line in the real window.
-#include <QClipboard>
 #include <QDockWidget>
-#include <QGuiApplication>
 #include <QScrollBar>
 #include <QTableView>
 
@@ -18,12 +16,8 @@ using testing::StartsWith;
 
 class Line : public Window {
  protected:
-  Line() {
-    Activate();
-    ConnectUnit();
-  }
+  Line() { ConnectUnit(); }
 
-  void Keys(const char* keys) { QTest::keySequence(window_.get(), QKeySequence(QString::fromLatin1(keys))); }
   void Get() {
     Find<QLabel>("lblProgress").clear();
     Keys("Ctrl+G");
@@ -87,9 +81,7 @@ TEST_F(Line, Verdict_ChangesNoHeight) {
   const QPoint place = PlaceOf("LinePane");
   for (const int unit : {1, 2}) {
     ChooseByKeys("CmbUnitID_1", unit);
-    Find<QLabel>("lblProgress").clear();
-    Press("Command3_1");
-    RunToTheEnd();
+    Run("Command3_1");
     QCoreApplication::processEvents();
     EXPECT_EQ(PlaceOf("LinePane"), place) << Text("lblVerdict");
   }
@@ -119,7 +111,7 @@ TEST_F(Line, Copy_IsWhatSupportNeeds) {
   Get();
   Say(300);
   Keys("Ctrl+Shift+L");  // the pane has never been shown
-  const std::string copied = QGuiApplication::clipboard()->text().toStdString();
+  const std::string copied = Copied();
   EXPECT_THAT(copied, AllOf(StartsWith("Tendril Configuration Utility 3.2.1\nSystem: "),
                             HasSubstr("\nPort: Comm 1, Virtual serial line 1, open\nUnit: 01\n"
                                       "Verdict: What is sent now gets no answer. To check the line, read the "
@@ -134,8 +126,7 @@ TEST_F(Line, Copy_IsWhatSupportNeeds) {
   Key(Qt::Key_End);
   QTest::keyClick(&Table(), Qt::Key_Up, Qt::ShiftModifier);
   Keys("Ctrl+C");
-  EXPECT_THAT(QGuiApplication::clipboard()->text().toStdString(),
-              ContainsRegex("^.+\tprogram\t.+\tunlock unit 2B\n.+\t.*unit 2C\n$"));
+  EXPECT_THAT(Copied(), ContainsRegex("^.+\tprogram\t.+\tunlock unit 2B\n.+\t.*unit 2C\n$"));
 }
 
 }  // namespace

@@ -1,7 +1,4 @@
 // The menu bar in the real window: keys, letters, and what they reach.
-#include <QAbstractItemView>
-#include <QClipboard>
-#include <QGuiApplication>
 #include <QLabel>
 #include <QMenuBar>
 #include <map>
@@ -13,10 +10,6 @@ namespace {
 
 class Menu : public Window {
  protected:
-  Menu() { window_->activateWindow(); }
-
-  // Presses keys on whatever control has the focus, as "Ctrl+3".
-  void Keys(const char* keys) { QTest::keySequence(window_.get(), QKeySequence(QString::fromLatin1(keys))); }
   std::string Id() {
     return Find<QComboBox>("CmbUnitID_0").currentText().toStdString() +
            Find<QComboBox>("CmbUnitID_1").currentText().toStdString();
@@ -124,7 +117,7 @@ TEST_F(Menu, EveryCommand_ByKeyboardAlone) {
   Keys("Ctrl+F9");
   EXPECT_EQ(Dial("ServoSimulator1").arm_pulse(), 1390) << "typed before the key";
   Keys("Ctrl+C");
-  EXPECT_EQ(QGuiApplication::clipboard()->text().toStdString(), "-120 µs") << "nothing is selected";
+  EXPECT_EQ(Copied(), "-120 µs") << "nothing is selected";
   Keys("Ctrl+F6");
   EXPECT_EQ(Text("cmdTest_0"), "Stop");
   Keys("Ctrl+F6");

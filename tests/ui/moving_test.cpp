@@ -1,5 +1,4 @@
 // What moves, how it is stopped, and which pictures are marked.
-#include <QAbstractItemView>
 #include <functional>
 
 #include "window_fixture.h"
@@ -9,8 +8,6 @@ namespace {
 
 class Moving : public Window {
  protected:
-  Moving() { Activate(); }
-
   bool Sweeps() { return Text("cmdTest_0") == "Stop"; }
   // Whether `act` ends a sweep and leaves the servo at the centre.
   bool Ends(const VirtualUnit& unit, const std::function<void()>& act) {
@@ -97,8 +94,7 @@ TEST_F(Moving, Pictures_AreMarkedWhenTheirRecordsHaveChanged) {
   const auto dots = [this] {
     std::string changed;
     for (const char* picture : {"ServoSimulator2_1", "ServoSimulator2_2", "cmdDigitalOutput_2"}) {
-      const auto said = Accessible(picture).text(QAccessible::Description);
-      changed += said.contains(QStringLiteral("Changed since")) ? '1' : '0';
+      changed += Said(picture).find("Changed since") != std::string::npos ? '1' : '0';
     }
     return changed;
   };

@@ -10,12 +10,6 @@ namespace {
 
 class Summary : public Window {
  protected:
-  void ShowSummary() {
-    Press("cmdShowSummary");
-    world_.time.Advance(20);
-    QTest::qWait(0);
-    ASSERT_TRUE(Visible("frmSumHeader"));
-  }
   bool EntryVisible() { return Visible("fraNumberEntry"); }
 };
 
@@ -91,7 +85,6 @@ TEST_F(Summary, TypedNumber_IsStoredWhenTheEntryCloses) {
 }
 
 TEST_F(Summary, NumberEntry_ByKeyboardAlone) {
-  Activate();
   ShowSummary();
   Find("txtSumVirtualRange_1").setFocus();
   Key(Qt::Key_Tab);

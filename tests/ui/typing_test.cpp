@@ -25,10 +25,6 @@ class Typing : public Window {
     Spin(spin).selectAll();
     Spin(spin).findChild<QLineEdit*>()->paste();
   }
-  void ShowSummary() {
-    Press("cmdShowSummary");
-    world_.time.Advance(20);
-  }
 };
 
 TEST_F(Typing, WhatCannotBeTaken_StaysIsExplainedAndIsNotStored) {
@@ -74,7 +70,6 @@ TEST_F(Typing, WhatCannotBeTaken_StaysIsExplainedAndIsNotStored) {
 }
 
 TEST_F(Typing, Escape_PutsTheValueBackAtOnceAndIsTheWindowsOtherwise) {
-  Activate();
   Click("ServoSimulator2_0");
   int of_the_window = 0;
   const QShortcut escape(QKeySequence(Qt::Key_Escape), window_.get(), [&] { ++of_the_window; });
@@ -120,8 +115,7 @@ TEST_F(Typing, CommandsAndViews_LeaveTheField) {
   for (const bool mouse : {false, true}) {
     type();
     if (mouse) Find("Command3_0").setFocus();
-    Press("Command3_0");
-    RunToTheEnd();
+    Run("Command3_0");
     EXPECT_THAT(
         Text("lblStatus"),
         HasSubstr("SUCCESS: Send Complete! Ports 1 to 8 are written. Sent without the 2400 that was typed."));
@@ -135,14 +129,12 @@ TEST_F(Typing, CommandsAndViews_LeaveTheField) {
   type();
   Key(Qt::Key_Tab);
   TypeOver("spnActPulseRange", "890");
-  Press("Command3_0");
-  RunToTheEnd();
+  Run("Command3_0");
   EXPECT_THAT(Text("lblStatus"), testing::Not(HasSubstr("typed")));
   EXPECT_EQ(unit.PortOptions(2)[2], 239);
 }
 
 TEST_F(Typing, NumberEntry_DropsItAfterItsTimeAndOnEscape) {
-  Activate();
   ShowSummary();
   const ChannelTable before = window_->WorkingConfiguration();
   Click("txtSumActualRange_3");

@@ -18,11 +18,9 @@ using testing::StartsWith;
 
 class Undoing : public Window {
  protected:
-  Undoing() { Activate(); }
-
   ChannelTable Records() { return window_->WorkingConfiguration(); }
-  void Undo() { QTest::keyClick(window_.get(), Qt::Key_Z, Qt::ControlModifier); }
-  void Redo() { QTest::keyClick(window_.get(), Qt::Key_Z, Qt::ControlModifier | Qt::ShiftModifier); }
+  void Undo() { Keys("Ctrl+Z"); }
+  void Redo() { Keys("Ctrl+Shift+Z"); }
   // The item of the menu that begins with `text`.
   QAction& Item(const char* text) {
     for (QAction* action : window_->findChildren<QAction*>()) {
@@ -31,10 +29,6 @@ class Undoing : public Window {
     throw std::logic_error(text);
   }
   void ArrowUp(const char* spin) { QTest::keyClick(&Spin(spin), Qt::Key_Up); }
-  void ShowSummary() {
-    Press("cmdShowSummary");
-    world_.time.Advance(20);
-  }
 };
 
 TEST_F(Undoing, TakesBackWhateverChangedARecord) {
@@ -59,11 +53,7 @@ TEST_F(Undoing, TakesBackWhateverChangedARecord) {
       {"a kind", [&] { Press("optChannelType_2"); }},
       {"an option", [&] { Press("optLostComm_0"); }},
       {"a preset", [&] { ChooseByKeys("cmbPresets", 2); }},
-      {"a get",
-       [&] {
-         Click("Command3_1");
-         RunToTheEnd();
-       }},
+      {"a get", [&] { Run("Command3_1"); }},
       {"an entry of the summary",
        [&] {
          ShowSummary();
@@ -202,31 +192,24 @@ TEST_F(Undoing, NamesTheOriginAndTheWayBack) {
   RunToTheEnd();
   EXPECT_EQ(Text("lblOrigin"), "Preset Medium Range (default)");
   EXPECT_THAT(Text("lblStatus"), EndsWith("are not. What it held before is not known: it was not read."));
-  Find<QLabel>("lblProgress").clear();
-  Click("Command3_0");
-  RunToTheEnd();
+  Run("Command3_0");
   EXPECT_THAT(Text("lblOrigin"), StartsWith("Sent to 01 at "));
   EXPECT_THAT(Text("lblStatus"), EndsWith("Ports 1 to 8 are written.")) << "it holds what was sent";
 
   unit.SetPortOptions(2, {1, 70, 230, 90, 190, 95, 180, 130, 140});
-  Click("Command3_1");
-  RunToTheEnd();
+  Run("Command3_1");
   EXPECT_THAT(Text("lblOrigin"), StartsWith("Read from 01 at "));
   const ChannelTable read = Records();
   ChooseByKeys("cmbPresets", 0);
   const ChannelTable preset = Records();
-  Click("Command3_0");
-  RunToTheEnd();
+  Run("Command3_0");
   Undo();  // of the preset, not of the send
   EXPECT_THAT(Text("lblOrigin"), AllOf(StartsWith("Sent to 01 at "), EndsWith("all channels changed since")));
   Redo();
   EXPECT_THAT(Text("lblOrigin"), Not(HasSubstr("changed since")));
-  Click("cmdCompare_0");  // reads what was sent: the way back stays
-  RunToTheEnd();
-  Click("Command3_0");
-  RunToTheEnd();
-  Click("Command3_1");  // so does a get
-  RunToTheEnd();
+  Run("cmdCompare_0");  // reads what was sent: the way back stays
+  Run("Command3_0");
+  Run("Command3_1");  // so does a get
   EXPECT_TRUE(Records() == preset);
   Item("Restore What Unit 01 Held at ").trigger();
   EXPECT_TRUE(Records() == read);

@@ -1,15 +1,11 @@
 // What the window says to users who cannot see it, and what they can copy. The events are tested with a real reader's
 // bus: this platform has none.
-#include <QClipboard>
-#include <QGuiApplication>
 
 #include "ui/status_line.h"
 #include "window_fixture.h"
 
 namespace tendril::test {
 namespace {
-
-std::string Copied() { return QGuiApplication::clipboard()->text().toStdString(); }
 
 TEST_F(Window, StatusLine_SaysTheOutcomeAndCanBeCopied) {
   ConnectUnit();

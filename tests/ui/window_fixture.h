@@ -8,7 +8,9 @@
 #include <QAbstractItemView>
 #include <QAccessible>
 #include <QApplication>
+#include <QClipboard>
 #include <QComboBox>
+#include <QLabel>
 #include <QSpinBox>
 #include <QTest>
 #include <QWheelEvent>
@@ -28,7 +30,7 @@ class Window : public testing::Test {
  protected:
   Window() {
     window_->show();
-    [[maybe_unused]] const bool exposed = QTest::qWaitForWindowExposed(window_.get());
+    Activate();
     world_.time.Advance(10);  // the comm listener client has connected and identified itself
     QTest::qWait(0);          // the parts that are hidden at first are made after the first paint
   }
@@ -46,6 +48,8 @@ class Window : public testing::Test {
     return *QAccessible::queryAccessibleInterface(&Find(name));
   }
   QPoint PlaceOf(const char* name) { return Find(name).mapTo(window_.get(), QPoint()); }
+  // What a screen reader says of a control besides its name.
+  std::string Said(const char* name) { return Accessible(name).text(QAccessible::Description).toStdString(); }
   std::string ToolTip(const char* name) { return Find(name).toolTip().toStdString(); }
   // The texts of labels, buttons and fields, joined by spaces.
   template <typename... Names>
@@ -69,8 +73,10 @@ class Window : public testing::Test {
   void Click(const char* control) { QTest::mouseClick(&Find(control), Qt::LeftButton); }
   // Clicks a button whose box may be smaller than the button.
   void Press(const char* button) { Find<QAbstractButton>(button).click(); }
-  // Presses a key on the control that has the focus.
+  // Presses a key, or keys as "Ctrl+3", on the control that has the focus.
   void Key(Qt::Key key) { QTest::keyClick(window_->focusWidget(), key); }
+  void Keys(const char* keys) { QTest::keySequence(window_.get(), QKeySequence(QString::fromLatin1(keys))); }
+  static std::string Copied() { return QGuiApplication::clipboard()->text().toStdString(); }
   // Selects the value of a spin button and types `text`, without Enter.
   void TypeOver(const char* spin, const char* text) {
     Spin(spin).setFocus();
@@ -105,6 +111,16 @@ class Window : public testing::Test {
   }
   void RunToTheEnd() {
     ASSERT_TRUE(world_.time.AdvanceUntil([&] { return !Text("lblProgress").empty(); }, 20000));
+  }
+  // Presses the button of a command and lets the command end.
+  void Run(const char* button) {
+    Find<QLabel>("lblProgress").clear();
+    Press(button);
+    RunToTheEnd();
+  }
+  void ShowSummary() {
+    Press("cmdShowSummary");
+    world_.time.Advance(20);
   }
 
   SimulatedWorld world_;

@@ -1,5 +1,4 @@
 // The real window: start-up, unit commands, live test, closing, and what every control has.
-#include <QAbstractItemView>
 #include <QAccessible>
 #include <QGroupBox>
 #include <QScrollArea>
@@ -63,8 +62,7 @@ TEST_F(Window, SmallScreens_CutNothingOff) {
     EXPECT_EQ(area.verticalScrollBar()->maximum(), 0) << view;
     resize(880, 466);  // and a border
     EXPECT_EQ(area.horizontalScrollBar()->maximum(), 0) << view;
-    Press("cmdShowSummary");
-    world_.time.Advance(20);
+    ShowSummary();
   }
   Find<QAction>("actLine").trigger();
   resize(880, 466);
@@ -97,7 +95,6 @@ TEST_F(Window, Send_ByMouse_WritesTheRecordsIntoTheUnit) {
 }
 
 TEST_F(Window, Send_ByKeyboardAlone_LeavesTheFocusWhereItWas) {
-  Activate();
   ConnectUnit();
   // To the button, past the two digits of the ID and the button that finds units.
   for (const Qt::Key key : {Qt::Key_Tab, Qt::Key_Tab, Qt::Key_Tab, Qt::Key_Tab, Qt::Key_Space}) Key(key);
@@ -120,8 +117,7 @@ TEST_F(Window, Get_ShowsThePortsOfTheUnit) {
   for (int port = 1; port <= 8; ++port) unit.SetPortOptions(port, {1, 70, 230, 90, 190, 95, 180, 130, 140});
   Click("ServoSimulator2_2");
   Press("chkSendSlideCommands");
-  Click("Command3_1");
-  RunToTheEnd();
+  Run("Command3_1");
   EXPECT_EQ(Text("lblProgress"), "SUCCESS: Upload Complete");
   EXPECT_FALSE(unit.LivePosition(3).has_value()) << "a get moves no servo";
   for (const char* servo : {"ServoSimulator2_0", "ServoSimulator2_7", "ServoSimulator1"})
@@ -137,8 +133,7 @@ TEST_F(Window, UpdateUnitId_GivesTheFactoryUnitItsIdButNever00) {
   EXPECT_FALSE(Find("Command3_2").isEnabled());
   EXPECT_THAT(ToolTip("Command3_2"), HasSubstr("cannot have the ID 00"));
   ChooseByKeys("CmbUnitID_1", 5);
-  Click("Command3_2");
-  RunToTheEnd();
+  Run("Command3_2");
   EXPECT_EQ(Text("lblProgress"), "SUCCESS: UnitID set to '05'");
   EXPECT_EQ(unit.id(), 0x05);
 }
@@ -174,8 +169,7 @@ TEST_F(Window, SelectedServo_IsMarkedAndFollowsTheSlider) {
   world_.time.Advance(50);
   EXPECT_EQ(Text("lblPositionValue_0", "lblPositionValue_1", "txtPositionValue"), "100 255 2000");
   EXPECT_EQ(unit.LivePosition(2), 200);
-  EXPECT_THAT(Accessible("HScrollSendServoPosition").text(QAccessible::Description).toStdString(),
-              HasSubstr("2000 µs"));
+  EXPECT_THAT(Said("HScrollSendServoPosition"), HasSubstr("2000 µs"));
 }
 
 TEST_F(Window, TestButtons_SweepTheDrawnAndTheRealServo) {
@@ -213,8 +207,7 @@ TEST_F(Window, Failure_IsReportedAndTheButtonsWorkAgain) {
     EXPECT_TRUE(Find("Command3_0").isEnabled());
     behind_the_box = Text("lblStatus");
   };
-  Click("Command3_0");
-  RunToTheEnd();
+  Run("Command3_0");
   EXPECT_EQ(world_.boxes.Take().at(0).title, "No Repsonse");
   EXPECT_THAT(behind_the_box, HasSubstr(": COMMAND FAILED! Port 1 is perhaps written, 2 to 8 are not."));
   EXPECT_EQ(Text("lblStatus"), behind_the_box);
@@ -225,9 +218,7 @@ TEST_F(Window, Failure_IsReportedAndTheButtonsWorkAgain) {
 
   // Closing the window while the box is open ends quietly.
   world_.boxes.while_open = [&] { EXPECT_TRUE(window_->close()); };
-  Find<QLabel>("lblProgress").clear();
-  Click("Command3_0");
-  RunToTheEnd();
+  Run("Command3_0");
   world_.time.Advance(60000);
   EXPECT_EQ(world_.boxes.shown.size(), 1u);
 }
@@ -285,8 +276,7 @@ TEST_F(Window, AccessibleActions_DoWhatClicksDo) {
     EXPECT_EQ(Record(5).NeutralPosition, 1500);
   }
 
-  Press("cmdShowSummary");
-  world_.time.Advance(20);
+  ShowSummary();
   act(Accessible("txtSumStopRange_4"));
   EXPECT_EQ(Text("lblDisplay"), "Channel 5 Stops");
 }
