@@ -25,7 +25,7 @@ namespace tendril::test {
 struct RecordedTerminal final : ctl::Terminal {
   QString Print(const QByteArray& text) override {
     out += WithSlashes(text);
-    return print_fault;
+    return {};
   }
   void PrintError(const QByteArray& text) override { error += WithSlashes(text); }
   int ErrorColumns() const override { return columns; }
@@ -48,7 +48,6 @@ struct RecordedTerminal final : ctl::Terminal {
 
   std::string out;
   std::string error;
-  QString print_fault;
   int columns = 0;
   std::optional<QString> answer;
   std::function<void()> asked;  // what the user does before the answer
@@ -79,12 +78,14 @@ class CtlTest : public testing::Test, protected ctl::Waiting {
   }
   // The same, with spaces between the arguments.
   int Run(const std::string& arguments) { return Run(QString::fromStdString(arguments).split(u' ')); }
-  // Requests a stop when this much time has passed.
-  void StopAfter(std::int32_t ms, int signal) {
-    stop_ = {};
-    stop_timer_ = world_.time.CreateTimer([this, signal] { stop_.Make(signal); });
-    stop_timer_->SetInterval(ms);
-    stop_timer_->SetEnabled(true);
+  // Does `action` in `ms`, while a command runs.
+  void In(std::int32_t ms, std::function<void()> action) {
+    timer_ = world_.time.CreateTimer([this, action = std::move(action)] {
+      timer_->SetEnabled(false);
+      action();
+    });
+    timer_->SetInterval(ms);
+    timer_->SetEnabled(true);
   }
   // The path of a file in the test's own folder.
   QString Path(const char* name) const { return folder_.filePath(QString::fromUtf8(name)); }
@@ -98,7 +99,7 @@ class CtlTest : public testing::Test, protected ctl::Waiting {
   SimulatedWorld world_{0xFFFFFC00};  // its clock wraps soon
   SimulatedControlPanel panel_{world_};
   ctl::StopRequest stop_;
-  std::unique_ptr<Timer> stop_timer_;
+  std::unique_ptr<Timer> timer_;
   RecordedTerminal terminal_;
   std::int64_t start_ms_ = 1'796'000'000'000;  // 2026-11-29T21:20:00Z
   ctl::Environment environment_{

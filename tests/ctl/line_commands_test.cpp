@@ -113,15 +113,14 @@ TEST_F(LineCommands, SetIdThatIsStopped_SaysHowTheUnitIsLeft) {
                    "Stopped. Only IDs up to 05 were polled. No unit answered. No ID has changed."),
         {"--alone", 1000, "Stopped. The unit may be at 0B already."}}) {
     AttachAll({{"restarting", 0xFF}});
-    StopAfter(after_ms, SIGINT);
+    stop_ = {};
+    In(after_ms, [this] { stop_.Make(SIGINT); });
     EXPECT_EQ(Run(std::string("set-id 0B --yes --quiet ") + option), 130);
     EXPECT_EQ(terminal_.error, std::string("tendril-ctl: ") + said + "\n");
   }
   AttachAll({{"restarting", 0xFF}});
   stop_ = {};
-  stop_timer_ = world_.time.CreateTimer([this] { world_.bench.Unplug(1); });
-  stop_timer_->SetInterval(1000);
-  stop_timer_->SetEnabled(true);
+  In(1000, [this] { world_.bench.Unplug(1); });
   EXPECT_EQ(Run("set-id 0B --yes --alone --quiet"), 1);
   EXPECT_THAT(terminal_.error,
               HasSubstr(" again. The unit may be at 0B already. Run set-id again, or find.\n"));

@@ -91,7 +91,8 @@ TEST_F(PortTest, Stop_GivesThePortBack) {
   // While the Control Panel is asked, and while units are searched for.
   for (const auto& [behaviour, after_ms] :
        {std::pair(PanelBehaviour::kSlow, 900), {PanelBehaviour::kProper, 500}}) {
-    StopAfter(after_ms, SIGTERM);
+    stop_ = {};
+    In(after_ms, [this] { stop_.Make(SIGTERM); });
     panel_.panel.SetBehaviour(behaviour);
     EXPECT_EQ(Run("find --port 3 --take-port --json"), 143);
     EXPECT_TRUE(panel_.panel.Holds(3));

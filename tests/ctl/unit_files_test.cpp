@@ -30,10 +30,8 @@ class UnitFiles : public CtlTest {
  protected:
   UnitFiles() {
     QDir::setCurrent(folder_.path());
-    EXPECT_EQ(Type("preset wide --output wide.json"), 0);
+    EXPECT_EQ(Run("preset wide --output wide.json"), 0);
   }
-  // As in a terminal.
-  int Type(const char* words) { return Run(QString::fromUtf8(words).split(u' ')); }
   void AttachUnits(std::uint8_t first, std::uint8_t last) {
     for (std::uint8_t id = first; id <= last; ++id) Attach("", id);
   }
@@ -55,20 +53,9 @@ class UnitFiles : public CtlTest {
     QDir().mkpath(QFileInfo(QString::fromUtf8(path)).path());
     Write(path, TextOf("wide.json").replace(before, after));
   }
-  // Does `action` in `ms`, while a command runs.
-  void In(std::int32_t ms, std::function<void()> action) {
-    timer_ = world_.time.CreateTimer([this, action = std::move(action)] {
-      timer_->SetEnabled(false);
-      action();
-    });
-    timer_->SetInterval(ms);
-    timer_->SetEnabled(true);
-  }
   static bool Untouched(const VirtualUnit& unit) {
     return unit.polls_heard() + unit.accepted_commands() == 0;
   }
-
-  std::unique_ptr<Timer> timer_;
 };
 
 TEST_F(UnitFiles, Send_GoesOnAfterAUnitThatFails) {
@@ -90,14 +77,14 @@ TEST_F(UnitFiles, Send_GoesOnAfterAUnitThatFails) {
   const std::string headings = "unit  written  compared\n";
   for (const auto& [fault, row] : rows) {
     VirtualUnit& unit = Attach(fault, 0x05);
-    EXPECT_EQ(Type("send wide.json 05,06"), 1);
+    EXPECT_EQ(Run("send wide.json 05,06"), 1);
     EXPECT_EQ(terminal_.out, headings + row + "06    yes      equal\n");
     EXPECT_THAT(terminal_.error, EndsWith("unit 06 (2 of 2): written, holds it\n"
                                           "tendril-ctl: 1 of 2 units failed. For another run: 05.\n"));
     world_.bench.Detach(1, unit);
   }
   const VirtualUnit& deaf = Attach("deaf", 0x05);
-  EXPECT_EQ(Type("send wide.json 05 --quiet --no-compare"), 0);
+  EXPECT_EQ(Run("send wide.json 05 --quiet --no-compare"), 0);
   EXPECT_EQ(terminal_.out, headings + "05    yes      -\n");
   EXPECT_EQ(terminal_.error, "");
   EXPECT_EQ(deaf.PortOptions(8), kWide);
@@ -106,14 +93,14 @@ TEST_F(UnitFiles, Send_GoesOnAfterAUnitThatFails) {
 TEST_F(UnitFiles, Compare_SaysWhatDiffers) {
   VirtualUnit& forgetful = Attach("", 0x05);
   In(2000, [&] { forgetful.SetPortOptions(3, {1, 50, 250, 70, 230, 70, 230, 151, 150}); });
-  EXPECT_EQ(Type("send wide.json 05 --json"), 1);
+  EXPECT_EQ(Run("send wide.json 05 --json"), 1);
   const auto json = QString::fromStdString(terminal_.out).simplified().toStdString();
   EXPECT_THAT(json, HasSubstr(R"("units": [ { "compared": "differs", "differences": [ { "held": "1510", )"
                               R"("part": "defaultPosition", "ports": [ 3 ], "wanted": "1500" } ], )"
                               R"("outcome": "differs", "unit": "05", "written": "all" } ])"));
   VirtualUnit& other = Attach("", 0x06);
   for (const int port : {1, 2, 3, 5, 7, 8}) other.SetPortOptions(port, kWide);
-  EXPECT_EQ(Type("compare wide.json 05,06,07"), 1);
+  EXPECT_EQ(Run("compare wide.json 05,06,07"), 1);
   EXPECT_THAT(
       terminal_.out,
       StartsWith(
@@ -124,9 +111,9 @@ TEST_F(UnitFiles, Compare_SaysWhatDiffers) {
               HasSubstr("tendril-ctl: 2 of 3 units differ, 1 failed. For another run: 05-07.\n"));
 
   Edit("same.json", "[500, 2500]", "[509, 2501]");
-  EXPECT_EQ(Type("compare wide.json same.json"), 0);
+  EXPECT_EQ(Run("compare wide.json same.json"), 0);
   Edit("other.json", "stop pulse", "hold");
-  EXPECT_EQ(Type("compare wide.json other.json"), 1);
+  EXPECT_EQ(Run("compare wide.json other.json"), 1);
   EXPECT_EQ(terminal_.out,
             "ports  part                 wide.json                            other.json\n"
             "1-8    lost communications  Stop Pulse / Start on First Command  Hold at Current Position\n");
@@ -137,7 +124,7 @@ TEST_F(UnitFiles, Stop_NamesTheUnitThatHoldsHalfAConfiguration) {
   VirtualUnit& unit = Attach("", 0x06);
   VirtualUnit& last = Attach("", 0x07);
   In(4000, [this] { stop_.Make(SIGINT); });
-  EXPECT_EQ(Type("send wide.json 05-07 --quiet"), 130);
+  EXPECT_EQ(Run("send wide.json 05-07 --quiet"), 130);
   EXPECT_EQ(terminal_.out,
             "unit  written  compared\n"
             "05    yes      equal\n"
@@ -155,7 +142,7 @@ TEST_F(UnitFiles, Stop_NamesTheUnitThatHoldsHalfAConfiguration) {
 TEST_F(UnitFiles, UnpluggedPort_EndsTheCommand) {
   AttachUnits(0x05, 0x06);
   In(1000, [this] { world_.bench.Unplug(1); });
-  EXPECT_EQ(Type("send wide.json 05,06 --quiet"), 1);
+  EXPECT_EQ(Run("send wide.json 05,06 --quiet"), 1);
   EXPECT_THAT(terminal_.out,
               HasSubstr("05    partly   -         The port went away: plug the adapter in again.\n"));
   EXPECT_THAT(terminal_.out, HasSubstr("\n06    no       -         Not tried.\n"));
@@ -168,11 +155,11 @@ TEST_F(UnitFiles, UnpluggedPort_EndsTheCommand) {
 TEST_F(UnitFiles, Backup_WritesWholeFilesAndReplacesNone) {
   AttachUnits(0x05, 0x07);
   In(100, [] { Write("other.json", "by another program"); });
-  EXPECT_EQ(Type("get 05 --output other.json --quiet"), 1);
+  EXPECT_EQ(Run("get 05 --output other.json --quiet"), 1);
   EXPECT_EQ(terminal_.out, "unit  file\n05    -     other.json exists already; --force overwrites it.\n");
   EXPECT_EQ(TextOf("other.json"), "by another program");
   In(200, [this] { stop_.Make(SIGINT); });
-  EXPECT_EQ(Type("backup kept 05-07 --quiet"), 130);
+  EXPECT_EQ(Run("backup kept 05-07 --quiet"), 130);
   EXPECT_EQ(FilesIn("kept"), "unit-05.json");
   EXPECT_THAT(terminal_.out, HasSubstr("06    -                  Stopped.\n"));
 }
@@ -185,18 +172,18 @@ TEST_F(UnitFiles, BackupAndRestore_GiveEachUnitBackWhatItHeld) {
       units.back()->SetPortOptions(port, {0x9E, 255, 1, id, 7, 8, 9, 10, static_cast<std::uint8_t>(port)});
   }
   Attach("garbling", 0x09);
-  EXPECT_EQ(Type("backup kept"), 1);
+  EXPECT_EQ(Run("backup kept"), 1);
   EXPECT_EQ(terminal_.out,
             "unit  file\n05    kept/unit-05.json\n06    kept/unit-06.json\n"
             "09    -                  Not read: perhaps several units.\n");
-  EXPECT_EQ(Type("get 05"), 0);
+  EXPECT_EQ(Run("get 05"), 0);
   EXPECT_THAT(terminal_.out, HasSubstr("\"unit\": \"05\",\n  \"read\": \"2026-11-"));
-  EXPECT_EQ(Type("send wide.json 05,06 --quiet"), 0);
-  EXPECT_EQ(Type("backup kept --quiet"), 2);  // without --force
-  EXPECT_EQ(Type("restore kept --backup changed --quiet"), 0);
+  EXPECT_EQ(Run("send wide.json 05,06 --quiet"), 0);
+  EXPECT_EQ(Run("backup kept --quiet"), 2);  // without --force
+  EXPECT_EQ(Run("restore kept --backup changed --quiet"), 0);
   for (std::uint8_t i = 0; i < 2; ++i)
     EXPECT_EQ(units[i]->PortOptions(4), (PortOptionBytes{0x9E, 255, 1, std::uint8_t(5 + i), 7, 8, 9, 10, 4}));
-  EXPECT_EQ(Type("compare wide.json changed/unit-06.json"), 0);
+  EXPECT_EQ(Run("compare wide.json changed/unit-06.json"), 0);
 }
 
 TEST_F(UnitFiles, AUnitWithoutABackup_IsNotWritten) {
@@ -205,13 +192,13 @@ TEST_F(UnitFiles, AUnitWithoutABackup_IsNotWritten) {
   inexact.SetPortOptions(3, {0x41, 60, 240, 100, 200, 100, 200, 150, 150});
   VirtualUnit& empty = Attach("", 0x07);
   empty.SetPortOptions(1, {4, 60, 240, 100, 200, 100, 200, 150, 150});
-  EXPECT_EQ(Type("get 06"), 1);
+  EXPECT_EQ(Run("get 06"), 1);
   EXPECT_THAT(terminal_.out, HasSubstr("\"unit\": \"06\","));
   EXPECT_EQ(
       terminal_.error,
       "tendril-ctl: The configuration cannot have all: port 3, power up: Start Pulse on First Command in the "
       "file, unknown (flags 40) in the unit.\n");
-  EXPECT_EQ(Type("send wide.json 05-07 --backup kept --quiet"), 1);
+  EXPECT_EQ(Run("send wide.json 05-07 --backup kept --quiet"), 1);
   EXPECT_EQ(exact.accepted_commands(), 8U);
   EXPECT_EQ(inexact.accepted_commands() + empty.accepted_commands(), 0U);
   const std::string gap(42, ' ');
@@ -278,11 +265,11 @@ TEST_F(UnitFiles, ABadFile_IsRefusedBeforeAnythingIsSent) {
            Case{"get 05 --output wide.json", "wide.json exists already; --force overwrites it."},
            Case{"backup wide.json 05", "wide.json/unit-05.json cannot be written: "},
        }) {
-    EXPECT_EQ(Type(words), 2) << words;
+    EXPECT_EQ(Run(words), 2) << words;
     EXPECT_THAT(terminal_.error, StartsWith("tendril-ctl: " + error)) << words;
   }
   EXPECT_TRUE(Untouched(unit));
-  EXPECT_EQ(Type("restore set --yes --quiet"), 0);
+  EXPECT_EQ(Run("restore set --yes --quiet"), 0);
   EXPECT_EQ(unit.accepted_commands(), 8U);
 }
 
@@ -309,7 +296,7 @@ TEST_F(UnitFiles, FortyUnits_TakeWhatTheProtocolTakes) {
   constexpr int kUnits = 40;
   AttachUnits(1, kUnits);
   const std::uint64_t begin_ms = world_.time.ElapsedMs();
-  EXPECT_EQ(Type("send wide.json 01-28 --quiet"), 0);
+  EXPECT_EQ(Run("send wide.json 01-28 --quiet"), 0);
   const auto taken_ms = static_cast<double>(world_.time.ElapsedMs() - begin_ms);
   // For each port that is written: two packets, a poll, its reply and a pause. For each that is read: a poll and its
   // reply, which are 8 and 16 bytes long. A unit begins each reply after its turn-round.
@@ -324,7 +311,7 @@ TEST_F(UnitFiles, FortyUnits_TakeWhatTheProtocolTakes) {
 TEST_F(UnitFiles, ProgressOnATerminal_IsOneLineWithTheTimeLeft) {
   AttachUnits(0x05, 0x07);
   terminal_.columns = 40;
-  EXPECT_EQ(Type("send wide.json 05-07"), 0);
+  EXPECT_EQ(Run("send wide.json 05-07"), 0);
   EXPECT_THAT(terminal_.error, HasSubstr("\runit 05 (1 of 3): port 2 of 8\r"));
   EXPECT_THAT(terminal_.error, HasSubstr("\runit 06 (2 of 3), 00:04 left\r"));
   EXPECT_THAT(terminal_.error, EndsWith("\r" + std::string(39, ' ') + "\r"));
@@ -332,7 +319,7 @@ TEST_F(UnitFiles, ProgressOnATerminal_IsOneLineWithTheTimeLeft) {
   const QStringList drawn = QString::fromStdString(terminal_.error).split(u'\r');
   EXPECT_EQ(std::ranges::adjacent_find(drawn), drawn.end());
   terminal_.columns = 46;
-  EXPECT_EQ(Type("send wide.json 08"), 1);
+  EXPECT_EQ(Run("send wide.json 08"), 1);
   const std::string indent(25, ' ');
   EXPECT_THAT(terminal_.out, HasSubstr("Unit 08 does not\n" + indent + "answer: check its\n" + indent));
 }
@@ -340,7 +327,7 @@ TEST_F(UnitFiles, ProgressOnATerminal_IsOneLineWithTheTimeLeft) {
 TEST_F(UnitFiles, Show_DoesNothingToTheTerminal) {
   Edit("named.json", "\"port\": 2,",
        "\"port\": 2, \"name\": \"a\\u001b[2J\\nb\\u202e456789012345678901234567\",");
-  EXPECT_EQ(Type("show named.json"), 0);
+  EXPECT_EQ(Run("show named.json"), 0);
   EXPECT_THAT(terminal_.out, HasSubstr("\n2     a\uFFFD[2J b\uFFFD4567890123456...  servo  500 to 2500"));
 }
 

@@ -26,47 +26,12 @@ class UnitSessionTest : public CtlTest {
   OptionTable held_{};
 };
 
-TEST_F(UnitSessionTest, Failures_HaveTheReasonThatTheLineShows) {
-  struct Case {
-    const char* unit;  // at 05; null: none
-    const char* reason;
-    const char* aftermath;
-  };
-  const Case cases[] = {
-      {nullptr,
-       "Unit 05 does not answer: check its power, its ID and the "
-       "wiring.",
-       "Port 1 is perhaps written, 2 to 8 are not."},
-      {"locked",
-       "Unit 05 answers, but has not accepted what was sent. Send again; if that fails, too, the unit or the "
-       "line is "
-       "faulty.",
-       "Port 1 is perhaps written, 2 to 8 are not."},
-  };
-  for (const Case& each : cases) {
-    VirtualUnit* const unit = each.unit == nullptr ? nullptr : &Attach(each.unit, 0x05);
-    const CommandResult result = units_.Send(0x05, records_);
-    EXPECT_EQ(result.kind, CommandResult::Kind::kFailed);
-    EXPECT_EQ(result.reason, each.reason);
-    EXPECT_EQ(result.aftermath, each.aftermath);
-    if (unit != nullptr) world_.bench.Detach(1, *unit);
-  }
-  records_.At(2).VirtualRange[1] = 2560;
-  Attach("", 0x05);
-  const CommandResult result = units_.Send(0x05, records_);
-  EXPECT_EQ(result.kind, CommandResult::Kind::kFailed);
-  EXPECT_EQ(result.aftermath, "Ports 1 to 2 are written, 3 to 8 are not.");
-  EXPECT_NE(result.reason.find("Virtual"), std::string::npos) << result.reason;
-}
-
 TEST_F(UnitSessionTest, StopRequest_EndsTheCommandAndLetsNoneBegin) {
   Attach("", 0x05);
-  const auto timer = world_.time.CreateTimer([this] { stop_.Make(SIGINT); });
-  timer->SetInterval(10);
   units_.SetStepHandler([&](const std::string& step, double part) {
     if (step != "port 4 of 8" || stop_.Made()) return;
     EXPECT_EQ(part, 3 / 8.0);
-    timer->SetEnabled(true);
+    In(10, [this] { stop_.Make(SIGINT); });
   });
   CommandResult result = units_.Send(0x05, records_);
   EXPECT_EQ(result.kind, CommandResult::Kind::kCancelled);
@@ -78,13 +43,11 @@ TEST_F(UnitSessionTest, StopRequest_EndsTheCommandAndLetsNoneBegin) {
 
 TEST_F(UnitSessionTest, PortThatIsBackAtOnce_IsNotOpenedAgain) {
   Attach("", 0x05);
-  const auto timer = world_.time.CreateTimer([this] { world_.bench.Replug(1); });
-  timer->SetInterval(1);
   bool unplugged = false;
   units_.SetStepHandler([&](const std::string& step, double /*part*/) {
     if ((step != "3 of 8 ports" && step != "port 3 of 8") || std::exchange(unplugged, true)) return;
     world_.bench.Unplug(1);
-    timer->SetEnabled(true);
+    In(1, [this] { world_.bench.Replug(1); });
   });
   for (const bool send : {false, true}) {
     world_.time.Advance(10);

@@ -12,9 +12,9 @@
 #include "platform/posix/serial_terminal.h"
 #include "platform/pseudo_terminal.h"
 #include "platform/qt/qt_serial_device.h"
-#include "platform/runtime_error.h"
 #include "platform/wait_for.h"
 #include "support/emulated_adapter.h"
+#include "support/failure_of.h"
 
 namespace tendril::test {
 namespace {
@@ -50,15 +50,6 @@ class SerialDeviceTest : public testing::Test {
   // The number of the failure of opening; 0 when it does not fail.
   std::int32_t FailureOfOpening(std::int32_t number = kComm) {
     return FailureOf([&] { device_->Open(number, 19200); }).number();
-  }
-  template <typename Call>
-  static RuntimeError FailureOf(const Call& call) {
-    try {
-      call();
-      return {0, "none"};
-    } catch (const RuntimeError& error) {
-      return error;
-    }
   }
   // What the device has sent, once it is `count` bytes.
   Bytes TakeFromLine(std::size_t count) {

@@ -12,6 +12,7 @@
 #include "platform/runtime_error.h"
 #include "platform/windows/serial_handle.h"
 #include "platform/windows/system_text.h"
+#include "support/failure_of.h"
 
 namespace tendril {
 namespace {
@@ -93,12 +94,7 @@ TEST(WindowsPorts, PortsInUse_AreToldApartFromMissingOnes) {
     void NotifyWritable(bool /*enabled*/) override {}
   };
   const auto fault_of = [](const std::filesystem::path& device) {
-    try {
-      Port(device, 19200);
-      return RuntimeError(0, "none");
-    } catch (const RuntimeError& fault) {
-      return fault;
-    }
+    return test::FailureOf([&device] { Port(device, 19200); });
   };
   const std::filesystem::path used = "C:\\tendril-used";
   const HANDLE other =

@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "serial/hw_serial.h"
+#include "support/failure_of.h"
 #include "support/memory_log.h"
 #include "support/recording_device.h"
 #include "support/simulated_time.h"
@@ -31,18 +32,6 @@ class LinkFixture : public testing::Test {
     link_.SetTraceSink([this](const std::string& line) { traces_.push_back(line); });
     link_.SetCommPort(3);
     link_.SetBaudRate(19200);
-  }
-
-  // What `operation` fails with.
-  template <typename Operation>
-  static RuntimeError FailureOf(Operation&& operation) {
-    try {
-      operation();
-    } catch (const RuntimeError& error) {
-      return error;
-    }
-    ADD_FAILURE() << "did not fail";
-    return {0, ""};
   }
 
   SimulatedTime time_{0xFFFF'FFFF - 40};  // soon wraps
