@@ -1,6 +1,5 @@
 // tendril-ctl as scripts use it: on a kernel terminal device, with the units in another process.
 #include <gmock/gmock.h>
-#include <gtest/gtest.h>
 
 #include <QDir>
 #include <QFile>

@@ -2,7 +2,6 @@
 #include "support/screen_reader.h"
 
 #include <gmock/gmock.h>
-#include <gtest/gtest.h>
 
 namespace tendril::test {
 namespace {

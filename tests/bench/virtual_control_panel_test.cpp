@@ -1,7 +1,6 @@
 #include "bench/virtual_control_panel.h"
 
 #include <gmock/gmock.h>
-#include <gtest/gtest.h>
 
 #include <map>
 #include <string>

@@ -1,7 +1,6 @@
 #include "bench/virtual_line.h"
 
 #include <gmock/gmock.h>
-#include <gtest/gtest.h>
 
 #include <memory>
 #include <utility>

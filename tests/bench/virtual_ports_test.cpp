@@ -1,7 +1,6 @@
 #include "bench/virtual_ports.h"
 
 #include <gmock/gmock.h>
-#include <gtest/gtest.h>
 
 #include <vector>
 

@@ -1,7 +1,6 @@
 #include "bench/virtual_unit.h"
 
 #include <gmock/gmock.h>
-#include <gtest/gtest.h>
 
 namespace tendril {
 namespace {

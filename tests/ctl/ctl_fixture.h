@@ -2,7 +2,6 @@
 #pragma once
 
 #include <gmock/gmock.h>
-#include <gtest/gtest.h>
 
 #include <QStringList>
 #include <QTemporaryDir>
@@ -12,7 +11,6 @@
 #include <utility>
 #include <variant>
 
-#include "bench/faulty_units.h"
 #include "ctl/command_line.h"
 #include "ctl/environment.h"
 #include "ctl/program.h"
@@ -56,13 +54,6 @@ struct RecordedTerminal final : ctl::Terminal {
 // Comm 1 to 4 exist; no unit is on a line. The Control Panel holds no port of them until it is given one.
 class CtlTest : public testing::Test, protected ctl::Waiting {
  protected:
-  // Puts the unit called `fault` on the line of Comm 1; an empty name is a well-behaved one.
-  VirtualUnit& Attach(const std::string& fault, std::uint8_t id) {
-    auto unit = fault.empty() ? std::make_unique<VirtualUnit>(id) : FindFaultKind(fault)->make(id);
-    VirtualUnit& attached = *unit;
-    world_.bench.Attach(1, std::move(unit));
-    return attached;
-  }
   // Runs "tendril-ctl" with these arguments, on Comm 1 unless they name a port, and returns the exit code. What it
   // prints is in `terminal_`.
   int Run(QStringList arguments) {

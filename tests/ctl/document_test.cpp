@@ -73,10 +73,10 @@ class Documents : public CtlTest {
 
 TEST_F(Documents, AreAsTheSchemaHasThem) {
   world_.bench.SetHeldByAnother(3, true, {"another", 4321});
-  Attach("", 0x01);
-  Attach("late", 0x02);
-  Attach("deaf", 0x03);
-  Attach("locked", 0x04);
+  world_.Attach("", 0x01);
+  world_.Attach("late", 0x02);
+  world_.Attach("deaf", 0x03);
+  world_.Attach("locked", 0x04);
   for (const char* arguments :
        {"ports", "find --port 3", "find 01-04", "preset wide --output wide.json", "preset narrow",
         "show wide.json", "get 01", "get 01,02 --output read", "send wide.json 01-04 --backup before",

@@ -18,7 +18,7 @@ class LineCommands : public CtlTest {
 
   void AttachAll(const Units& units) {
     for (VirtualUnit* unit : std::exchange(units_, {})) world_.bench.Detach(1, *unit);
-    for (const auto& [fault, id] : units) units_.push_back(&Attach(fault, id));
+    for (const auto& [fault, id] : units) units_.push_back(&world_.Attach(fault, id));
   }
   std::vector<VirtualUnit*> units_;
 };

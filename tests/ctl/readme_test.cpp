@@ -16,8 +16,8 @@ TEST_F(Readme, ExampleShowsWhatATerminalShows) {
   const QRegularExpression example(QStringLiteral("(?<=in another terminal:\n\n)(    .*\n)+"));
   const QString shown = example.match(QString::fromUtf8(file.readAll())).captured();
   QDir::setCurrent(folder_.path());
-  Attach("", 0x01);  // the units of tendril-bench
-  Attach("", 0x0A);
+  world_.Attach("", 0x01);  // the units of tendril-bench
+  world_.Attach("", 0x0A);
   QString printed;
   const QRegularExpression command(QStringLiteral("\\$ tendril-ctl (.*)\n"));
   for (const auto& match : command.globalMatch(shown)) {

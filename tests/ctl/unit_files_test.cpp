@@ -33,7 +33,7 @@ class UnitFiles : public CtlTest {
     EXPECT_EQ(Run("preset wide --output wide.json"), 0);
   }
   void AttachUnits(std::uint8_t first, std::uint8_t last) {
-    for (std::uint8_t id = first; id <= last; ++id) Attach("", id);
+    for (std::uint8_t id = first; id <= last; ++id) world_.Attach("", id);
   }
   // "unit-05.json unit-06.json".
   static std::string FilesIn(const char* folder) {
@@ -73,17 +73,17 @@ TEST_F(UnitFiles, Send_GoesOnAfterAUnitThatFails) {
       {"missing-port",
        "05    yes      -         Unit 05 answers, but does not report all of its eight ports.\n"
        "                         Read it again; if that fails, too, it is faulty.\n"}};
-  Attach("", 0x06);
+  world_.Attach("", 0x06);
   const std::string headings = "unit  written  compared\n";
   for (const auto& [fault, row] : rows) {
-    VirtualUnit& unit = Attach(fault, 0x05);
+    VirtualUnit& unit = world_.Attach(fault, 0x05);
     EXPECT_EQ(Run("send wide.json 05,06"), 1);
     EXPECT_EQ(terminal_.out, headings + row + "06    yes      equal\n");
     EXPECT_THAT(terminal_.error, EndsWith("unit 06 (2 of 2): written, holds it\n"
                                           "tendril-ctl: 1 of 2 units failed. For another run: 05.\n"));
     world_.bench.Detach(1, unit);
   }
-  const VirtualUnit& deaf = Attach("deaf", 0x05);
+  const VirtualUnit& deaf = world_.Attach("deaf", 0x05);
   EXPECT_EQ(Run("send wide.json 05 --quiet --no-compare"), 0);
   EXPECT_EQ(terminal_.out, headings + "05    yes      -\n");
   EXPECT_EQ(terminal_.error, "");
@@ -91,14 +91,14 @@ TEST_F(UnitFiles, Send_GoesOnAfterAUnitThatFails) {
 }
 
 TEST_F(UnitFiles, Compare_SaysWhatDiffers) {
-  VirtualUnit& forgetful = Attach("", 0x05);
+  VirtualUnit& forgetful = world_.Attach("", 0x05);
   In(2000, [&] { forgetful.SetPortOptions(3, {1, 50, 250, 70, 230, 70, 230, 151, 150}); });
   EXPECT_EQ(Run("send wide.json 05 --json"), 1);
   const auto json = QString::fromStdString(terminal_.out).simplified().toStdString();
   EXPECT_THAT(json, HasSubstr(R"("units": [ { "compared": "differs", "differences": [ { "held": "1510", )"
                               R"("part": "defaultPosition", "ports": [ 3 ], "wanted": "1500" } ], )"
                               R"("outcome": "differs", "unit": "05", "written": "all" } ])"));
-  VirtualUnit& other = Attach("", 0x06);
+  VirtualUnit& other = world_.Attach("", 0x06);
   for (const int port : {1, 2, 3, 5, 7, 8}) other.SetPortOptions(port, kWide);
   EXPECT_EQ(Run("compare wide.json 05,06,07"), 1);
   EXPECT_THAT(
@@ -120,9 +120,9 @@ TEST_F(UnitFiles, Compare_SaysWhatDiffers) {
 }
 
 TEST_F(UnitFiles, Stop_NamesTheUnitThatHoldsHalfAConfiguration) {
-  Attach("", 0x05);
-  VirtualUnit& unit = Attach("", 0x06);
-  VirtualUnit& last = Attach("", 0x07);
+  world_.Attach("", 0x05);
+  VirtualUnit& unit = world_.Attach("", 0x06);
+  VirtualUnit& last = world_.Attach("", 0x07);
   In(4000, [this] { stop_.Make(SIGINT); });
   EXPECT_EQ(Run("send wide.json 05-07 --quiet"), 130);
   EXPECT_EQ(terminal_.out,
@@ -167,11 +167,11 @@ TEST_F(UnitFiles, Backup_WritesWholeFilesAndReplacesNone) {
 TEST_F(UnitFiles, BackupAndRestore_GiveEachUnitBackWhatItHeld) {
   std::vector<VirtualUnit*> units;
   for (std::uint8_t id = 0x05; id <= 0x06; ++id) {
-    units.push_back(&Attach("", id));
+    units.push_back(&world_.Attach("", id));
     for (int port = 1; port <= kUnitPorts; ++port)
       units.back()->SetPortOptions(port, {0x9E, 255, 1, id, 7, 8, 9, 10, static_cast<std::uint8_t>(port)});
   }
-  Attach("garbling", 0x09);
+  world_.Attach("garbling", 0x09);
   EXPECT_EQ(Run("backup kept"), 1);
   EXPECT_EQ(terminal_.out,
             "unit  file\n05    kept/unit-05.json\n06    kept/unit-06.json\n"
@@ -187,10 +187,10 @@ TEST_F(UnitFiles, BackupAndRestore_GiveEachUnitBackWhatItHeld) {
 }
 
 TEST_F(UnitFiles, AUnitWithoutABackup_IsNotWritten) {
-  VirtualUnit& exact = Attach("", 0x05);
-  VirtualUnit& inexact = Attach("", 0x06);
+  VirtualUnit& exact = world_.Attach("", 0x05);
+  VirtualUnit& inexact = world_.Attach("", 0x06);
   inexact.SetPortOptions(3, {0x41, 60, 240, 100, 200, 100, 200, 150, 150});
-  VirtualUnit& empty = Attach("", 0x07);
+  VirtualUnit& empty = world_.Attach("", 0x07);
   empty.SetPortOptions(1, {4, 60, 240, 100, 200, 100, 200, 150, 150});
   EXPECT_EQ(Run("get 06"), 1);
   EXPECT_THAT(terminal_.out, HasSubstr("\"unit\": \"06\","));
@@ -215,7 +215,7 @@ TEST_F(UnitFiles, AUnitWithoutABackup_IsNotWritten) {
 }
 
 TEST_F(UnitFiles, ABadFile_IsRefusedBeforeAnythingIsSent) {
-  VirtualUnit& unit = Attach("", 0x05);
+  VirtualUnit& unit = world_.Attach("", 0x05);
   Write("list.json", "hello");
   Edit("later.json", "\"version\": 1", "\"version\": 2");
   Edit("beyond.json", "\"neutralPosition\": 1500", "\"neutralPosition\": 2551");

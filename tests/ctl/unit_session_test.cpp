@@ -27,7 +27,7 @@ class UnitSessionTest : public CtlTest {
 };
 
 TEST_F(UnitSessionTest, StopRequest_EndsTheCommandAndLetsNoneBegin) {
-  Attach("", 0x05);
+  world_.Attach("", 0x05);
   units_.SetStepHandler([&](const std::string& step, double part) {
     if (step != "port 4 of 8" || stop_.Made()) return;
     EXPECT_EQ(part, 3 / 8.0);
@@ -42,7 +42,7 @@ TEST_F(UnitSessionTest, StopRequest_EndsTheCommandAndLetsNoneBegin) {
 }
 
 TEST_F(UnitSessionTest, PortThatIsBackAtOnce_IsNotOpenedAgain) {
-  Attach("", 0x05);
+  world_.Attach("", 0x05);
   bool unplugged = false;
   units_.SetStepHandler([&](const std::string& step, double /*part*/) {
     if ((step != "3 of 8 ports" && step != "port 3 of 8") || std::exchange(unplugged, true)) return;
@@ -65,8 +65,8 @@ TEST_F(UnitSessionTest, PortThatIsBackAtOnce_IsNotOpenedAgain) {
 }
 
 TEST_F(UnitSessionTest, NoiseOfAUnit_HasPassedBeforeTheNextOne) {
-  Attach("flooding", 0x05);
-  Attach("", 0x06);
+  world_.Attach("flooding", 0x05);
+  world_.Attach("", 0x06);
   EXPECT_FALSE(units_.Send(0x05, records_).Done());
   EXPECT_TRUE(units_.LookFor(0x06).Done());
   EXPECT_TRUE(units_.Send(0x06, records_).Done());
@@ -99,7 +99,7 @@ TEST_F(UnitSessionTest, ReadingWithAMissedReply_IsDoneTwice) {
 }
 
 TEST_F(UnitSessionTest, LateReplies_AreNoneOfTheNextUnit) {
-  VirtualUnit& next = Attach("", 0x06);
+  VirtualUnit& next = world_.Attach("", 0x06);
   for (int port = 1; port <= kUnitPorts; ++port)
     next.SetPortOptions(port, {1, 50, 250, 70, 230, 70, 230, 150, 150});
   for (std::uint64_t late_us = 100'000; late_us <= 160'000; late_us += 15'000) {

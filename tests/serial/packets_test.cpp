@@ -1,7 +1,6 @@
 #include "serial/packets.h"
 
 #include <gmock/gmock.h>
-#include <gtest/gtest.h>
 
 #include <array>
 

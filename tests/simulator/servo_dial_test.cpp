@@ -1,7 +1,6 @@
 #include "simulator/servo_dial.h"
 
 #include <gmock/gmock.h>
-#include <gtest/gtest.h>
 
 #include <limits>
 #include <tuple>

@@ -2,7 +2,10 @@
 #pragma once
 
 #include <memory>
+#include <string>
+#include <utility>
 
+#include "bench/faulty_units.h"
 #include "bench/virtual_ports.h"
 #include "bench/virtual_unit.h"
 #include "platform/serial_device.h"
@@ -18,6 +21,14 @@ struct SimulatedWorld {
   explicit SimulatedWorld(std::uint32_t start_ms = 1000) : time(start_ms) {
     for (const int port : {1, 2, 3, 4}) bench.AddPort(port);
     device = bench.CreateDevice();
+  }
+
+  // Puts the unit called `fault` on the line of Comm 1; an empty name is a well-behaved one.
+  VirtualUnit& Attach(const std::string& fault, std::uint8_t id) {
+    auto unit = fault.empty() ? std::make_unique<VirtualUnit>(id) : FindFaultKind(fault)->make(id);
+    VirtualUnit& attached = *unit;
+    bench.Attach(1, std::move(unit));
+    return attached;
   }
 
   SimulatedTime time;

@@ -2,7 +2,6 @@
 #include "trace/line_trace.h"
 
 #include <gmock/gmock.h>
-#include <gtest/gtest.h>
 
 #include <memory>
 #include <string>

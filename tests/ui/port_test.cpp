@@ -1,6 +1,4 @@
 // The comm port in the window: its list, and what the window says of it.
-#include <gmock/gmock.h>
-
 #include "bench/faulty_units.h"
 #include "window_fixture.h"
 

@@ -1,6 +1,4 @@
 // Undo and redo, the origin of the configuration, and the way back after a send.
-#include <gmock/gmock.h>
-
 #include <QComboBox>
 #include <functional>
 #include <vector>

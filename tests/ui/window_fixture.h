@@ -2,7 +2,6 @@
 #pragma once
 
 #include <gmock/gmock.h>
-#include <gtest/gtest.h>
 
 #include <QAbstractButton>
 #include <QAbstractItemView>
@@ -16,10 +15,10 @@
 #include <QWheelEvent>
 #include <cmath>
 #include <memory>
-#include <stdexcept>
 #include <string>
 
 #include "simulator/servo_simulator.h"
+#include "support/find_control.h"
 #include "support/simulated_control_panel.h"
 #include "ui/frm_new_servo_config.h"
 
@@ -37,9 +36,7 @@ class Window : public testing::Test {
 
   template <typename Widget = QWidget>
   Widget& Find(const char* name) {
-    auto* widget = window_->findChild<Widget*>(QString::fromUtf8(name));
-    if (widget == nullptr) throw std::logic_error(std::string("no control named ") + name);
-    return *widget;
+    return FindControl<Widget>(*window_, name);
   }
   QSpinBox& Spin(const char* name) { return Find<QSpinBox>(name); }
   bool Checked(const char* button) { return Find<QAbstractButton>(button).isChecked(); }

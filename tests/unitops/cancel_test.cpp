@@ -12,7 +12,7 @@ class Outcomes : public CommandTest {
   std::string Said(UnitOperation& operation, const std::string& fault, int cancel_ms) {
     const bool change = &operation == &commands_.change_id;
     target_.unit = change ? 0x0A : 0x01;
-    VirtualUnit& unit = Attach(fault, change ? 0xFF : 0x01);
+    VirtualUnit& unit = world_.Attach(fault, change ? 0xFF : 0x01);
     operation.Start();
     if (cancel_ms != kNever) {
       world_.time.Advance(static_cast<std::uint64_t>(cancel_ms));

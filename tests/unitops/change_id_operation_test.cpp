@@ -30,7 +30,7 @@ class ChangeId : public CommandTest {
 };
 
 TEST_F(ChangeId, UnitFromTheFactory_IsFoundGivenItsIdAndConfirmed) {
-  auto& unit = Attach("", 0xFF);
+  auto& unit = world_.Attach("", 0xFF);
   target_.unit = 0x0A;
   commands_.change_id.Start();
   EXPECT_EQ(commands_.running.What(), "Giving the unit the ID 0A");
@@ -53,7 +53,7 @@ TEST_F(ChangeId, EveryUnit_EndsWithItsOutcome) {
                        std::size_t confirm_polls) {
     SCOPED_TRACE(fault);
     sent_ = {{}};
-    VirtualUnit& unit = Attach(fault, id);
+    VirtualUnit& unit = world_.Attach(fault, id);
     target_.unit = new_id;
     Run(commands_.change_id);
     EXPECT_EQ(Polls('*'), find_polls);
@@ -87,7 +87,7 @@ TEST_F(ChangeId, Faults_StopItAndAreShownOnce) {
   world_.bench.Replug(1);
 
   // At the step that sends the new ID.
-  Attach("", 0xFF);
+  world_.Attach("", 0xFF);
   commands_.change_id.Start();
   EXPECT_TRUE(link_.PortOpen());
   world_.log.broken = true;

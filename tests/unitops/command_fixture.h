@@ -2,13 +2,11 @@
 #pragma once
 
 #include <gmock/gmock.h>
-#include <gtest/gtest.h>
 
 #include <memory>
 #include <string>
 #include <utility>
 
-#include "bench/faulty_units.h"
 #include "platform/hex_text.h"
 #include "serial/hw_serial.h"
 #include "support/recorded_progress.h"
@@ -52,13 +50,6 @@ class CommandTest : public testing::Test {
     };
   }
 
-  // Puts the unit called `fault` on the line of Comm 1; an empty name is a well-behaved one.
-  VirtualUnit& Attach(const std::string& fault, std::uint8_t id) {
-    auto unit = fault.empty() ? std::make_unique<VirtualUnit>(id) : FindFaultKind(fault)->make(id);
-    VirtualUnit& attached = *unit;
-    world_.bench.Attach(1, std::move(unit));
-    return attached;
-  }
   // Lets the command run until it has ended.
   void RunToTheEnd() {
     constexpr std::uint64_t kLongestMs = 12000;

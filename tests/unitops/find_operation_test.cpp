@@ -19,7 +19,7 @@ class Find : public CommandTest {
 // wait: 20 bits at 19200 for each of them, 38, and the 45 pads. The ID that two units have is polled twice.
 TEST_F(Find, TakesNoLongerThanBytesAndTimeOuts) {
   target_.unit = 0x33;
-  for (const int id : {0x01, 0x0A, 0x7F, 0x20, 0x20}) Attach("", static_cast<std::uint8_t>(id));
+  for (const int id : {0x01, 0x0A, 0x7F, 0x20, 0x20}) world_.Attach("", static_cast<std::uint8_t>(id));
   const std::uint64_t start_ms = world_.time.ElapsedMs();
   commands_.find.Start();
   world_.time.Advance(1100);
@@ -44,7 +44,7 @@ TEST_F(Find, TakesNoLongerThanBytesAndTimeOuts) {
 
 // Nothing follows the poll that is out.
 TEST_F(Find, CancelledOrUnplugged_EndsWithThePollAndKeepsWhatItHasFound) {
-  Attach("", 0x01);
+  world_.Attach("", 0x01);
   for (const bool unplugged : {false, true}) {
     noted_.clear();
     commands_.find.Start();
@@ -74,7 +74,7 @@ TEST_F(Find, SaysWhatIsAtAnId) {
                                                        {"unfinished", "02 perhaps several units"},
                                                        {"late", "02 answers too late"}};
   for (const auto& [fault, found] : cases) {
-    VirtualUnit& unit = Attach(fault, 0x02);
+    VirtualUnit& unit = world_.Attach(fault, 0x02);
     commands_.find.Start();
     world_.time.Advance(600);
     EXPECT_EQ(Found(), found) << fault;

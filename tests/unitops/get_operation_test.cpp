@@ -22,7 +22,7 @@ TEST_F(Get, Units_EndAsTheyReportTheirPorts) {
     for (std::size_t slot = 0; slot < kPortCount; ++slot) SetFromPreset(kPresets[0], working_.At(slot));
     const ChannelTable before = working_;
     ChannelTable of_the_unit = before;
-    VirtualUnit& unit = Attach(fault, 0x05);
+    VirtualUnit& unit = world_.Attach(fault, 0x05);
     for (std::uint8_t port = 1; port <= kPortCount; ++port) {
       OptionBytes options{159, 50, 220, 90, 190, 100, 180, 140, 150};
       options[port] = port;  // another value in every port
@@ -96,7 +96,7 @@ TEST_F(Get, RefusedPoll_IsASendError) {
   EXPECT_FALSE(progress_.shown);
 
   target_.unit = 1;
-  Attach("", 0x01);
+  world_.Attach("", 0x01);
   commands_.get.Start();
   target_.unit = 0;
   RunToTheEnd();
@@ -105,7 +105,7 @@ TEST_F(Get, RefusedPoll_IsASendError) {
 
 TEST_F(Get, Unplugged_IsAFaultAndChangesNothing) {
   const ChannelTable before = working_;
-  Attach("", 0x01);
+  world_.Attach("", 0x01);
   commands_.get.Start();
   world_.time.Advance(60);
   world_.bench.Unplug(1);

@@ -118,7 +118,7 @@ class Live : public CommandTest {
 
 TEST_F(Live, Sweep_StepsAndRestsToTheMillisecond) {
   choice_.values.VirtualStops = {1430, 1640};
-  auto& unit = Attach("", 0x01);
+  auto& unit = world_.Attach("", 0x01);
   test_.OnTestButton(1);
   EXPECT_TRUE(view_.captions[1]);
   world_.time.Advance(2900);
@@ -261,7 +261,7 @@ TEST_F(Live, WaitingPosition_GoesOutUnlessItsRecordsOrItsPortAreGone) {
   EXPECT_THAT(SentPositions(), ElementsAre(140, 142, 150));
   SetSliderSends(true);
   Drag();
-  Attach("", 0x0A);
+  world_.Attach("", 0x0A);
   const std::size_t logged = world_.log.lines.size();
   commands_.get.Start();
   EXPECT_EQ(world_.log.lines.size(), logged + 1) << "at once, before the command's own";
@@ -283,7 +283,7 @@ TEST_F(Live, WaitingPosition_GoesOutUnlessItsRecordsOrItsPortAreGone) {
 }
 
 TEST_F(Live, UnitCommand_StopsASweepAndHasTheLineToItself) {
-  auto& unit = Attach("", 0x01);
+  auto& unit = world_.Attach("", 0x01);
   test_.OnTestButton(0);
   world_.time.Advance(500);
   sent_.clear();
@@ -329,7 +329,7 @@ TEST_F(Live, Faults_StopEverythingAndAreShownOnce) {
 
   // At a step, at a position that waits, and when either makes way for a command, which then does not start: the
   // timers have stopped before the box opens.
-  auto& unit = Attach("", 0x01);
+  auto& unit = world_.Attach("", 0x01);
   world_.boxes.while_open = [&] {
     world_.time.Advance(2000);
     EXPECT_EQ(world_.time.RunningTimers(), 0);

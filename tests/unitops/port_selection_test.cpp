@@ -1,7 +1,6 @@
 #include "unitops/port_selection.h"
 
 #include <gmock/gmock.h>
-#include <gtest/gtest.h>
 
 #include "serial/hw_serial.h"
 #include "support/recording_device.h"

@@ -47,18 +47,5 @@ TEST_F(Progress, Outcome_StaysForThreeSecondsUnlessAnotherCommandStarts) {
   Expect(5000, true, 400, ProgressColour::kBlue);
 }
 
-using Events = CommandTest;
-
-TEST_F(Events, SayWhichUnitAnswered_WasReadAndWasSentTo) {
-  Attach("", 0x01);
-  Run(commands_.send);
-  Run(commands_.get);
-  EXPECT_EQ(noted_, "01+ 01+ 01+ 01+ 01+ 01+ 01+ 01+ sent 01 01+ 01+ 01+ 01+ 01+ 01+ 01+ 01+ replaced 01 ");
-  noted_.clear();
-  target_.unit = 0x0A;
-  Run(commands_.send);
-  EXPECT_EQ(noted_, "0A- 0A- 0A- ");
-}
-
 }  // namespace
 }  // namespace tendril::test

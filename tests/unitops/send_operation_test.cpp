@@ -39,7 +39,7 @@ class Send : public CommandTest {
 };
 
 TEST_F(Send, EveryPort_GoesOutAsUnlockOptionsAndPoll) {
-  auto& unit = Attach("", 0x01);
+  auto& unit = world_.Attach("", 0x01);
   const Bytes sent = Sent([&] { Run(commands_.send); });
   ExpectSuccess();
   Bytes expected;
@@ -57,7 +57,7 @@ TEST_F(Send, EveryPort_GoesOutAsUnlockOptionsAndPoll) {
 }
 
 TEST_F(Send, Ports_FollowEachOther300msAfterTheAcknowledgement) {
-  auto& unit = Attach("", 0x01);
+  auto& unit = world_.Attach("", 0x01);
   commands_.send.Start();
   EXPECT_EQ(commands_.running.What(), "Sending to unit 01");
   AcknowledgePort(unit, 1);
@@ -77,7 +77,7 @@ TEST_F(Send, BadlyBehavedUnits_EndWithTheirOutcome) {
   target_.unit = 0x05;
   const auto polls = [&](const std::string& fault) {  // that reach the unit
     SCOPED_TRACE(fault);
-    VirtualUnit& unit = Attach(fault, 0x05);
+    VirtualUnit& unit = world_.Attach(fault, 0x05);
     Run(commands_.send);
     const auto heard = unit.polls_heard();
     world_.bench.Detach(1, unit);
@@ -111,14 +111,14 @@ TEST_F(Send, OnlyTheReplysSecondByte_Accepts) {
 }
 
 TEST_F(Send, IdSetTo00InTheMiddle_IsASendErrorAtTheNextPort) {
-  VirtualUnit& mute = Attach("mute", 0x01);
+  VirtualUnit& mute = world_.Attach("mute", 0x01);
   commands_.send.Start();
   target_.unit = 0x00;  // a repeat goes to the unit that did not answer
   RunToTheEnd();
   ExpectFailure(kNoResponse);
   world_.bench.Detach(1, mute);
   target_.unit = 0x01;
-  Attach("", 0x01);
+  world_.Attach("", 0x01);
   commands_.send.Start();
   target_.unit = 0;
   RunToTheEnd();
@@ -143,7 +143,7 @@ TEST_F(Send, Refusals_AreShownAndStartNothing) {
 }
 
 TEST_F(Send, InvalidRecord_StopsBeforeItsPort) {
-  VirtualUnit& unit = Attach("", 0x01);
+  VirtualUnit& unit = world_.Attach("", 0x01);
   working_.At(4).ActualRange[0] = 9;
   world_.boxes.while_open = [&] { EXPECT_FALSE(commands_.running.Active()); };
   const std::vector<BoxMessage> box{
@@ -169,7 +169,7 @@ TEST_F(Send, InvalidRecord_StopsBeforeItsPort) {
 }
 
 TEST_F(Send, UnpluggedBetweenTwoPorts_IsADownloadFailure) {
-  auto& unit = Attach("", 0x01);
+  auto& unit = world_.Attach("", 0x01);
   commands_.send.Start();
   AcknowledgePort(unit, 2);
   world_.bench.Unplug(1);
@@ -189,7 +189,7 @@ TEST_F(Send, UnpluggedBetweenTwoPorts_IsADownloadFailure) {
 }
 
 TEST_F(Send, SecondStartAndRepliesOfOtherKinds_AreIgnored) {
-  auto& unit = Attach("", 0x01);
+  auto& unit = world_.Attach("", 0x01);
   commands_.send.Start();
   commands_.running.Operation()->OnPollReply(true, 0x01, 'n', Bytes{1, 11});
   world_.time.Advance(700);
@@ -199,7 +199,7 @@ TEST_F(Send, SecondStartAndRepliesOfOtherKinds_AreIgnored) {
 }
 
 TEST_F(Send, StoppedByTheClosingWindow_ShowsAndSendsNothingMore) {
-  auto& unit = Attach("", 0x01);
+  auto& unit = world_.Attach("", 0x01);
   for (const std::uint64_t ms : {10u, 200u}) {  // while a poll is out, and in the pause after the first port
     commands_.send.Start();
     world_.time.Advance(ms);

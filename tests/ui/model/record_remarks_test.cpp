@@ -1,7 +1,6 @@
 #include "ui/model/record_remarks.h"
 
 #include <gmock/gmock.h>
-#include <gtest/gtest.h>
 
 namespace tendril {
 namespace {
