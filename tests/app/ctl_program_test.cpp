@@ -2,12 +2,10 @@
 #include <gmock/gmock.h>
 
 #include <QDir>
-#include <QFile>
 #include <csignal>
 #include <memory>
 #include <string>
 
-#include "exchange/configuration_text.h"
 #include "support/bench_process.h"
 #include "support/ctl_process.h"
 #ifdef __linux__
@@ -26,15 +24,9 @@ QStringList Words(const char* line) { return QString::fromUtf8(line).split(QLati
 class CtlProgram : public testing::Test {
  protected:
   CtlProgram() {
-    ConfigurationText configuration;
-    for (std::size_t slot = 0; slot < kPortCount; ++slot)
-      SetFromPreset(kPresets[kStartPreset], configuration.records.At(slot));
-    QFile file(folder_.filePath(QStringLiteral("show.json")));
-    const QByteArray text = std::get<QByteArray>(WriteConfiguration(configuration));
-    if (!file.open(QIODevice::WriteOnly) || file.write(text) != text.size())
-      throw std::runtime_error("show.json");
     home_ = QDir::currentPath();
     QDir::setCurrent(folder_.path());
+    Expect("preset medium --output show.json", 0, "");
   }
   ~CtlProgram() override { QDir::setCurrent(home_); }
 
@@ -116,13 +108,17 @@ TEST_F(CtlProgram, UnpluggedAdapter_LeavesTheOtherUnitsAlone) {
   EXPECT_EQ(ctl.ExitCode(), 1);
   EXPECT_THAT(ctl.Out(), HasSubstr("The port went away: plug the adapter in again."));
   EXPECT_THAT(ctl.Out(), HasSubstr("0A    no       -         Not tried."));
+  EXPECT_THAT(ctl.Error(), HasSubstr("1 of 2 units failed, 1 was not tried. For another run: 01,0A."));
 }
 
 #ifdef __linux__
-TEST_F(CtlProgram, FullDisk_LeavesNoFile) {
+TEST_F(CtlProgram, FullDisk_LeavesTheOldFileAndNoOther) {
   bench_.Start();
-  Expect("get 01 --port 1 --output read.json", 1, "read.json cannot be written: File too large.",
-         "ulimit -f 0");
+  for (const char* file : {"read.json", "show.json"}) {
+    const QByteArray arguments = QByteArray("get 01 --port 1 --force --output ") + file;
+    Expect(arguments, 1, (file + std::string(" cannot be written: File too large.")).c_str(), "ulimit -f 1");
+  }
+  Expect("show show.json", 0, "");
   Expect("preset wide", 1, "The result cannot be written: No space left on device", "exec >/dev/full");
   EXPECT_EQ(Files(), "show.json");
 }

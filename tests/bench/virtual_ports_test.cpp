@@ -5,13 +5,11 @@
 #include <vector>
 
 #include "bench/virtual_unit.h"
-#include "platform/runtime_error.h"
 #include "support/simulated_time.h"
 
 namespace tendril {
 namespace {
 
-using testing::ElementsAre;
 using testing::IsEmpty;
 
 const Bytes kPoll = {0x00, 0x05, 0x88, 0x2A, 0x2D, 0x00};
@@ -66,34 +64,6 @@ TEST_F(VirtualPortsTest, FullInputBuffer_DropsTheSurplusAndReportsIt) {
   time.Advance(3000);
   EXPECT_THAT(events, testing::AllOf(testing::Not(IsEmpty()), testing::Each(SerialEvent::kReceiveOverflow)));
   EXPECT_EQ(device->ReadAll(), Bytes(kSerialInputBufferBytes, 1));
-}
-
-TEST_F(VirtualPortsTest, Unplugged_ClosesItselfAndReportsItOnce) {
-  Open();
-  device->Write(kPoll);
-  time.Advance(2);
-  events.clear();
-  ports.Unplug(1);
-  EXPECT_FALSE(device->Exists(1));
-  EXPECT_THAT(events, IsEmpty());
-  device->Write(kPoll);  // the owner does not know yet
-  EXPECT_EQ(device->PendingOutput(), 0u);
-  EXPECT_EQ(device->ReadAll(), (Bytes{0x00, 0x05, 0x88}));
-  time.Advance(100);
-  EXPECT_THAT(events, ElementsAre(SerialEvent::kDeviceLost));
-  EXPECT_THROW(device->Write(kPoll), RuntimeError) << "it has closed itself";
-  EXPECT_THROW(device->Open(1, 19200), RuntimeError);
-
-  ports.Replug(1);
-  Open();
-  device->Write(kPoll);
-  time.Advance(4);
-  EXPECT_EQ(device->ReadAll(), kPoll);
-  events.clear();
-  ports.Unplug(1);
-  device->Close();  // a closed port reports no loss
-  time.Advance(100);
-  EXPECT_THAT(events, IsEmpty());
 }
 
 }  // namespace

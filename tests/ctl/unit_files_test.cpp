@@ -8,12 +8,7 @@
 #include <string>
 
 #include "config/option_bytes.h"
-#include "ctl/configuration_files.h"
 #include "ctl/ctl_fixture.h"
-
-#ifdef __linux__
-#include <sys/resource.h>
-#endif
 
 namespace tendril::test {
 namespace {
@@ -139,19 +134,6 @@ TEST_F(UnitFiles, Stop_NamesTheUnitThatHoldsHalfAConfiguration) {
   EXPECT_TRUE(Untouched(last));
 }
 
-TEST_F(UnitFiles, UnpluggedPort_EndsTheCommand) {
-  AttachUnits(0x05, 0x06);
-  In(1000, [this] { world_.bench.Unplug(1); });
-  EXPECT_EQ(Run("send wide.json 05,06 --quiet"), 1);
-  EXPECT_THAT(terminal_.out,
-              HasSubstr("05    partly   -         The port went away: plug the adapter in again.\n"));
-  EXPECT_THAT(terminal_.out, HasSubstr("\n06    no       -         Not tried.\n"));
-  EXPECT_EQ(
-      terminal_.error,
-      "tendril-ctl: The port went away: plug the adapter in again. 1 of 2 units failed, 1 was not tried. "
-      "For another run: 05-06.\n");
-}
-
 TEST_F(UnitFiles, Backup_WritesWholeFilesAndReplacesNone) {
   AttachUnits(0x05, 0x07);
   In(100, [] { Write("other.json", "by another program"); });
@@ -272,25 +254,6 @@ TEST_F(UnitFiles, ABadFile_IsRefusedBeforeAnythingIsSent) {
   EXPECT_EQ(Run("restore set --yes --quiet"), 0);
   EXPECT_EQ(unit.accepted_commands(), 8U);
 }
-
-#ifdef __linux__
-TEST_F(UnitFiles, AFullDisk_LeavesTheOldFileAndNoOther) {
-  const QByteArray good = TextOf("wide.json");
-  rlimit limit{};
-  getrlimit(RLIMIT_FSIZE, &limit);
-  const rlimit small{512, limit.rlim_max};
-  const auto old_handler = std::signal(SIGXFSZ, SIG_IGN);
-  setrlimit(RLIMIT_FSIZE, &small);
-  ctl::CommandLine force;
-  force.force = true;
-  const QString fault = ctl::WriteNewFile(QStringLiteral("wide.json"), good + good, force);
-  setrlimit(RLIMIT_FSIZE, &limit);
-  std::signal(SIGXFSZ, old_handler);
-  EXPECT_EQ(fault, QStringLiteral("wide.json cannot be written: File too large."));
-  EXPECT_EQ(TextOf("wide.json"), good);
-  EXPECT_EQ(FilesIn("."), "wide.json");
-}
-#endif
 
 TEST_F(UnitFiles, FortyUnits_TakeWhatTheProtocolTakes) {
   constexpr int kUnits = 40;

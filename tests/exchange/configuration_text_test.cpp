@@ -126,12 +126,5 @@ TEST(ConfigurationText, RefusedWithPlaceAndReason) {
   }
 }
 
-TEST(ConfigurationText, RecordThatCannotBeSent_IsNotWritten) {
-  auto read = std::get<ConfigurationText>(ReadConfiguration(Example()));
-  read.records.At(3).PortType = -1;
-  EXPECT_EQ(std::get<Refusal>(WriteConfiguration(read)).Sentence().toStdString(),
-            "port 4: output kind -1 cannot be sent");
-}
-
 }  // namespace
 }  // namespace tendril

@@ -1,50 +1,28 @@
 #include "unitops/change_id_operation.h"
 
-#include <vector>
-
 #include "command_fixture.h"
 
 namespace tendril::test {
 namespace {
 
-class ChangeId : public CommandTest {
- protected:
-  ChangeId() {
-    world_.bench.Line(1).SetTap([this](const LineByte& byte) {
-      if (byte.from != LineSide::kProgram) return;
-      if (byte.value != 0) {
-        sent_.back().push_back(byte.value);
-      } else if (!sent_.back().empty()) {
-        sent_.emplace_back();
-      }
-    });
-  }
-  std::size_t Polls(std::uint8_t kind) const {
-    return static_cast<std::size_t>(std::count_if(sent_.begin(), sent_.end(), [&](const Bytes& packet) {
-      return packet.size() == 4 && packet[1] == 0x88 && packet[2] == kind;
-    }));
-  }
-
-  std::vector<Bytes> sent_{
-      {}};  // packets that the program sent, by the bytes between their zeros; the last is empty
-};
+using ChangeId = CommandTest;
 
 TEST_F(ChangeId, UnitFromTheFactory_IsFoundGivenItsIdAndConfirmed) {
   auto& unit = world_.Attach("", 0xFF);
   target_.unit = 0x0A;
-  commands_.change_id.Start();
-  EXPECT_EQ(commands_.running.What(), "Giving the unit the ID 0A");
-  target_.unit = 0x0B;  // does not count any more
-  RunToTheEnd();
+  const Bytes sent = Sent([&] {
+    commands_.change_id.Start();
+    EXPECT_EQ(commands_.running.What(), "Giving the unit the ID 0A");
+    target_.unit = 0x0B;  // does not count any more
+    RunToTheEnd();
+  });
   ExpectSuccess("SUCCESS: UnitID set to '0A'");
   EXPECT_EQ(unit.id(), 0x0A);
   EXPECT_EQ(unit.rejected_commands(), 0u);
 
-  EXPECT_EQ(sent_, (std::vector<Bytes>{{0xFF, 0x88, '*', 45},
-                                       {0xFF, 0x8A, 0x56},
-                                       {0xFF, 0x0F, 0x0A, 0x0A, 0x0A, 0x38},
-                                       {0x0A, 0x88, '+', 45},
-                                       {}}));
+  EXPECT_EQ(sent, (Bytes{0, 0xFF, 0x88, '*',  45, 0, 0,    0,                                //
+                         0, 0xFF, 0x8A, 0x56, 0,  0, 0xFF, 0x0F, 0x0A, 0x0A, 0x0A, 0x38, 0,  //
+                         0, 0x0A, 0x88, '+',  45, 0, 0,    0}));
   EXPECT_EQ(world_.time.ElapsedMs(), 800u) << "one step every 200 ms";
 }
 
@@ -52,12 +30,16 @@ TEST_F(ChangeId, EveryUnit_EndsWithItsOutcome) {
   const auto run = [&](const std::string& fault, std::uint8_t id, std::uint8_t new_id, std::size_t find_polls,
                        std::size_t confirm_polls) {
     SCOPED_TRACE(fault);
-    sent_ = {{}};
     VirtualUnit& unit = world_.Attach(fault, id);
     target_.unit = new_id;
-    Run(commands_.change_id);
-    EXPECT_EQ(Polls('*'), find_polls);
-    EXPECT_EQ(Polls('+'), confirm_polls);
+    const Bytes sent = Sent([&] { Run(commands_.change_id); });
+    const auto polls = [&sent](std::uint8_t kind) {
+      std::size_t count = 0;
+      for (std::size_t i = 1; i < sent.size(); ++i) count += sent[i - 1] == 0x88 && sent[i] == kind ? 1 : 0;
+      return count;
+    };
+    EXPECT_EQ(polls('*'), find_polls);
+    EXPECT_EQ(polls('+'), confirm_polls);
     const std::uint8_t last_id = unit.id();
     world_.bench.Detach(1, unit);
     return last_id;

@@ -55,6 +55,16 @@ class CommandTest : public testing::Test {
     constexpr std::uint64_t kLongestMs = 12000;
     ASSERT_TRUE(world_.time.AdvanceUntil([&] { return !commands_.running.Active(); }, kLongestMs));
   }
+  // What the program puts on the line of Comm 1 meanwhile.
+  Bytes Sent(const std::function<void()>& action) {
+    Bytes bytes;
+    world_.bench.Line(1).SetTap([&](const LineByte& byte) {
+      if (byte.from == LineSide::kProgram) bytes.push_back(byte.value);
+    });
+    action();
+    world_.bench.Line(1).SetTap(nullptr);
+    return bytes;
+  }
   void Run(UnitOperation& operation) {
     operation.Start();
     RunToTheEnd();

@@ -26,16 +26,6 @@ class Send : public CommandTest {
     };
     ASSERT_TRUE(world_.time.AdvanceUntil(acknowledged, 1000));
   }
-  // What the program puts on the line.
-  Bytes Sent(const std::function<void()>& action) {
-    Bytes bytes;
-    world_.bench.Line(1).SetTap([&](const LineByte& byte) {
-      if (byte.from == LineSide::kProgram) bytes.push_back(byte.value);
-    });
-    action();
-    world_.bench.Line(1).SetTap(nullptr);
-    return bytes;
-  }
 };
 
 TEST_F(Send, EveryPort_GoesOutAsUnlockOptionsAndPoll) {
