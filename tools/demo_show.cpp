@@ -171,6 +171,7 @@ class Show {
   }
 
   void Send() {
+    QApplication::processEvents();  // all of it is painted before the first poll
     const VirtualUnit& unit = program_.bench.unit_01;
     user_.Press(kSend);
     // In the pause between two ports: a picture takes longer than a unit waits for the line.

@@ -31,7 +31,8 @@ UtilityProgram::UtilityProgram()
       processes(OpenProcessList()),
       control_panel(platform.timers, platform.boxes, wsCLI, registry, *processes),
       window(Serial1, platform.timers, platform.boxes, control_panel,
-             {kVersion, FromPath(CommandLogPath()), FromPath(RegistryPath())}) {
+             // The path of the log has a separator twice on Windows.
+             {kVersion, FromPath(CommandLogPath().lexically_normal()), FromPath(RegistryPath())}) {
   Serial1.SetTraceSink(Trace);
   Serial1.SetTraceOutput(serial_trace().isDebugEnabled());
   platform.boxes.SetParent(&window);
