@@ -18,6 +18,7 @@ struct QtPlatform {
     boxes.Show({description, kDefaultBoxTitle, BoxIcon::kCritical});
   };
   QtTimerFactory timers{on_fault};
+  QtTimerFactory inexact_timers{on_fault, false};  // for the connection to the Control Panel
 };
 
 }  // namespace tendril

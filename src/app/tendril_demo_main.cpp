@@ -5,6 +5,7 @@
 
 #include "app/caller_terminal.h"
 #include "app/demo_program.h"
+#include "app/system_appearance.h"
 #include "ui/appearance.h"
 
 int main(int argc, char** argv) {
@@ -29,6 +30,7 @@ int main(int argc, char** argv) {
     return EXIT_SUCCESS;
   }
   parser.process(application);  // the options of Qt
+  tendril::FollowSystemAppearance();
   if (parser.isSet(dark)) tendril::SetDarkAppearance(true);
   tendril::DemoProgram program;
   program.window.show();

@@ -29,7 +29,7 @@ UtilityProgram::UtilityProgram()
       registry_store(OpenSystemRegistry(Warn)),
       registry(*registry_store, Warn),
       processes(OpenProcessList()),
-      control_panel(platform.timers, platform.boxes, wsCLI, registry, *processes),
+      control_panel(platform.inexact_timers, platform.boxes, wsCLI, registry, *processes),
       window(Serial1, platform.timers, platform.boxes, control_panel,
              // The path of the log has a separator twice on Windows.
              {kVersion, FromPath(CommandLogPath().lexically_normal()), FromPath(RegistryPath())}) {

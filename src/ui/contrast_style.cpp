@@ -110,6 +110,19 @@ void ContrastStyle::drawPrimitive(PrimitiveElement element, const QStyleOption* 
   if (outline->surrounds) DrawFocus(*painter, *option, option->rect, element == PE_PanelButtonCommand);
 }
 
+void ContrastStyle::drawControl(ControlElement element, const QStyleOption* option, QPainter* painter,
+                                const QWidget* widget) const {
+  const auto* button = qstyleoption_cast<const QStyleOptionButton*>(option);
+  if (draws_edges_ || element != CE_PushButtonBevel || button == nullptr ||
+      !button->features.testFlag(QStyleOptionButton::DefaultButton)) {
+    return QProxyStyle::drawControl(element, option, painter, widget);
+  }
+  // In the style of Windows the default button pulses: it is painted again and again while its dialog is open.
+  QStyleOptionButton still = *button;
+  still.styleObject = nullptr;
+  QProxyStyle::drawControl(element, &still, painter, widget);
+}
+
 void ContrastStyle::drawComplexControl(ComplexControl control, const QStyleOptionComplex* option,
                                        QPainter* painter, const QWidget* widget) const {
   const auto draw = [&](auto edged, double contrast) {

@@ -11,7 +11,8 @@
 namespace tendril {
 
 // Corrects the application's palette. Over the Fusion style, it also draws the outlines of controls and the frames of
-// group boxes in QPalette::Mid, and a line around what has the focus. Other styles draw as they do without it.
+// group boxes in QPalette::Mid, and a line around what has the focus. Other styles draw as they do without it, but for
+// buttons that pulse.
 class ContrastStyle : public QProxyStyle {
   Q_OBJECT
 
@@ -26,6 +27,8 @@ class ContrastStyle : public QProxyStyle {
   void polish(QPalette& palette) override;
   void drawPrimitive(PrimitiveElement element, const QStyleOption* option, QPainter* painter,
                      const QWidget* widget) const override;
+  void drawControl(ControlElement element, const QStyleOption* option, QPainter* painter,
+                   const QWidget* widget) const override;
   void drawComplexControl(ComplexControl control, const QStyleOptionComplex* option, QPainter* painter,
                           const QWidget* widget) const override;
 

@@ -9,11 +9,17 @@
 namespace tendril {
 namespace {
 
+#ifdef _WIN32
+constexpr Qt::TimerType kInexact = Qt::CoarseTimer;
+#else
+constexpr Qt::TimerType kInexact = Qt::PreciseTimer;  // the other types fire up to 5 % early
+#endif
+
 class QtTimer final : public Timer {
  public:
-  QtTimer(std::function<void()> on_tick, FaultHandler on_fault)
+  QtTimer(std::function<void()> on_tick, FaultHandler on_fault, bool exact)
       : tick_(std::make_shared<Tick>(Tick{std::move(on_tick), std::move(on_fault)})) {
-    timer_.setTimerType(Qt::PreciseTimer);  // the other types fire up to 5 % early
+    timer_.setTimerType(exact ? Qt::PreciseTimer : kInexact);
     QObject::connect(&timer_, &QTimer::timeout, &timer_, [this] { OnTimeout(); });
   }
 
@@ -71,7 +77,7 @@ class QtTimer final : public Timer {
 }  // namespace
 
 std::unique_ptr<Timer> QtTimerFactory::CreateTimer(std::function<void()> on_tick) {
-  return std::make_unique<QtTimer>(std::move(on_tick), on_fault_);
+  return std::make_unique<QtTimer>(std::move(on_tick), on_fault_, exact_);
 }
 
 }  // namespace tendril
