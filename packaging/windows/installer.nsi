@@ -8,13 +8,18 @@ SetCompressor /SOLID lzma
 
 !define PRODUCT "Tendril Configuration Utility"
 !define UNINSTALL_KEY "Software\Microsoft\Windows\CurrentVersion\Uninstall\Tendril Configuration Utility"
-!define EXIT_RUNNING 3  ; the exit code then, besides NSIS's own: 0 done, 1 cancelled, 2 failed
+; Exit codes, besides NSIS's own: 0 done, 1 cancelled, 2 failed.
+!define EXIT_RUNNING 3      ; a program that runs is in the way
+!define EXIT_OLD_WINDOWS 4
+!define OLDEST_BUILD 15063  ; Qt's imports: SetProcessDpiAwarenessContext
+!define OLDEST_WINDOWS "Windows 10 version 1703"
 
 Name "${PRODUCT}"
 OutFile "${OUTPUT}"
 InstallDir "$PROGRAMFILES64\Tendril"
 InstallDirRegKey HKLM "${UNINSTALL_KEY}" InstallLocation  ; an upgrade goes where the older version is
 RequestExecutionLevel admin
+AllowSkipFiles off
 ManifestSupportedOS all
 ManifestDPIAware true
 ShowInstDetails nevershow
@@ -43,13 +48,13 @@ VIAddVersionKey ProductVersion "${VERSION}"
 !insertmacro MUI_LANGUAGE English
 
 ; A program that runs cannot be opened for writing. Asks to close it; silent, ends with an exit code.
-!macro EndWhileRunning program
+!macro EndWhileRunning folder program
   ${Do}
-    ${IfNot} ${FileExists} "$INSTDIR\${program}.exe"
+    ${IfNot} ${FileExists} "${folder}\${program}.exe"
       ${ExitDo}
     ${EndIf}
     ClearErrors
-    FileOpen $0 "$INSTDIR\${program}.exe" a
+    FileOpen $0 "${folder}\${program}.exe" a
     ${IfNot} ${Errors}
       FileClose $0
       ${ExitDo}
@@ -61,17 +66,31 @@ VIAddVersionKey ProductVersion "${VERSION}"
   ${Loop}
 !macroend
 
-!macro EndWhileAnyRuns
-  !insertmacro EndWhileRunning tendril-utility
-  !insertmacro EndWhileRunning tendril-demo
-  !insertmacro EndWhileRunning tendril-ctl
+!macro EndWhileAnyRuns folder
+  !insertmacro EndWhileRunning "${folder}" tendril-utility
+  !insertmacro EndWhileRunning "${folder}" tendril-demo
+  !insertmacro EndWhileRunning "${folder}" tendril-ctl
+!macroend
+
+; With "_?=" the uninstaller runs where it is, so its exit code is known, and it cannot remove itself.
+!macro RemoveVersion folder
+  ${If} ${FileExists} "${folder}\uninstall.exe"
+    ExecWait '"${folder}\uninstall.exe" /S _?=${folder}' $0
+    ${If} $0 <> 0
+      MessageBox MB_OK|MB_ICONSTOP "The version that is installed cannot be removed." /SD IDOK
+      SetErrorLevel $0
+      Quit
+    ${EndIf}
+    Delete "${folder}\uninstall.exe"
+    RMDir "${folder}"
+  ${EndIf}
 !macroend
 
 Function .onInit
   SetShellVarContext all
-  ${IfNot} ${AtLeastWin10}
-    MessageBox MB_YESNO|MB_ICONEXCLAMATION|MB_DEFBUTTON2 \
-      "The ${PRODUCT} needs Windows 10 or newer. Install it on this older Windows all the same?" /SD IDYES IDYES +2
+  ${IfNot} ${AtLeastBuild} ${OLDEST_BUILD}
+    MessageBox MB_OK|MB_ICONSTOP "The ${PRODUCT} needs ${OLDEST_WINDOWS} or newer." /SD IDOK
+    SetErrorLevel ${EXIT_OLD_WINDOWS}
     Quit
   ${EndIf}
 FunctionEnd
@@ -81,25 +100,19 @@ Function un.onInit
 FunctionEnd
 
 Section
-  !insertmacro EndWhileAnyRuns
-  ; What an older version has and this one has not, goes.
-  ${If} ${FileExists} "$INSTDIR\uninstall.exe"
-    ExecWait '"$INSTDIR\uninstall.exe" /S _?=$INSTDIR' $0
-    ${If} $0 <> 0
-      MessageBox MB_OK|MB_ICONSTOP "The version that is installed cannot be removed." /SD IDOK
-      SetErrorLevel $0
-      Quit
-    ${EndIf}
+  ; An older version may be in another folder.
+  ReadRegStr $1 HKLM "${UNINSTALL_KEY}" InstallLocation
+  ${If} $1 == ""
+    StrCpy $1 $INSTDIR
   ${EndIf}
+  !insertmacro EndWhileAnyRuns "$1"
+  !insertmacro EndWhileAnyRuns "$INSTDIR"
+  !insertmacro RemoveVersion "$1"
+  !insertmacro RemoveVersion "$INSTDIR"
+
+  ; First what removes an installation: it may fail in the middle.
   SetOutPath "$INSTDIR"
-  File /r "${FOLDER}/*"
   WriteUninstaller "$INSTDIR\uninstall.exe"
-
-  CreateDirectory "$SMPROGRAMS\${PRODUCT}"
-  CreateShortcut "$SMPROGRAMS\${PRODUCT}\${PRODUCT}.lnk" "$INSTDIR\tendril-utility.exe"
-  CreateShortcut "$SMPROGRAMS\${PRODUCT}\Demonstration without hardware.lnk" "$INSTDIR\tendril-demo.exe"
-  CreateShortcut "$SMPROGRAMS\${PRODUCT}\Manual.lnk" "$INSTDIR\docs\manual.html"
-
   WriteRegStr HKLM "${UNINSTALL_KEY}" DisplayName "${PRODUCT}"
   WriteRegStr HKLM "${UNINSTALL_KEY}" DisplayVersion "${VERSION}"
   WriteRegStr HKLM "${UNINSTALL_KEY}" DisplayIcon "$INSTDIR\tendril-utility.exe"
@@ -111,10 +124,16 @@ Section
   WriteRegDWORD HKLM "${UNINSTALL_KEY}" NoRepair 1
   SectionGetSize 0 $0
   WriteRegDWORD HKLM "${UNINSTALL_KEY}" EstimatedSize $0
+
+  File /r "${FOLDER}/*"
+  CreateDirectory "$SMPROGRAMS\${PRODUCT}"
+  CreateShortcut "$SMPROGRAMS\${PRODUCT}\${PRODUCT}.lnk" "$INSTDIR\tendril-utility.exe"
+  CreateShortcut "$SMPROGRAMS\${PRODUCT}\Demonstration without hardware.lnk" "$INSTDIR\tendril-demo.exe"
+  CreateShortcut "$SMPROGRAMS\${PRODUCT}\Manual.lnk" "$INSTDIR\docs\manual.html"
 SectionEnd
 
 Section Uninstall
-  !insertmacro EndWhileAnyRuns
+  !insertmacro EndWhileAnyRuns "$INSTDIR"
   ; Each file by its name: what the user has put there stays.
   !include "${REMOVAL}"
   Delete "$INSTDIR\uninstall.exe"
