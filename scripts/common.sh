@@ -13,6 +13,8 @@ windows_packages=(cmake ninja-build g++-mingw-w64-x86-64-posix googletest wine64
 qt_windows_packages=(dpkg-dev python3 qt6-base-dev)
 # What packing for Windows needs besides.
 windows_package_packages=(cmark-gfm nsis zip)
+# What testing these packages needs besides.
+test_windows_package_packages=(xvfb xdotool unzip)
 fuzz_packages=(clang-14 libclang-rt-14-dev llvm-14 cmake ninja-build qt6-base-dev libgl-dev)
 coverage_packages=(gcovr)
 check_packages=(clang-format-14 clang-tidy-14)

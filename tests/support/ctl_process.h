@@ -12,12 +12,12 @@
 
 namespace tendril::test {
 
-// TENDRIL_CTL_PROGRAM names the program.
+// TENDRIL_CTL_PROGRAM names the program; TENDRIL_CTL in the environment another one, such as the installed one.
 class CtlProcess {
  public:
 #ifdef _WIN32
   explicit CtlProcess(const QStringList& arguments, const char* /*redirection*/ = nullptr) {
-    process_.start(QStringLiteral(TENDRIL_CTL_PROGRAM), arguments);
+    process_.start(qEnvironmentVariable("TENDRIL_CTL", QStringLiteral(TENDRIL_CTL_PROGRAM)), arguments);
     process_.closeWriteChannel();
   }
 #else
@@ -26,7 +26,7 @@ class CtlProcess {
     process_.start(QStringLiteral("/bin/sh"),
                    QStringList{QStringLiteral("-c"),
                                QString::fromUtf8(redirection) + QStringLiteral(" && exec \"$0\" \"$@\""),
-                               QStringLiteral(TENDRIL_CTL_PROGRAM)} +
+                               qEnvironmentVariable("TENDRIL_CTL", QStringLiteral(TENDRIL_CTL_PROGRAM))} +
                        arguments);
     process_.closeWriteChannel();
   }
