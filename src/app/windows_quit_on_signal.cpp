@@ -2,6 +2,7 @@
 
 #include <QObject>
 #include <mutex>
+#include <optional>
 #include <thread>
 #include <utility>
 
@@ -38,26 +39,49 @@ BOOL WINAPI OnConsoleEvent(DWORD event) {
   HoldProcess();
 }
 
-LRESULT CALLBACK OnWindowMessage(HWND window, UINT message, WPARAM first, LPARAM second) {
-  const bool session_ends = message == WM_ENDSESSION && first != 0;
-  if (session_ends && DeliverRequest(kTerminate)) HoldProcess();
-  return ::DefWindowProcW(window, message, first, second);
-}
+// Where a program uses user32.dll, and Qt does, the end of the session comes to its windows instead of the handler above:
+// here to a window that is never shown, in a thread that ends with this object. A process that ends in the middle of a
+// thread's call to user32.dll may hang.
+class SessionWatch {
+ public:
+  ~SessionWatch() {
+    ::SetEvent(over_);
+    thread_.join();
+    ::CloseHandle(over_);
+  }
 
-// Where a program uses user32.dll, and Qt does, the end of the session comes to its windows instead. This one is never
-// shown, and lives as long as the process.
-void WatchSession() {
-  WNDCLASSW kind = {};
-  kind.lpfnWndProc = OnWindowMessage;
-  kind.hInstance = ::GetModuleHandleW(nullptr);
-  kind.lpszClassName = L"TendrilSession";
-  if (::RegisterClassW(&kind) == 0) return;  // there is one already
-  std::thread([instance = kind.hInstance, name = kind.lpszClassName] {
-    ::CreateWindowExW(0, name, L"", 0, 0, 0, 0, 0, nullptr, nullptr, instance, nullptr);
-    MSG message;
-    while (::GetMessageW(&message, nullptr, 0, 0) > 0) ::DispatchMessageW(&message);
-  }).detach();
-}
+ private:
+  static LRESULT CALLBACK OnMessage(HWND window, UINT message, WPARAM first, LPARAM second) {
+    const bool session_ends = message == WM_ENDSESSION && first != 0;
+    if (session_ends && DeliverRequest(kTerminate)) ::WaitForSingleObject(over_of_this_thread_, INFINITE);
+    return ::DefWindowProcW(window, message, first, second);
+  }
+
+  void Run() {
+    over_of_this_thread_ = over_;
+    WNDCLASSW kind = {};
+    kind.lpfnWndProc = OnMessage;
+    kind.hInstance = ::GetModuleHandleW(nullptr);
+    kind.lpszClassName = L"TendrilSession";
+    ::RegisterClassW(&kind);  // fails when an earlier watch has done it
+    const HWND window = ::CreateWindowExW(0, kind.lpszClassName, L"", 0, 0, 0, 0, 0, nullptr, nullptr,
+                                          kind.hInstance, nullptr);
+    while (::MsgWaitForMultipleObjects(1, &over_, FALSE, INFINITE, QS_ALLINPUT) == WAIT_OBJECT_0 + 1) {
+      for (MSG message; ::PeekMessageW(&message, nullptr, 0, 0, PM_REMOVE);) ::DispatchMessageW(&message);
+    }
+    ::DestroyWindow(window);
+  }
+
+  static thread_local HANDLE over_of_this_thread_;
+
+  HANDLE over_ =
+      ::CreateEventW(nullptr, TRUE, FALSE, nullptr);  // set when the program has done what it has to
+  std::thread thread_{[this] { Run(); }};
+};
+
+thread_local HANDLE SessionWatch::over_of_this_thread_ = nullptr;
+
+std::optional<SessionWatch> session_watch;  // none while there is no QuitOnSignal
 
 // The calling thread, for others.
 HANDLE ThisThread() {
@@ -95,13 +119,16 @@ QuitOnSignal::QuitOnSignal(std::function<void(int)> handler)
     deliver_request = [this](int signal) { delivery_->Deliver(signal); };
   }
   ::SetConsoleCtrlHandler(OnConsoleEvent, TRUE);
-  WatchSession();
+  session_watch.emplace();
 }
 
 QuitOnSignal::~QuitOnSignal() {
   ::SetConsoleCtrlHandler(OnConsoleEvent, FALSE);
-  const std::lock_guard guard(request_lock);
-  deliver_request = nullptr;
+  {
+    const std::lock_guard guard(request_lock);
+    deliver_request = nullptr;
+  }
+  session_watch.reset();
 }
 
 }  // namespace tendril
