@@ -40,9 +40,8 @@ VIAddVersionKey ProductVersion "${VERSION}"
 !define MUI_UNICON "${ICON}"
 !define MUI_ABORTWARNING
 !insertmacro MUI_PAGE_DIRECTORY
+!define MUI_INSTFILESPAGE_FINISHHEADER_SUBTEXT "The ${PRODUCT} is in the Start menu."
 !insertmacro MUI_PAGE_INSTFILES
-!define MUI_FINISHPAGE_TEXT "The ${PRODUCT} is in the Start menu."
-!insertmacro MUI_PAGE_FINISH
 !insertmacro MUI_UNPAGE_CONFIRM
 !insertmacro MUI_UNPAGE_INSTFILES
 !insertmacro MUI_LANGUAGE English
