@@ -173,7 +173,7 @@ void LineTrace::NoteSent(std::span<const std::uint8_t> bytes) {
 }
 
 void LineTrace::NotePoll(std::span<const std::uint8_t> packet) {
-  FlushReceived();
+  if (!EchoBegun()) FlushReceived();
   poll_ = WaitingPoll{.unit = packet[1], .kind = packet[3]};
   parser_.Start(packet[1]);
   NoteSent(packet);
@@ -229,6 +229,14 @@ void LineTrace::NoteLateReply(std::uint8_t code) {
   const bool none_came = poll.outcome == PollOutcome::kSilence || poll.outcome == PollOutcome::kEchoOnly ||
                          poll.outcome == PollOutcome::kNoAnswer;
   if (none_came && code == poll.kind) poll.outcome = PollOutcome::kTooLate;
+}
+
+// On a busy machine some bytes of a command come back before the poll is sent.
+bool LineTrace::EchoBegun() const {
+  const Bytes begun = WithoutZeros(received_.Seen());
+  return !begun.empty() && std::any_of(unechoed_.begin(), unechoed_.end(), [&begun](const Bytes& sent) {
+    return begun.size() <= sent.size() && std::equal(begun.begin(), begun.end(), sent.begin());
+  });
 }
 
 // What came without an end is shown, too.

@@ -130,6 +130,7 @@ class LineTrace {
   void NotePacket(const Bytes& packet, ReplyParser::Verdict verdict);
   void NoteTimeOut();
   void NoteLateReply(std::uint8_t code);
+  bool EchoBegun() const;
   void FlushReceived();
   void EndPoll(bool replied);
   void NoteSearch(bool replied);

@@ -36,7 +36,9 @@ class PacketSplitter {
     has_content_ = true;
     return false;
   }
-  // Takes what came since the last packet was taken.
+  // What came since the last packet was taken.
+  const Bytes& Seen() const { return bytes_; }
+  // Takes it.
   Bytes Take() {
     has_content_ = false;
     return std::exchange(bytes_, {});
