@@ -5,3 +5,4 @@ string(REGEX REPLACE "href=\"([a-z-]+)\\.md" "href=\"\\1.html" body "${body}")
 string(REGEX MATCH "<h1>([^<]*)</h1>" title "${body}")
 set(title "${CMAKE_MATCH_1}")
 configure_file("${TEMPLATE}" "${OUTPUT}" @ONLY)
+file(TOUCH "${OUTPUT}")  # a page that has not changed is made, too

@@ -66,12 +66,19 @@ without_display() {
   export QT_LOGGING_RULES="default.warning=false"
 }
 
+# The tests under wine load a library of their own first, whose path has to be one word.
+require_plain_path() {
+  [[ $PWD != *[[:space:]:]* ]] || { say "The tests under wine need a folder without spaces and colons in its path"; exit 1; }
+}
+
 # configure PRESET: when needed.
 configure() {
   require_packages "${build_packages[@]}"
-  if [ "$1" = windows-qt ] && ! grep -qsxF "CMAKE_PREFIX_PATH:UNINITIALIZED=$TENDRIL_WINDOWS_QT" build/windows-qt/CMakeCache.txt
-  then
-    rm -rf build/windows-qt  # there is none, or it is made with another Qt
+  if [ "$1" = windows-qt ]; then
+    export TENDRIL_WINDOWS_QT="${TENDRIL_WINDOWS_QT:-$(windows_qt_folder)}"
+    [ -d "$TENDRIL_WINDOWS_QT" ] || { say "There is no Qt for Windows yet: scripts/qt-windows makes it"; exit 1; }
+    grep -qsxF "CMAKE_PREFIX_PATH:UNINITIALIZED=$TENDRIL_WINDOWS_QT" build/windows-qt/CMakeCache.txt ||
+      rm -rf build/windows-qt  # there is none, or it is made with another Qt
   fi
   [ ! -f "build/$1/build.ninja" ] || return 0
   say "Configuring ($1)"

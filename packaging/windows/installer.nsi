@@ -1,5 +1,5 @@
 ; The installer for Windows, 64 bits, for all users. scripts/package-windows calls makensis with:
-;   VERSION, FOLDER (what to install), REMOVAL (a file that removes each of these), OUTPUT, ICON, SIGN (a command, or empty)
+;   VERSION, FOLDER (what to install), REMOVAL (files that remove it), OUTPUT, ICON, SIGN (a command, or empty)
 Target amd64-unicode
 SetCompressor /SOLID lzma
 !include MUI2.nsh
@@ -8,7 +8,8 @@ SetCompressor /SOLID lzma
 
 !define PRODUCT "Tendril Configuration Utility"
 !define UNINSTALL_KEY "Software\Microsoft\Windows\CurrentVersion\Uninstall\Tendril Configuration Utility"
-; Exit codes, besides NSIS's own: 0 done, 1 cancelled, 2 failed.
+; Exit codes, besides NSIS's own: 0 done, 1 cancelled.
+!define EXIT_FAILED 2
 !define EXIT_RUNNING 3      ; a program that runs is in the way
 !define EXIT_OLD_WINDOWS 4
 !define OLDEST_BUILD 15063  ; Qt's imports: SetProcessDpiAwarenessContext
@@ -33,7 +34,7 @@ VIAddVersionKey LegalCopyright ""
 VIAddVersionKey ProductName "${PRODUCT}"
 VIAddVersionKey ProductVersion "${VERSION}"
 !if "${SIGN}" != ""
-  !uninstfinalize '${SIGN} "%1"'
+  !uninstfinalize '${SIGN} "%1"' = 0
 !endif
 
 !define MUI_ICON "${ICON}"
@@ -134,7 +135,14 @@ SectionEnd
 Section Uninstall
   !insertmacro EndWhileAnyRuns "$INSTDIR"
   ; Each file by its name: what the user has put there stays.
-  !include "${REMOVAL}"
+  ClearErrors
+  !include "${REMOVAL}/files.nsh"
+  ${If} ${Errors}
+    MessageBox MB_OK|MB_ICONSTOP "Some files are in use. Restart Windows, and uninstall again." /SD IDOK
+    SetErrorLevel ${EXIT_FAILED}
+    Quit
+  ${EndIf}
+  !include "${REMOVAL}/folders.nsh"
   Delete "$INSTDIR\uninstall.exe"
   RMDir "$INSTDIR"
   Delete "$SMPROGRAMS\${PRODUCT}\${PRODUCT}.lnk"

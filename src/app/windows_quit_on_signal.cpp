@@ -83,6 +83,9 @@ thread_local HANDLE SessionWatch::over_of_this_thread_ = nullptr;
 
 std::optional<SessionWatch> session_watch;  // none while there is no QuitOnSignal
 
+// Once, and for good: to remove a handler waits for one that holds the process.
+std::once_flag console_watch;
+
 // The calling thread, for others.
 HANDLE ThisThread() {
   HANDLE thread = nullptr;
@@ -118,12 +121,11 @@ QuitOnSignal::QuitOnSignal(std::function<void(int)> handler)
     const std::lock_guard guard(request_lock);
     deliver_request = [this](int signal) { delivery_->Deliver(signal); };
   }
-  ::SetConsoleCtrlHandler(OnConsoleEvent, TRUE);
+  std::call_once(console_watch, [] { ::SetConsoleCtrlHandler(OnConsoleEvent, TRUE); });
   session_watch.emplace();
 }
 
 QuitOnSignal::~QuitOnSignal() {
-  ::SetConsoleCtrlHandler(OnConsoleEvent, FALSE);
   {
     const std::lock_guard guard(request_lock);
     deliver_request = nullptr;

@@ -33,9 +33,7 @@ class DeviceList {
     SP_DEVINFO_DATA device = {};
     device.cbSize = sizeof device;
     for (DWORD index = 0; SetupDiEnumDeviceInfo(devices_, index, &device); ++index) {
-      if (CompareStringOrdinal(PortName(device).c_str(), -1, port.c_str(), -1, TRUE) == CSTR_EQUAL) {
-        return device;
-      }
+      if (EqualNames(PortName(device), port)) return device;
     }
     return std::nullopt;
   }

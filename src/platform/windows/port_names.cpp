@@ -5,12 +5,10 @@
 #include <array>
 #include <string>
 
+#include "platform/windows/wide_text.h"
+
 namespace tendril {
 namespace {
-
-bool EqualNames(const wchar_t* a, const std::wstring& b) {
-  return CompareStringOrdinal(a, -1, b.c_str(), -1, TRUE) == CSTR_EQUAL;
-}
 
 // Drivers list their ports here. A value's name is the driver's for the device, its text the port.
 bool Listed(const std::wstring& port) {

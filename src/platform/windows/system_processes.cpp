@@ -6,20 +6,15 @@
 
 #include <string>
 
-#include "platform/unicode.h"
+#include "platform/windows/wide_text.h"
 
 namespace tendril {
 namespace {
 
-bool SameName(const wchar_t* a, const std::u16string& b) {
-  const auto* wide = reinterpret_cast<const wchar_t*>(b.c_str());
-  return CompareStringOrdinal(a, -1, wide, static_cast<int>(b.size()), TRUE) == CSTR_EQUAL;
-}
-
 class SystemProcessList final : public ProcessList {
  public:
   bool IsRunning(std::string_view program) const override {
-    const std::u16string name = Utf16(program);
+    const std::wstring name = WideText(program);
     const HANDLE processes = CreateToolhelp32Snapshot(TH32CS_SNAPPROCESS, 0);
     if (processes == INVALID_HANDLE_VALUE) return false;
     bool running = false;
@@ -27,7 +22,7 @@ class SystemProcessList final : public ProcessList {
     process.dwSize = sizeof process;
     for (BOOL more = Process32FirstW(processes, &process); more && !running;
          more = Process32NextW(processes, &process)) {
-      running = SameName(process.szExeFile, name);
+      running = EqualNames(process.szExeFile, name);
     }
     CloseHandle(processes);
     return running;
