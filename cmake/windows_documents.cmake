@@ -16,7 +16,7 @@ add_custom_target(tendril_pages ALL DEPENDS ${pages})
 install(FILES ${pages} docs/configuration.schema.json docs/tendril-ctl.schema.json DESTINATION docs)
 install(DIRECTORY docs/pictures DESTINATION docs)
 
-# scripts/qt-windows leaves these beside Qt. Who has Qt from elsewhere has its licences there.
+# scripts/qt-windows puts these beside Qt. Qt from elsewhere comes with licences of its own.
 get_target_property(qt_core Qt6::Core IMPORTED_LOCATION_RELEASE)
 get_filename_component(qt "${qt_core}/../.." ABSOLUTE)
 if(EXISTS "${qt}/source-version")

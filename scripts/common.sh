@@ -47,7 +47,7 @@ require_packages() {
 # The version of the source of the installed Qt.
 qt_version() { dpkg-query -W -f '${source:Version}' qt6-base-dev 2>/dev/null; }
 
-# The folder of Qt for Windows. Where it exists, it is complete; else scripts/qt-windows makes it. Another version of Qt,
+# The folder of Qt for Windows. If it exists, it is complete; if not, scripts/qt-windows makes it. Another version of Qt,
 # other options or another compiler have a folder of their own.
 windows_qt_folder() {
   local version made_of
