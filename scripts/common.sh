@@ -15,6 +15,8 @@ qt_windows_packages=(dpkg-dev python3 qt6-base-dev)
 windows_package_packages=(cmark-gfm nsis zip)
 # What testing these packages needs besides.
 test_windows_package_packages=(xvfb xdotool unzip)
+# What making the Debian packages needs besides.
+package_packages=(dpkg-dev file cmark-gfm)
 fuzz_packages=(clang-14 libclang-rt-14-dev llvm-14 cmake ninja-build qt6-base-dev libgl-dev)
 coverage_packages=(gcovr)
 check_packages=(clang-format-14 clang-tidy-14)
