@@ -16,7 +16,7 @@ windows_package_packages=(cmark-gfm nsis zip)
 # What testing these packages needs besides.
 test_windows_package_packages=(xvfb xdotool unzip)
 # What making the Debian packages needs besides.
-package_packages=(dpkg-dev file cmark-gfm)
+package_packages=(dpkg-dev file)
 fuzz_packages=(clang-14 libclang-rt-14-dev llvm-14 cmake ninja-build qt6-base-dev libgl-dev)
 coverage_packages=(gcovr)
 check_packages=(clang-format-14 clang-tidy-14)
