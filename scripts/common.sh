@@ -4,7 +4,7 @@ cd "$(dirname "${BASH_SOURCE[0]}")/.."
 
 # What building, running and testing needs on Debian 12 and its relatives.
 build_packages=(g++ cmake ninja-build qt6-base-dev libgl-dev libgtest-dev libgmock-dev
-                fonts-dejavu-core)
+                fonts-dejavu-core cmark-gfm)
 # What one test needs besides: a display and an accessibility bus for the program.
 test_packages=(xvfb dbus at-spi2-core xdotool)
 # What building and testing for Windows needs; GoogleTest is compiled along.

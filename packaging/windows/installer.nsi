@@ -129,7 +129,7 @@ Section
   CreateDirectory "$SMPROGRAMS\${PRODUCT}"
   CreateShortcut "$SMPROGRAMS\${PRODUCT}\${PRODUCT}.lnk" "$INSTDIR\tendril-utility.exe"
   CreateShortcut "$SMPROGRAMS\${PRODUCT}\Demonstration without hardware.lnk" "$INSTDIR\tendril-demo.exe"
-  CreateShortcut "$SMPROGRAMS\${PRODUCT}\Manual.lnk" "$INSTDIR\docs\manual.html"
+  CreateShortcut "$SMPROGRAMS\${PRODUCT}\Manual.lnk" "$INSTDIR\docs\manual\index.html"
 SectionEnd
 
 Section Uninstall

@@ -199,7 +199,8 @@ void frmNewServoConfig::ConnectMenu() {
   connect(menu_, &MainMenu::KeysChosen, c, [this] { ShowKeys(*this, *menu_); });
   connect(menu_, &MainMenu::ManualChosen, c, [this] {
     live_test_.OnTestButton(LiveTest::kNoButton);  // no servo moves while the user looks elsewhere
-    OpenManual(boxes_);
+    if (const QString sentence = OpenManual(ManualChapter::kContents, boxes_); !sentence.isEmpty())
+      status_->Say(sentence);
   });
   connect(menu_, &MainMenu::AboutChosen, c, [this] { ShowAbout(*this, info_); });
   connect(menu_, &MainMenu::StopChosen, c, [this] { live_test_.EndSweep(); });

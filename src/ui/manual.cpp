@@ -9,28 +9,34 @@
 namespace tendril {
 namespace {
 
-// Both from the program's folder: where the manual is installed, and where the sources have it.
-constexpr const char* kManualPlaces[] = {TENDRIL_INSTALLED_MANUAL, TENDRIL_SOURCE_MANUAL};
+// Both from the program's folder: where the manual is installed, and where the build has it.
+constexpr const char* kManualPlaces[] = {TENDRIL_INSTALLED_MANUAL, TENDRIL_BUILT_MANUAL};
 
-// The first place where there is one; else the first place.
-QString ManualPath() {
+// In the first place where there is one; else in the first place.
+QString PathOf(ManualChapter chapter) {
+  const std::string_view page = PageOf(chapter);
+  const QString file =
+      u'/' + QString::fromUtf8(page.data(), qsizetype(page.size())) + QStringLiteral(TENDRIL_MANUAL_SUFFIX);
   const QDir program(QCoreApplication::applicationDirPath());
   for (const char* place : kManualPlaces) {
-    QString path = QDir::cleanPath(program.filePath(QString::fromUtf8(place)));
+    QString path = QDir::cleanPath(program.filePath(QString::fromUtf8(place) + file));
     if (QFile::exists(path)) return path;
   }
-  return QDir::cleanPath(program.filePath(QString::fromUtf8(kManualPlaces[0])));
+  return QDir::cleanPath(program.filePath(QString::fromUtf8(kManualPlaces[0]) + file));
 }
 
 }  // namespace
 
-void OpenManual(MessageBoxes& boxes) {
-  const QString path = ManualPath();
-  if (QFile::exists(path) && QDesktopServices::openUrl(QUrl::fromLocalFile(path))) return;
+QString OpenManual(ManualChapter chapter, MessageBoxes& boxes) {
+  const QString path = PathOf(chapter);
+  const QString shown = QDir::toNativeSeparators(path);
+  if (QFile::exists(path) && QDesktopServices::openUrl(QUrl::fromLocalFile(path)))
+    return QStringLiteral("Opening the manual: ") + shown;
   const QString text = QFile::exists(path) ? QStringLiteral("The manual cannot be opened. It is here:")
                                            : QStringLiteral("The manual is missing. It belongs here:");
-  boxes.Show({(text + QStringLiteral("\r\n") + QDir::toNativeSeparators(path)).toStdString(),
-              kDefaultBoxTitle, BoxIcon::kExclamation});
+  boxes.Show(
+      {(text + QStringLiteral("\r\n") + shown).toStdString(), kDefaultBoxTitle, BoxIcon::kExclamation});
+  return {};
 }
 
 }  // namespace tendril

@@ -2,10 +2,12 @@
 #pragma once
 
 #include "platform/message_boxes.h"
+#include "ui/model/manual_chapter.h"
 
 namespace tendril {
 
-// Opens the manual in the system's own viewer. When that fails, a box says where the manual is.
-void OpenManual(MessageBoxes& boxes);
+// Opens a chapter of the manual in the system's own viewer. Returns the sentence that says where the chapter is, since a
+// system without a viewer may open nothing. When it is known that nothing opens, a box says so, and the sentence is empty.
+QString OpenManual(ManualChapter chapter, MessageBoxes& boxes);
 
 }  // namespace tendril
