@@ -1,10 +1,5 @@
 # What the user reads, installed beside the programs: the manual and the format of the files. With cmark-gfm they are
 # pages for a browser, made in the folder of the build; without it they stay Markdown.
-if(WIN32)
-  set(CMAKE_INSTALL_DOCDIR docs CACHE PATH "")
-else()
-  set(CMAKE_INSTALL_DOCDIR "${CMAKE_INSTALL_DATAROOTDIR}/doc/tendril-utility" CACHE PATH "")
-endif()
 find_program(TENDRIL_CMARK cmark-gfm)
 set(documents "${PROJECT_SOURCE_DIR}/docs")
 install(DIRECTORY docs/pictures DESTINATION "${CMAKE_INSTALL_DOCDIR}" COMPONENT utility)

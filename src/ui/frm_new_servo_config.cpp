@@ -197,11 +197,7 @@ void frmNewServoConfig::ConnectMenu() {
   connect(menu_, &MainMenu::DismissChosen, c, [this] { compared_.Dismiss(); });
   connect(menu_, &MainMenu::SimulatorChosen, c, [this] { ShowConfig(); });
   connect(menu_, &MainMenu::KeysChosen, c, [this] { ShowKeys(*this, *menu_); });
-  connect(menu_, &MainMenu::ManualChosen, c, [this] {
-    live_test_.OnTestButton(LiveTest::kNoButton);  // no servo moves while the user looks elsewhere
-    if (const QString sentence = OpenManual(ManualChapter::kContents, boxes_); !sentence.isEmpty())
-      status_->Say(sentence);
-  });
+  connect(menu_, &MainMenu::ManualChosen, c, [this] { ShowManual(); });
   connect(menu_, &MainMenu::AboutChosen, c, [this] { ShowAbout(*this, info_); });
   connect(menu_, &MainMenu::StopChosen, c, [this] { live_test_.EndSweep(); });
 }
@@ -337,6 +333,27 @@ void frmNewServoConfig::FindUnits() {
 
 void frmNewServoConfig::SayUnitId() {
   status_->Say(QStringLiteral("Unit ID ") + QString::fromStdString(HexByte(connection_->UnitId())));
+}
+
+void frmNewServoConfig::ShowManual() {
+  ManualFacts facts{
+      .moves = facts_.AnythingMoves(), .port = ports_.Facts(), .no_answer = facts_.UnitMissing()};
+  const std::pair<const QWidget*, ManualChapter> kDescribed[] = {
+      {connection_, ManualChapter::kFirstUnit},
+      {command_area_, ManualChapter::kConfigurations},
+      {apply_boxes_, ManualChapter::kConfigurations},
+      {live_test_area_, ManualChapter::kLiveTest},
+      {line_, ManualChapter::kNoAnswer},
+      {views_, ManualChapter::kNumbers}};
+  for (const auto& [area, chapter] : kDescribed) {
+    if (area != nullptr && area->isAncestorOf(focusWidget())) {
+      facts.focus = chapter;
+      break;
+    }
+  }
+  live_test_.OnTestButton(LiveTest::kNoButton);  // no servo moves while the user looks elsewhere
+  const QString sentence = OpenManual(FittingChapter(facts), boxes_);
+  if (!sentence.isEmpty()) status_->Say(sentence);
 }
 
 void frmNewServoConfig::closeEvent(QCloseEvent* event) {

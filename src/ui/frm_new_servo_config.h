@@ -103,6 +103,7 @@ class frmNewServoConfig : public QMainWindow {
   bool MakeWayForCommand();
   void FindUnits();
   void SayUnitId();
+  void ShowManual();
   LinePane& Line();
   void MakeSummary();
   void ShowSummary();

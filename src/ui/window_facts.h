@@ -32,6 +32,10 @@ class WindowFacts {
   void Show();
   // `unit` was polled, and has replied or not. Shows that.
   void NotePoll(std::uint8_t unit, bool replied);
+  // Whether a servo test runs, or the slider moves the servo.
+  bool AnythingMoves() const { return Moving().moves != Moves::kNothing; }
+  // Whether the chosen unit did not answer when it was polled last.
+  bool UnitMissing() const { return answers_.Missing(link_.CommPort(), target_.UnitId()); }
 
  private:
   MovingFacts Moving() const;

@@ -35,6 +35,32 @@ TEST_F(Window, About_CopiesEveryFactThatItShows) {
   EXPECT_TRUE(about.isVisible()) << "the same dialog";
 }
 
+TEST_F(Window, Manual_OpensTheChapterThatFits) {
+  QTextBrowser viewer;
+  QDesktopServices::setUrlHandler(QStringLiteral("file"), &viewer, "setSource");
+  const auto opened = [&] {
+    Keys("Ctrl+F1");
+    return viewer.source().fileName().section(u'.', 0, 0).toStdString();
+  };
+  EXPECT_EQ(opened(), "first-unit");
+  EXPECT_THAT(Text("lblStatus"),
+              HasSubstr(QDir::toNativeSeparators(viewer.source().toLocalFile()).toStdString()));
+  ChooseByKeys("cmbNYX", 1);
+  Run("Command3_1");
+  EXPECT_EQ(opened(), "no-answer");
+  Keys("Ctrl+PgDown");
+  EXPECT_EQ(opened(), "first-unit") << "this unit was not asked; the focus is on the connection";
+  Keys("Ctrl+1");
+  Spin("spnDefaultPos").setFocus();
+  EXPECT_EQ(opened(), "numbers");
+  Click("chkSendSlideCommands");
+  EXPECT_EQ(opened(), "live-test");
+  Click("chkSendSlideCommands");
+  Find("Command3_0").setFocus();
+  EXPECT_EQ(opened(), "configurations");
+  QDesktopServices::unsetUrlHandler(QStringLiteral("file"));
+}
+
 TEST_F(Window, Manual_IsOpenedOrTheUserSeesWhereItIs) {
   QTextBrowser viewer;
   QDesktopServices::setUrlHandler(QStringLiteral("file"), &viewer, "setSource");

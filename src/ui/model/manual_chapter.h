@@ -3,6 +3,8 @@
 
 #include <string_view>
 
+#include "unitops/port_facts.h"
+
 namespace tendril {
 
 // In the order of the manual's contents.
@@ -21,11 +23,17 @@ enum class ManualChapter {
 };
 
 // The name of the chapter's file, without a suffix.
-constexpr std::string_view PageOf(ManualChapter chapter) {
-  constexpr std::string_view kPages[] = {"index",     "first-unit", "numbers",       "configurations",
-                                         "live-test", "many-units", "control-panel", "ports",
-                                         "no-answer", "keys",       "support"};
-  return kPages[static_cast<int>(chapter)];
-}
+std::string_view PageOf(ManualChapter chapter);
+
+// What the window shows when the user asks for the manual.
+struct ManualFacts {
+  bool moves = false;  // a servo test runs, or the slider moves the servo
+  PortFacts port = {};
+  bool no_answer = false;                          // the chosen unit did not answer when it was asked last
+  ManualChapter focus = ManualChapter::kContents;  // what describes the controls that the user works with
+};
+
+// What moves comes first, then what is wrong, then what the user works with.
+ManualChapter FittingChapter(const ManualFacts& facts);
 
 }  // namespace tendril

@@ -8,6 +8,11 @@ void UnitAnswers::Note(std::int16_t port, std::uint8_t unit, bool replied, const
   polls_[{port, unit}] = {replied, time};
 }
 
+bool UnitAnswers::Missing(std::int16_t port, std::uint8_t unit) const {
+  const auto poll = polls_.find({port, unit});
+  return poll != polls_.end() && !poll->second.replied;
+}
+
 std::string UnitAnswers::Sentence(std::int16_t port, std::uint8_t unit) const {
   const std::string name = "Unit " + HexByte(unit);
   const auto poll = polls_.find({port, unit});
