@@ -19,11 +19,16 @@ test_windows_package_packages=(xvfb xdotool unzip)
 package_packages=(dpkg-dev file)
 fuzz_packages=(clang-14 libclang-rt-14-dev llvm-14 cmake ninja-build qt6-base-dev libgl-dev)
 coverage_packages=(gcovr)
-check_packages=(clang-format-14 clang-tidy-14)
+check_packages=(clang-format-14 clang-tidy-14 codespell)
 icon_packages=(librsvg2-bin optipng icoutils)
 picture_packages=(imagemagick optipng)
 
 say() { printf '%s\n' "== $*" >&2; }
+
+# For scripts that go by the list of files that git keeps.
+require_clone() {
+  git rev-parse --is-inside-work-tree >/dev/null 2>&1 || { say "$0 needs a clone of the repository, with git"; exit 1; }
+}
 
 # Installs those of the named packages that are missing. Asks for a password only then.
 require_packages() {

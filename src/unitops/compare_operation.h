@@ -27,7 +27,7 @@ class CompareOperation final : public ReadOperation {
   std::string Aftermath() const override;
 
  private:
-  // The boxes say what a get's do, and name the command.
+  // The boxes say what those of a get do, and name the command.
   static constexpr Texts kTexts{"Comparing unit ", "Compare Failed", "Compare", "Compare",
                                 "SUCCESS: Compare Complete"};
 
