@@ -38,10 +38,12 @@ foreach(component utility ctl bench)
   tendril_install_compressed("${CMAKE_BINARY_DIR}/changelog" changelog "${folder}" ${component})
 endforeach()
 
-install(FILES packaging/completion/tendril-ctl
-  DESTINATION "${CMAKE_INSTALL_DATADIR}/bash-completion/completions" COMPONENT ctl)
-install(FILES packaging/completion/_tendril-ctl
-  DESTINATION "${CMAKE_INSTALL_DATADIR}/zsh/vendor-completions" COMPONENT ctl)
+foreach(component ctl bench)
+  install(FILES packaging/completion/tendril-${component}
+    DESTINATION "${CMAKE_INSTALL_DATADIR}/bash-completion/completions" COMPONENT ${component})
+  install(FILES packaging/completion/_tendril-${component}
+    DESTINATION "${CMAKE_INSTALL_DATADIR}/zsh/vendor-completions" COMPONENT ${component})
+endforeach()
 
 set(CPACK_GENERATOR DEB)
 set(CPACK_PACKAGE_NAME tendril)

@@ -1,8 +1,9 @@
 #!/usr/bin/env bash
-# completion_test.sh PROGRAM: the shell completion and the manual page of tendril-ctl have what --help has, and no more.
+# completion_test.sh CTL BENCH: the shell completions and the manual pages of the two have what --help has, and no more.
 set -o pipefail
 cd "$(dirname "${BASH_SOURCE[0]}")/../../packaging" || exit
 program=$1
+bench=$2
 failed=0
 
 # same WHAT WANTED FOUND: the same words, in any order.
@@ -19,15 +20,17 @@ same() {
 
 # What bash offers for the last one of the words.
 source completion/tendril-ctl
+source completion/tendril-bench
+completed=ctl  # or bench
 offered() {
-  COMP_WORDS=(tendril-ctl "$@") COMP_CWORD=$#
-  _tendril_ctl
+  COMP_WORDS=("tendril-$completed" "$@") COMP_CWORD=$#
+  "_tendril_$completed"
   printf '%s\n' "${COMPREPLY[@]}"
 }
-# What is declared for zsh after a command, or without one. The file has no syntax that bash does not know.
+# What is declared for zsh after a command, or without one. The files have no syntax that bash does not know.
 declared() {
   local command=$1 words=(- "$1")
-  source completion/_tendril-ctl | sed 's/\[.*\]\(:\?\).*/\1/'
+  source "completion/_tendril-$completed" | sed 's/\[.*\]\(:\?\).*/\1/'
 }
 _arguments() {
   if [[ $1 == -C && $command ]]; then state=argument; else printf '%s\n' "$@"; fi
@@ -59,7 +62,7 @@ for command in $commands; do
     *) wanted='' ;;
   esac
   same "$command's files" "$wanted" \
-    "$(offered "$command" ma; offered "$command" completion/t; grep '^1:F.*_files' <<<"$declared")"
+    "$(offered "$command" ma; offered "$command" completion/tendril-c; grep '^1:F.*_files' <<<"$declared")"
 done
 
 page=$(tr -d '\134' <man/tendril-ctl.1)
@@ -67,4 +70,18 @@ same 'commands in the page' "$all_usages" "$(sed -n 's/^\.SS //p' <<<"$page")"
 same 'options in the page' "$all_options" "$(sed -nE 's/^\.BI? (-[hv], )?(--[a-z-]+).*/\2/p' <<<"$page")"
 same 'options in the text of the page' "$all_options" "$(grep -oe '--[a-z][a-z-]*' <<<"$page")"
 same 'exit codes in the page' "$exit_codes" "$(sed -nE 's/^\.B ([0-9]+)$/\1/p' <<<"$page")"
+
+completed=bench
+help=$("$bench" --help | grep -v -e --help-all)
+options=$(sed -nE 's/^  (-[hv], )?(--[a-z-]+) <.*>.*/\2:/p; s/^  (-[hv], )?(--[a-z-]+)  .*/\2/p' <<<"$help")
+faults=$(sed -n '/^Faults:/,/^$/s/^  \([a-z-]*\) .*/\1/p' <<<"$help")
+behaviours=$(sed -n '/^Behaviours/,/^$/s/^  \([a-z-]*\) .*/\1/p' <<<"$help")
+same 'options of the bench in bash' "${options//:/}" "$(offered -)"
+same 'options of the bench in zsh' "$options" "$(declared '' | tr -d '*')"
+same 'options in the page of the bench' "${options//:/}" \
+  "$(tr -d '\134' <man/tendril-bench.1 | sed -nE 's/^\.BI? (-[hv], )?(--[a-z-]+).*/\2/p')"
+same 'faults in bash' "$faults" "$(offered --fault '')"
+same 'behaviours in bash' "$behaviours" "$(offered --panel-behaviour '')"
+same 'faults and behaviours in zsh' "$faults $behaviours" "$(sed -nE '/^(faults|behaviours)=/,/\)$/p' completion/_tendril-bench |
+  tr '()' '\n\n' | grep -v =)"
 exit $failed
