@@ -10,6 +10,10 @@ install(FILES packaging/linux/tendril-utility.desktop packaging/linux/tendril-de
   DESTINATION "${CMAKE_INSTALL_DATADIR}/applications" COMPONENT utility)
 install(FILES "${CMAKE_BINARY_DIR}/com.kelvane.tendril_utility.metainfo.xml"
   DESTINATION "${CMAKE_INSTALL_DATADIR}/metainfo" COMPONENT utility)
+if(TENDRIL_CMARK)  # it names the pages
+  install(FILES packaging/linux/tendril-utility.manual
+    DESTINATION "${CMAKE_INSTALL_DATADIR}/doc-base" COMPONENT utility)
+endif()
 set(icons "${CMAKE_INSTALL_DATADIR}/icons/hicolor")
 install(FILES packaging/icons/tendril-utility.svg DESTINATION "${icons}/scalable/apps" COMPONENT utility)
 foreach(size 16 32 48 64 128 256)
@@ -61,7 +65,7 @@ set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
 set(CPACK_DEBIAN_UTILITY_PACKAGE_NAME tendril-utility)
 set(CPACK_DEBIAN_UTILITY_PACKAGE_SECTION electronics)
 set(CPACK_DEBIAN_UTILITY_PACKAGE_DEPENDS qt6-qpa-plugins)  # loaded at run time
-set(CPACK_DEBIAN_UTILITY_PACKAGE_RECOMMENDS "tendril-ctl, qt6-wayland")
+set(CPACK_DEBIAN_UTILITY_PACKAGE_RECOMMENDS "tendril-ctl, qt6-wayland, xdg-utils")  # the last opens the manual
 set(CPACK_DEBIAN_UTILITY_DESCRIPTION [[
 setup of Tendril servo controllers, in a window
 A Tendril unit is a servo controller with eight ports on a Nyx serial lighting
