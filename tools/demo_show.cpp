@@ -4,11 +4,14 @@
 #include <QCommandLineParser>
 #include <QDir>
 #include <QElapsedTimer>
+#include <QPainter>
 #include <QPixmap>
 #include <QSize>
+#include <QSlider>
 #include <QSpinBox>
 #include <QTest>
 #include <QTimer>
+#include <algorithm>
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
@@ -31,6 +34,7 @@ namespace tendril::test {
 namespace {
 
 constexpr int kMaxStepMs = 30'000;
+constexpr int kBetweenPictures = 24;
 
 void Print(const std::string& line) {
   std::puts(line.c_str());
@@ -39,6 +43,16 @@ void Print(const std::string& line) {
 
 void Require(bool met, const std::string& otherwise) {
   if (!met) throw std::runtime_error(otherwise);
+}
+
+// Two pictures in one, side by side, each in the middle of its height.
+QPixmap Beside(const QPixmap& left, const QPixmap& right, const QColor& ground) {
+  QPixmap both(left.width() + kBetweenPictures + right.width(), std::max(left.height(), right.height()));
+  both.fill(ground);
+  QPainter painter(&both);
+  painter.drawPixmap(0, (both.height() - left.height()) / 2, left);
+  painter.drawPixmap(both.width() - right.width(), (both.height() - right.height()) / 2, right);
+  return both;
 }
 
 // Each step raises std::runtime_error when it does not succeed.
@@ -108,6 +122,33 @@ class Show {
     SavePictureOfDialog("&Keys", "KeysDialog", "keys.png");
   }
 
+  // Pictures of parts of the window, for the manual: the connection to a unit fresh from the factory; a servo beside its
+  // pulse scale as it is at first, with a trim, and with a left stop at which it rests; the servo at both ends of its
+  // virtual range; and values that are not stored.
+  void TakeCloseUps() {
+    user_.ChoosePort(2);
+    user_.Find<QComboBox>("CmbUnitID_0").setCurrentIndex(0xF);
+    user_.Find<QComboBox>("CmbUnitID_1").setCurrentIndex(0xF);
+    auto& find = user_.Find("cmdFindUnits");
+    QWidget& group = *find.parentWidget();
+    Save(group.grab({0, 0, find.geometry().right() + kBetweenPictures, group.height()}), "connection.png");
+
+    Press("ServoSimulator2_0");
+    SaveCloseUp("scale-first.png", Servo(), Scale());
+    const QPixmap shortest = ServoAt(0);
+    SaveCloseUp("pulse-lengths.png", shortest, ServoAt(LiveTest::kSliderMaximum));
+
+    ServoAt(LiveTest::kSliderMaximum / 2);
+    Step("spnNeutralTrim", 10);
+    SavePicture(*user_.Find("PulseScale").parentWidget(), "not-stored.png");
+    Press("ServoSimulator2_0");  // stores, and moves the arm with the range
+    SaveCloseUp("scale-trim.png", Servo(), Scale());
+    Step("spnLeftVirtStop", 15);
+    Step("spnDefaultPos", -20);
+    const QPixmap at_stop = ServoAt(0);
+    SaveCloseUp("scale-left-stop.png", at_stop, Scale());
+  }
+
  private:
   static void Await(const std::function<bool()>& done, const std::string& what) {
     Require(WaitFor(done, kMaxStepMs),
@@ -126,9 +167,27 @@ class Show {
 
   void SavePicture(const char* name) { SavePicture(program_.window, name); }
   void SavePicture(QWidget& shown, const char* name) const {
-    const QString path = QDir(folder_).filePath(QString::fromUtf8(name));
     QApplication::sendPostedEvents(nullptr, QEvent::LayoutRequest);  // of texts that have just changed
-    Require(shown.grab().save(path), "Cannot save the picture " + path.toStdString());
+    Save(shown.grab(), name);
+  }
+
+  QPixmap Picture(const char* control) const {
+    QApplication::sendPostedEvents(nullptr, QEvent::LayoutRequest);
+    return user_.Find(control).grab();
+  }
+  QPixmap Servo() const { return Picture("ServoSimulator1"); }
+  QPixmap Scale() const { return Picture("PulseScale"); }
+  // The servo with the slider at `place`, or as near to it as the stops allow.
+  QPixmap ServoAt(int place) const {
+    user_.Find<QSlider>("HScrollSendServoPosition").setValue(place);
+    return Servo();
+  }
+  void SaveCloseUp(const char* name, const QPixmap& left, const QPixmap& right) const {
+    Save(Beside(left, right, program_.window.palette().color(QPalette::Window)), name);
+  }
+  void Save(const QPixmap& picture, const char* name) const {
+    const QString path = QDir(folder_).filePath(QString::fromUtf8(name));
+    Require(picture.save(path), "Cannot save the picture " + path.toStdString());
     Print("Picture: " + path.toStdString());
   }
   void SavePictureOfQuestion() {
@@ -250,10 +309,13 @@ int main(int argc, char** argv) {
   const QCommandLineOption pictures(
       QStringLiteral("pictures"),
       QStringLiteral("Only save pictures: of every view of the window, and of its dialogs."));
+  const QCommandLineOption close_ups(
+      QStringLiteral("close-ups"),
+      QStringLiteral("Only save pictures of parts of the window, for the manual."));
   const QCommandLineOption dark(QStringLiteral("dark"), QStringLiteral("Light text on a dark background."));
   const QCommandLineOption size(QStringLiteral("size"), QStringLiteral("The size of the window."),
                                 QStringLiteral("width>x<height"), QStringLiteral("1280x800"));
-  parser.addOptions({pictures, dark, size});
+  parser.addOptions({pictures, close_ups, dark, size});
   parser.addPositionalArgument(QStringLiteral("folder"), QStringLiteral("Where to save the pictures."));
   parser.process(application);
   if (parser.positionalArguments().size() != 1) parser.showHelp(EXIT_FAILURE);
@@ -262,7 +324,11 @@ int main(int argc, char** argv) {
     const QStringList sides = parser.value(size).split(QLatin1Char('x'));
     tendril::test::Require(sides.size() == 2, "The size needs a width and a height.");
     tendril::test::Show show(parser.positionalArguments().constFirst(), {sides[0].toInt(), sides[1].toInt()});
-    parser.isSet(pictures) ? show.TakePictures() : show.Demonstrate();
+    if (parser.isSet(close_ups)) {
+      show.TakeCloseUps();
+    } else {
+      parser.isSet(pictures) ? show.TakePictures() : show.Demonstrate();
+    }
     return EXIT_SUCCESS;
   } catch (const std::exception& fault) {
     std::fprintf(stderr, "%s\n", fault.what());
