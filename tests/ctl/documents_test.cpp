@@ -1,5 +1,6 @@
 // The commands that README.md and the manual show, with tendril-ctl in simulated time. Each document starts with a new
-// folder and new units: those of the tendril-bench command that it shows, or those of the bench itself.
+// folder and new units: on Comm 1 those of the tendril-bench command that it shows, or those of the bench itself; on Comm 2
+// one fresh from the factory.
 #include <QDir>
 #include <QFile>
 #include <QProcess>
@@ -53,6 +54,7 @@ class ShownIn : public CtlTest, public testing::WithParamInterface<QString> {
 
 TEST_P(ShownIn, CommandsPrintWhatIsShown) {
   AttachUnits(TextOf(GetParam()));
+  world_.bench.Attach<VirtualUnit>(2, std::uint8_t{0xFF});
   ASSERT_TRUE(QDir(folder_.path()).mkdir(QStringLiteral("home")));
   QDir::setCurrent(Path("home"));
   QProcess shell;

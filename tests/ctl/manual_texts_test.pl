@@ -28,11 +28,11 @@ for my $source (glob 'src/*/*.{h,cpp,in} src/*/*/*.{h,cpp}') {
     $literal =~ s/\\u([0-9A-Fa-f]{4})/chr hex $1/ge;
     $literal =~ s/&(?=\w)//g;  # marks a menu's key
     $literal =~ s/ +/ /g;
-    $fragments{$_} = $fragments{s/^ //r} = 1 for split /%\d|(?:\\[rnt"])+|(?<=[.!?:])(?= )/, $literal;
+    $fragments{$_} = $fragments{s/^[,;]? | $//r} = 1 for split /%\d|(?:\\[rnt"])+|(?<=[.!?:])(?= )/, $literal;
   }
 }
-$fragments{$_} = 1 for qw(Yes No OK), map { text_of($_) =~ /^Name=(.*)/gm } glob 'packaging/linux/*.desktop';
-my $any = join '|', map { quotemeta } sort grep { !/^\w{0,2}$/ || /^F\d$/ } keys %fragments;
+$fragments{$_} = 1 for map { text_of($_) =~ /^Name=(.*)/gm } glob 'packaging/linux/*.desktop';
+my $any = join '|', 'Yes', 'No', map { quotemeta } sort grep { !/^\w{0,2}$/ || /^F\d$/ } keys %fragments;
 my $composed = qr/^(?:$any)+$/;
 
 my $failed = 0;

@@ -1,7 +1,10 @@
 // The menu bar in the real window: keys, letters, and what they reach.
+#include <QFile>
 #include <QLabel>
 #include <QMenuBar>
+#include <QRegularExpression>
 #include <map>
+#include <set>
 
 #include "window_fixture.h"
 
@@ -51,6 +54,30 @@ TEST_F(Menu, NoKeyAndNoLetterTwice) {
     }
   }
   EXPECT_TRUE(QKeySequence::mnemonic(Find<QAbstractButton>("Command3_2").text()).isEmpty());
+}
+
+// "| Ctrl+Y, Ctrl+Z | *Undo*: more |": each key of the menus is in the manual, and no other.
+TEST_F(Menu, KeysAreThoseOfTheManual) {
+  std::set<std::string> keys;
+  for (const QAction* action : window_->findChildren<QAction*>()) {
+    const QString text = action->text().remove(u'&').trimmed();
+    for (const QKeySequence& key : action->shortcuts())
+      keys.insert(
+          (key.toString() + u' ' + (text.startsWith(u"Channel ") ? text.first(7) : text)).toStdString());
+  }
+  QFile chapter(QStringLiteral(TENDRIL_SOURCES "/docs/manual/keys.md"));
+  ASSERT_TRUE(chapter.open(QIODevice::ReadOnly));
+  const QString text = QString::fromUtf8(chapter.readAll());
+  std::set<std::string> written;
+  const QRegularExpression row(QStringLiteral("(?m)^\\| ([^|]+) \\| \\*([^*]+)\\*"));
+  for (const auto& match : row.globalMatch(text)) {
+    QString named = match.captured(1);
+    named.replace(QStringLiteral("1 to Ctrl+8"),
+                  QStringLiteral("1, Ctrl+2, Ctrl+3, Ctrl+4, Ctrl+5, Ctrl+6, Ctrl+7, Ctrl+8"));
+    for (const QString& key : named.split(QStringLiteral(", ")))
+      written.insert((key + u' ' + match.captured(2)).toStdString());
+  }
+  EXPECT_EQ(written, keys);
 }
 
 TEST_F(Menu, Keys_ChooseChannelsInTheSimulatorViewOnly) {
