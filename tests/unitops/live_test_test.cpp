@@ -62,6 +62,7 @@ class Live : public CommandTest {
       if (!open) test_.OnPortClosed();
     });
     choice_.values = working_.At(2);
+    choice_.values.NeutralPosition = 1600;  // no movement begins or ends there
     world_.bench.Line(1).SetTap([this](const LineByte& byte) { Hear(byte); });
   }
 
