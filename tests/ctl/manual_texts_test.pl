@@ -38,10 +38,10 @@ my $composed = qr/^(?:$any)+$/;
 my $failed = 0;
 for my $chapter (glob 'docs/manual/*.md') {
   my $text = text_of($chapter);
-  $text =~ s/^    .*//gm;       # code
+  $text =~ s/(?<=\n\n)(?: {4}.*\n)+//g;  # code
   $text =~ s/`[^`]*`/`/g;
   $text =~ s/\*\*//g;
-  $text =~ s/^\|/\n|/gm;        # each row stands alone
+  $text =~ s/^\|/\n|/gm;  # each row stands alone
   for my $paragraph (split /\n\s*\n/, $text) {
     $paragraph =~ s/\s+/ /g;
     my $plain = $paragraph =~ s/\*[^*]*\*/*/gr;
