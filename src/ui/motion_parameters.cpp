@@ -58,16 +58,18 @@ struct Test {
 };
 constexpr std::array<Test, LiveTest::kTestButtons> kTests{
     {{"virtual pulse range",
-      "Moves the servo to and fro through its virtual range, until the button is pressed again.",
+      "Moves the servo to and fro through its stored virtual range, beyond the virtual stops, until the "
+      "button is pressed again. Begins and ends at 1500 µs.",
       TestIcon::kSweep, 1, 1, Parameter::kVirtualRange},
      {"virtual stops",
-      "Moves the servo to and fro between its virtual stops, until the button is pressed again.",
+      "Moves the servo to and fro between its stored virtual stops, until the button is pressed again. "
+      "Begins and ends at 1500 µs.",
       TestIcon::kSweep, 4, 2, Parameter::kRightStop},
-     {"default position", "Moves the servo to its default position.", TestIcon::kStep, 6, 1,
+     {"default position", "Moves the servo to its stored default position.", TestIcon::kStep, 6, 1,
       Parameter::kDefaultPosition},
      {"actual pulse range",
       "Warning: goes beyond the virtual stops, to the servo's physical ends. Moves the servo to and fro "
-      "through its whole actual range, until the button is pressed again.",
+      "through its whole stored actual range, until the button is pressed again. Begins and ends at 1500 µs.",
       TestIcon::kDangerSweep, 0, 1, Parameter::kActualRange},
      {"centre", "Moves the servo to the centre, 1500 µs.", TestIcon::kStep, 2, 1, Parameter::kNeutralTrim}}};
 
