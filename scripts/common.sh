@@ -16,7 +16,9 @@ windows_package_packages=(cmark-gfm nsis zip)
 # What testing these packages needs besides.
 test_windows_package_packages=(xvfb xdotool unzip)
 # What making the Debian packages needs besides.
-package_packages=(dpkg-dev file)
+package_packages=(dpkg-dev file lintian desktop-file-utils appstream man-db)
+# What testing these packages needs besides.
+test_package_packages=(debootstrap cmake xvfb xdotool xclip)
 fuzz_packages=(clang-14 libclang-rt-14-dev llvm-14 cmake ninja-build qt6-base-dev libgl-dev)
 coverage_packages=(gcovr)
 check_packages=(clang-format-14 clang-tidy-14 codespell)
@@ -28,6 +30,19 @@ say() { printf '%s\n' "== $*" >&2; }
 # For scripts that go by the list of files that git keeps.
 require_clone() {
   git rev-parse --is-inside-work-tree >/dev/null 2>&1 || { say "$0 needs a clone of the repository, with git"; exit 1; }
+}
+
+# The commit of the sources. Unknown where they are changed, or no clone.
+commit() {
+  local commit
+  commit=$(git describe --always --abbrev=40 --dirty 2>/dev/null) || commit=-dirty
+  [[ $commit != *-dirty ]] && printf '%s\n' "$commit"
+}
+
+# quietly COMMAND [ARGUMENT ...]: shows what it prints only when it fails.
+quietly() {
+  local output
+  output=$("$@" 2>&1) || { printf '%s\n' "$output" >&2; say "Failed: $*"; exit 1; }
 }
 
 # Installs those of the named packages that are missing. Asks for a password only then.
