@@ -5,6 +5,8 @@
 #include <QFile>
 #include <QProcess>
 #include <QRegularExpression>
+#include <string>
+#include <vector>
 
 #include "ctl/ctl_fixture.h"
 
@@ -19,21 +21,21 @@ QString TextOf(const QString& document) {
 }
 
 // The documents that show commands.
-QStringList WithCommands() {
-  QStringList documents{QStringLiteral("README.md")};
+std::vector<std::string> WithCommands() {
+  std::vector<std::string> documents{"README.md"};
   const QDir manual(kSources + QStringLiteral("/docs/manual"));
   for (const QString& chapter : manual.entryList({QStringLiteral("*.md")})) {
     const QString document = QStringLiteral("docs/manual/") + chapter;
-    if (TextOf(document).contains(u"\n    $ ")) documents << document;
+    if (TextOf(document).contains(u"\n    $ ")) documents.push_back(document.toStdString());
   }
   return documents;
 }
 
-class ShownIn : public CtlTest, public testing::WithParamInterface<QString> {
+class ShownIn : public CtlTest, public testing::WithParamInterface<std::string> {
  protected:
   // Attaches what options such as "--unit 0A" and "--fault mute:0B" name.
   void AttachUnits(const QString& text) {
-    const QRegularExpression unit(QStringLiteral("(?<=--)(?:unit |fault ([a-z-]+):)([0-9A-F]{2})"));
+    const QRegularExpression unit(QStringLiteral("--(?:unit |fault ([a-z-]+):)([0-9A-F]{2})"));
     const QString options =
         QRegularExpression(QStringLiteral("`tendril-bench ([^`]*)`")).match(text).captured();
     for (const auto& match :
@@ -53,14 +55,15 @@ class ShownIn : public CtlTest, public testing::WithParamInterface<QString> {
 };
 
 TEST_P(ShownIn, CommandsPrintWhatIsShown) {
-  AttachUnits(TextOf(GetParam()));
+  const QString document = QString::fromStdString(GetParam());
+  AttachUnits(TextOf(document));
   world_.bench.Attach<VirtualUnit>(2, std::uint8_t{0xFF});
   ASSERT_TRUE(QDir(folder_.path()).mkdir(QStringLiteral("home")));
   QDir::setCurrent(Path("home"));
   QProcess shell;
   shell.setReadChannel(QProcess::StandardError);
   shell.start(QStringLiteral("bash"),
-              {kSources + QStringLiteral("/tests/ctl/run_document.sh"), kSources + u'/' + GetParam()});
+              {kSources + QStringLiteral("/tests/ctl/run_document.sh"), kSources + u'/' + document});
   while (shell.canReadLine() || shell.waitForReadyRead()) {
     if (!shell.canReadLine()) continue;
     const int code = Run(QString::fromUtf8(shell.readLine()).chopped(1).split(u'\t'));
@@ -73,7 +76,8 @@ TEST_P(ShownIn, CommandsPrintWhatIsShown) {
 }
 
 INSTANTIATE_TEST_SUITE_P(Manual, ShownIn, testing::ValuesIn(WithCommands()), [](const auto& instance) {
-  return instance.param.section(u'/', -1).remove(QRegularExpression(QStringLiteral("\\W"))).toStdString();
+  QString name = QString::fromStdString(instance.param).section(u'/', -1);
+  return name.remove(QRegularExpression(QStringLiteral("\\W"))).toStdString();
 });
 
 }  // namespace

@@ -16,7 +16,6 @@ tendril-ctl() {
   cat "$scratch/error" >&2
   return "$code"
 }
-sudo() { :; }  # what it runs is tried where a system may be changed
 
 shown=$(sed -n '/^    \$ /,/^$/{/./p}' "$1")
 printed=$(while IFS= read -r line; do
