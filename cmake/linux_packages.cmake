@@ -64,7 +64,6 @@ set(CPACK_DEBIAN_PACKAGE_SOURCE tendril)
 set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
 set(CPACK_DEBIAN_UTILITY_PACKAGE_NAME tendril-utility)
 set(CPACK_DEBIAN_UTILITY_PACKAGE_SECTION electronics)
-set(CPACK_DEBIAN_UTILITY_PACKAGE_DEPENDS qt6-qpa-plugins)  # loaded at run time
 set(CPACK_DEBIAN_UTILITY_PACKAGE_RECOMMENDS "tendril-ctl, qt6-wayland, xdg-utils")  # the last opens the manual
 set(CPACK_DEBIAN_UTILITY_DESCRIPTION [[
 setup of Tendril servo controllers, in a window
