@@ -42,11 +42,15 @@ foreach(component utility ctl bench)
   tendril_install_compressed("${CMAKE_BINARY_DIR}/changelog" changelog "${folder}" ${component})
 endforeach()
 
+set(zsh_folder site-functions)
+if(EXISTS /etc/debian_version)
+  set(zsh_folder vendor-completions)
+endif()
 foreach(component ctl bench)
   install(FILES packaging/completion/tendril-${component}
     DESTINATION "${CMAKE_INSTALL_DATADIR}/bash-completion/completions" COMPONENT ${component})
   install(FILES packaging/completion/_tendril-${component}
-    DESTINATION "${CMAKE_INSTALL_DATADIR}/zsh/vendor-completions" COMPONENT ${component})
+    DESTINATION "${CMAKE_INSTALL_DATADIR}/zsh/${zsh_folder}" COMPONENT ${component})
 endforeach()
 
 set(CPACK_GENERATOR DEB)
