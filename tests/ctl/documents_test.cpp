@@ -20,14 +20,20 @@ QString TextOf(const QString& document) {
   return file.open(QIODevice::ReadOnly) ? QString::fromUtf8(file.readAll()) : QString();
 }
 
-// The documents that show commands.
-std::vector<std::string> WithCommands() {
+std::vector<std::string> EveryDocument() {
   std::vector<std::string> documents{"README.md"};
   const QDir manual(kSources + QStringLiteral("/docs/manual"));
-  for (const QString& chapter : manual.entryList({QStringLiteral("*.md")})) {
-    const QString document = QStringLiteral("docs/manual/") + chapter;
-    if (TextOf(document).contains(u"\n    $ ")) documents.push_back(document.toStdString());
-  }
+  for (const QString& chapter : manual.entryList({QStringLiteral("*.md")}))
+    documents.push_back("docs/manual/" + chapter.toStdString());
+  return documents;
+}
+
+// Those that show commands and what they print.
+std::vector<std::string> WithExamples() {
+  std::vector<std::string> documents = EveryDocument();
+  std::erase_if(documents, [](const std::string& document) {
+    return !TextOf(QString::fromStdString(document)).contains(u"\n    $ ");
+  });
   return documents;
 }
 
@@ -75,7 +81,19 @@ TEST_P(ShownIn, CommandsPrintWhatIsShown) {
   EXPECT_EQ(shell.exitCode(), 0) << shell.readAllStandardOutput().constData();
 }
 
-INSTANTIATE_TEST_SUITE_P(Manual, ShownIn, testing::ValuesIn(WithCommands()), [](const auto& instance) {
+using CommandsInTheText = CtlTest;
+
+TEST_F(CommandsInTheText, Work) {
+  world_.Attach("", 0x01);
+  QDir::setCurrent(folder_.path());
+  const QRegularExpression command(QStringLiteral("`tendril-ctl ([^`]*)`"));
+  for (const std::string& document : EveryDocument()) {
+    for (const auto& match : command.globalMatch(TextOf(QString::fromStdString(document))))
+      EXPECT_EQ(Run(match.captured(1).split(u' ')), 0) << match.captured().toStdString() << terminal_.error;
+  }
+}
+
+INSTANTIATE_TEST_SUITE_P(Manual, ShownIn, testing::ValuesIn(WithExamples()), [](const auto& instance) {
   QString name = QString::fromStdString(instance.param).section(u'/', -1);
   return name.remove(QRegularExpression(QStringLiteral("\\W"))).toStdString();
 });
