@@ -17,11 +17,15 @@ endif()
 set(TENDRIL_MANUAL "${CMAKE_BINARY_DIR}/docs/manual")
 set(TENDRIL_MANUAL_SUFFIX .html)
 
-set(chapters index first-unit numbers configurations live-test many-units control-panel ports no-answer keys support)
+# The contents, and the chapters that they link to.
+set(contents "${documents}/manual/index.md")
+set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS "${contents}")
+file(STRINGS "${contents}" chapters REGEX "^[0-9]+\\. ")
+list(TRANSFORM chapters REPLACE "^.*\\((.*)\\.md\\).*$" "\\1")
+list(PREPEND chapters index)
 list(TRANSFORM chapters PREPEND manual/)
 set(template "${PROJECT_SOURCE_DIR}/packaging/page.html.in")
 set(script "${PROJECT_SOURCE_DIR}/cmake/page.cmake")
-set(contents "${documents}/manual/index.md")
 set(made)
 foreach(document ${chapters} configuration-format)
   set(page "${CMAKE_BINARY_DIR}/docs/${document}.html")
@@ -39,6 +43,7 @@ file(GLOB pictures "${documents}/pictures/*.png")
 set(schemas "${documents}/configuration.schema.json" "${documents}/tendril-ctl.schema.json")
 set(script "${PROJECT_SOURCE_DIR}/cmake/check_links.cmake")
 add_custom_command(OUTPUT "${CMAKE_BINARY_DIR}/docs/links.checked" DEPENDS ${made} ${pictures} ${schemas} "${script}"
+  COMMAND "${CMAKE_COMMAND}" -E rm -rf "${CMAKE_BINARY_DIR}/docs/pictures"
   COMMAND "${CMAKE_COMMAND}" -E copy_directory "${documents}/pictures" "${CMAKE_BINARY_DIR}/docs/pictures"
   COMMAND "${CMAKE_COMMAND}" -E copy ${schemas} "${CMAKE_BINARY_DIR}/docs"
   COMMAND "${CMAKE_COMMAND}" "-DFOLDER=${CMAKE_BINARY_DIR}/docs" -P "${script}"

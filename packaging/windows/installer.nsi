@@ -128,7 +128,7 @@ Section
   File /r "${FOLDER}/*"
   CreateDirectory "$SMPROGRAMS\${PRODUCT}"
   CreateShortcut "$SMPROGRAMS\${PRODUCT}\${PRODUCT}.lnk" "$INSTDIR\tendril-utility.exe"
-  CreateShortcut "$SMPROGRAMS\${PRODUCT}\Demonstration without hardware.lnk" "$INSTDIR\tendril-demo.exe"
+  CreateShortcut "$SMPROGRAMS\${PRODUCT}\Tendril Demonstration.lnk" "$INSTDIR\tendril-demo.exe"
   CreateShortcut "$SMPROGRAMS\${PRODUCT}\Manual.lnk" "$INSTDIR\docs\manual\index.html"
 SectionEnd
 
@@ -146,7 +146,7 @@ Section Uninstall
   Delete "$INSTDIR\uninstall.exe"
   RMDir "$INSTDIR"
   Delete "$SMPROGRAMS\${PRODUCT}\${PRODUCT}.lnk"
-  Delete "$SMPROGRAMS\${PRODUCT}\Demonstration without hardware.lnk"
+  Delete "$SMPROGRAMS\${PRODUCT}\Tendril Demonstration.lnk"
   Delete "$SMPROGRAMS\${PRODUCT}\Manual.lnk"
   RMDir "$SMPROGRAMS\${PRODUCT}"
   DeleteRegKey HKLM "${UNINSTALL_KEY}"

@@ -344,6 +344,7 @@ void frmNewServoConfig::ShowManual() {
       {apply_boxes_, ManualChapter::kConfigurations},
       {live_test_area_, ManualChapter::kLiveTest},
       {line_, ManualChapter::kNoAnswer},
+      {summary_, ManualChapter::kConfigurations},
       {views_, ManualChapter::kNumbers}};
   for (const auto& [area, chapter] : kDescribed) {
     if (area != nullptr && area->isAncestorOf(focusWidget())) {

@@ -34,7 +34,7 @@ class WindowFacts {
   void NotePoll(std::uint8_t unit, bool replied);
   // Whether a servo test runs, or the slider moves the servo.
   bool AnythingMoves() const { return Moving().moves != Moves::kNothing; }
-  // Whether the chosen unit did not answer when it was polled last.
+  // UnitAnswers::Missing() of the chosen unit.
   bool UnitMissing() const { return answers_.Missing(link_.CommPort(), target_.UnitId()); }
 
  private:

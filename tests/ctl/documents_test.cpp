@@ -77,7 +77,7 @@ TEST_P(ShownIn, CommandsPrintWhatIsShown) {
     Save("error", Failure());
     shell.write(QByteArray::number(code) + '\n');
   }
-  shell.waitForFinished();
+  ASSERT_TRUE(shell.waitForFinished()) << "a command does not end";
   EXPECT_EQ(shell.exitCode(), 0) << shell.readAllStandardOutput().constData();
 }
 

@@ -34,10 +34,15 @@ for my $source (glob 'src/*/*.{h,cpp,in} src/*/*/*.{h,cpp}') {
 $fragments{$_} = 1 for map { text_of($_) =~ /^Name=(.*)/gm } glob 'packaging/linux/*.desktop';
 my $any = join '|', 'Yes', 'No', map { quotemeta } sort grep { !/^\w{0,2}$/ || /^F\d$/ } keys %fragments;
 my $composed = qr/^(?:$any)+$/;
+my $single = qr/^\s*(?:$any)\s*$/;
 
 my $failed = 0;
 for my $chapter (glob 'docs/manual/*.md') {
   my $text = text_of($chapter);
+  if ($text =~ /^((?: {0,3}|\t| {5,})\$ .*|```.*)/m) {
+    print "$chapter: this example is not run: $1\n";
+    $failed = 1;
+  }
   $text =~ s/(?<=\n\n)(?: {4}.*\n)+//g;  # code
   $text =~ s/`[^`]*`/`/g;
   $text =~ s/\*\*//g;
@@ -50,8 +55,10 @@ for my $chapter (glob 'docs/manual/*.md') {
     my @pieces = map { grep { /\w/ } split /[*`]/ } @quoted;
     # A variable part within a quoted text is no label.
     (my $outside = $paragraph) =~ s/"(?:[^"*]|\*[^*]*\*)*"//g;
-    push @pieces, map { /$composed/ ? () : split / > |\b\d[\dA-F:]*\b/ } grep { /^[A-Z]/ } $outside =~ /\*([^*]*)\*/g;
-    for my $wrong (grep { /\w/ && !/$composed/ } @pieces) {
+    my @labels = map { /$single/ ? () : split / > |(?= Unit \d)|\b\d[\dA-F:]*\b/ }
+      grep { /^[A-Z]/ } $outside =~ /\*([^*]*)\*/g;
+    push @labels, grep { !/^Ctrl\+[1-8]$/ } $paragraph =~ /\bCtrl\+(?:Shift\+)?\w+/g;
+    for my $wrong ((grep { /\w/ && !/$composed/ } @pieces), grep { /\w/ && !/$single/ } @labels) {
       print "$chapter: the sources do not have \"$wrong\".\n";
       $failed = 1;
     }

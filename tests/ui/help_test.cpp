@@ -48,8 +48,12 @@ TEST_F(Window, Manual_OpensTheChapterThatFits) {
   ChooseByKeys("cmbNYX", 1);
   Run("Command3_1");
   EXPECT_EQ(opened(), "no-answer");
-  Keys("Ctrl+PgDown");
+  Keys("Ctrl+PgUp");
   EXPECT_EQ(opened(), "first-unit") << "this unit was not asked; the focus is on the connection";
+  Run("Command3_2");
+  EXPECT_EQ(opened(), "no-answer") << "its ID was to be changed: every unit was asked";
+  world_.bench.Attach<VirtualUnit>(1, std::uint8_t{0x02});
+  Run("Command3_1");
   Keys("Ctrl+1");
   Spin("spnDefaultPos").setFocus();
   EXPECT_EQ(opened(), "numbers");
@@ -64,7 +68,7 @@ TEST_F(Window, Manual_OpensTheChapterThatFits) {
 TEST_F(Window, Manual_IsOpenedOrTheUserSeesWhereItIs) {
   QTextBrowser viewer;
   QDesktopServices::setUrlHandler(QStringLiteral("file"), &viewer, "setSource");
-  for (int i = 0; i <= static_cast<int>(ManualChapter::kSupport); ++i) {
+  for (int i = 0; i <= static_cast<int>(ManualChapter::kNoAnswer); ++i) {
     const QString sentence = OpenManual(ManualChapter(i), world_.boxes);
     EXPECT_THAT(sentence.toStdString(),
                 HasSubstr(QDir::toNativeSeparators(viewer.source().toLocalFile()).toStdString()));
@@ -73,7 +77,7 @@ TEST_F(Window, Manual_IsOpenedOrTheUserSeesWhereItIs) {
   EXPECT_TRUE(world_.boxes.Take().empty());
 
   QDesktopServices::unsetUrlHandler(QStringLiteral("file"));
-  EXPECT_EQ(OpenManual(ManualChapter::kSupport, world_.boxes), QString());  // this platform opens nothing
+  EXPECT_EQ(OpenManual(ManualChapter::kNoAnswer, world_.boxes), QString());  // this platform opens nothing
   ASSERT_EQ(world_.boxes.shown.size(), 1u);
   EXPECT_THAT(world_.boxes.shown[0].text,
               HasSubstr(QDir::toNativeSeparators(viewer.source().toLocalFile()).toStdString()));

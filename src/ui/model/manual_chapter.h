@@ -7,19 +7,16 @@
 
 namespace tendril {
 
-// In the order of the manual's contents.
+// Those that the window opens. The contents lead to the others.
 enum class ManualChapter {
   kContents,
   kFirstUnit,
   kNumbers,
   kConfigurations,
   kLiveTest,
-  kManyUnits,
   kControlPanel,
   kPorts,
-  kNoAnswer,
-  kKeys,
-  kSupport
+  kNoAnswer
 };
 
 // The name of the chapter's file, without a suffix.
@@ -33,7 +30,7 @@ struct ManualFacts {
   ManualChapter focus = ManualChapter::kContents;  // what describes the controls that the user works with
 };
 
-// What moves comes first, then what is wrong, then what the user works with.
+// What moves comes first, then what is wrong, then what the user works with. Without a port nothing is wrong yet.
 ManualChapter FittingChapter(const ManualFacts& facts);
 
 }  // namespace tendril

@@ -1,6 +1,7 @@
 #include "ui/model/unit_answers.h"
 
 #include "platform/hex_text.h"
+#include "serial/packets.h"
 
 namespace tendril {
 
@@ -9,7 +10,8 @@ void UnitAnswers::Note(std::int16_t port, std::uint8_t unit, bool replied, const
 }
 
 bool UnitAnswers::Missing(std::int16_t port, std::uint8_t unit) const {
-  const auto poll = polls_.find({port, unit});
+  auto poll = polls_.find({port, unit});
+  if (poll == polls_.end()) poll = polls_.find({port, kAllUnits});
   return poll != polls_.end() && !poll->second.replied;
 }
 

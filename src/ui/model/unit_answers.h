@@ -14,7 +14,7 @@ class UnitAnswers {
   // `unit` on comm port `port` was polled at `time` ("14:02"), and has replied or not.
   void Note(std::int16_t port, std::uint8_t unit, bool replied, const std::string& time);
 
-  // Whether `unit` did not answer when it was polled last.
+  // Whether `unit` did not answer when it was polled last, or, before its first poll, when every unit was.
   bool Missing(std::int16_t port, std::uint8_t unit) const;
 
   // "Unit 01 answered at 14:02", "Unit 01: no answer at 14:02", "Unit 01: not asked yet".

@@ -7,20 +7,24 @@
 namespace tendril {
 namespace {
 
-TEST(ManualChapter, IsAboutThePortWhileThatIsNotOpen) {
+TEST(ManualChapter, IsAboutWhatMovesOrIsWrongBeforeWhatTheUserWorksWith) {
   struct Case {
-    PortFacts port;
+    ManualFacts facts;
     std::string_view page;
   };
-  for (const auto& [port, page] : std::vector<Case>{
-           {{.any_listed = false}, "ports"},
-           {{}, "first-unit"},
-           {{.chosen = 3, .fault = PortFault::kNotAllowed}, "ports"},
-           {{.chosen = 3, .open = 2, .fault = PortFault::kControlPanelHasIt}, "control-panel"},
-           {{.chosen = 3, .requested = 3, .request = PortControl::kUnanswered}, "control-panel"},
-           {{.chosen = 3, .fault = PortFault::kGone, .requested = 2}, "ports"},
-           {{.chosen = 3, .open = 3, .requested = 3}, "numbers"}}) {
-    EXPECT_EQ(PageOf(FittingChapter({.port = port, .focus = ManualChapter::kNumbers})), page);
+  constexpr auto kNumbers = ManualChapter::kNumbers;
+  const PortFacts open{.chosen = 3, .open = 3, .requested = 3};
+  for (const auto& [facts, page] : std::vector<Case>{
+           {{.moves = true, .port = {.chosen = 3, .fault = PortFault::kGone}}, "live-test"},
+           {{.port = {.any_listed = false}}, "ports"},
+           {{.focus = ManualChapter::kFirstUnit}, "first-unit"},
+           {{.port = {.any_listed = false}, .focus = kNumbers}, "numbers"},
+           {{.port = {.chosen = 3, .fault = PortFault::kNotAllowed}, .focus = kNumbers}, "ports"},
+           {{.port = {.chosen = 3, .open = 2, .fault = PortFault::kControlPanelHasIt}}, "control-panel"},
+           {{.port = {.chosen = 3, .fault = PortFault::kGone, .requested = 3}}, "ports"},
+           {{.port = open, .no_answer = true, .focus = kNumbers}, "no-answer"},
+           {{.port = open, .focus = kNumbers}, "numbers"}}) {
+    EXPECT_EQ(PageOf(FittingChapter(facts)), page);
   }
 }
 
