@@ -5,14 +5,15 @@
 use strict;
 use warnings;
 use utf8;
-use open qw(:std :encoding(UTF-8));
 use File::Basename;
+
+binmode STDOUT, ':utf8';
 
 chdir dirname(__FILE__) . '/../..' or die;
 
 sub text_of {
   my ($path) = @_;
-  open my $file, '<', $path or die "$path: $!";
+  open my $file, '<:utf8', $path or die "$path: $!";
   local $/;
   return <$file>;
 }
