@@ -1,6 +1,8 @@
 // The user's manual.
 #pragma once
 
+#include <QString>
+
 #include "platform/message_boxes.h"
 #include "ui/model/manual_chapter.h"
 
