@@ -17,26 +17,36 @@ endif()
 set(TENDRIL_MANUAL "${CMAKE_BINARY_DIR}/docs/manual")
 set(TENDRIL_MANUAL_SUFFIX .html)
 
-# The contents, and the chapters that they link to.
-set(contents "${documents}/manual/index.md")
-set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS "${contents}")
-file(STRINGS "${contents}" chapters REGEX "^[0-9]+\\. ")
-list(TRANSFORM chapters REPLACE "^.*\\((.*)\\.md\\).*$" "\\1")
-list(PREPEND chapters index)
-list(TRANSFORM chapters PREPEND manual/)
-set(template "${PROJECT_SOURCE_DIR}/packaging/page.html.in")
-set(script "${PROJECT_SOURCE_DIR}/cmake/page.cmake")
+# tendril_page(<document> [<page>=<text> ...]): docs/<document>.md as a page, with these links above and below. A page is
+# named without its suffix.
 set(made)
-foreach(document ${chapters} configuration-format)
+function(tendril_page document)
+  set(input "${documents}/${document}.md")
   set(page "${CMAKE_BINARY_DIR}/docs/${document}.html")
-  add_custom_command(OUTPUT "${page}" DEPENDS "${documents}/${document}.md" "${contents}" "${template}" "${script}"
-    COMMAND "${CMAKE_COMMAND}" "-DCMARK=${TENDRIL_CMARK}" "-DTEMPLATE=${template}" "-DCONTENTS=${contents}"
-            "-DINPUT=${documents}/${document}.md" "-DOUTPUT=${page}" -P "${script}"
+  set(template "${PROJECT_SOURCE_DIR}/packaging/page.html.in")
+  set(script "${PROJECT_SOURCE_DIR}/cmake/page.cmake")
+  add_custom_command(OUTPUT "${page}" DEPENDS "${input}" "${template}" "${script}"
+    COMMAND "${CMAKE_COMMAND}" "-DCMARK=${TENDRIL_CMARK}" "-DTEMPLATE=${template}" "-DINPUT=${input}" "-DOUTPUT=${page}"
+            "-DLINKS=${ARGN}" -P "${script}"
     COMMENT "Writing ${document}.html" VERBATIM)
-  list(APPEND made "${page}")
   cmake_path(GET document PARENT_PATH folder)
   install(FILES "${page}" DESTINATION "${CMAKE_INSTALL_DOCDIR}/${folder}" COMPONENT utility)
+  set(made ${made} "${page}" PARENT_SCOPE)
+endfunction()
+
+# The chapters are those that the contents link to. Each leads to the next one.
+set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS "${documents}/manual/index.md")
+file(STRINGS "${documents}/manual/index.md" chapters REGEX "^[0-9]+\\. ")
+list(TRANSFORM chapters REPLACE "^[0-9]+\\. .(.*)\\]\\((.*)\\.md\\)$" "\\2=\\1")
+list(REVERSE chapters)
+set(next)
+foreach(chapter IN LISTS chapters)
+  string(REGEX REPLACE "=.*" "" name "${chapter}")
+  tendril_page(manual/${name} "index=Contents" ${next})
+  string(REPLACE "=" "=Next: " next "${chapter}")
 endforeach()
+tendril_page(manual/index)
+tendril_page(configuration-format "manual/index=Manual")
 
 # Beside the pages, what they link to.
 file(GLOB pictures "${documents}/pictures/*.png")

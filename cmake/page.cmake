@@ -1,6 +1,6 @@
-# cmake -DCMARK=... -DTEMPLATE=... -DCONTENTS=... -DINPUT=X.md -DOUTPUT=X.html -P page.cmake: a document as a page for any
-# browser. A heading can be linked to under the name that Markdown's viewers give it. A chapter, which is one that the file
-# with the CONTENTS links to, leads to the next one.
+# cmake -DCMARK=... -DTEMPLATE=... -DINPUT=X.md -DOUTPUT=X.html -DLINKS=... -P page.cmake: a document as a page for any
+# browser, with the LINKS (page=text) above and below. A heading can be linked to under the name that Markdown's viewers
+# give it.
 execute_process(COMMAND "${CMARK}" --extension table --to html "${INPUT}"
   OUTPUT_VARIABLE body COMMAND_ERROR_IS_FATAL ANY)
 string(REGEX REPLACE "href=\"([a-z./-]+)\\.md" "href=\"\\1.html" body "${body}")
@@ -27,29 +27,8 @@ foreach(heading IN LISTS headings)
 endforeach()
 string(REPLACE "${semicolon}" ";" body "${body}")
 
-set(navigation "")
-cmake_path(GET INPUT FILENAME chapter)
-file(STRINGS "${CONTENTS}" entries REGEX "^[0-9]+\\. \\[[^]]*\\]\\([a-z-]*\\.md\\)")
-list(TRANSFORM entries REPLACE "^[0-9]+\\. .([^]]*)\\]\\(([a-z-]*\\.md)\\).*" "\\2=\\1")
-list(FIND entries "${chapter}=${title}" at)
-if(at GREATER_EQUAL 0)
-  string(APPEND navigation "<a href=\"index.html\">Contents</a>")
-  math(EXPR at "${at} + 1")
-  list(LENGTH entries count)
-  if(at LESS count)
-    list(GET entries ${at} next)
-    string(REGEX REPLACE "^(.*)\\.md=(.*)" "<a href=\"\\1.html\">Next: \\2</a>" next "${next}")
-    string(APPEND navigation " · ${next}")
-  endif()
-else()
-  cmake_path(GET INPUT PARENT_PATH folder)
-  cmake_path(GET CONTENTS PARENT_PATH chapters)
-  if(NOT folder STREQUAL chapters)
-    set(navigation "<a href=\"manual/index.html\">Manual</a>")
-  elseif(NOT INPUT STREQUAL CONTENTS)
-    message(FATAL_ERROR "${CONTENTS} has no entry \"[${title}](${chapter})\".")
-  endif()
-endif()
+list(TRANSFORM LINKS REPLACE "^([^=]*)=(.*)$" "<a href=\"\\1.html\">\\2</a>")
+list(JOIN LINKS " · " navigation)
 if(navigation)
   set(navigation "<nav>${navigation}</nav>\n")
 endif()

@@ -1,4 +1,5 @@
-# The licences of the libraries that are installed for Windows. scripts/qt-windows puts them beside Qt. Qt from elsewhere comes with licences of its own.
+# The licences of the libraries that are installed for Windows. scripts/qt-windows puts them beside Qt. Qt from elsewhere
+# comes with licences of its own.
 get_target_property(qt_core Qt6::Core IMPORTED_LOCATION_RELEASE)
 get_filename_component(qt "${qt_core}/../.." ABSOLUTE)
 if(EXISTS "${qt}/source-version")

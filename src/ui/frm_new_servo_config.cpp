@@ -338,7 +338,7 @@ void frmNewServoConfig::SayUnitId() {
 void frmNewServoConfig::ShowManual() {
   ManualFacts facts{
       .moves = facts_.AnythingMoves(), .port = ports_.Facts(), .no_answer = facts_.UnitMissing()};
-  const std::pair<const QWidget*, ManualChapter> kDescribed[] = {
+  const std::pair<const QWidget*, ManualChapter> described[] = {
       {connection_, ManualChapter::kFirstUnit},
       {command_area_, ManualChapter::kConfigurations},
       {apply_boxes_, ManualChapter::kConfigurations},
@@ -346,7 +346,7 @@ void frmNewServoConfig::ShowManual() {
       {line_, ManualChapter::kNoAnswer},
       {summary_, ManualChapter::kConfigurations},
       {views_, ManualChapter::kNumbers}};
-  for (const auto& [area, chapter] : kDescribed) {
+  for (const auto& [area, chapter] : described) {
     if (area != nullptr && area->isAncestorOf(focusWidget())) {
       facts.focus = chapter;
       break;
